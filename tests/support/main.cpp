@@ -1,0 +1,17 @@
+// The main of every test program: unattended, so no dialog of the system may wait for a person.
+
+#include <gtest/gtest.h>
+
+#include "platform/win32.h"
+
+#ifdef _WIN32
+static void SilenceDialogs() { SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOGPFAULTERRORBOX | SEM_NOOPENFILEERRORBOX); }
+#else
+static void SilenceDialogs() {}
+#endif
+
+int main(int argc, char** argv) {
+  SilenceDialogs();
+  testing::InitGoogleTest(&argc, argv);
+  return RUN_ALL_TESTS();
+}
