@@ -1,0 +1,47 @@
+// The instance handles of one module, used to look up its resources.
+//
+// Written when a module is attached, read afterwards; not locked.
+#pragma once
+
+#include "platform/win32.h"
+#include "qxcore/core/export.h"
+#include "qxcore/string/string.h"
+
+class QXCORE_API SModuleState {
+ public:
+  // All handles null, not initialised.
+  constexpr SModuleState() noexcept = default;
+  SModuleState(const SModuleState&) = default;
+  SModuleState& operator=(const SModuleState&) = default;
+
+  // Takes `instance` as module and resource handle, the first time only; later calls do nothing.
+  void Init(HINSTANCE instance);
+
+  int IsInitialized() const { return m_initialized; }
+  HINSTANCE GetInstance() const { return m_instance; }
+  HINSTANCE GetResInstance() const { return m_resInstance; }
+  HINSTANCE GetLangResInstance() const { return m_langResInstance; }
+
+  // Text `id` of the resource handle's string table; empty when there is none.
+  SString LoadStringW(unsigned int id);
+  // The same text, formatted with the arguments like SString::Format.
+  SString Format(unsigned int id, ...);
+
+ protected:
+  // Redirects the resource handle and gives back the former one. A null handle changes nothing and
+  // gives null.
+  static HINSTANCE SetResInstance(SModuleState* state, HINSTANCE instance);
+
+ private:
+  std::int32_t m_initialized = 0;
+  HINSTANCE m_instance = nullptr;
+  HINSTANCE m_resInstance = nullptr;
+  HINSTANCE m_langResInstance = nullptr;  // a satellite with localised resources, if a client sets one
+};
+
+// The library's own state, initialised with the library's handle.
+QXCORE_API SModuleState* SCoreGetModuleState();
+
+// The module in which a resource is looked up when a caller names none: the library's resource
+// handle. `name` and `type` are resource names or ordinals as FindResourceW takes them.
+QXCORE_API HINSTANCE SGetResInstance(const WCHAR* name, const WCHAR* type);

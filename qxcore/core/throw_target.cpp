@@ -1,0 +1,60 @@
+#include "qxcore/core/throw_target.h"
+
+#include <new>
+
+#include "qxcore/container/map.h"
+#include "qxcore/string/string_iterators.h"
+#include "qxcore/string/text_search.h"
+
+namespace {
+
+using Registry = SMap<SString, std::int32_t, SAscStrCas>;
+
+// Lives as long as the process: targets of other modules may end after everything here.
+Registry& TheRegistry() {
+  alignas(Registry) static unsigned char storage[sizeof(Registry)];
+  static Registry* registry = new (storage) Registry;
+  return *registry;
+}
+
+}  // namespace
+
+SString STargetedException::GetMessageText() const { return m_text; }
+std::int32_t STargetedException::GetValue() const { return m_value; }
+
+int STargetedException::HasTarget() const {
+  for (parts_iterator name(m_targets, WTEXT(',')); name; ++name) {
+    const std::int32_t* count = TheRegistry().Retrieve(*name);
+    if (count != nullptr && *count > 0) return 1;
+  }
+  return 0;
+}
+
+int STargetedException::Match(const SThrowTarget& target) const {
+  SStringView names = target.GetNames().View();
+  for (parts_iterator name(m_targets, WTEXT(',')); name; ++name) {
+    SStringView wanted = name.View();
+    for (std::size_t at = names.find(wanted); at != SStringView::npos; at = names.find(wanted, at + 1)) {
+      std::size_t end = at + wanted.size();
+      if (end == names.size() || names[end] == WTEXT(',')) return 1;
+    }
+  }
+  return 0;
+}
+
+void SThrowTarget::Activate() {
+  if (m_active != 0) return;
+  // All names are made known before one is counted, so that a failure counts none.
+  for (parts_iterator name(m_names, WTEXT(',')); name; ++name) TheRegistry()[*name];
+  m_active = 1;
+  for (parts_iterator name(m_names, WTEXT(',')); name; ++name) ++TheRegistry()[*name];
+}
+
+void SThrowTarget::Done() noexcept {
+  if (m_active == 0) return;
+  m_active = 0;
+  for (parts_iterator name(m_names, WTEXT(',')); name; ++name) {
+    std::int32_t* count = TheRegistry().Retrieve(*name);
+    if (count != nullptr) --*count;
+  }
+}

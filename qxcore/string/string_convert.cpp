@@ -1,0 +1,124 @@
+// Code pages, classification and numbers of SString.
+
+#include <cstdlib>
+
+#include "platform/wide.h"
+#include "qxcore/string/string.h"
+#include "qxcore/string/text_conversion.h"
+
+// --- code pages ---
+
+void SString::CharToOemW() {
+  // Each character becomes one byte of the OEM page, kept as a character of that value; a character
+  // that takes two bytes there becomes two characters.
+  SString converted;
+  for (WCHAR c : *this) {
+    char bytes[8];
+    int count = WideCharToMultiByte(CP_OEMCP, 0, &c, 1, bytes, sizeof bytes, nullptr, nullptr);
+    for (int i = 0; i < count; ++i) converted += static_cast<WCHAR>(static_cast<unsigned char>(bytes[i]));
+  }
+  *this = converted;
+}
+
+void SString::OemToCharW() {
+  SString bytes = *this;
+  SString converted;
+  for (int i = 0; i < Length(); ++i) {
+    char pair[2] = {static_cast<char>(m_text[i]), static_cast<char>(i + 1 < Length() ? m_text[i + 1] : 0)};
+    bool isLead = IsDBCSLeadByteEx(CP_OEMCP, static_cast<BYTE>(pair[0])) && pair[1] != 0;
+    WCHAR characters[4];
+    int count = MultiByteToWideChar(CP_OEMCP, 0, pair, isLead ? 2 : 1, characters, 4);
+    converted += SStringView(characters, static_cast<std::size_t>(count));
+    if (isLead) ++i;
+  }
+  *this = converted;
+}
+
+char* SString::ToAnsi(char* dst) const {
+  Swcstombsz(dst, m_text, static_cast<unsigned>(Length()));
+  return dst;
+}
+
+WCHAR* SString::ToUnicode(WCHAR* dst) const {
+  std::memcpy(dst, m_text, (static_cast<std::size_t>(Length()) + 1) * sizeof(WCHAR));
+  return dst;
+}
+
+int SString::CanConvertToMBCS() const {
+  UINT page = GetACP();
+  if (IsEmpty()) return 1;
+  BOOL usedDefault = FALSE;
+  bool isUtf8 = page == CP_UTF8;
+  DWORD flags = isUtf8 ? WC_ERR_INVALID_CHARS : WC_NO_BEST_FIT_CHARS;
+  int bytes = WideCharToMultiByte(page, flags, m_text, Length(), nullptr, 0, nullptr, isUtf8 ? nullptr : &usedDefault);
+  return bytes > 0 && !usedDefault;
+}
+
+// --- classification ---
+
+#define QXCORE_CLASSIFY(Member, condition)          \
+  int SString::Member(int index) const {            \
+    if (index < 0 || index >= Length()) return 0;   \
+    WCHAR c = m_text[index];                        \
+    return (condition) ? 1 : 0;                     \
+  }
+
+QXCORE_CLASSIFY(IsASCII, c < 0x80)
+QXCORE_CLASSIFY(IsAlpha, platform::IsAlpha(c))
+QXCORE_CLASSIFY(IsAlphaNum, platform::IsAlpha(c) || platform::IsDigit(c))
+QXCORE_CLASSIFY(IsDigit, platform::IsDigit(c))
+QXCORE_CLASSIFY(IsLower, platform::IsLower(c))
+QXCORE_CLASSIFY(IsUpper, platform::IsUpper(c))
+QXCORE_CLASSIFY(IsWhitespace, platform::IsSpace(c))
+QXCORE_CLASSIFY(IsXDigit, platform::IsXDigit(c))
+
+static bool IsSign(WCHAR c) { return c == WTEXT('+') || c == WTEXT('-'); }
+static bool IsDecimal(WCHAR c) { return c >= WTEXT('0') && c <= WTEXT('9'); }
+
+int SString::IsInteger() const {
+  const WCHAR* at = m_text + (IsSign(m_text[0]) ? 1 : 0);
+  if (at == end()) return 0;
+  for (; at != end(); ++at) {
+    if (!IsDecimal(*at)) return 0;
+  }
+  return 1;
+}
+
+static const WCHAR* SkipDecimals(const WCHAR* at) {
+  while (IsDecimal(*at)) ++at;
+  return at;
+}
+
+int SString::IsNumber() const {
+  const WCHAR* at = m_text + (IsSign(m_text[0]) ? 1 : 0);
+  const WCHAR* whole = SkipDecimals(at);
+  bool hasDigits = whole != at;
+  at = whole;
+  if (*at == WTEXT('.')) {
+    const WCHAR* fraction = SkipDecimals(at + 1);
+    hasDigits = hasDigits || fraction != at + 1;
+    at = fraction;
+  }
+  if (!hasDigits) return 0;
+  if (*at == WTEXT('e') || *at == WTEXT('E')) {
+    const WCHAR* exponent = at + 1 + (IsSign(at[1]) ? 1 : 0);
+    at = SkipDecimals(exponent);
+    if (at == exponent) return 0;
+  }
+  return at == end();
+}
+
+int SString::IsRtf() const { return IsRtfText(m_text); }
+
+int SString::IsRtfText(const WCHAR* text) {
+  if (text == nullptr) return 0;
+  SStringView view(text);
+  return view.substr(0, 5) == WTEXT("{\\rtf") || view.substr(0, 6) == WTEXT("{\\urtf");
+}
+
+// --- numbers ---
+
+long SString::ToLONG() const { return platform::WideToLong(m_text); }
+unsigned long SString::ToULONG() const { return platform::WideToUnsignedLong(m_text); }
+double SString::ToDouble() const { return platform::WideToDouble(m_text); }
+int SString::ToBOOL() const { return CompareNoCase(Yes) == 0 || ToLONG() != 0; }

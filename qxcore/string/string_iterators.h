@@ -1,0 +1,125 @@
+// Iterators over an SString's words, lines, separated parts and characters.
+//
+// They refer to the string, which must stay alive and unchanged meanwhile. The token iterators yield
+// each token as a new SString and are false once they stand behind the last one:
+//   for (word_iterator word(text); word; ++word) Use(*word);
+// A token that begins at the very end of the text still counts where a separator stands before it
+// (parts: "a," has two), or where it is the first token of an empty text (parts and lines: one, empty).
+// A line end at the end of the text does not begin another line; white space at the end no word.
+#pragma once
+
+#include "platform/win32.h"
+#include "qxcore/core/export.h"
+#include "qxcore/string/string.h"
+
+// What the three token iterators share; only they differ in where a token ends and the next begins.
+class QXCORE_API STokenIterator {
+ public:
+  // The current token; empty when it has no characters or the iterator stands behind the last one.
+  SString operator*() const { return SString(SStringView(m_start, static_cast<std::size_t>(m_end - m_start))); }
+  const WCHAR* GetPointer() const { return m_start; }  // first character of the current token
+  SStringView View() const { return SStringView(m_start, static_cast<std::size_t>(m_end - m_start)); }
+  explicit operator bool() const { return !m_isDone; }
+  bool operator==(const STokenIterator& other) const {
+    return m_text == other.m_text && m_start == other.m_start && m_isDone == other.m_isDone;
+  }
+
+ protected:
+  explicit STokenIterator(const SString& text) : m_text(&text), m_start(text), m_restart(&text), m_end(m_start) {}
+  const WCHAR* TextEnd() const { return m_text->end(); }
+  void Finish() {
+    m_start = m_end = TextEnd();
+    m_isDone = true;
+  }
+
+  const SString* m_text;
+  const WCHAR* m_start;
+  const SString* m_restart;
+  const WCHAR* m_end;
+  bool m_isDone = false;
+};
+
+// Runs of characters that are not white space. The first token begins at the beginning of the string,
+// and is empty when the string begins with white space; that is meant.
+class QXCORE_API word_iterator : public STokenIterator {
+ public:
+  explicit word_iterator(const SString& text) : STokenIterator(text) { reset(); }
+  word_iterator& operator++();
+  word_iterator operator++(int) {
+    word_iterator before = *this;
+    ++*this;
+    return before;
+  }
+  void reset();  // back to the first token
+
+ private:
+  void ScanEnd();
+};
+
+// Lines; carriage return, line feed, or one after the other end a line.
+class QXCORE_API line_iterator : public STokenIterator {
+ public:
+  explicit line_iterator(const SString& text) : STokenIterator(text) { reset(); }
+  line_iterator& operator++();
+  line_iterator operator++(int) {
+    line_iterator before = *this;
+    ++*this;
+    return before;
+  }
+  void reset();
+
+ private:
+  void ScanEnd();
+};
+
+// Parts between separators; two adjacent separators hold an empty part, one at the end is followed by one.
+class QXCORE_API parts_iterator : public STokenIterator {
+ public:
+  parts_iterator(const SString& text, WCHAR separator) : STokenIterator(text), m_separator(separator) { reset(); }
+  parts_iterator& operator++();
+  parts_iterator operator++(int) {
+    parts_iterator before = *this;
+    ++*this;
+    return before;
+  }
+  void reset();
+
+ private:
+  void ScanEnd();
+
+  WCHAR m_separator;
+};
+
+// Walks characters. Reading at the end gives the terminator.
+class QXCORE_API const_iterator {
+ public:
+  explicit const_iterator(const SString& text, int start = 0) : m_text(&text), m_at(text.GetPointerAt(start)) {}
+  WCHAR operator*() const { return *m_at; }
+  const_iterator& operator++() {
+    ++m_at;
+    return *this;
+  }
+  const_iterator operator++(int) {
+    const_iterator before = *this;
+    ++m_at;
+    return before;
+  }
+  const_iterator& operator+=(int n) {
+    m_at += n;
+    return *this;
+  }
+  auto operator<=>(const const_iterator& other) const { return m_at <=> other.m_at; }
+  bool operator==(const const_iterator& other) const { return m_at == other.m_at; }
+  explicit operator bool() const { return m_at < m_text->end(); }
+  const WCHAR* GetPointer() const { return m_at; }
+  bool IsEoln() const { return *m_at == WTEXT('\r') || *m_at == WTEXT('\n'); }
+  bool IsWhitespace() const;
+  void SaveState() { m_saved = m_at; }
+  void RestoreState() { m_at = m_saved != nullptr ? m_saved : m_at; }  // nothing where none was saved
+  void reset() { m_at = *m_text; }
+
+ private:
+  const SString* m_text;
+  const WCHAR* m_at;
+  const WCHAR* m_saved = nullptr;
+};

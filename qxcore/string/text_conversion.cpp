@@ -1,0 +1,96 @@
+#include "qxcore/string/text_conversion.h"
+
+#include <cstring>
+
+#include "qxcore/string/string.h"
+
+char* ST2UTF8Helper(char* dst, const WCHAR* src, int max) {
+  char* out = dst;
+  for (int i = 0; i < max && src[i] != 0; ++i) {
+    unsigned c = static_cast<unsigned>(src[i]);
+    if (c < 0x80) {
+      *out++ = static_cast<char>(c);
+    } else if (c < 0x800) {
+      *out++ = static_cast<char>(0xC0 | c >> 6);
+      *out++ = static_cast<char>(0x80 | (c & 0x3F));
+    } else {
+      *out++ = static_cast<char>(0xE0 | c >> 12);
+      *out++ = static_cast<char>(0x80 | (c >> 6 & 0x3F));
+      *out++ = static_cast<char>(0x80 | (c & 0x3F));
+    }
+  }
+  *out = 0;
+  return dst;
+}
+
+WCHAR* SUTF82THelper(WCHAR* dst, const char* src, int max) {
+  WCHAR* out = dst;
+  for (int i = 0; i < max && *src != 0; ++i) {
+    unsigned lead = static_cast<unsigned char>(*src++);
+    if (lead < 0x80) {
+      *out++ = static_cast<WCHAR>(lead);
+    } else if (lead >= 0xC0 && lead < 0xF0) {
+      unsigned value = lead < 0xE0 ? lead & 0x1F : lead & 0x0F;
+      for (int more = lead < 0xE0 ? 1 : 2; more > 0; --more) {
+        if (*src == 0) goto cut;
+        value = value << 6 | (static_cast<unsigned char>(*src++) & 0x3F);
+      }
+      *out++ = static_cast<WCHAR>(value);
+    }
+  }
+cut:
+  *out = 0;
+  return dst;
+}
+
+int g_bSwcstombszHadLoss = 0;
+
+int Swcstombsz(char* dst, const WCHAR* src, unsigned int n) {
+  if (dst != nullptr) *dst = 0;
+  if (src == nullptr || (dst == nullptr && n != 0)) return 0;
+  g_bSwcstombszHadLoss = 0;
+  int size = dst != nullptr ? static_cast<int>(2 * n + 1) : 0;
+  int written;
+  if (GetACP() == CP_UTF8) {  // takes neither these flags nor a default character
+    written = WideCharToMultiByte(CP_UTF8, 0, src, -1, dst, size, nullptr, nullptr);
+  } else {
+    BOOL usedDefault = FALSE;
+    written = WideCharToMultiByte(CP_ACP, WC_COMPOSITECHECK | WC_DEFAULTCHAR, src, -1, dst, size, nullptr, &usedDefault);
+    g_bSwcstombszHadLoss = usedDefault;
+  }
+  if (written == 0 && dst != nullptr) *dst = 0;
+  return written;
+}
+
+int Smbstowcsz(WCHAR* dst, const char* src, unsigned int n) {
+  if (dst != nullptr) *dst = 0;
+  if (src == nullptr || (dst == nullptr && n != 0)) return 0;
+  int written = MultiByteToWideChar(CP_ACP, 0, src, -1, dst, dst != nullptr ? static_cast<int>(n + 1) : 0);
+  if (written == 0 && dst != nullptr) *dst = 0;
+  return written;
+}
+
+static bool WidenASCII(WCHAR* dst, const char* src, int count) {
+  unsigned seen = 0;
+  for (int i = 0; i < count; ++i) {
+    unsigned byte = static_cast<unsigned char>(src[i]);
+    dst[i] = static_cast<WCHAR>(byte);
+    seen |= byte;
+  }
+  return seen < 0x80;
+}
+
+SString SAnsiToString(const char* text, int count) {
+  SString converted;
+  if (text == nullptr || count <= 0) return converted;
+  if (const void* end = std::memchr(text, 0, static_cast<std::size_t>(count))) {
+    count = static_cast<int>(static_cast<const char*>(end) - text);
+  }
+  if (count == 0) return converted;
+  if (!WidenASCII(converted.GetBufferSetLength(count), text, count)) {
+    int length = MultiByteToWideChar(CP_ACP, 0, text, count, nullptr, 0);
+    WCHAR* buffer = converted.Lock(length);
+    converted.Unlock(MultiByteToWideChar(CP_ACP, 0, text, count, buffer, length));
+  }
+  return converted;
+}
