@@ -1,0 +1,169 @@
+// Owning doubly linked lists: the untyped __SList and its typed shell SList<T>.
+//
+// Nodes never move: the address of an element is valid until it is erased. Inserting and erasing are
+// O(1), access by position is O(n). Not for lists of objects that carry their own links: see SDList.
+// Only inserting allocates; a failure throws SEOutOfMemory and leaves the list as it was.
+//
+// Threads: one list is for one thread at a time; different lists are independent.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <initializer_list>
+#include <iterator>
+#include <new>
+#include <utility>
+
+#include "qxcore/container/node_pool.h"
+#include "qxcore/core/export.h"
+
+// The untyped list: nodes whose payload only the virtual operations know.
+class QXCORE_API __SList {
+ public:
+  struct Node {
+    Node* m_next;
+    Node* m_prev;
+    void* Payload() { return this + 1; }
+    const void* Payload() const { return this + 1; }
+  };
+
+  int GetCount() const { return m_count; }
+  bool IsEmpty() const { return m_count == 0; }
+
+ protected:
+  __SList() noexcept : m_end(&m_sentinel), m_sentinel{&m_sentinel, &m_sentinel} {}
+  __SList(const __SList&) = delete;
+
+  // Frees nothing: the element operations are the derived class's, which has to call Clear itself.
+  virtual ~__SList();
+
+  virtual Node* AllocNode() = 0;  // room for a node and its payload; throws SEOutOfMemory
+  virtual void FreeNode(Node* node) = 0;
+  virtual void DestroyPayload(void* payload) = 0;
+  virtual void CopyPayload(Node* node, const void* source) = 0;  // constructs a copy in the node
+
+  // Clears the list, then copies every payload in order. A failure leaves the elements copied so far.
+  __SList& operator=(const __SList& other);
+
+  // Payload of the first or last node; null in an empty list.
+  void* GetFront() const { return m_count != 0 ? m_end->m_next->Payload() : nullptr; }
+  void* GetBack() const { return m_count != 0 ? m_end->m_prev->Payload() : nullptr; }
+  // Payload at a position, 0 being the first; null out of range.
+  void* GetAt(int position) const;
+
+  // A new node with a copy of the payload in front of `before`; the end node appends.
+  Node* Insert(Node* before, const void* source);
+  void Erase(Node* node);
+  void Clear();
+  void MoveTo(Node* node, Node* before);  // relinks the node in front of `before`
+  void Swap(__SList& other) noexcept;     // exchanges the contents; both must be of one type
+
+  std::int32_t m_count = 0;
+  Node* m_end;      // &m_sentinel
+  Node m_sentinel;  // links the first and the last node into a ring
+
+ private:
+  static void LinkBefore(Node* node, Node* before);
+  static void Unlink(Node* node);
+};
+
+static_assert(sizeof(void*) != 4 || sizeof(__SList) == 20, "the layout is public");
+
+// A list of T. `Allocator` gives the memory of the nodes (see SNodePools). T needs to be copyable; its
+// destructor must not throw.
+template <class T, class Allocator = SNodePools>
+class SList : public __SList {
+  struct TypedNode : Node {
+    T m_value;
+  };
+  static_assert(alignof(T) <= sizeof(Node), "the payload follows the links directly");
+
+  template <class Value>
+  class Iterator {
+   public:
+    using iterator_category = std::bidirectional_iterator_tag;
+    using value_type = T;
+    using difference_type = std::ptrdiff_t;
+    using pointer = Value*;
+    using reference = Value&;
+
+    Iterator() = default;
+    explicit Iterator(Node* node) : m_node(node) {}
+    operator Iterator<const T>() const { return Iterator<const T>(m_node); }
+    Value& operator*() const { return *static_cast<T*>(m_node->Payload()); }
+    Value* operator->() const { return static_cast<T*>(m_node->Payload()); }
+    Iterator& operator++() { return m_node = m_node->m_next, *this; }
+    Iterator& operator--() { return m_node = m_node->m_prev, *this; }
+    Iterator operator++(int) { return Iterator(std::exchange(m_node, m_node->m_next)); }
+    Iterator operator--(int) { return Iterator(std::exchange(m_node, m_node->m_prev)); }
+    friend bool operator==(Iterator a, Iterator b) { return a.m_node == b.m_node; }
+
+   private:
+    friend class SList;
+    Node* m_node = nullptr;
+  };
+
+ public:
+  using value_type = T;
+  using reference = T&;
+  using const_reference = const T&;
+  using size_type = std::size_t;
+  using difference_type = std::ptrdiff_t;
+  using iterator = Iterator<T>;
+  using const_iterator = Iterator<const T>;
+
+  SList() noexcept = default;
+  SList(std::initializer_list<T> values) : SList() {
+    for (const T& value : values) AddBack(value);
+  }
+  SList(const SList& other) : SList() { __SList::operator=(other); }
+  SList(SList&& other) noexcept : SList() { Swap(other); }
+  ~SList() override { __SList::Clear(); }
+  // Clears, then copies in order; a failure leaves what was copied so far.
+  SList& operator=(const SList& other) { return __SList::operator=(other), *this; }
+  SList& operator=(SList&& other) noexcept { return Swap(other), *this; }
+
+  // --- access; the list must hold the element that is asked for ---
+  T& GetFront() { return *static_cast<T*>(__SList::GetFront()); }
+  const T& GetFront() const { return *static_cast<const T*>(__SList::GetFront()); }
+  T& GetBack() { return *static_cast<T*>(__SList::GetBack()); }
+  const T& GetBack() const { return *static_cast<const T*>(__SList::GetBack()); }
+  T& GetAt(int position) { return *static_cast<T*>(__SList::GetAt(position)); }
+  const T& GetAt(int position) const { return *static_cast<const T*>(__SList::GetAt(position)); }
+
+  iterator begin() { return iterator(m_end->m_next); }
+  iterator end() { return iterator(m_end); }
+  const_iterator begin() const { return const_iterator(m_end->m_next); }
+  const_iterator end() const { return const_iterator(m_end); }
+  auto rbegin() { return std::reverse_iterator(end()); }
+  auto rend() { return std::reverse_iterator(begin()); }
+  auto rbegin() const { return std::reverse_iterator(end()); }
+  auto rend() const { return std::reverse_iterator(begin()); }
+  std::size_t size() const { return static_cast<std::size_t>(m_count); }
+  bool empty() const { return m_count == 0; }
+
+  // --- modification; `value` may be an element of this list ---
+  iterator AddFront(const T& value) { return iterator(__SList::Insert(m_end->m_next, &value)); }
+  iterator AddBack(const T& value) { return iterator(__SList::Insert(m_end, &value)); }
+  iterator Insert(const_iterator before, const T& value) { return iterator(__SList::Insert(before.m_node, &value)); }
+  void push_back(const T& value) { AddBack(value); }  // for std::back_inserter
+  // Removes the element and gives the place behind it.
+  iterator Erase(const_iterator place) {
+    iterator next(place.m_node->m_next);
+    __SList::Erase(place.m_node);
+    return next;
+  }
+  void RemoveFront() { __SList::Erase(m_end->m_next); }  // the list must not be empty
+  void RemoveBack() { __SList::Erase(m_end->m_prev); }
+  void Clear() { __SList::Clear(); }
+  // Moves the element without copying it; iterators stay valid.
+  void MoveToFront(const_iterator place) { MoveTo(place.m_node, m_end->m_next); }
+  void MoveToBack(const_iterator place) { MoveTo(place.m_node, m_end); }
+  void Swap(SList& other) noexcept { __SList::Swap(other); }
+
+ protected:
+  Node* AllocNode() override { return static_cast<Node*>(Allocator::Alloc(sizeof(TypedNode), alignof(TypedNode))); }
+  void FreeNode(Node* node) override { Allocator::Free(node, sizeof(TypedNode), alignof(TypedNode)); }
+  void DestroyPayload(void* payload) override { static_cast<T*>(payload)->~T(); }
+  void CopyPayload(Node* node, const void* source) override { new (node->Payload()) T(*static_cast<const T*>(source)); }
+};
