@@ -49,10 +49,14 @@ SIdleConsumerList::~SIdleConsumerList() { DropStorage(m_fields); }
 void SIdleConsumerList::Register(SIdleConsumer* consumer) {
   Fields& fields = FieldsOf(this);
   if (fields.m_storage == nullptr) fields.m_storage = new (SMemAlloc(sizeof(Storage))) Storage;
+  Storage* storage = fields.m_storage;
   try {
-    fields.m_storage->m_ring.AddBack(consumer);
+    auto place = storage->m_ring.AddBack(consumer);
+    for (Walk* walk = storage->m_walks; walk != nullptr; walk = walk->m_outer) {
+      if (walk->m_next == storage->m_ring.end()) walk->m_next = place;
+    }
   } catch (...) {
-    if (fields.m_storage->m_ring.IsEmpty()) DropStorage(fields);
+    if (storage->m_ring.IsEmpty()) DropStorage(fields);
     throw;
   }
 }
