@@ -52,10 +52,24 @@ using LPSTR = char*;
 using LPCSTR = const char*;
 using SIZE_T = std::size_t;
 using LCID = DWORD;
+using USHORT = std::uint16_t;
+using UCHAR = std::uint8_t;
+using INT = int;
+using UINT_PTR = std::uintptr_t;
+using ULONG_PTR = std::uintptr_t;
+using DWORD_PTR = std::uintptr_t;
+using HLOCAL = HANDLE;
+using LPBOOL = BOOL*;
+using LPDWORD = DWORD*;
+using LPINT = int*;
+using LPCCH = const char*;
+using LPCWCH = const WCHAR*;
 
 struct HINSTANCE__;
 using HINSTANCE = HINSTANCE__*;
 using HMODULE = HINSTANCE;
+struct HRSRC__;
+using HRSRC = HRSRC__*;
 
 // --- constants ---
 
@@ -72,6 +86,9 @@ using HMODULE = HINSTANCE;
 #define E_OUTOFMEMORY ((HRESULT)0x8007000E)
 #define E_ABORT ((HRESULT)0x80004004)
 #define E_FAIL ((HRESULT)0x80004005)
+#define WINAPI
+#define CALLBACK
+#include "platform/win32_constants.h"
 
 // --- names that the Windows headers change: a client may write either form here, too ---
 
@@ -88,6 +105,8 @@ using HMODULE = HINSTANCE;
 #define GetSystemDirectory GetSystemDirectoryW
 #define GetWindowsDirectory GetWindowsDirectoryW
 #define GetTempFileName GetTempFileNameW
+
+#include "platform/win32_functions.h"
 
 #endif
 
