@@ -24,11 +24,6 @@ int CompareMapped(const WCHAR* a, const WCHAR* b, int count, Map map) {
   return 0;
 }
 
-SString Cut(const WCHAR* text, int count) {
-  SStringView view(text);
-  return count == kWhole ? SString(view) : SString(view.substr(0, static_cast<std::size_t>(std::max(count, 0))));
-}
-
 struct ByCodeUnit {
   int count = kWhole;
   int operator()(const WCHAR* a, const WCHAR* b) const {
@@ -46,18 +41,15 @@ struct ByLowerCase {
 struct ByLocale {
   int count = kWhole;
   int operator()(const WCHAR* a, const WCHAR* b) const {
-    return count == kWhole ? platform::WideCollate(a, b) : platform::WideCollate(Cut(a, count), Cut(b, count));
+    return count == kWhole ? platform::WideCollate(a, b) : platform::WideCollate(a, b, static_cast<std::size_t>(count));
   }
 };
 
 struct ByLocaleNoCase {
   int count = kWhole;
   int operator()(const WCHAR* a, const WCHAR* b) const {
-    SString lowerA = Cut(a, count);
-    SString lowerB = Cut(b, count);
-    lowerA.ToLower();
-    lowerB.ToLower();
-    return platform::WideCollate(lowerA, lowerB);
+    return count == kWhole ? platform::WideCollateNoCase(a, b)
+                           : platform::WideCollateNoCase(a, b, static_cast<std::size_t>(count));
   }
 };
 

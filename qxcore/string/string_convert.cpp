@@ -119,6 +119,6 @@ int SString::IsRtfText(const WCHAR* text) {
 // --- numbers ---
 
 long SString::ToLONG() const { return platform::WideToLong(m_text); }
-unsigned long SString::ToULONG() const { return platform::WideToUnsignedLong(m_text); }
+unsigned long SString::ToULONG() const { return platform::WideToULong(m_text); }
 double SString::ToDouble() const { return platform::WideToDouble(m_text); }
 int SString::ToBOOL() const { return CompareNoCase(Yes) == 0 || ToLONG() != 0; }

@@ -1,0 +1,8 @@
+// The names that readers and writers of text share.
+#pragma once
+
+class SAbstractIO {
+ public:
+  class SIOSeekableCharReader;  // characters with positions: seekable_char_reader.h
+  class SMultiFormatSupport;    // encodings and their names: multi_format_support.h
+};

@@ -1,0 +1,76 @@
+// What all multi-format readers know of themselves: the requested and the selected encoding, how the
+// selection came about, and what was lost while reading.
+#pragma once
+
+#include "qxcore/core/export.h"
+#include "qxcore/stream/data_affinity.h"
+#include "qxcore/stream/encoding_guess.h"
+#include "qxcore/stream/multi_format_support.h"
+#include "qxcore/stream/text_decoder.h"
+#include "qxcore/string/string.h"
+
+class QXCORE_API SMultiFormatReaderStatusBase {
+ public:
+  using Support = SAbstractIO::SMultiFormatSupport;
+  using Encoding = Support::Encoding;
+
+  // A growing buffer: bytes lie from start to end, in a block of `capacity` bytes.
+  struct BufferStatus {
+    unsigned char* block = nullptr;  // owned by the reader
+    unsigned char* start = nullptr;
+    unsigned char* end = nullptr;
+    unsigned long capacity = 0;
+
+    unsigned long Size() const { return static_cast<unsigned long>(end - start); }
+  };
+
+  // Status bits.
+  static constexpr unsigned kRawPresent = 0x1;   // raw data was there before detection
+  static constexpr unsigned kWholeInput = 0x2;   // no more raw data follows
+  static constexpr unsigned kProvisional = 0x4;  // ASCII so far; more data may show other bytes
+  static constexpr unsigned kSelected = 0x20;    // a selection was made
+  static constexpr unsigned kWarning = 0x40;     // detection's result deserves a warning
+
+  // A copy has the encodings, the status and the reports, but empty buffers of its own.
+  SMultiFormatReaderStatusBase(const SMultiFormatReaderStatusBase& other);
+  SMultiFormatReaderStatusBase& operator=(const SMultiFormatReaderStatusBase& other);
+  virtual ~SMultiFormatReaderStatusBase();
+
+  // Makes room for `size` bytes from the buffer's start on, keeping its content; by doubling. Throws
+  // SEOutOfMemory and changes nothing.
+  virtual void AllocRawData(BufferStatus& buffer, unsigned long size);
+  virtual void AllocStrData(BufferStatus& buffer, unsigned long size);
+
+  Encoding GetRequestedFormat() const { return m_requested; }
+  // The selected encoding with the requested policy; 0 before the first read or check, and when it failed.
+  Encoding GetFormat() const { return m_selected; }
+  unsigned int GetStatus() const { return m_status; }
+  const SDataAffinity& GetAffinity() const { return m_affinity; }  // the evidence of the last detection
+
+  // With a flag other than 0, UTF-8 is taken for well-formed and its continuation bytes are not checked.
+  // Gives the former flag. Takes effect with the next check of the format.
+  int SetQuickUTF8ToUTF16(int quick);
+
+  // What a user should know of the selection; empty when there is nothing to say.
+  SString GetDetectionWarning() const;
+  // How the selection came about, also where that deserves no warning; empty when nothing was detected.
+  SString GetDetectionReport() const;
+  // That characters were replaced or dropped; empty while none was.
+  SString GetEncodingWarning() const;
+  unsigned long long GetReplacedCount() const { return m_decoder.GetReplaced(); }
+  unsigned long long GetDroppedCount() const { return m_decoder.GetDropped(); }
+
+ protected:
+  explicit SMultiFormatReaderStatusBase(Encoding requested) : m_requested(requested) {}
+  static void FreeBuffer(BufferStatus& buffer) noexcept;
+
+  Encoding m_requested;
+  Encoding m_selected = 0;
+  BufferStatus m_raw;
+  unsigned int m_status = 0;
+  SDataAffinity m_affinity;
+  SEncodingGuess m_guess;
+  STextDecoder m_decoder;
+  bool m_hasFailed = false;
+  int m_quickUTF8 = 0;
+};

@@ -1,0 +1,33 @@
+// The byte output of the whole library: files, memory, filters.
+//
+// Write failures throw (SEIODiskFullException, SEIOWriteFailed). Destructors never throw: who must
+// know that everything arrived calls Close, or Flush, before. A stream is used by one thread at a time.
+#pragma once
+
+#include "qxcore/core/export.h"
+#include "qxcore/core/object.h"
+
+class QXCORE_API SOutputStream : public SObject {
+  QXCORE_DECLARE_CLASS(SOutputStream)
+
+  // Writes one byte, the low eight bits.
+  virtual void Write(int byte) = 0;
+  // Writes a block; gives the number of bytes written, which is `count` unless it throws. Here: byte by
+  // byte through Write(int).
+  virtual unsigned long Write(const void* buffer, unsigned long count);
+  // Hands everything that waits to the target. Here: nothing waits.
+  virtual void Flush();
+  // Flushes and ends the stream. Here: nothing.
+  virtual void Close();
+
+ protected:
+  SOutputStream() = default;
+};
+
+// The common base of output filters: class information only.
+class QXCORE_API SOutputFilterStream : public SOutputStream {
+  QXCORE_DECLARE_CLASS(SOutputFilterStream)
+
+ protected:
+  SOutputFilterStream() = default;
+};

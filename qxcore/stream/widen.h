@@ -1,0 +1,34 @@
+// Widening of 7-bit characters, sixteen at a time where the processor can.
+#pragma once
+
+#include <cstddef>
+
+#include "platform/win32.h"
+
+#ifdef __SSE2__
+#include <emmintrin.h>
+#endif
+
+// Copies bytes below 0x80 to characters, up to `size` of them, and stops at the first other byte. Gives
+// their number. `out` has room for `size` characters.
+inline std::size_t SWidenASCII(const unsigned char* in, std::size_t size, WCHAR* out) {
+  std::size_t done = 0;
+#ifdef __SSE2__
+  constexpr std::size_t kBlock = 16;
+  const __m128i zero = _mm_setzero_si128();
+  for (; size - done >= kBlock; done += kBlock) {
+    __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i*>(in + done));
+    unsigned high = static_cast<unsigned>(_mm_movemask_epi8(block));
+    __m128i* target = reinterpret_cast<__m128i*>(out + done);
+    // Written whole even if not all of it is plain: the room is there, and what follows overwrites it.
+    _mm_storeu_si128(target, _mm_unpacklo_epi8(block, zero));
+    _mm_storeu_si128(target + 1, _mm_unpackhi_epi8(block, zero));
+    if (high != 0) return done + static_cast<std::size_t>(__builtin_ctz(high));
+  }
+#endif
+  while (done < size && in[done] < 0x80) {
+    out[done] = in[done];
+    ++done;
+  }
+  return done;
+}
