@@ -48,7 +48,7 @@ SString::SString(const char* text) : SString() { *this = text; }
 
 SString::SString(const char* text, int count) : SString(SAnsiToString(text, count)) {}
 
-SString::SString(const SStringBuffer& buffer) : SString(static_cast<SString>(buffer)) {}
+SString::SString(const SStringBuffer& buffer) : SString(buffer.View()) {}
 
 SString::SString(int truth) : SString(truth != 0 ? Yes : No) {}
 
@@ -108,7 +108,7 @@ SString& SString::operator=(WCHAR character) {
 
 SString& SString::operator=(char character) { return *this = SAnsiToString(&character, character != 0 ? 1 : 0); }
 
-SString& SString::operator=(const SStringBuffer& buffer) { return *this = static_cast<SString>(buffer); }
+SString& SString::operator=(const SStringBuffer& buffer) { return *this = SString(buffer); }
 
 // --- appending ---
 
@@ -133,7 +133,7 @@ SString& SString::operator+=(const char* text) {
 
 SString& SString::operator+=(char character) { return *this += SAnsiToString(&character, character != 0 ? 1 : 0); }
 
-SString& SString::operator+=(const SStringBuffer& buffer) { return *this += static_cast<SString>(buffer); }
+SString& SString::operator+=(const SStringBuffer& buffer) { return *this += SString(buffer); }
 
 void SString::ConcatByCopy(int n, const WCHAR* text) {
   if (n <= 0) return;

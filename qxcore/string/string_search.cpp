@@ -8,8 +8,6 @@
 
 namespace {
 
-SStringView ViewOf(const WCHAR* text) { return text != nullptr ? SStringView(text) : SStringView(); }
-
 // What lies between `from`, a pointer into the text, and the text's end; `from` null means all of it.
 SStringView RestOf(const SString& text, const WCHAR* from) {
   if (from == nullptr) return text.View();
