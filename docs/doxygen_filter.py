@@ -1,0 +1,164 @@
+#!/usr/bin/env python3
+"""Turns the ordinary comments of a header into the form that doxygen reads.
+
+How the headers document, and what this makes of it:
+- a comment above a declaration documents it, and the declarations that follow it in the same paragraph
+  (up to a blank line or another comment);
+- a comment behind a declaration documents that one alone;
+- a section comment, "// --- search: what holds for all of these ---", documents what has none of its own;
+- the comment that opens the file documents its first class, where that has none of its own; in a file
+  without classes, whatever has none of its own.
+
+A public name that none of these reaches stays undocumented, and doxygen reports it as an error.
+"""
+
+import re
+import sys
+
+SECTION = re.compile(r"^\s*// --- (.*?)(?: ---)?$")
+TRAILING = re.compile(r"^(?P<code>.*?\S)\s+//\s?(?P<text>.*)$")
+
+
+def strip_code(line):
+    """The line without strings and comments, for counting braces."""
+    line = re.sub(r'"(\\.|[^"\\])*"', '""', line)
+    line = re.sub(r"'(\\.|[^'\\])'", "''", line)
+    return line.split("//")[0]
+
+
+class Filter:
+    def __init__(self, lines):
+        self.lines = lines
+        self.out = []
+        self.section = []
+        self.block = []  # the comment that stands above, of this paragraph
+        self.fresh = False  # the block has not been written yet
+        self.header = []
+        self.header_used = False
+        self.stack = []  # what each open brace is: "class", "enum", "namespace" or "body"
+        self.statement = ""  # code of the declaration that is being read
+
+    def scope_documents(self):
+        return all(kind != "body" for kind in self.stack)
+
+    def emit_doc(self, indent, text):
+        self.out.append(indent + "/** " + "\n".join([text[0]] + [indent + " *  " + line for line in text[1:]]) + " */")
+
+    def doc_for(self, code):
+        if self.block:
+            return self.block
+        if re.match(r"\s*(template.*>\s*)?(class|struct)\b[^;]*\{", code) and self.header and not self.header_used:
+            self.header_used = True
+            return self.header
+        return self.section
+
+    def begins_name(self, code):
+        stripped = code.strip()
+        if not stripped or stripped.startswith(("#", "}", "{", ")", ":", "public", "private", "protected", "static_assert", "using namespace", "namespace", "extern template", "template class", "template struct")):
+            return False
+        if re.match(r"(class|struct|enum)\s+[\w ]+;", stripped):
+            return False  # a forward declaration is documented where it is defined
+        if stripped.startswith("friend") and "(" not in stripped:
+            return False
+        return True
+
+    def run(self):
+        lines = self.lines
+        i = 0
+        while i < len(lines) and (lines[i].startswith("//") or not lines[i].strip()):
+            if lines[i].startswith("//"):
+                self.header.append(lines[i][2:].strip())
+            i += 1
+        if self.header:
+            self.out.append("/** @file\n * " + "\n * ".join(self.header) + " */")
+        if not any(re.match(r"(template.*>\s*)?(class|struct)\b[^;]*$", line) for line in lines):
+            self.section = self.header
+        continued_macro = False
+        while i < len(lines):
+            line = lines[i]
+            i += 1
+            stripped = line.strip()
+            if continued_macro or stripped.startswith("#"):
+                if stripped.startswith("#define") and self.fresh:
+                    self.emit_doc("", self.block)
+                    self.fresh = False
+                continued_macro = stripped.endswith("\\")
+                self.out.append(line)
+                continue
+            if not stripped:
+                if not self.statement:
+                    self.block, self.fresh = [], False
+                self.out.append(line)
+                continue
+            if stripped.startswith("//"):
+                section = SECTION.match(line)
+                text = stripped[2:].strip()
+                if section:
+                    self.section, self.block, self.fresh = [section[1]], [], False
+                elif self.fresh:
+                    self.block.append(text)
+                else:
+                    self.block, self.fresh = [text], True
+                continue
+            self.code_line(line)
+        return "\n".join(self.out) + "\n"
+
+    def code_line(self, line):
+        indent = line[: len(line) - len(line.lstrip())]
+        trailing = TRAILING.match(line)
+        in_scope = self.scope_documents()
+        if in_scope and not self.statement and self.begins_name(line):
+            own = trailing and strip_code(line).rstrip().endswith((";", ",", "{", "}"))
+            if not own or self.fresh:
+                doc = self.doc_for(line)
+                if doc:
+                    self.emit_doc(indent, doc)
+            if own:
+                line = trailing["code"] + ("  ///< " if not self.fresh else "  // ") + trailing["text"]
+        self.fresh = False
+        self.out.append(line)
+        self.track(strip_code(line))
+
+    def track(self, code):
+        for character in code:
+            if character == "{":
+                head = self.statement
+                if re.search(r"\benum\b", head):
+                    kind = "enum"
+                elif re.search(r"\b(class|struct|union)\b", head) and "(" not in re.sub(r"\balignas\([^)]*\)|__attribute__\(\(.*?\)\)", "", head) and "=" not in head:
+                    kind = "class"
+                elif re.search(r"\b(namespace|extern\s*\"\")", head):
+                    kind = "namespace"
+                else:
+                    kind = "body"
+                self.stack.append(kind)
+                if kind != "body":
+                    self.statement = ""
+                    self.section = [] if kind == "class" else self.section
+                    self.block = [] if kind == "class" else self.block
+            elif character == "}":
+                kind = self.stack.pop() if self.stack else "body"
+                if kind != "body":
+                    self.block = []
+                if self.scope_documents() and kind == "body":
+                    self.statement = ""
+            elif character == ";" and self.scope_documents():
+                self.statement = ""
+            elif character == "," and self.stack and self.stack[-1] == "enum":
+                self.statement = ""
+            elif self.scope_documents():
+                if not (character.isspace() and not self.statement):
+                    self.statement += character
+        if re.fullmatch(r"\s*(public|private|protected):\s*", self.statement or ""):
+            self.statement = ""
+        if self.statement.rstrip().endswith(":") and re.match(r"^(public|private|protected)\s*:$", self.statement.strip()):
+            self.statement = ""
+
+
+def main():
+    with open(sys.argv[1], encoding="utf-8") as file:
+        sys.stdout.write(Filter(file.read().split("\n")).run())
+
+
+if __name__ == "__main__":
+    main()
