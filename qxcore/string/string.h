@@ -355,7 +355,12 @@ class QXCORE_API SString {
     std::int32_t refs = data->Refs();
     return refs == 1 || refs == SStringData::kLocked;
   }
-  static void AppendInPlace(SStringData* data, int n, const WCHAR* text);
+  static void AppendInPlace(SStringData* data, int n, const WCHAR* text) {
+    WCHAR* end = data->Text() + data->m_length;
+    std::memmove(end, text, static_cast<std::size_t>(n) * sizeof(WCHAR));
+    end[n] = 0;
+    data->m_length += n;
+  }
   void ConcatByCopy(int n, const WCHAR* text);
   void ReleaseData() noexcept {
     SStringData* data = Data();
@@ -381,13 +386,6 @@ class QXCORE_API SString {
 };
 
 static_assert(sizeof(SString) == sizeof(void*), "a string is one pointer");
-
-inline void SString::AppendInPlace(SStringData* data, int n, const WCHAR* text) {
-  WCHAR* end = data->Text() + data->m_length;
-  std::memmove(end, text, static_cast<std::size_t>(n) * sizeof(WCHAR));
-  end[n] = 0;
-  data->m_length += n;
-}
 
 // --- concatenation: one allocation each; a temporary on the left grows in place where it fits ---
 
