@@ -1,0 +1,22 @@
+// All public headers of the library.
+#pragma once
+
+#include "qxcore/core/assert_valid.h"
+#include "qxcore/core/debug_counter.h"
+#include "qxcore/core/exception.h"
+#include "qxcore/core/export.h"
+#include "qxcore/core/fixed_alloc.h"
+#include "qxcore/core/idle_consumer.h"
+#include "qxcore/core/io_exceptions.h"
+#include "qxcore/core/memory.h"
+#include "qxcore/core/module_state.h"
+#include "qxcore/core/object.h"
+#include "qxcore/core/throw_target.h"
+#include "qxcore/string/ansi_string.h"
+#include "qxcore/string/md5.h"
+#include "qxcore/string/natural_compare.h"
+#include "qxcore/string/string.h"
+#include "qxcore/string/string_buffer.h"
+#include "qxcore/string/string_iterators.h"
+#include "qxcore/string/text_conversion.h"
+#include "qxcore/string/text_search.h"

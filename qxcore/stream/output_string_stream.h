@@ -1,0 +1,71 @@
+// Writes UTF-16 text into a byte stream in a chosen encoding, or keeps it as a string.
+//
+// Formats with bit kOptionalBOM or kRequiredBOM begin with a byte order mark, also when no text follows.
+// A character that cannot be mapped is replaced ('?' unless changed) or dropped, and the encoding warning
+// tells of it; with the lossless policy it throws an exception of the SEIOCantMap family. A surrogate pair may
+// come in two calls: its first half waits, until Close at the latest.
+#pragma once
+
+#include "qxcore/core/export.h"
+#include "qxcore/stream/multi_format_support.h"
+#include "qxcore/stream/output_stream.h"
+#include "qxcore/stream/text_encoder.h"
+#include "qxcore/string/string_buffer.h"
+
+class QXCORE_API SOutputStringStream : public SOutputStream {
+  QXCORE_DECLARE_CLASS(SOutputStringStream)
+
+  using Support = SAbstractIO::SMultiFormatSupport;
+  using Encoding = Support::Encoding;
+
+  // Keeps the text in memory, for GetString.
+  SOutputStringStream();
+  // Writes to `out`, which must stay alive; the second form deletes it at the end when `owns` is set.
+  explicit SOutputStringStream(SOutputStream& out, Encoding format = Support::kUTF16LE);
+  SOutputStringStream(SOutputStream* out, Encoding format, bool owns);
+  SOutputStringStream(const SOutputStringStream&) = delete;
+  SOutputStringStream& operator=(const SOutputStringStream&) = delete;
+  // Writes what waits; a failure is lost here, so call Close before.
+  ~SOutputStringStream() override;
+
+  // One 16-bit character.
+  void Write(int character) override;
+  // `count` bytes of 16-bit characters, whole ones only; gives the number of bytes taken.
+  unsigned long Write(const void* buffer, unsigned long count) override;
+  // `count` characters; gives their number.
+  unsigned long Write(const WCHAR* text, unsigned int count);
+  unsigned long Write(const SString& text) { return Write(text.GetSafePointer(), static_cast<unsigned>(text.Length())); }
+  // The same and a line end, carriage return and line feed on every target.
+  unsigned long WriteLn(const WCHAR* text, unsigned int count);
+  void WriteLn();
+  // Flushes the target; half of a surrogate pair goes on waiting.
+  void Flush() override;
+  // Writes what waits and closes the target.
+  void Close() override;
+
+  // The text so far, when it is kept in memory; gives 1, else 0 and an empty string.
+  int GetString(SString* text) const;
+
+  // The format of what follows. A mark stands only at the very beginning. Throws SEIOInvalidEncoding when
+  // the machine does not support it.
+  void SetFormat(Encoding format);
+  Encoding GetFormat() const { return m_encoder.GetEncoding(); }
+  // What stands for characters that cannot be mapped; 0 drops them. Gives the former one.
+  WCHAR SetReplacement(WCHAR replacement);
+  WCHAR GetReplacement() const { return m_encoder.GetReplacement(); }
+  // That characters were replaced or dropped; empty while none was.
+  SString GetEncodingWarning() const;
+  unsigned long long GetReplacedCount() const { return m_encoder.GetReplaced(); }
+  unsigned long long GetDroppedCount() const { return m_encoder.GetDropped(); }
+
+ private:
+  void Begin();
+  void WriteWaiting();
+
+  SOutputStream* m_out;
+  bool m_owns;
+  bool m_hasBegun = false;
+  WCHAR m_waitingHalf = 0;  // the first half of a surrogate pair
+  STextEncoder m_encoder;
+  SStringBuffer m_text;
+};

@@ -1,0 +1,345 @@
+// Sharing, copy-on-write, lent-out buffers, size classes; all against a plain string as the model.
+
+#include "qxcore/string/string.h"
+
+#include <thread>
+#include <unordered_map>
+#include <vector>
+
+#include "qxcore/core/memory.h"
+#include "qxcore/string/string_buffer.h"
+#include "tests/support/failing_allocations.h"
+#include "tests/support/text.h"
+
+namespace {
+
+SString Repeated(int length, WCHAR c = WTEXT('x')) { return SString(SStringView(WideString(static_cast<std::size_t>(length), c))); }
+std::int32_t RefsOf(const SString& text) { return SStringData::Of(text.GetSafePointer())->m_refs; }
+bool Shares(const SString& a, const SString& b) { return a.GetSafePointer() == b.GetSafePointer(); }
+
+TEST(StringConstruction, NumbersAndTruth_HaveTheirStatedForms) {
+  EXPECT_TRUE(Shares(SString(5), SString::Yes));
+  EXPECT_TRUE(Shares(SString(0), SString::No));
+  EXPECT_EQ(SString(5L), WTEXT("5"));
+  EXPECT_EQ(SString(-7L), WTEXT("-7"));
+  EXPECT_EQ(SString(0.5), WTEXT("0.5"));
+  EXPECT_TRUE(Shares(SString(nullptr), SString::null));
+  EXPECT_TRUE(Shares(SString(static_cast<const WCHAR*>(nullptr)), SString::null));
+  EXPECT_TRUE(Shares(SString(static_cast<const char*>(nullptr)), SString::null));
+  EXPECT_EQ(SString("a\xE9z"), WTEXT("a\u00E9z"));
+  EXPECT_EQ(SString("abcdef", 3), WTEXT("abc"));
+  EXPECT_EQ(SString("ab", 9), WTEXT("ab"));
+  EXPECT_FALSE((std::is_constructible_v<SString, char>));
+  EXPECT_FALSE((std::is_constructible_v<SString, WCHAR>));
+  EXPECT_FALSE((std::is_constructible_v<SString, unsigned>));
+  EXPECT_FALSE((std::is_convertible_v<int, SString>));
+}
+
+TEST(StringBuffers, Length_DecidesTheSizeClass) {
+  const struct {
+    int length, allocated;
+  } kCases[] = {{1, 16},     {16, 16},     {17, 32},     {32, 32},     {33, 64},    {64, 64},     {65, 128},
+                {128, 128},  {129, 256},   {257, 512},   {513, 1024},  {1025, 2048}, {2048, 2048}, {2049, 2560},
+                {2560, 2560}, {2561, 3072}};
+  for (const auto& one : kCases) {
+    SString text = Repeated(one.length);
+    EXPECT_EQ(text.GetAllocLength(), one.allocated) << one.length;
+    EXPECT_EQ(text.GetAt(one.length), 0);
+  }
+  EXPECT_EQ(SString().GetAllocLength(), 1);
+  EXPECT_EQ(SString::CrLf.GetAllocLength(), 3);
+  SString grown = Repeated(16);
+  const WCHAR* before = grown;
+  grown += WTEXT('y');
+  EXPECT_NE(grown.GetSafePointer(), before);
+  EXPECT_EQ(grown.GetAllocLength(), 32);
+  before = grown;
+  grown += WTEXT("zz");
+  EXPECT_EQ(grown.GetSafePointer(), before);
+}
+
+TEST(StringBuffers, LargeOnes_AreCountedUntilTheyGo) {
+  const long bytes = SString::GetLargeBufferBytes();
+  const long count = SString::GetLargeBufferCount();
+  {
+    SString large = Repeated(5000);
+    SString shared = large;
+    EXPECT_EQ(SString::GetLargeBufferCount(), count + 1);
+    EXPECT_EQ(SString::GetLargeBufferBytes(), bytes + 12 + (5120 + 1) * 2);
+  }
+  EXPECT_EQ(SString::GetLargeBufferCount(), count);
+  EXPECT_EQ(SString::GetLargeBufferBytes(), bytes);
+}
+
+TEST(StringSharing, Copies_ShareUntilOneWrites) {
+  SString a = WTEXT("shared text");
+  SString b = a;
+  SString c;
+  c = b;
+  EXPECT_TRUE(Shares(a, b) && Shares(b, c));
+  EXPECT_EQ(RefsOf(a), 3);
+  b.SetAt(0, WTEXT('S'));
+  EXPECT_EQ(a, WTEXT("shared text"));
+  EXPECT_EQ(b, WTEXT("Shared text"));
+  EXPECT_EQ(RefsOf(a), 2);
+  SString moved = std::move(c);
+  EXPECT_TRUE(Shares(moved, a) && c.IsEmpty());
+  a = a;
+  EXPECT_EQ(RefsOf(a), 2);
+}
+
+TEST(StringSharing, StaticTexts_AreNeverWritten) {
+  SString text = SString::Yes;
+  text.ToUpper();
+  EXPECT_EQ(text, WTEXT("YES"));
+  EXPECT_EQ(SString::Yes, WTEXT("Yes"));
+  SString empty;
+  empty.AssignCopy(0, nullptr);
+  empty.ToUpper();
+  empty.MakeReverse();
+  empty.Unlock(0);
+  empty.UnlockBuffer(true);
+  empty.CopyBeforeWrite();
+  EXPECT_TRUE(Shares(empty, SString::null));
+  EXPECT_EQ(SString::null.Length(), 0);
+}
+
+TEST(StringLocking, LockedText_IsCopiedDeeply) {
+  SString locked = WTEXT("abc");
+  WCHAR* buffer = locked.LockBuffer(10);
+  EXPECT_EQ(locked.Length(), 10);
+  EXPECT_EQ(RefsOf(locked), SStringData::kLocked);
+  buffer[3] = 0;
+  SString copy = locked;
+  EXPECT_FALSE(Shares(copy, locked));
+  EXPECT_EQ(copy, WTEXT("abc"));
+  SString assigned = WTEXT("previous");
+  assigned = locked;
+  EXPECT_EQ(assigned, WTEXT("abc"));
+  locked.UnlockBuffer(true);
+  EXPECT_EQ(locked.Length(), 3);
+  SString sharing = locked;
+  EXPECT_TRUE(Shares(sharing, locked));
+}
+
+TEST(StringLocking, EmptyTextToLockedTarget_KeepsBufferAndLength) {
+  for (int way = 0; way < 3; ++way) {
+    SString target = WTEXT("abcdef");
+    WCHAR* buffer = target.LockBuffer();
+    if (way == 0) target = SString();
+    if (way == 1) target = SString(SString::null);
+    if (way == 2) target.AssignCopy(0, nullptr);
+    EXPECT_EQ(target.GetSafePointer(), buffer);
+    EXPECT_EQ(buffer[0], 0);
+    EXPECT_EQ(target.Length(), 6);
+    target.UnlockBuffer(true);
+    EXPECT_TRUE(Shares(target, SString::null));
+  }
+}
+
+TEST(StringLocking, TextToLockedTarget_IsCopiedIntoItsBufferWhereItFits) {
+  SString target;
+  WCHAR* buffer = target.LockBuffer(16);
+  SString source = WTEXT("0123456789");
+  target = source;
+  EXPECT_EQ(target.GetSafePointer(), buffer);
+  EXPECT_EQ(target, source);
+  EXPECT_EQ(RefsOf(source), 1);
+  target = Repeated(40);
+  EXPECT_NE(target.GetSafePointer(), buffer);
+  EXPECT_EQ(target.Length(), 40);
+}
+
+TEST(StringLocking, Unlock_MeasuresOrCuts) {
+  SString text = WTEXT("abcdef");
+  text.Lock(0);
+  text.Unlock(4);
+  EXPECT_EQ(text, WTEXT("abcd"));
+  SString other = text;
+  other.Unlock(2);
+  EXPECT_EQ(other, WTEXT("ab"));
+  EXPECT_EQ(text, WTEXT("abcd"));
+  SString fixed = SString::Yes;
+  fixed.UnlockTchar(1);
+  EXPECT_EQ(fixed, WTEXT("Y"));
+  WCHAR* buffer = text.LockBuffer(100);
+  buffer[1] = 0;
+  text.Unlock(-1);
+  EXPECT_EQ(text.Length(), 1);
+  EXPECT_EQ(RefsOf(text), SStringData::kLocked) << "Unlock leaves the mark";
+  text.UnlockBuffer(false);
+  EXPECT_EQ(RefsOf(text), 1);
+  text.Lock(8);
+  text.Unlock(0);
+  EXPECT_TRUE(Shares(text, SString::null));
+  WCHAR* sized = text.GetBufferSetLength(3);
+  EXPECT_EQ(sized[3], 0);
+  EXPECT_EQ(text.Length(), 3);
+}
+
+// Every operation that changes a text, its argument anywhere, also in the text itself, and the text
+// owned, shared or static; the model is a plain string.
+TEST(StringModel, RandomOperations_AgreeWithPlainString) {
+  RandomText random(20261121);
+  const SStringView kAlphabet = WTEXT("aAbB,");
+  for (int round = 0; round < 20000; ++round) {
+    WideString model = random.Make(40, kAlphabet);
+    SString text(model.c_str());
+    SString sharer;
+    if (random.Number(2) == 0) sharer = text;
+    WideString argument = random.Make(3, kAlphabet);
+    int from = random.Number(static_cast<int>(model.size()) + 1);
+    const bool isOwn = random.Number(3) == 0;
+    if (isOwn) argument = model.substr(static_cast<std::size_t>(from));
+    const WCHAR* arg = isOwn ? text.GetPointerAt(from) : argument.c_str();
+    int index = random.Number(50) - 5;
+    std::size_t place = static_cast<std::size_t>(std::clamp(index, 0, static_cast<int>(model.size())));
+    switch (random.Number(8)) {
+      case 0:
+        text += arg;
+        model += argument;
+        break;
+      case 1:
+        text = arg;
+        model = argument;
+        break;
+      case 2:
+        text.Insert(arg, index);
+        model.insert(place, argument);
+        break;
+      case 3: {
+        int count = random.Number(9);
+        int end = std::clamp(index + count, static_cast<int>(place), static_cast<int>(model.size()));
+        text.Delete(index, count);
+        model.erase(place, static_cast<std::size_t>(end) - place);
+        break;
+      }
+      case 4: {
+        int replaced = 0;
+        std::size_t at = 0;
+        while (!argument.empty() && (at = model.find(argument, at)) != WideString::npos) {
+          model.replace(at, argument.size(), WTEXT("<>"));
+          at += 2;
+          ++replaced;
+        }
+        EXPECT_EQ(text.ReplaceAll(arg, WTEXT("<>")), replaced);
+        break;
+      }
+      case 5: {
+        WCHAR c = kAlphabet[static_cast<std::size_t>(random.Number(5))];
+        text.Trim(c);
+        std::size_t first = model.find_first_not_of(c);
+        model = first == WideString::npos ? WideString() : model.substr(first, model.find_last_not_of(c) - first + 1);
+        break;
+      }
+      case 6: {
+        std::size_t at = model.find(WTEXT(','));
+        SString right;
+        int found = text.Split(&text, &right, WTEXT(','));
+        EXPECT_EQ(found != 0, at != WideString::npos);
+        if (found) {
+          EXPECT_EQ(right, model.substr(at + 1).c_str());
+        }
+        model = model.substr(0, at);
+        break;
+      }
+      case 7: {
+        int count = random.Number(60) - 5;
+        text = text.Mid(index, count);
+        model = model.substr(place, static_cast<std::size_t>(std::max(count, 0)));
+        break;
+      }
+    }
+    ASSERT_EQ(text.View(), SStringView(model)) << "round " << round;
+    ASSERT_EQ(text.GetAt(text.Length()), 0);
+    if (model.empty()) {
+      ASSERT_TRUE(Shares(text, SString::null));
+    }
+  }
+}
+
+TEST(StringModel, EqualLengthReplacement_HappensInPlace) {
+  SString text = WTEXT("one two one");
+  const WCHAR* before = text;
+  EXPECT_EQ(text.ReplaceAll(WTEXT("one"), WTEXT("six")), 2);
+  EXPECT_EQ(text.GetSafePointer(), before);
+  EXPECT_EQ(text, WTEXT("six two six"));
+  EXPECT_EQ(text.ReplaceAllNoCase(WTEXT("SIX"), WTEXT("")), 2);
+  EXPECT_EQ(text, WTEXT(" two "));
+  EXPECT_EQ(text.ReplaceAll(WTEXT(""), WTEXT("x")), 0);
+  EXPECT_EQ(text.ReplaceAll(nullptr, WTEXT("x")), 0);
+  EXPECT_EQ(text.Replace(WTEXT("two"), WTEXT("2")), 1);
+  EXPECT_EQ(text.Translate(WTEXT(" 2"), WTEXT("_")), 2);
+  EXPECT_EQ(text, WTEXT("_2_"));
+}
+
+TEST(StringView, ConversionsOperatorsAndHash) {
+  SString text = WTEXT("view");
+  SStringView view = text;
+  EXPECT_EQ(view, WTEXT("view"));
+  EXPECT_EQ(SString(view), text);
+  EXPECT_TRUE(text < SString(WTEXT("views")) && text > WTEXT("vie") && text == WTEXT("view"));
+  std::unordered_map<SString, int> map;
+  map[text] = 3;
+  EXPECT_EQ(map[SString(WTEXT("view"))], 3);
+  EXPECT_EQ(text[0u] + text[3L], WTEXT('v') + WTEXT('w'));
+  EXPECT_EQ(WTEXT("a") + text + WTEXT('b') + "c" + 'd', WTEXT("aviewbcd"));
+  EXPECT_EQ(WTEXT('<') + text, WTEXT("<view"));
+}
+
+TEST(StringMemory, EachAllocationFailing_LeavesTheTextAsItWas) {
+  // A pool serves small buffers from its free list; buffers above 2048 characters always allocate.
+  SString text = Repeated(3000);
+  SString before = text;
+  const SString insert = Repeated(100, WTEXT('y'));
+  int failures = WithEachAllocationFailing(
+      [&] {
+        SString work = text;
+        work += insert;
+        work.Insert(insert, 5);
+        work.ReplaceAll(WTEXT("x"), WTEXT("zz"));
+        work.Format(WTEXT("%s-%s"), work.GetSafePointer(), insert.GetSafePointer());
+        text = work;
+        text = before;
+      },
+      [&] { EXPECT_EQ(text, before); });
+  EXPECT_GT(failures, 3);
+}
+
+TEST(StringMemory, PoolFailure_TrimsThePoolsAndTriesOnceMore) {
+  std::vector<SString> held;
+  SMemFailAt(1, true);
+  EXPECT_THROW(
+      {
+        for (int i = 0; i < 10000; ++i) held.push_back(Repeated(1500, static_cast<WCHAR>(WTEXT('a') + i % 26)));
+      },
+      SEOutOfMemory);
+  SMemFailAt(1, false);  // only the next one: the second try succeeds
+  EXPECT_NO_THROW(held.push_back(Repeated(3000)));
+  EXPECT_TRUE(SMemHasFailed());
+  SMemFailAt(0);
+  for (std::size_t i = 0; i + 1 < held.size(); ++i) EXPECT_EQ(held[i].Length(), 1500);
+  held.clear();
+  EXPECT_GT(SString::FreeUnused(), 0);
+}
+
+// Run under ThreadSanitizer, too.
+TEST(StringThreads, SharedBuffers_SurviveManyHolders) {
+  const SString shared = WTEXT("held by several threads");
+  auto work = [shared] {
+    for (int i = 0; i < 20000; ++i) {
+      SString copy = shared;
+      SString other = copy;
+      if (i % 3 == 0) other += WTEXT("!");
+      if (i % 5 == 0) copy.SetAt(0, WTEXT('H'));
+      SString fresh = Repeated(i % 300 + 1);
+    }
+  };
+  std::vector<std::thread> threads;
+  for (int i = 0; i < 4; ++i) threads.emplace_back(work);
+  for (std::thread& thread : threads) thread.join();
+  EXPECT_EQ(shared, WTEXT("held by several threads"));
+  EXPECT_EQ(RefsOf(shared), 2);  // this one and the one in `work`
+}
+
+}  // namespace
