@@ -1,0 +1,125 @@
+#include "qxcore/container/table_mem.h"
+
+#include <cstring>
+
+#include "qxcore/container/table_storage.h"
+#include "qxcore/core/memory.h"
+
+__STableMem::~__STableMem() { __STableMem::Clear(); }
+
+void __STableMem::Destroy(void*) {}
+
+void __STableMem::CopyTo(void* destination, const void* source) {
+  std::memcpy(destination, source, static_cast<std::size_t>(ElemSize()));
+}
+
+void* __STableMem::Allocate(int n) { return __STableDumb::AllocData(n, ElemSize()); }
+
+void __STableMem::Free(void* block) { __STableDumb::FreeData(static_cast<__STableData*>(block)); }
+
+__STableMem& __STableMem::operator=(const __STableMem& other) {
+  if (m_table.m_data == other.m_table.m_data) return *this;
+  Clear();
+  m_table = other.m_table;
+  return *this;
+}
+
+void __STableMem::Clear() {
+  __STableData* data = m_table.GetData();
+  if (data == nullptr) return;
+  m_table.Detach();
+  if (--data->m_refs != 0) return;
+  for (int i = data->m_count; i > 0; --i) Destroy(data->Elements() + std::ptrdiff_t{i - 1} * data->m_elementSize);
+  Free(data);
+}
+
+// A new block with copies of n elements.
+__STableData* __STableMem::CopyBlock(const void* elements, int n, int capacity) {
+  auto* data = static_cast<__STableData*>(Allocate(capacity));
+  auto at = [data](int i) { return data->Elements() + std::ptrdiff_t{i} * data->m_elementSize; };
+  try {
+    for (; data->m_count < n; ++data->m_count) {
+      CopyTo(at(data->m_count),
+             static_cast<const char*>(elements) + std::ptrdiff_t{data->m_count} * data->m_elementSize);
+    }
+  } catch (...) {
+    while (data->m_count > 0) Destroy(at(--data->m_count));
+    Free(data);
+    throw;
+  }
+  return data;
+}
+
+void __STableMem::GrowTo(int n) {
+  if (n == 0) return;
+  __STableData* old = m_table.GetData();
+  if (old == nullptr) {
+    m_table.Attach(Allocate(n));
+  } else if (old->m_refs == 1) {
+    m_table.GrowTo(n);
+  } else if (n >= old->m_count) {
+    __STableData* data = CopyBlock(old->Elements(), old->m_count, n);
+    m_table.Attach(data);  // lets go of the shared block
+  }
+}
+
+void* __STableMem::NewAt(int i) {
+  if (m_table.m_data.IsEmpty()) {
+    GrowTo(table_storage::kFirstCapacity);
+  } else if (GetCount() == GetCapacity()) {
+    GrowTo(table_storage::NextCapacity(GetCapacity()));
+  } else if (IsShared()) {
+    DetachBlock();
+  }
+  return m_table.NewAt(i);
+}
+
+void __STableMem::CloseSlot(int i) { m_table.Remove(i); }
+
+void __STableMem::Insert(int i, const void* element) {
+  // Copied before anything moves: the element may be one of this table's own.
+  table_storage::TransitSlot copy(ElemSize());
+  CopyTo(copy.Address(), element);
+  void* slot;
+  try {
+    slot = NewAt(i);
+  } catch (...) {
+    Destroy(copy.Address());
+    throw;
+  }
+  std::memcpy(slot, copy.Address(), static_cast<std::size_t>(ElemSize()));
+}
+
+void __STableMem::Remove(int i) {
+  if (IsShared()) DetachBlock();
+  Destroy(m_table.GetAt(i));
+  m_table.Remove(i);
+}
+
+void __STableMem::MoveTo(int from, int to) {
+  if (from == to) return;
+  if (IsShared()) DetachBlock();
+  m_table.MoveTo(from, to);
+}
+
+void __STableMem::Swap(int i, int j) {
+  if (i == j) return;
+  if (IsShared()) DetachBlock();
+  m_table.Swap(i, j);
+}
+
+void __STableMem::Reverse() {
+  if (IsShared()) DetachBlock();
+  m_table.Reverse();
+}
+
+void __STableMem::CopyArray(const void* elements, int n) {
+  if (n <= 0) return Clear();
+  Attach(CopyBlock(elements, n, n));
+}
+
+void __STableMem::Attach(void* block) {
+  if (block == m_table.GetData()) return m_table.Attach(block);
+  Clear();
+  m_table.Attach(block);
+}
