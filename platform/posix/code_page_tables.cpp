@@ -1,5 +1,7 @@
 #include <iconv.h>
+#include <unicode/uchar.h>
 #include <unicode/ucnv.h>
+#include <unicode/unorm2.h>
 
 #include <algorithm>
 #include <atomic>
@@ -160,6 +162,17 @@ int ValueOf(const DecodeTable& table, unsigned code) {
   return table.kind[code] == 0 ? table.single[code] : -1;
 }
 
+// The letter under the accents, or NUL for what is no accented letter.
+WCHAR BaseLetter(WCHAR c) {
+  UErrorCode error = U_ZERO_ERROR;
+  WCHAR parts[32];
+  const std::int32_t length = unorm2_getDecomposition(unorm2_getNFKDInstance(&error), c, parts, 32, &error);
+  if (U_FAILURE(error) || length < 1) return 0;
+  for (std::int32_t i = 1; i < length; ++i)
+    if (u_charType(parts[i]) != U_NON_SPACING_MARK) return 0;
+  return parts[0];
+}
+
 std::unique_ptr<EncodeTable> MakeEncodeTable(const CodePageInfo& page, const DecodeTable& decode) {
   auto table = std::make_unique<EncodeTable>();
   Converter converter(page);
@@ -179,10 +192,10 @@ std::unique_ptr<EncodeTable> MakeEncodeTable(const CodePageInfo& page, const Dec
     if (!valid && value != 0 && table->exact[value] == 0)
       table->exact[value] = table->fit[value] = static_cast<std::uint16_t>(code);
   });
-  for (unsigned c = 1; c < 65536 && !latinStandIn; ++c) {
+  for (unsigned c = 1; c < 65536; ++c) {
     if (table->exact[c] != 0) continue;
-    const int fit = converter.Encode(static_cast<WCHAR>(c), true);
-    if (fit >= 0) table->fit[c] = static_cast<std::uint16_t>(fit);
+    const int fit = latinStandIn ? -1 : converter.Encode(static_cast<WCHAR>(c), true);
+    table->fit[c] = fit >= 0 ? static_cast<std::uint16_t>(fit) : table->exact[BaseLetter(static_cast<WCHAR>(c))];
   }
   return table;
 }

@@ -230,16 +230,16 @@ TEST(CodePages, DoubleByteEdges) {
 
 std::vector<UINT> g_enumerated;
 
+BOOL CALLBACK NotePage(LPWSTR name) {
+  UINT page = 0;
+  for (; *name != 0; ++name) page = page * 10 + static_cast<UINT>(*name - '0');
+  g_enumerated.push_back(page);
+  return TRUE;
+}
+
 TEST(CodePages, EnumerationListsWhatIsValid) {
   g_enumerated.clear();
-  ASSERT_TRUE(EnumSystemCodePagesW(
-      [](LPWSTR name) -> BOOL {
-        UINT page = 0;
-        for (; *name != 0; ++name) page = page * 10 + static_cast<UINT>(*name - '0');
-        g_enumerated.push_back(page);
-        return TRUE;
-      },
-      CP_INSTALLED));
+  ASSERT_TRUE(EnumSystemCodePagesW(NotePage, CP_INSTALLED));
   for (const Golden& golden : kGolden)
     EXPECT_NE(std::find(g_enumerated.begin(), g_enumerated.end(), golden.page), g_enumerated.end()) << golden.page;
   for (UINT page : g_enumerated) EXPECT_TRUE(IsValidCodePage(page)) << page;
