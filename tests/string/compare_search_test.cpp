@@ -132,7 +132,8 @@ TEST(Search, Positions_RefuseWhatLiesOutside) {
   EXPECT_EQ(SString().FindPos(WTEXT('c'), 0), -1);
   EXPECT_EQ(text.ReverseFindPos(WTEXT('c'), 4), 2);
   EXPECT_EQ(text.ReverseFindPos(WTEXT('a'), 6), -1);
-  EXPECT_EQ(_tcsistr(WTEXT("xABx"), WTEXT("abz"), 2), WTEXT("xABx") + 1);
+  const WCHAR* haystack = WTEXT("xABx");
+  EXPECT_EQ(_tcsistr(haystack, WTEXT("abz"), 2), haystack + 1);
 }
 
 // Backtracking over every split: right, and slow.

@@ -1,0 +1,203 @@
+// Conversions, classification, numbers, formatting, resource texts and digests.
+
+#include <cstdio>
+
+#include "platform/wide.h"
+#include "qxcore/core/module_state.h"
+#include "qxcore/string/ansi_string.h"
+#include "qxcore/string/md5.h"
+#include "qxcore/string/string.h"
+#include "qxcore/string/text_conversion.h"
+#include "tests/support/text.h"
+
+namespace {
+
+TEST(Utf8Helpers, EveryCodeUnit_RoundTrips) {
+  for (unsigned c = 1; c < 0x10000; ++c) {
+    const WCHAR text[2] = {static_cast<WCHAR>(c), 0};
+    char bytes[4] = {'#', '#', '#', '#'};
+    WCHAR back[2];
+    ST2UTF8Helper(bytes, text, 1);
+    int length = c < 0x80 ? 1 : c < 0x800 ? 2 : 3;
+    ASSERT_EQ(bytes[length], 0);
+    ASSERT_EQ(SUTF82THelper(back, bytes, 1)[0], c);
+    ASSERT_EQ(back[1], 0);
+  }
+}
+
+TEST(Utf8Helpers, DamagedInput_IsDroppedAndNeverReadPastItsEnd) {
+  WCHAR out[16];
+  EXPECT_EQ(SString(SUTF82THelper(out, "a\x80\xF0z", 4)), WTEXT("az"));
+  EXPECT_EQ(SString(SUTF82THelper(out, "a\x80\xF0z", 3)), WTEXT("a")) << "what is dropped counts";
+  const char cut[] = {'a', '\xE4', '\xB8', 0, 'X', 'Y'};
+  EXPECT_EQ(SString(SUTF82THelper(out, cut, 10)), WTEXT("a"));
+  const char cutAtOnce[] = {'\xC3', 0, 'X'};
+  EXPECT_EQ(SString(SUTF82THelper(out, cutAtOnce, 10)), WTEXT(""));
+  EXPECT_EQ(SString(SUTF82THelper(out, "abc", 0)), WTEXT(""));
+}
+
+TEST(AnsiConversion, Loss_IsRecordedAndBuffersAreKeptTo) {
+  char bytes[16];
+  EXPECT_EQ(Swcstombsz(bytes, WTEXT("a\u00E9"), 4), 3);
+  EXPECT_EQ(std::string(bytes), "a\xE9");
+  EXPECT_EQ(g_bSwcstombszHadLoss, 0);
+  Swcstombsz(bytes, WTEXT("\u4E2D"), 4);
+  EXPECT_NE(g_bSwcstombszHadLoss, 0);
+  EXPECT_EQ(Swcstombsz(bytes, nullptr, 4), 0);
+  EXPECT_EQ(bytes[0], 0);
+  EXPECT_EQ(Swcstombsz(nullptr, WTEXT("abc"), 3), 0);
+  EXPECT_EQ(Swcstombsz(bytes, WTEXT("abcdef"), 2), 0) << "five bytes do not hold six and a NUL";
+  EXPECT_EQ(bytes[0], 0);
+  EXPECT_EQ(SString(WTEXT("a\u00E9")).CanConvertToMBCS(), 1);
+  EXPECT_EQ(SString(WTEXT("\u4E2D")).CanConvertToMBCS(), 0);
+
+  SAnsiString narrow(SString(WTEXT("na\u00EFve")));
+  EXPECT_STREQ(static_cast<const char*>(narrow), "na\xEFve");
+  EXPECT_EQ(narrow.Length(), 5);
+  EXPECT_EQ(narrow.LengthByte(), 5);
+  SAnsiString counted(WTEXT("abcdef"), 2);
+  EXPECT_STREQ(static_cast<const char*>(counted), "ab");
+  SAnsiString assigned;
+  assigned = counted;
+  EXPECT_EQ(static_cast<const char*>(assigned), static_cast<const char*>(counted)) << "the pointer, not the text";
+  assigned.Detach();
+  SUnicodeString wide("na\xEFve", 3);
+  EXPECT_EQ(SString(static_cast<const WCHAR*>(wide)), WTEXT("na\u00EF"));
+  EXPECT_EQ(wide.Length(), 3);
+}
+
+TEST(OemConversion, RoundTripsThroughTheOemPage) {
+  SString text = WTEXT("na\u00EFve \u00E9t\u00E9 \u2592");
+  SString oem = text;
+  oem.CharToOemW();
+  EXPECT_NE(oem, text);
+  oem.OemToCharW();
+  EXPECT_EQ(oem, text);
+}
+
+TEST(NoAccent, ComposedLetters_LoseTheirMarks) {
+  SString text = WTEXT("\u00C9t\u00E9 na\u00EFf \u00F8 \u4E2D");
+  EXPECT_EQ(text.NoAccent(), 3);
+  EXPECT_EQ(text, WTEXT("Ete naif \u00F8 \u4E2D"));
+}
+
+TEST(Numbers, TextsAreReadAsStated) {
+  const struct {
+    const WCHAR* text;
+    int isInteger, isNumber, truth;
+  } kCases[] = {{WTEXT("+"), 0, 0, 0},    {WTEXT("-12"), 1, 1, 1},  {WTEXT("1.0"), 0, 1, 1},  {WTEXT(""), 0, 0, 0},
+                {WTEXT("yes"), 0, 0, 1},  {WTEXT("YES"), 0, 0, 1},  {WTEXT("7"), 1, 1, 1},    {WTEXT("0"), 1, 1, 0},
+                {WTEXT("no"), 0, 0, 0},   {WTEXT("1e"), 0, 0, 1},   {WTEXT(".5e-3"), 0, 1, 0}, {WTEXT("."), 0, 0, 0},
+                {WTEXT("12a"), 0, 0, 1},  {WTEXT("1e+5"), 0, 1, 1}};
+  for (const auto& one : kCases) {
+    SString text = one.text;
+    EXPECT_EQ(text.IsInteger(), one.isInteger) << testing::PrintToString(text);
+    EXPECT_EQ(text.IsNumber(), one.isNumber) << testing::PrintToString(text);
+    EXPECT_EQ(text.ToBOOL(), one.truth) << testing::PrintToString(text);
+  }
+  EXPECT_EQ(SString(WTEXT(" -123x")).ToLONG(), -123);
+  EXPECT_EQ(SString(WTEXT("99999999999")).ToLONG(), 2147483647);
+  EXPECT_EQ(SString(WTEXT("4294967295")).ToULONG(), 4294967295ul);
+  EXPECT_EQ(SString(WTEXT("-2.5e3x")).ToDouble(), -2500.0);
+}
+
+TEST(Classification, OutsideTheText_IsNothing) {
+  SString text = WTEXT("aZ5 \u00E9\u0416");
+  EXPECT_TRUE(text.IsAlpha(0) && text.IsLower(0) && text.IsXDigit(0) && text.IsASCII(0));
+  EXPECT_TRUE(text.IsUpper(1) && !text.IsXDigit(1) && text.IsDigit(2) && text.IsAlphaNum(2) && text.IsWhitespace(3));
+  EXPECT_TRUE(text.IsAlpha(4) && text.IsLower(4) && !text.IsASCII(4) && text.IsUpper(5));
+  EXPECT_FALSE(text.IsAlpha(-1) || text.IsASCII(6) || text.IsASCII(99));
+  EXPECT_EQ(SString::IsRtfText(WTEXT("{\\rtf1")), 1);
+  EXPECT_EQ(SString::IsRtfText(WTEXT("{\\urtf1")), 1);
+  EXPECT_EQ(SString::IsRtfText(WTEXT("{\\rt")), 0);
+  EXPECT_EQ(SString::IsRtfText(nullptr), 0);
+}
+
+TEST(Format, Conversions_AgreeWithTheNarrowRuntime) {
+  RandomText random(5);
+  const char* kFlags[] = {"", "-", "+", "0", " ", "#", "-+"};
+  const char* kWidths[] = {"", "1", "12", "40"};
+  const char* kPrecisions[] = {"", ".0", ".3", ".12"};
+  for (char type : std::string("duxXo")) {
+    for (const char* flags : kFlags) {
+      for (const char* width : kWidths) {
+        for (const char* precision : kPrecisions) {
+          std::string format = std::string("<%") + flags + width + precision + type + ">";
+          int value = random.Number(100000) - 50000;
+          char expected[128];
+          std::snprintf(expected, sizeof expected, format.c_str(), value);
+          SString text;
+          text.Format(SString(format.c_str()), value);
+          EXPECT_EQ(text, SString(expected)) << format;
+        }
+      }
+    }
+  }
+}
+
+TEST(Format, TextOfAnyKindAndLength_Fits) {
+  SString text;
+  text.Format(WTEXT("%s|%S|%hs|%ls|%c|%5.2s|%%|%-4s|"), WTEXT("wide"), "narrow", "short", WTEXT("long"), 'x', WTEXT("abc"), WTEXT("z"));
+  EXPECT_EQ(text, WTEXT("wide|narrow|short|long|x|   ab|%|z   |"));
+  SString longText(SStringView(WideString(100000, WTEXT('y'))));
+  text.Format(WTEXT("%s%s"), longText.GetSafePointer(), longText.GetSafePointer());
+  EXPECT_EQ(text.Length(), 200000);
+  text = WTEXT("self");
+  text.Format(WTEXT("%s-%s"), text.GetSafePointer(), text.GetSafePointer());
+  EXPECT_EQ(text, WTEXT("self-self"));
+  text.Format(WTEXT("%f"), 1e308);
+  EXPECT_EQ(text.Length(), 316) << "more than any allowance for a floating number";
+  text.Format(WTEXT("%*d|%.*f"), 6, 42, 1, 2.25);
+  EXPECT_EQ(text.Left(7), WTEXT("    42|"));
+  text.Format(WTEXT("%ld %lu %I64d"), -5L, 6ul, 1234567890123LL);
+  EXPECT_EQ(text, WTEXT("-5 6 1234567890123"));
+  const char unterminated[3] = {'a', 'b', 'c'};
+  text.Format(WTEXT("%.3hs"), unterminated);
+  EXPECT_EQ(text, WTEXT("abc"));
+  text.Format(WTEXT(""));
+  EXPECT_TRUE(text.IsEmpty());
+  text.Format(WTEXT("%s"), static_cast<const WCHAR*>(nullptr));
+  EXPECT_EQ(text, WTEXT("(null)"));
+}
+
+TEST(Resources, Texts_AreLoadedByTheirIds) {
+  SString text;
+  EXPECT_NE(text.LoadStringW(200), 0);
+  EXPECT_EQ(text, WTEXT("Cannot open for reading"));
+  EXPECT_EQ(text.LoadStringW(9), 0);
+  EXPECT_TRUE(text.IsEmpty());
+  EXPECT_EQ(SCoreGetModuleState()->LoadStringW(196), WTEXT("Unexpected end of file."));
+  EXPECT_EQ(SStringLoad(9, WTEXT("fallback")), WTEXT("fallback"));
+  EXPECT_EQ(SString(SCoreGetModuleState()->GetResInstance(), 202), WTEXT("Write failed"));
+  EXPECT_EQ(SCoreGetModuleState()->Format(222, WTEXT("ANSI")), WTEXT(" even though \"ANSI\" encoding was expected"));
+  text.Format(222u, WTEXT("OEM"));
+  EXPECT_EQ(text, WTEXT(" even though \"OEM\" encoding was expected"));
+}
+
+TEST(Digest, KnownMessagesAndPieces) {
+  EXPECT_EQ(MD5(SString()), WTEXT("d41d8cd98f00b204e9800998ecf8427e"));
+  // RFC 1321, A.5, over bytes.
+  const struct {
+    const char* message;
+    const char* digest;
+  } kCases[] = {{"abc", "900150983cd24fb0d6963f7d28e17f72"},
+                {"message digest", "f96b697d7cb7938d525a2f31aaf161d0"},
+                {"12345678901234567890123456789012345678901234567890123456789012345678901234567890",
+                 "57edf4a22be3c955ac49da2e2107b67a"}};
+  for (const auto& one : kCases) {
+    for (std::size_t piece : {1u, 7u, 64u, 100u}) {
+      SMd5 md5;
+      std::string message = one.message;
+      for (std::size_t at = 0; at < message.size(); at += piece) md5.Add(message.data() + at, std::min(piece, message.size() - at));
+      unsigned char digest[16];
+      md5.Finish(digest);
+      char digits[33];
+      for (int i = 0; i < 16; ++i) std::snprintf(digits + 2 * i, 3, "%02x", digest[i]);
+      EXPECT_STREQ(digits, one.digest);
+    }
+  }
+  // "ab" as 61 00 62 00.
+  EXPECT_EQ(MD5(SString(WTEXT("ab"))), WTEXT("aa3a791e273bce9cf4a2a7caa9028b36"));
+}
+
+}  // namespace
