@@ -76,7 +76,8 @@ void PutInteger(Sink& sink, const Conversion& to, std::uint64_t magnitude, bool 
   if (to.alternate && base == 8 && wanted <= length) wanted = length + 1;
   std::string digits(wanted > length ? wanted - length : 0, '0');
   while (length > 0) digits += reversed[--length];
-  PutNumber(sink, to, prefix, digits.data(), digits.size(), to.zero);
+  // With a precision the flag 0 is ignored.
+  PutNumber(sink, to, prefix, digits.data(), digits.size(), to.zero && to.precision < 0);
 }
 
 std::string Print(const char* format, int precision, double value) {

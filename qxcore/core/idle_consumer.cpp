@@ -30,6 +30,9 @@ struct SIdleConsumerList::Storage {
 };
 
 // Takes the pointer as an argument, so that no compiler concludes from `this` that it is not null.
+// Out of line, so that no compiler sees in a caller that the pointer is null.
+SIdleConsumerList* SIdleConsumerList::Common() { return nullptr; }
+
 SIdleConsumerList::Fields& SIdleConsumerList::FieldsOf(SIdleConsumerList* list) {
   static constinit Fields common{0, nullptr};
   return list != nullptr ? list->m_fields : common;

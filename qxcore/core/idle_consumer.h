@@ -45,7 +45,7 @@ class QXCORE_API SIdleConsumerList {
   ~SIdleConsumerList();  // forgets the consumers that are left; they are not owned
 
   // The common list: always null, see above.
-  static SIdleConsumerList* Common() { return nullptr; }
+  static SIdleConsumerList* Common();
 
   // Appends the consumer, which is not owned. Throws SEOutOfMemory.
   void Register(SIdleConsumer* consumer);

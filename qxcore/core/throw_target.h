@@ -14,6 +14,9 @@
 
 class SThrowTarget;
 
+// Thrown and caught as itself, never deleted through a base: the destructor takes no virtual slot.
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wnon-virtual-dtor"
 class QXCORE_API STargetedException {
  public:
   STargetedException(const SString& targets, const SString& text, std::int32_t value = 0)
@@ -34,14 +37,12 @@ class QXCORE_API STargetedException {
 
   const SString& GetTargets() const { return m_targets; }
 
- protected:
-  ~STargetedException() = default;
-
  private:
   SString m_targets;
   SString m_text;
   std::int32_t m_value;
 };
+#pragma GCC diagnostic pop
 
 // Derive from it to become a catcher; Activate where the catching begins, Done where it ends.
 class QXCORE_API SThrowTarget {

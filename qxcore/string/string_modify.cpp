@@ -178,6 +178,22 @@ int SString::ReplaceAll(WCHAR oldCharacter, WCHAR newCharacter) {
   return count;
 }
 
+// Writes the source with its matches replaced; `firstAt` is the first of them. With texts of one length
+// the source may be where it is written: what is searched lies behind what was written.
+template <class Finder>
+static void ReplaceOnto(SStringView source, std::size_t firstAt, SStringView wanted, SStringView replacement, WCHAR* out,
+                        Finder find) {
+  const WCHAR* from = source.data();
+  const WCHAR* end = from + source.size();
+  for (const WCHAR* at = from + firstAt; at != nullptr;) {
+    out = std::copy(from, at, out);
+    out = std::copy(replacement.begin(), replacement.end(), out);
+    from = at + wanted.size();
+    at = find(SStringView(from, static_cast<std::size_t>(end - from)), wanted);
+  }
+  std::copy(from, end, out);
+}
+
 template <class Finder>
 int SString::ReplaceEvery(const WCHAR* oldText, const WCHAR* newText, Finder find) {
   SStringView wanted = ViewOf(oldText);
@@ -189,29 +205,18 @@ int SString::ReplaceEvery(const WCHAR* oldText, const WCHAR* newText, Finder fin
   for (const WCHAR* at = first; at != nullptr; at = find(restFrom(at + wanted.size()), wanted)) ++count;
   if (count == 0) return 0;
 
-  SString source(*this);      // keeps the text alive while it is read
-  SString oldKept(wanted);    // either argument may lie in this string's own buffer
+  SString oldKept(wanted);  // either argument may lie in this string's own buffer
   SString newKept(ViewOf(newText));
-  wanted = oldKept.View();
-  SStringView replacement = newKept.View();
-  if (wanted.size() == replacement.size()) {
+  const std::size_t firstAt = static_cast<std::size_t>(first - m_text);
+  if (oldKept.Length() == newKept.Length()) {
     CopyBeforeWrite();
-  } else {
-    long long length = Length() + count * (0LL + newKept.Length() - oldKept.Length());
-    SString room(Adopt{}, AllocBuffer(static_cast<int>(std::min<long long>(length, 0x7FFFFFFF))));
-    Swap(room);
-    if (length == 0) return count;
+    ReplaceOnto(View(), firstAt, oldKept.View(), newKept.View(), m_text, find);
+    return count;
   }
-  WCHAR* out = m_text;
-  const WCHAR* from = source.begin();
-  const WCHAR* sourceEnd = source.end();
-  for (const WCHAR* at = source.begin() + (first - source.begin()); at != nullptr;) {
-    out = std::copy(from, at, out);
-    out = std::copy(replacement.begin(), replacement.end(), out);
-    from = at + wanted.size();
-    at = find(SStringView(from, static_cast<std::size_t>(sourceEnd - from)), wanted);
-  }
-  std::copy(from, sourceEnd, out);
+  long long length = Length() + count * (0LL + newKept.Length() - oldKept.Length());
+  SString result(Adopt{}, AllocBuffer(static_cast<int>(std::min<long long>(length, 0x7FFFFFFF))));
+  if (length > 0) ReplaceOnto(View(), firstAt, oldKept.View(), newKept.View(), result.m_text, find);
+  Swap(result);
   return count;
 }
 

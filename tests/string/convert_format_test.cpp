@@ -9,6 +9,7 @@
 #include "qxcore/string/string.h"
 #include "qxcore/string/text_conversion.h"
 #include "tests/support/text.h"
+#include "tests/support/wine.h"
 
 namespace {
 
@@ -122,6 +123,8 @@ TEST(Format, Conversions_AgreeWithTheNarrowRuntime) {
     for (const char* flags : kFlags) {
       for (const char* width : kWidths) {
         for (const char* precision : kPrecisions) {
+          // Wine 8 pads with zeros although a precision is given, against the published rule.
+          if (std::string(flags) == "0" && *precision != 0 && IsWine()) continue;
           std::string format = std::string("<%") + flags + width + precision + type + ">";
           int value = random.Number(100000) - 50000;
           char expected[128];

@@ -308,6 +308,7 @@ TEST(StringMemory, EachAllocationFailing_LeavesTheTextAsItWas) {
 
 TEST(StringMemory, PoolFailure_TrimsThePoolsAndTriesOnceMore) {
   std::vector<SString> held;
+  for (int i = 0; i < 9; ++i) held.push_back(Repeated(1500));
   SMemFailAt(1, true);
   EXPECT_THROW(
       {
