@@ -9,6 +9,9 @@ How the headers document, and what this makes of it:
 - the comment that opens the file documents its first class, where that has none of its own; in a file
   without classes, whatever has none of its own.
 
+- names whose meaning the language or the standard library fixes (copies, moves, begin, value_type, ...)
+  need no comment.
+
 A public name that none of these reaches stays undocumented, and doxygen reports it as an error.
 """
 
@@ -18,12 +21,55 @@ import sys
 SECTION = re.compile(r"^\s*// --- (.*?)(?: ---)?$")
 TRAILING = re.compile(r"^(?P<code>.*?\S)\s+//\s?(?P<text>.*)$")
 
+STANDARD_NAMES = (
+    "value_type|reference|const_reference|pointer|size_type|difference_type|iterator|const_iterator|iterator_category|key_type|"
+    "mapped_type|reverse_iterator|const_reverse_iterator|iterator_concept"
+)
+STANDARD_MEMBERS = "begin|end|cbegin|cend|rbegin|rend|crbegin|crend|size|empty|push_back|clear|front|back|data|swap"
+CONVENTIONS = (
+    (re.compile(rf"\busing ({STANDARD_NAMES})\s*="), "As the standard library's containers have it."),
+    (re.compile(rf"\b({STANDARD_MEMBERS})\(.*\)"), "As the standard library's containers have it."),
+    (re.compile(r"^(?:constexpr |explicit )*(\w+)\(const (\w+)(<[\w, ]*>)?& ?\w*\)"), "Copies."),
+    (re.compile(r"^(?:constexpr |explicit )*(\w+)\((\w+)(<[\w, ]*>)?&& ?\w*\)"), "Moves; the other is left empty."),
+    (re.compile(r"^(\w+)& operator=\(const (\w+)(<[\w, ]*>)?& ?\w*\)"), "Copies."),
+    (re.compile(r"^(\w+)& operator=\((\w+)(<[\w, ]*>)?&& ?\w*\)"), "Moves; the other is left empty."),
+    (re.compile(r"\boperator(\+\+|--|->|\*)\("), "As the standard library's iterators have it."),
+    (re.compile(r"^(?:explicit )?\w+\(std::initializer_list<"), "Holds copies of the values, in their order."),
+    (re.compile(r"\bGetCount\(\) const\b"), "How many elements there are."),
+    (re.compile(r"\bIsEmpty\(\) const\b"), "Whether there is no element."),
+    (re.compile(r"\bGetCapacity\(\) const\b"), "How many elements there is room for."),
+    (re.compile(r"\boperator(==|!=|<=>|<|>|<=|>=)\("), "Compares."),
+)
+
+
+def by_convention(code):
+    """The comment for a name whose meaning is fixed, or nothing."""
+    code = code.strip().removeprefix("QXCORE_API ")
+    for pattern, text in CONVENTIONS:
+        match = pattern.search(code)
+        if match and (text not in ("Copies.", "Moves; the other is left empty.") or match[1] == match[2]):
+            return [text]
+    return []
+
 
 def strip_code(line):
     """The line without strings and comments, for counting braces."""
     line = re.sub(r'"(\\.|[^"\\])*"', '""', line)
     line = re.sub(r"'(\\.|[^'\\])'", "''", line)
     return line.split("//")[0]
+
+
+def without_template_head(statement):
+    """The statement behind "template <...>", whose default arguments would confuse."""
+    head = statement.lstrip()
+    if not head.startswith("template"):
+        return head
+    depth = 0
+    for position, character in enumerate(head):
+        depth += {"<": 1, ">": -1}.get(character, 0)
+        if character == ">" and depth == 0:
+            return without_template_head(head[position + 1 :])
+    return head
 
 
 class Filter:
@@ -50,7 +96,7 @@ class Filter:
         if re.match(r"\s*(template.*>\s*)?(class|struct)\b[^;]*\{", code) and self.header and not self.header_used:
             self.header_used = True
             return self.header
-        return self.section
+        return self.section or by_convention(code)
 
     def begins_name(self, code):
         stripped = code.strip()
@@ -122,7 +168,7 @@ class Filter:
     def track(self, code):
         for character in code:
             if character == "{":
-                head = self.statement
+                head = without_template_head(self.statement)
                 if re.search(r"\benum\b", head):
                     kind = "enum"
                 elif re.search(r"\b(class|struct|union)\b", head) and "(" not in re.sub(r"\balignas\([^)]*\)|__attribute__\(\(.*?\)\)", "", head) and "=" not in head:
@@ -149,10 +195,10 @@ class Filter:
             elif self.scope_documents():
                 if not (character.isspace() and not self.statement):
                     self.statement += character
-        if re.fullmatch(r"\s*(public|private|protected):\s*", self.statement or ""):
+        if re.fullmatch(r"\s*(public|private|protected)\s*:\s*", self.statement):
             self.statement = ""
-        if self.statement.rstrip().endswith(":") and re.match(r"^(public|private|protected)\s*:$", self.statement.strip()):
-            self.statement = ""
+        if self.statement:
+            self.statement += " "
 
 
 def main():
