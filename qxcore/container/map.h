@@ -89,8 +89,11 @@ class SMapBase : public __STree {
 template <class K, class V, class Comparer = SAscending<K>, class Allocator = SNodePools>
 class SMap : public SMapBase<K, V, Comparer, Allocator> {
   using Base = SMapBase<K, V, Comparer, Allocator>;
+
+ public:
   using typename Base::Entry;
 
+ private:
   template <class Value>
   class Iterator : __STree::iterator {
     using Tree = __STree::iterator;
@@ -188,8 +191,11 @@ class SMap : public SMapBase<K, V, Comparer, Allocator> {
 template <class K, class V, class Allocator = SNodePools, class Comparer = SAscending<K>>
 class SUnsortedMap : public SMapBase<K, V, Comparer, Allocator> {
   using Base = SMapBase<K, V, Comparer, Allocator>;
+
+ public:
   using typename Base::Entry;
 
+ private:
   template <class Value>
   class Iterator {
    public:

@@ -1,0 +1,239 @@
+// SList beside std::list, and SDList with its iterator, its order and its item-relative operations.
+
+#include "qxcore/container/list.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <list>
+#include <random>
+#include <vector>
+
+#include "counted.h"
+#include "qxcore/container/dlist.h"
+#include "qxcore/core/exception.h"
+#include "qxcore/core/memory.h"
+
+namespace {
+
+std::vector<int> Values(const SList<Counted>& list) {
+  std::vector<int> values;
+  for (const Counted& element : list) values.push_back(element.Get());
+  std::vector<int> backwards;
+  for (auto place = list.rbegin(); place != list.rend(); ++place) backwards.push_back(place->Get());
+  EXPECT_TRUE(std::equal(values.begin(), values.end(), backwards.rbegin(), backwards.rend()));
+  EXPECT_EQ(static_cast<int>(values.size()), list.GetCount());
+  return values;
+}
+
+TEST(List, RandomChanges_AreThoseOfAStdList) {
+  std::mt19937 random(3);
+  {
+    SList<Counted> list;
+    std::list<int> peer;
+    for (int step = 0; step < 5000; ++step) {
+      int value = static_cast<int>(random() % 1000);
+      int at = peer.empty() ? 0 : static_cast<int>(random() % peer.size());
+      auto place = std::next(list.begin(), at);
+      auto peerPlace = std::next(peer.begin(), at);
+      switch (random() % 8) {
+        case 0:
+          list.AddFront(Counted(value)), peer.push_front(value);
+          break;
+        case 1:
+          list.AddBack(Counted(value)), peer.push_back(value);
+          break;
+        case 2:
+          list.Insert(place, Counted(value)), peer.insert(peerPlace, value);
+          break;
+        case 3:
+          if (!peer.empty()) {
+            EXPECT_EQ(list.GetAt(at).Get(), *peerPlace);
+            EXPECT_EQ(std::distance(list.begin(), list.Erase(place)), at);
+            peer.erase(peerPlace);
+          }
+          break;
+        case 4:
+          if (!peer.empty()) list.MoveToBack(place), peer.splice(peer.end(), peer, peerPlace);
+          break;
+        case 5:
+          if (!peer.empty()) list.MoveToFront(place), peer.splice(peer.begin(), peer, peerPlace);
+          break;
+        case 6:
+          if (!peer.empty()) list.RemoveBack(), peer.pop_back();
+          break;
+        case 7:
+          if (step % 100 == 0) {
+            SList<Counted> copy(list), swapped;
+            swapped.Swap(copy);
+            EXPECT_TRUE(copy.IsEmpty());
+            EXPECT_EQ(Values(copy), std::vector<int>());
+            list = swapped;
+          }
+      }
+      ASSERT_EQ(Values(list), std::vector<int>(peer.begin(), peer.end())) << "step " << step;
+    }
+    const Counted* address = &list.AddBack(Counted(1)).operator*();
+    while (list.GetCount() > 1) list.RemoveFront();
+    EXPECT_EQ(&list.GetFront(), address) << "elements do not move";
+    list.RemoveFront();
+    EXPECT_EQ(list.begin(), list.end());
+  }
+  EXPECT_TRUE(Counted::living.empty());
+}
+
+TEST(List, Failures_LeaveTheListAsItWas) {
+  struct Large {  // not from a pool
+    int m_value;
+    char m_rest[200];
+  };
+  SList<Large> large{Large{1, {}}};
+  SMemFailAt(1);
+  EXPECT_THROW(large.AddBack(Large{2, {}}), SEOutOfMemory);
+  SMemFailAt(0);
+  EXPECT_EQ(large.GetCount(), 1);
+  {
+    SList<Counted> list{Counted(1), Counted(2)};
+    Counted third(3);
+    Counted::failAt = 1;
+    EXPECT_THROW(list.AddFront(third), CopyFailed);
+    EXPECT_EQ(Values(list), (std::vector<int>{1, 2}));
+    Counted::failAt = 2;
+    EXPECT_THROW(SList<Counted> copy(list), CopyFailed);
+    Counted::failAt = 0;
+  }
+  EXPECT_TRUE(Counted::living.empty());
+}
+
+// --- SDList ---
+
+class Item : public SDListItem {
+ public:
+  static inline int living = 0;
+  explicit Item(int value) : m_value(value) { ++living; }
+  ~Item() override { --living; }
+  int m_value;
+};
+
+int ValueOf(const SDListItem* item) { return item != nullptr ? static_cast<const Item*>(item)->m_value : -1; }
+
+std::vector<int> Values(const SDList& list) {
+  std::vector<int> values;
+  for (SDListItem* item = list.GetHead(); item != nullptr; item = item->GetNext()) values.push_back(ValueOf(item));
+  std::vector<int> backwards;
+  for (SDListItem* item = list.GetTail(); item != nullptr; item = item->GetPrevious())
+    backwards.push_back(ValueOf(item));
+  EXPECT_TRUE(std::equal(values.begin(), values.end(), backwards.rbegin(), backwards.rend()));
+  EXPECT_EQ(static_cast<int>(values.size()), list.GetCount());
+  return values;
+}
+
+int CompareItems(SDListItem* a, SDListItem* b) { return ValueOf(a) - ValueOf(b); }
+
+TEST(DList, AddAndGetAt_AtAndBeyondTheEnds) {
+  SDList list;
+  list.AddAt(new Item(1), 0);
+  list.AddAtTail(new Item(2));
+  list.AddAt(new Item(3), 5);
+  list.AddAt(new Item(4), 1);
+  list.AddAt(new Item(5), -2);
+  list.AddAtHead(nullptr);
+  EXPECT_EQ(Values(list), (std::vector<int>{5, 1, 4, 2, 3}));
+  EXPECT_EQ(ValueOf(list.GetAt(-3)), 5);
+  EXPECT_EQ(ValueOf(list.GetAt(4)), 3);
+  EXPECT_EQ(list.GetAt(5), nullptr);
+  list.DeleteAt(7);
+  list.DeleteAt(-1);
+  EXPECT_EQ(list.GetCount(), 5);
+  list.DeleteAt(2);
+  list.DeleteAtTail();
+  SDListItem* head = list.DetachAtHead();
+  EXPECT_EQ(ValueOf(head), 5);
+  EXPECT_EQ(Values(list), (std::vector<int>{1, 2}));
+  list.Init(head, 0);
+  EXPECT_EQ(Values(list), (std::vector<int>{5, 1, 2})) << "other flags keep the items";
+  list.Init(nullptr, 1);
+  EXPECT_EQ(Item::living, 0);
+  EXPECT_EQ(Values(list), std::vector<int>());
+  list.DeleteAtHead();
+  EXPECT_EQ(list.DetachAtTail(), nullptr);
+  EXPECT_EQ(list.GetAt(0), nullptr);
+}
+
+TEST(DList, SwapAndSort_RandomOrders) {
+  std::mt19937 random(5);
+  for (int round = 0; round < 300; ++round) {
+    SDList list;
+    std::vector<int> peer;
+    for (unsigned count = random() % 30; count > 0; --count) {
+      peer.push_back(static_cast<int>(random() % 20));
+      list.AddAtTail(new Item(peer.back()));
+    }
+    if (!peer.empty()) {
+      auto i = random() % peer.size(), j = random() % peer.size();
+      list.Swap(static_cast<long>(i), static_cast<long>(j));
+      std::swap(peer[i], peer[j]);
+      list.Swap(-1, 0);
+      list.Swap(0, static_cast<long>(peer.size()));
+    }
+    ASSERT_EQ(Values(list), peer);
+    list.Sort(CompareItems);
+    std::sort(peer.begin(), peer.end());
+    ASSERT_EQ(Values(list), peer);
+  }
+  SDList sorted;
+  for (int i = 0; i < 5000; ++i) sorted.AddAtTail(new Item(i));
+  sorted.Sort(CompareItems);  // the worst case for the pivot: neither stack nor patience runs out
+  EXPECT_EQ(ValueOf(sorted.GetTail()), 4999);
+}
+
+TEST(DList, ForEach_VisitsAllAndCounts) {
+  SDList list;
+  for (int i = 0; i < 5; ++i) list.AddAtTail(new Item(i));
+  EXPECT_EQ(list.ForEach([](SDListItem* item) { return ValueOf(item) % 2; }), 2);
+}
+
+TEST(DList, Iterator_WalksSkipsAndDeletes) {
+  SDList list;
+  for (int i = 0; i < 6; ++i) list.AddAtTail(new Item(i));
+  SDListIterator place(list, 2);
+  EXPECT_EQ(ValueOf(place.Next()), 3);
+  EXPECT_EQ(ValueOf(place.Skip(-2)), 1);
+  EXPECT_EQ(ValueOf(place.Skip(4)), 5);
+  SDListIterator copy(place);
+  EXPECT_EQ(place.Next(), nullptr);
+  EXPECT_EQ(place.Previous(), nullptr) << "beyond the end until First or Last";
+  EXPECT_EQ(ValueOf(copy.Previous()), 4);
+  EXPECT_EQ(ValueOf(place.First()), 0);
+  while (place.GetCurrent() != nullptr) {
+    if (ValueOf(place.GetCurrent()) % 2 == 0) {
+      place.DeleteCurrent();
+    } else {
+      place.Next();
+    }
+  }
+  EXPECT_EQ(Values(list), (std::vector<int>{1, 3, 5}));
+  EXPECT_EQ(ValueOf(place.Last()), 5);
+}
+
+TEST(XDList, OperationsRelativeToAnItem) {
+  SXDList list;
+  Item* middle = new Item(2);
+  list.AddAtTail(middle);
+  list.AddBefore(middle, new Item(1));
+  list.AddAfter(middle, new Item(3));
+  EXPECT_EQ(Values(list), (std::vector<int>{1, 2, 3}));
+  EXPECT_EQ(ValueOf(list.GetBefore(middle)), 1);
+  EXPECT_EQ(ValueOf(list.GetAfter(middle)), 3);
+  list.DeleteBefore(middle);
+  list.DeleteBefore(middle);  // there is none
+  delete list.DetachAfter(middle);
+  EXPECT_EQ(list.DetachAfter(middle), nullptr);
+  EXPECT_EQ(list.GetAfter(nullptr), nullptr);
+  EXPECT_EQ(Values(list), (std::vector<int>{2}));
+  list.Delete(middle);
+  EXPECT_EQ(Values(list), std::vector<int>());
+  EXPECT_EQ(Item::living, 0);
+}
+
+}  // namespace
