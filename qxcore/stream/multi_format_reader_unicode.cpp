@@ -51,11 +51,11 @@ SString Reader::ReadLn() {
     line.Concat(start, end);
     Deliver(static_cast<unsigned long>(end - start) + (lineFeed != nullptr ? 1 : 0));
     if (lineFeed == nullptr) continue;
-    SString text = line;
+    SString text = line.Detach();
     if (!text.IsEmpty() && text.GetAt(text.Length() - 1) == WTEXT('\r')) text.Unlock(text.Length() - 1);
     return text;
   }
-  return line;
+  return line.Detach();
 }
 
 SString Reader::ReadAll() {
