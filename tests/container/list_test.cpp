@@ -49,7 +49,8 @@ TEST(List, RandomChanges_AreThoseOfAStdList) {
         case 3:
           if (!peer.empty()) {
             EXPECT_EQ(list.GetAt(at).Get(), *peerPlace);
-            EXPECT_EQ(std::distance(list.begin(), list.Erase(place)), at);
+            auto next = list.Erase(place);
+            EXPECT_EQ(std::distance(list.begin(), next), at);
             peer.erase(peerPlace);
           }
           break;
