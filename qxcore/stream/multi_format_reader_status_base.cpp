@@ -6,12 +6,12 @@
 #include "qxcore/core/memory.h"
 #include "qxcore/core/module_state.h"
 
-using Status = SMultiFormatReaderStatusBase;
+using StatusBase = SMultiFormatReaderStatusBase;
 using Reason = SEncodingGuess::Reason;
 
-Status::SMultiFormatReaderStatusBase(const SMultiFormatReaderStatusBase& other) : m_requested(0) { *this = other; }
+StatusBase::SMultiFormatReaderStatusBase(const SMultiFormatReaderStatusBase& other) : m_requested(0) { *this = other; }
 
-SMultiFormatReaderStatusBase& Status::operator=(const SMultiFormatReaderStatusBase& other) {
+SMultiFormatReaderStatusBase& StatusBase::operator=(const SMultiFormatReaderStatusBase& other) {
   m_requested = other.m_requested;
   m_selected = other.m_selected;
   m_status = other.m_status & ~kRawPresent;
@@ -23,9 +23,9 @@ SMultiFormatReaderStatusBase& Status::operator=(const SMultiFormatReaderStatusBa
   return *this;
 }
 
-Status::~SMultiFormatReaderStatusBase() { FreeBuffer(m_raw); }
+StatusBase::~SMultiFormatReaderStatusBase() { FreeBuffer(m_raw); }
 
-void Status::FreeBuffer(BufferStatus& buffer) noexcept {
+void StatusBase::FreeBuffer(BufferStatus& buffer) noexcept {
   SMemFree(buffer.block);
   buffer = BufferStatus();
 }
@@ -42,10 +42,10 @@ static void Grow(SMultiFormatReaderStatusBase::BufferStatus& buffer, unsigned lo
   buffer.capacity = capacity;
 }
 
-void Status::AllocRawData(BufferStatus& buffer, unsigned long size) { Grow(buffer, size); }
-void Status::AllocStrData(BufferStatus& buffer, unsigned long size) { Grow(buffer, size); }
+void StatusBase::AllocRawData(BufferStatus& buffer, unsigned long size) { Grow(buffer, size); }
+void StatusBase::AllocStrData(BufferStatus& buffer, unsigned long size) { Grow(buffer, size); }
 
-int Status::SetQuickUTF8ToUTF16(int quick) {
+int StatusBase::SetQuickUTF8ToUTF16(int quick) {
   std::swap(quick, m_quickUTF8);
   return quick;
 }
@@ -58,13 +58,13 @@ static SString Text(unsigned id, const SString& first, const SString& second = S
   formatted.Format(Text(id), first.GetSafePointer(), second.GetSafePointer());
   return formatted;
 }
-static SString NameOf(Status::Encoding encoding) { return Status::Support::GetEncodingName(encoding, 0, 1); }
+static SString NameOf(StatusBase::Encoding encoding) { return StatusBase::Support::GetEncodingName(encoding, 0, 1); }
 
-SString Status::GetDetectionWarning() const {
+SString StatusBase::GetDetectionWarning() const {
   return m_hasFailed || (m_status & kWarning) != 0 ? GetDetectionReport() : SString();
 }
 
-SString Status::GetDetectionReport() const {
+SString StatusBase::GetDetectionReport() const {
   if (m_hasFailed) return Text(220);
   const SString hint = NameOf(m_requested);
   const SString selected = NameOf(m_selected);
@@ -91,7 +91,7 @@ SString Status::GetDetectionReport() const {
   return differs ? report + Text(225, hint) : report;
 }
 
-SString Status::GetEncodingWarning() const {
+SString StatusBase::GetEncodingWarning() const {
   const SString from = NameOf(m_selected);
   const SString to = Support::GetAppEncodingName();
   SString warning;

@@ -25,11 +25,13 @@ class QXCORE_API SMultiFormatReaderStatusBase {
   };
 
   // Status bits.
-  static constexpr unsigned kRawPresent = 0x1;   // raw data was there before detection
-  static constexpr unsigned kWholeInput = 0x2;   // no more raw data follows
-  static constexpr unsigned kProvisional = 0x4;  // ASCII so far; more data may show other bytes
-  static constexpr unsigned kSelected = 0x20;    // a selection was made
-  static constexpr unsigned kWarning = 0x40;     // detection's result deserves a warning
+  enum Status : unsigned {
+    kRawPresent = 0x1,   // raw data was there before detection
+    kWholeInput = 0x2,   // no more raw data follows
+    kProvisional = 0x4,  // ASCII so far; more data may show other bytes
+    kSelected = 0x20,    // a selection was made
+    kWarning = 0x40      // detection's result deserves a warning
+  };
 
   // A copy has the encodings, the status and the reports, but empty buffers of its own.
   SMultiFormatReaderStatusBase(const SMultiFormatReaderStatusBase& other);

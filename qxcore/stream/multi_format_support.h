@@ -12,7 +12,9 @@
 #include "qxcore/stream/abstract_io.h"
 #include "qxcore/string/string.h"
 
-class QXCORE_API SAbstractIO::SMultiFormatSupport {
+// Its functions are exported one by one: constants of a class that is imported as a whole could not be
+// bound to references.
+class SAbstractIO::SMultiFormatSupport {
  public:
   using Encoding = std::uint32_t;
 
@@ -63,13 +65,13 @@ class QXCORE_API SAbstractIO::SMultiFormatSupport {
     return (a & mask) == (b & mask);
   }
   // The code page that bytes of a kind ANSI or OEM value are in; 0 for other kinds.
-  static unsigned int CodePageOf(Encoding encoding);
+  QXCORE_API static unsigned int CodePageOf(Encoding encoding);
 
   // The name of an encoding: the first one of the name table; code pages without a name are "Cp" and the
   // number. With `withPolicy`, the policy follows in suffixes ("+Detect"). With `userFriendly`, the
   // translatable words come from the string table. A code page that is neither the active one nor
   // installed has "* NOT INSTALLED *" behind it. Value 0: "<Undefined>", or nothing with `emptyIfUndefined`.
-  static SString GetEncodingName(Encoding encoding, int withPolicy = 0, int userFriendly = 0, int emptyIfUndefined = 0);
+  QXCORE_API static SString GetEncodingName(Encoding encoding, int withPolicy = 0, int userFriendly = 0, int emptyIfUndefined = 0);
 
   // The encoding that a text names. Surrounding blanks are ignored; the longest name of the table that
   // begins the text wins, case does not matter, and suffixes of the policy may follow. "Cp" and a number
@@ -78,19 +80,19 @@ class QXCORE_API SAbstractIO::SMultiFormatSupport {
   // "<Undefined>", an empty text and what is no name.
   // `matched`, where given, is set to the number of characters that were understood, blanks included;
   // when it is less than the text's length, something follows that means nothing.
-  static Encoding MatchEncodingName(const SString& name, int installed = 0, int* matched = nullptr);
+  QXCORE_API static Encoding MatchEncodingName(const SString& name, int installed = 0, int* matched = nullptr);
 
   // Whether text can be converted from and to the encoding on this machine: 1 or 0.
-  static int MachineSupports(Encoding encoding);
+  QXCORE_API static int MachineSupports(Encoding encoding);
 
   // The name of the application's own character set: that of little-endian UTF-16.
-  static SString GetAppEncodingName();
+  QXCORE_API static SString GetAppEncodingName();
 
   // Replaces the words of a table name that are translatable by their translation.
-  static SString MakeUserFriendly(const SString& name);
+  QXCORE_API static SString MakeUserFriendly(const SString& name);
 
   using EncodingMap = SMap<SString, Encoding, SAscStrNoC>;
   // Adds name and value of encodings to a sorted map: the display name of each value, with `aliases` all
   // names; with `installedOnly` only those that the machine supports. Gives how many names were added.
-  static int ListAvailableEncodings(EncodingMap& names, int installedOnly, int aliases);
+  QXCORE_API static int ListAvailableEncodings(EncodingMap& names, int installedOnly, int aliases);
 };

@@ -16,9 +16,9 @@ SStringBuffer::SStringBuffer(const SString& text, unsigned capacity, unsigned nu
 
 void SStringBuffer::Reset(unsigned capacity, unsigned numerator, unsigned denominator) {
   m_text.Release();
-  m_capacity = capacity != 0 ? capacity : kDefaultCapacity;
-  m_numerator = numerator != 0 ? numerator : kDefaultNumerator;
-  m_denominator = denominator != 0 ? denominator : kDefaultDenominator;
+  m_capacity = capacity != 0 ? capacity : unsigned{kDefaultCapacity};
+  m_numerator = numerator != 0 ? numerator : unsigned{kDefaultNumerator};
+  m_denominator = denominator != 0 ? denominator : unsigned{kDefaultDenominator};
   int grown = MulDiv(static_cast<int>(m_capacity), static_cast<int>(m_numerator), static_cast<int>(m_denominator));
   if (grown <= static_cast<int>(m_capacity)) {
     m_numerator = kDefaultNumerator;

@@ -13,9 +13,7 @@
 
 class QXCORE_API SStringBuffer {
  public:
-  static constexpr unsigned kDefaultCapacity = 0x40000;
-  static constexpr unsigned kDefaultNumerator = 5;
-  static constexpr unsigned kDefaultDenominator = 3;
+  enum Defaults : unsigned { kDefaultCapacity = 0x40000, kDefaultNumerator = 5, kDefaultDenominator = 3 };
 
   // Capacity in characters and the ratio numerator / denominator by which it grows; 0 means the
   // default. The text, where given, is the first content.

@@ -21,8 +21,11 @@ struct SStringData {
   std::int32_t m_allocLength;  // characters that fit, the terminator not counted
 
   WCHAR* Text() { return reinterpret_cast<WCHAR*>(this + 1); }
-  static SStringData* Of(WCHAR* text) { return reinterpret_cast<SStringData*>(text) - 1; }
-  static const SStringData* Of(const WCHAR* text) { return reinterpret_cast<const SStringData*>(text) - 1; }
+  // By way of an integer: compilers take a step back from a pointer to characters for a mistake.
+  static SStringData* Of(WCHAR* text) {
+    return reinterpret_cast<SStringData*>(reinterpret_cast<std::uintptr_t>(text) - sizeof(SStringData));
+  }
+  static const SStringData* Of(const WCHAR* text) { return Of(const_cast<WCHAR*>(text)); }
 
   std::int32_t Refs() const { return __atomic_load_n(&m_refs, __ATOMIC_ACQUIRE); }
 };

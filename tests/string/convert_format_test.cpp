@@ -1,6 +1,7 @@
 // Conversions, classification, numbers, formatting, resource texts and digests.
 
 #include <cstdio>
+#include <cstring>
 
 #include "platform/wide.h"
 #include "qxcore/core/module_state.h"
@@ -123,6 +124,8 @@ TEST(Format, Conversions_AgreeWithTheNarrowRuntime) {
     for (const char* flags : kFlags) {
       for (const char* width : kWidths) {
         for (const char* precision : kPrecisions) {
+          // A sign is for signed numbers; runtimes differ in what they make of it elsewhere.
+          if (type != 'd' && (*flags == ' ' || std::strchr(flags, '+') != nullptr)) continue;
           // Wine 8 pads with zeros although a precision is given, against the published rule.
           if (std::string(flags) == "0" && *precision != 0 && IsWine()) continue;
           std::string format = std::string("<%") + flags + width + precision + type + ">";
