@@ -6,6 +6,7 @@
 
 // By code unit, up to the first NUL.
 struct SAscStrCas {
+  // Negative when a comes first, positive when b does, else 0.
   static int Compare(const WCHAR* a, const WCHAR* b) {
     if (a == b) return 0;
     while (*a == *b && *a != 0) ++a, ++b;
@@ -15,6 +16,7 @@ struct SAscStrCas {
 
 // The same after mapping to lower case, one to one and without regard to a locale.
 struct SAscStrNoC {
+  // Negative when a comes first, positive when b does, else 0.
   static int Compare(const WCHAR* a, const WCHAR* b) {
     if (a == b) return 0;
     for (;; ++a, ++b) {
@@ -27,5 +29,6 @@ struct SAscStrNoC {
 // By operator <.
 template <class K>
 struct SAscending {
+  // Negative when a comes first, positive when b does, else 0.
   static int Compare(const K& a, const K& b) { return a < b ? -1 : b < a ? 1 : 0; }
 };

@@ -21,6 +21,7 @@ class QXCORE_API SDListItem {
   SDListItem& operator=(const SDListItem&) { return *this; }
   virtual ~SDListItem();
 
+  // The neighbours in the list; null at its ends and outside of a list.
   SDListItem* GetNext() const { return m_next; }
   SDListItem* GetPrevious() const { return m_previous; }
 
@@ -30,9 +31,10 @@ class QXCORE_API SDListItem {
   SDListItem* m_previous = nullptr;
 };
 
+// A list that links items which carry their links themselves, and owns them.
 class QXCORE_API SDList {
  public:
-  using Visit = int (*)(SDListItem* item);
+  using Visit = int (*)(SDListItem* item);                // what ForEach calls
   using Compare = int (*)(SDListItem* a, SDListItem* b);  // negative when a comes before b
 
   SDList() = default;
@@ -45,18 +47,21 @@ class QXCORE_API SDList {
   void WINAPI Done();  // deletes every item
 
   int GetCount() const { return m_count; }
+  // The ends; null in an empty list.
   SDListItem* GetHead() const { return m_head; }
   SDListItem* GetTail() const { return m_tail; }
   // The item that is `index` steps behind the head; the head for an index below 1. Null when the list is
   // shorter.
   SDListItem* WINAPI GetAt(long index) const;
 
+  // The list owns the item from then on; null is ignored.
   void WINAPI AddAtHead(SDListItem* item);
   void WINAPI AddAtTail(SDListItem* item);
   // The item becomes the element at the index; at the head for an index below 1, at the tail for one that
   // is not below the count.
   void WINAPI AddAt(SDListItem* item, long index);
 
+  // Nothing happens in an empty list.
   void WINAPI DeleteAtHead();
   void WINAPI DeleteAtTail();
   void WINAPI DeleteAt(long index);  // an index outside of the list is ignored
@@ -103,7 +108,7 @@ class QXCORE_API SDListIterator {
   // Begins at the item that the list's GetAt gives for the index.
   explicit SDListIterator(SDList& list, long index = 0) : m_list(&list), m_current(list.GetAt(index)) {}
 
-  SDListItem* GetCurrent() const { return m_current; }
+  SDListItem* GetCurrent() const { return m_current; }  // null beyond either end
   // Move, and give the item at the new position, or null.
   SDListItem* First() { return m_current = m_list->GetHead(); }
   SDListItem* Last() { return m_current = m_list->GetTail(); }
@@ -122,11 +127,12 @@ class QXCORE_API SDListIterator {
 // item then stays the caller's), and so is a missing neighbour.
 class QXCORE_API SXDList : public SDList {
  public:
+  // The list owns the item from then on.
   void AddBefore(SDListItem* reference, SDListItem* item);
   void AddAfter(SDListItem* reference, SDListItem* item);
   void DeleteBefore(SDListItem* reference);  // deletes the item in front of it
-  void DeleteAfter(SDListItem* reference);
-  void Delete(SDListItem* item);
+  void DeleteAfter(SDListItem* reference);   // deletes the item behind it
+  void Delete(SDListItem* item);             // deletes the item itself
   // Give the item to the caller, who owns it then; null when there is none.
   SDListItem* DetachBefore(SDListItem* reference);
   SDListItem* DetachAfter(SDListItem* reference);

@@ -21,8 +21,10 @@
 class QXCORE_API __SList {
  public:
   struct Node {
+    // Neighbours in the ring.
     Node* m_next;
     Node* m_prev;
+    // The element.
     void* Payload() { return this + 1; }
     const void* Payload() const { return this + 1; }
   };
@@ -37,9 +39,9 @@ class QXCORE_API __SList {
   // Frees nothing: the element operations are the derived class's, which has to call Clear itself.
   virtual ~__SList();
 
-  virtual Node* AllocNode() = 0;  // room for a node and its payload; throws SEOutOfMemory
-  virtual void FreeNode(Node* node) = 0;
-  virtual void DestroyPayload(void* payload) = 0;
+  virtual Node* AllocNode() = 0;                   // room for a node and its payload; throws SEOutOfMemory
+  virtual void FreeNode(Node* node) = 0;           // gives the room back; the payload has ended
+  virtual void DestroyPayload(void* payload) = 0;  // ends the payload's life
   virtual void CopyPayload(Node* node, const void* source) = 0;  // constructs a copy in the node
 
   // Clears the list, then copies every payload in order. A failure leaves the elements copied so far.
@@ -58,9 +60,9 @@ class QXCORE_API __SList {
   void MoveTo(Node* node, Node* before);  // relinks the node in front of `before`
   void Swap(__SList& other) noexcept;     // exchanges the contents; both must be of one type
 
-  std::int32_t m_count = 0;
-  Node* m_end;      // &m_sentinel
-  Node m_sentinel;  // links the first and the last node into a ring
+  std::int32_t m_count = 0;  // elements
+  Node* m_end;               // &m_sentinel
+  Node m_sentinel;           // links the first and the last node into a ring
 
  private:
   static void LinkBefore(Node* node, Node* before);

@@ -18,10 +18,11 @@
 #include "qxcore/container/table_dumb.h"
 #include "qxcore/container/tree.h"
 
+// One entry: the key stays, the value may change.
 template <class K, class V>
 struct SMapEntry {
-  const K m_key;
-  V m_value;
+  const K m_key;  // what the map is ordered by
+  V m_value;      // what it leads to
 };
 
 // What both maps have in common. A key is passed through the tree as the address of a K.

@@ -18,6 +18,7 @@ class QXCORE_API SStringMapAllocator {
  public:
   static SFixedAlloc& m_Nodes;  // "SStringMapAllocator", 128 entries a block; never destroyed
 
+  // As an allocator of SMap; the sizes are those of an entry.
   static void* Alloc(std::size_t, std::size_t) { return Nodes().Alloc(); }
   static void Free(void* node, std::size_t, std::size_t) noexcept { Nodes().Free(node); }
 
@@ -31,6 +32,7 @@ class QXCORE_API SStringMapAllocator {
 // Writes and reads the flat text form of a map.
 class QXCORE_API SMapListFormat {
  public:
+  // The separators between entries and between key and value, and what makes either literal.
   SMapListFormat(WCHAR item, WCHAR pair, WCHAR escape) : m_item(item), m_pair(pair), m_escape(escape) {}
 
   // Appends one entry, and the item separator before it unless it is the first.
@@ -60,6 +62,7 @@ concept SIsStringMap = requires {
 template <class Map>
 class SStringMapShell : public Map {
  public:
+  // Tells the string maps from other types.
   using string_map_tag = void;
   using Map::Map;
   using Map::operator=;
@@ -135,27 +138,30 @@ class QXCORE_API SStringMap : public SStringMapShell<SMap<SString, SString, SAsc
   static const SStringMap null;  // always empty
 };
 
+// The same without regard to case.
 class QXCORE_API SStringMapNoCase : public SStringMapShell<SMap<SString, SString, SAscStrNoC, SStringMapAllocator>> {
  public:
   using SStringMapShell::SStringMapShell;
   using SStringMapShell::operator=;
-  static const SStringMapNoCase null;
+  static const SStringMapNoCase null;  // always empty
 };
 
+// In the order in which the keys came; see SUnsortedMap.
 class QXCORE_API SStringUnsortedMap
     : public SStringMapShell<SUnsortedMap<SString, SString, SStringMapAllocator, SAscStrCas>> {
  public:
   using SStringMapShell::SStringMapShell;
   using SStringMapShell::operator=;
-  static const SStringUnsortedMap null;
+  static const SStringUnsortedMap null;  // always empty
 };
 
+// The same without regard to case.
 class QXCORE_API SStringUnsortedMapNoCase
     : public SStringMapShell<SUnsortedMap<SString, SString, SStringMapAllocator, SAscStrNoC>> {
  public:
   using SStringMapShell::SStringMapShell;
   using SStringMapShell::operator=;
-  static const SStringUnsortedMapNoCase null;
+  static const SStringUnsortedMapNoCase null;  // always empty
 };
 
 static_assert(sizeof(void*) != 4 || (sizeof(SStringMap) == 12 && sizeof(SStringUnsortedMap) == 16),

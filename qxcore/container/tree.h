@@ -15,15 +15,18 @@
 
 class QXCORE_API __STree {
  public:
+  // The colour of an entry.
   enum _Redbl : std::int32_t { kRed, kBlack };
 
   // The head of an entry; the payload follows directly.
   struct Entry {
+    // Links to the entries below and above; null for none.
     Entry* m_left;
     Entry* m_parent;
     Entry* m_right;
-    _Redbl m_color;
+    _Redbl m_color;  // of the link from above
 
+    // Key and value.
     void* Payload() { return this + 1; }
     const void* Payload() const { return this + 1; }
   };
@@ -36,13 +39,15 @@ class QXCORE_API __STree {
   class iterator {
    public:
     iterator() = default;
+    // Stands at an entry of the tree, or with null behind the last one.
     iterator(const __STree* tree, Entry* entry) : m_tree(tree), m_entry(entry) {}
+    // In the order of the keys; Previous from behind the last one gives that.
     void Next() { m_entry = Successor(m_entry); }
     void Previous() { m_entry = m_entry != nullptr ? Predecessor(m_entry) : m_tree->GetLastEntry(); }
     friend bool operator==(const iterator& a, const iterator& b) { return a.m_entry == b.m_entry; }
 
-    const __STree* m_tree = nullptr;
-    Entry* m_entry = nullptr;
+    const __STree* m_tree = nullptr;  // not owned
+    Entry* m_entry = nullptr;         // null behind the last one
   };
 
   // Where a key is, or where it would be put in.

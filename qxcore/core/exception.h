@@ -10,6 +10,7 @@
 
 class QXCORE_API SException {
  public:
+  // A failure with its text for the user and its result code.
   SException(const SString& text, HRESULT code) : m_text(text), m_code(code) {}
   SException(const SException&) = default;
   SException& operator=(const SException&) = default;
@@ -32,6 +33,7 @@ class QXCORE_API SException {
 // A failure of the platform or of COM, told by its HRESULT.
 class QXCORE_API SECOMException : public SException {
  public:
+  // With the system's message, or a text of its own.
   explicit SECOMException(HRESULT code) : SException(SString(), code) {}
   SECOMException(HRESULT code, const SString& text) : SException(text, code) {}
 
@@ -51,6 +53,7 @@ class QXCORE_API SEOutOfMemory : public SECOMException {
 // An object could not be constructed; code and text are the raiser's.
 class QXCORE_API SEConstructor : public SException {
  public:
+  // Text and code as the raiser has them.
   SEConstructor(const SString& text, HRESULT code) : SException(text, code) {}
   const WCHAR* GetExceptionName() const override;
 };
@@ -58,6 +61,7 @@ class QXCORE_API SEConstructor : public SException {
 // A zip archive cannot be read; code and text are the raiser's.
 class QXCORE_API SEZipException : public SException {
  public:
+  // Text and code as the raiser has them.
   SEZipException(const SString& text, HRESULT code) : SException(text, code) {}
   const WCHAR* GetExceptionName() const override;
 };
@@ -65,6 +69,7 @@ class QXCORE_API SEZipException : public SException {
 // A Win32 error code with its system message. Not thrown by the library; a value for clients.
 class QXCORE_API SEWinError {
  public:
+  // `code` as GetLastError gives it.
   explicit SEWinError(DWORD code) : m_code(static_cast<HRESULT>(code)) {}
   virtual ~SEWinError();
 
@@ -73,7 +78,7 @@ class QXCORE_API SEWinError {
   virtual const WCHAR* GetText() const;
   virtual const WCHAR* GetExceptionName() const;
 
-  DWORD GetCode() const { return static_cast<DWORD>(m_code); }
+  DWORD GetCode() const { return static_cast<DWORD>(m_code); }  // the Win32 error code
 
  private:
   mutable SString m_text;

@@ -37,6 +37,7 @@ class QXCORE_API SIdleConsumer {
   SIdleConsumerList* m_idleList;  // null for the common list
 };
 
+// Consumers in the order in which they are called.
 class QXCORE_API SIdleConsumerList {
  public:
   constexpr SIdleConsumerList() noexcept = default;

@@ -17,10 +17,10 @@ class QXCORE_API SModuleState {
   // Takes `instance` as module and resource handle, the first time only; later calls do nothing.
   void Init(HINSTANCE instance);
 
-  int IsInitialized() const { return m_initialized; }
-  HINSTANCE GetInstance() const { return m_instance; }
-  HINSTANCE GetResInstance() const { return m_resInstance; }
-  HINSTANCE GetLangResInstance() const { return m_langResInstance; }
+  int IsInitialized() const { return m_initialized; }                 // 1 after Init, else 0
+  HINSTANCE GetInstance() const { return m_instance; }                // the module itself
+  HINSTANCE GetResInstance() const { return m_resInstance; }          // where resources are looked up
+  HINSTANCE GetLangResInstance() const { return m_langResInstance; }  // the module of translated resources, or null
 
   // Text `id` of the resource handle's string table; empty when there is none.
   SString LoadStringW(unsigned int id);

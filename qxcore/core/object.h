@@ -46,6 +46,7 @@ struct QXCORE_API SClassInfo {
 // Head of the list of all class records; null before the first one is made.
 extern QXCORE_API SClassInfo* g_pClassInfo;
 
+// The root: what every polymorphic object of the library can do.
 class QXCORE_API SObject {
  public:
   // The record of SObject itself: schema 1, no base, no factory.
@@ -82,9 +83,9 @@ T* SObjectCast(SObject* object, const SClassInfo* info) {
 }
 
 // Declares the class record and its query in a class body. Leaves the access at public.
-#define QXCORE_DECLARE_CLASS(Class)  \
- public:                             \
-  static SClassInfo class##Class;    \
+#define QXCORE_DECLARE_CLASS(Class) \
+ public:                            \
+  static SClassInfo class##Class;   \
   SClassInfo* GetClassInfoW() const override;
 
 // The same for a class that can be created from its record.
@@ -93,10 +94,11 @@ T* SObjectCast(SObject* object, const SClassInfo* info) {
   static SObject* CreateObject();
 
 // Defines what the two above declare; in one source file, at namespace level.
-#define QXCORE_IMPLEMENT_CLASS(Class, Base, schema)                                                  \
-  SClassInfo Class::class##Class(#Class, schema, sizeof(Class), &Base::class##Base, nullptr);        \
+#define QXCORE_IMPLEMENT_CLASS(Class, Base, schema)                                           \
+  SClassInfo Class::class##Class(#Class, schema, sizeof(Class), &Base::class##Base, nullptr); \
   SClassInfo* Class::GetClassInfoW() const { return &class##Class; }
-#define QXCORE_IMPLEMENT_CREATABLE_CLASS(Class, Base, schema)                                        \
+// The same for a class that QXCORE_DECLARE_CREATABLE_CLASS declares.
+#define QXCORE_IMPLEMENT_CREATABLE_CLASS(Class, Base, schema)                                              \
   SClassInfo Class::class##Class(#Class, schema, sizeof(Class), &Base::class##Base, &Class::CreateObject); \
-  SClassInfo* Class::GetClassInfoW() const { return &class##Class; }                                 \
+  SClassInfo* Class::GetClassInfoW() const { return &class##Class; }                                       \
   SObject* Class::CreateObject() { return new Class; }

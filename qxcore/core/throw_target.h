@@ -19,6 +19,7 @@ class SThrowTarget;
 #pragma GCC diagnostic ignored "-Wnon-virtual-dtor"
 class QXCORE_API STargetedException {
  public:
+  // `targets`: names separated by commas, e.g. "Scripting,DlgAbort".
   STargetedException(const SString& targets, const SString& text, std::int32_t value = 0)
       : m_targets(targets), m_text(text), m_value(value) {}
   STargetedException(const STargetedException&) = default;
@@ -35,7 +36,7 @@ class QXCORE_API STargetedException {
   // meant.
   int Match(const SThrowTarget& target) const;
 
-  const SString& GetTargets() const { return m_targets; }
+  const SString& GetTargets() const { return m_targets; }  // the names, separated by commas
 
  private:
   SString m_targets;
@@ -47,6 +48,7 @@ class QXCORE_API STargetedException {
 // Derive from it to become a catcher; Activate where the catching begins, Done where it ends.
 class QXCORE_API SThrowTarget {
  public:
+  // `names`: what the catcher answers to, separated by commas. Not active yet.
   explicit SThrowTarget(const SString& names) : m_names(names) {}
   SThrowTarget(const SThrowTarget&) = delete;
   SThrowTarget& operator=(const SThrowTarget&) = delete;
@@ -55,8 +57,8 @@ class QXCORE_API SThrowTarget {
   // Takes the names' counts back, once; the names stay known.
   void Done() noexcept;
 
-  const SString& GetNames() const { return m_names; }
-  bool IsActive() const { return m_active != 0; }
+  const SString& GetNames() const { return m_names; }  // the names, separated by commas
+  bool IsActive() const { return m_active != 0; }      // between Activate and Done
 
  protected:
   // Counts the names, once. On SEOutOfMemory none is counted.

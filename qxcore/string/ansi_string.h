@@ -16,17 +16,19 @@ class SString;
 class QXCORE_API SAnsiString {
  public:
   SAnsiString() = default;
-  explicit SAnsiString(const WCHAR* text);             // null gives a null pointer
-  SAnsiString(const WCHAR* text, int count);           // at most `count` characters of it
+  explicit SAnsiString(const WCHAR* text);    // null gives a null pointer
+  SAnsiString(const WCHAR* text, int count);  // at most `count` characters of it
+  // The whole text, up to its first NUL.
   explicit SAnsiString(const SString& text);
   SAnsiString(const SAnsiString&) = delete;
   SAnsiString& operator=(const SAnsiString&) = default;  // member by member: the pointer is copied
   ~SAnsiString() { Done(); }
 
-  void Done();            // frees the text and clears the pointer
-  char* Detach();         // gives the pointer up without freeing the text (free with std::free)
-  int Length() const;     // characters of the multi-byte text
+  void Done();             // frees the text and clears the pointer
+  char* Detach();          // gives the pointer up without freeing the text (free with std::free)
+  int Length() const;      // characters of the multi-byte text
   int LengthByte() const;  // bytes
+  // The text; null where none was converted. Valid until Done.
   operator char*() { return m_text; }
   operator const char*() const { return m_text; }
 
@@ -50,6 +52,7 @@ class QXCORE_API SUnicodeString {
   void Done();
   WCHAR* Detach();
   int Length() const;  // characters
+  // The text; null where none was converted. Valid until Done.
   operator WCHAR*() { return m_text; }
   operator const WCHAR*() const { return m_text; }
 

@@ -11,6 +11,7 @@
 class QXCORE_API SMd5 {
  public:
   SMd5() noexcept;
+  // Appends bytes to the message.
   void Add(const void* bytes, std::size_t count) noexcept;
   // Ends the message and writes the 16 bytes of the digest; the object must not be used further.
   void Finish(unsigned char digest[16]) noexcept;

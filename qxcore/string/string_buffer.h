@@ -13,6 +13,7 @@
 
 class QXCORE_API SStringBuffer {
  public:
+  // In characters, and the ratio by which it grows.
   enum Defaults : unsigned { kDefaultCapacity = 0x40000, kDefaultNumerator = 5, kDefaultDenominator = 3 };
 
   // Capacity in characters and the ratio numerator / denominator by which it grows; 0 means the

@@ -25,24 +25,27 @@ class QXCORE_API STokenIterator {
   }
 
  protected:
+  // The iterator keeps the string's address: the string must outlive it and stay as it is.
   explicit STokenIterator(const SString& text) : m_text(&text), m_start(text), m_restart(&text), m_end(m_start) {}
-  const WCHAR* TextEnd() const { return m_text->end(); }
+  const WCHAR* TextEnd() const { return m_text->end(); }  // behind the last character
+  // Stands behind the last token from now on.
   void Finish() {
     m_start = m_end = TextEnd();
     m_isDone = true;
   }
 
-  const SString* m_text;
-  const WCHAR* m_start;
-  const SString* m_restart;
-  const WCHAR* m_end;
-  bool m_isDone = false;
+  const SString* m_text;     // the string that is walked
+  const WCHAR* m_start;      // the current token's first character
+  const SString* m_restart;  // the string that reset goes back to
+  const WCHAR* m_end;        // behind the current token's last character
+  bool m_isDone = false;     // stands behind the last token
 };
 
 // Runs of characters that are not white space. The first token begins at the beginning of the string,
 // and is empty when the string begins with white space; that is meant.
 class QXCORE_API word_iterator : public STokenIterator {
  public:
+  // Stands at the first token of the string, which must outlive the iterator.
   explicit word_iterator(const SString& text) : STokenIterator(text) { reset(); }
   word_iterator& operator++();
   word_iterator operator++(int) {
@@ -59,6 +62,7 @@ class QXCORE_API word_iterator : public STokenIterator {
 // Lines; carriage return, line feed, or one after the other end a line.
 class QXCORE_API line_iterator : public STokenIterator {
  public:
+  // Stands at the first line of the string, which must outlive the iterator.
   explicit line_iterator(const SString& text) : STokenIterator(text) { reset(); }
   line_iterator& operator++();
   line_iterator operator++(int) {
@@ -66,7 +70,7 @@ class QXCORE_API line_iterator : public STokenIterator {
     ++*this;
     return before;
   }
-  void reset();
+  void reset();  // back to the first token
 
  private:
   void ScanEnd();
@@ -75,6 +79,7 @@ class QXCORE_API line_iterator : public STokenIterator {
 // Parts between separators; two adjacent separators hold an empty part, one at the end is followed by one.
 class QXCORE_API parts_iterator : public STokenIterator {
  public:
+  // Stands at the first part of the string, which must outlive the iterator.
   parts_iterator(const SString& text, WCHAR separator) : STokenIterator(text), m_separator(separator) { reset(); }
   parts_iterator& operator++();
   parts_iterator operator++(int) {
@@ -82,7 +87,7 @@ class QXCORE_API parts_iterator : public STokenIterator {
     ++*this;
     return before;
   }
-  void reset();
+  void reset();  // back to the first token
 
  private:
   void ScanEnd();
@@ -93,6 +98,7 @@ class QXCORE_API parts_iterator : public STokenIterator {
 // Walks characters. Reading at the end gives the terminator.
 class QXCORE_API const_iterator {
  public:
+  // Stands at index `start`, from 0 to the length, of the string, which must outlive the iterator.
   explicit const_iterator(const SString& text, int start = 0) : m_text(&text), m_at(text.GetPointerAt(start)) {}
   WCHAR operator*() const { return *m_at; }
   const_iterator& operator++() {
@@ -104,6 +110,7 @@ class QXCORE_API const_iterator {
     ++m_at;
     return before;
   }
+  // Moves by n characters; both ends are the caller's care.
   const_iterator& operator+=(int n) {
     m_at += n;
     return *this;
@@ -111,15 +118,16 @@ class QXCORE_API const_iterator {
   auto operator<=>(const const_iterator& other) const { return m_at <=> other.m_at; }
   bool operator==(const const_iterator& other) const { return m_at == other.m_at; }
   explicit operator bool() const { return m_at < m_text->end(); }
-  const WCHAR* GetPointer() const { return m_at; }
+  const WCHAR* GetPointer() const { return m_at; }  // the current character's address
+  // What the current character is: a line end, white space.
   bool IsEoln() const { return *m_at == WTEXT('\r') || *m_at == WTEXT('\n'); }
   bool IsWhitespace() const;
-  void SaveState() { m_saved = m_at; }
+  void SaveState() { m_saved = m_at; }                                 // remembers the place for RestoreState
   void RestoreState() { m_at = m_saved != nullptr ? m_saved : m_at; }  // nothing where none was saved
-  void reset() { m_at = *m_text; }
+  void reset() { m_at = *m_text; }                                     // back to the first character
 
  private:
-  const SString* m_text;
+  const SString* m_text;  // the string that is walked
   const WCHAR* m_at;
   const WCHAR* m_saved = nullptr;
 };
