@@ -85,6 +85,7 @@ class QXCORE_API SDList {
   void WINAPI AssertValid() const {}  // checks are compiled out
 
  protected:
+  // Sorts the items from index left to index right.
   void QuickSort(Compare compare, long left, long right);
   friend class SDListIterator;
   void LinkBefore(SDListItem* item, SDListItem* before);  // null: at the tail

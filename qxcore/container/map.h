@@ -48,19 +48,22 @@ class SMapBase : public __STree {
   ~SMapBase() override = default;
 
   struct TypedEntry : Entry {
-    value_type m_payload;
+    value_type m_payload;  // key and value
   };
   static_assert(alignof(value_type) <= alignof(TypedEntry) && sizeof(Entry) % alignof(value_type) == 0,
                 "the payload follows the head directly");
 
+  // From an entry to what it holds, and from a key to the word that stands for it.
   static value_type& PayloadOf(Entry* entry) { return *static_cast<value_type*>(entry->Payload()); }
   static V* ValueOf(Entry* entry) { return entry != nullptr ? &PayloadOf(entry).m_value : nullptr; }
   static const K& ToKey(long key) { return *reinterpret_cast<const K*>(key); }
   static long FromKey(const K& key) { return reinterpret_cast<long>(&key); }
 
+  // The entry with the key, or null.
   Entry* FindEntry(const K& key) const {
     return Search([&key](Entry* entry) { return Comparer::Compare(key, PayloadOf(entry).m_key); });
   }
+  // Where the key is or would be.
   Place FindPlace(const K& key) const {
     return Descend([&key](Entry* entry) { return Comparer::Compare(key, PayloadOf(entry).m_key); });
   }
@@ -77,6 +80,7 @@ class SMapBase : public __STree {
     return entry;
   }
 
+  // The operations that the tree asks for.
   Entry* AllocEntry() final { return static_cast<Entry*>(Allocator::Alloc(sizeof(TypedEntry), alignof(TypedEntry))); }
   void FreeEntry(Entry* entry) final { Allocator::Free(entry, sizeof(TypedEntry), alignof(TypedEntry)); }
   void DestroyPayload(Entry* entry) final { PayloadOf(entry).~value_type(); }
@@ -87,6 +91,7 @@ class SMapBase : public __STree {
   long KeyOf(const void* payload) const final { return FromKey(static_cast<const value_type*>(payload)->m_key); }
 };
 
+// An ordered map; iteration is in the order of the keys.
 template <class K, class V, class Comparer = SAscending<K>, class Allocator = SNodePools>
 class SMap : public SMapBase<K, V, Comparer, Allocator> {
   using Base = SMapBase<K, V, Comparer, Allocator>;
@@ -181,6 +186,7 @@ class SMap : public SMapBase<K, V, Comparer, Allocator> {
   void Clear() { __STree::Clear(); }
   void Swap(SMap& other) noexcept { __STree::Swap(other); }
 
+  // The entry with the key; end() when there is none.
   iterator Find(const K& key) { return {this, this->FindEntry(key)}; }
   const_iterator Find(const K& key) const { return {this, this->FindEntry(key)}; }
   iterator begin() { return {this, this->GetFirstEntry()}; }
@@ -189,6 +195,7 @@ class SMap : public SMapBase<K, V, Comparer, Allocator> {
   const_iterator end() const { return {this, nullptr}; }
 };
 
+// A map whose iteration is in the order in which the keys came.
 template <class K, class V, class Allocator = SNodePools, class Comparer = SAscending<K>>
 class SUnsortedMap : public SMapBase<K, V, Comparer, Allocator> {
   using Base = SMapBase<K, V, Comparer, Allocator>;

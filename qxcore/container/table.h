@@ -20,6 +20,7 @@ class QXCORE_API __STable {
   int GetCapacity() const { return m_capacity; }
 
  protected:
+  // Empty; the size is that of one element, in bytes.
   explicit __STable(int elementSize) : m_elementSize(elementSize) {}
   // Copies the elements with the operations of this class: a derived class that has its own assigns instead.
   __STable(const __STable& other);
@@ -31,10 +32,12 @@ class QXCORE_API __STable {
   virtual void Destroy(void* element);                         // ends an element's life; nothing to do here
   virtual void CopyTo(void* destination, const void* source);  // constructs a copy; here of the bytes
   virtual void* Allocate(int n);                               // raw storage; throws SEOutOfMemory
-  virtual void Free(void* block);
+  virtual void Free(void* block);                              // gives a block of Allocate back
 
+  // The address of element i, which is not checked.
   void* GetAt(int i) { return m_data + std::ptrdiff_t{i} * m_elementSize; }
-  const void* GetAt(int i) const { return m_data + std::ptrdiff_t{i} * m_elementSize; }
+  const void* GetAt(int i) const { return m_data + std::ptrdiff_t{i} * m_elementSize; }  // bytes
+  // The address of the first element; null while there is no storage.
   void* GetArray() { return m_data; }
   const void* GetArray() const { return m_data; }
 
@@ -58,10 +61,10 @@ class QXCORE_API __STable {
   void* EndSlot() { return GetAt(m_count); }
   void CountOneMore() { ++m_count; }
 
-  char* m_data = nullptr;  // null while nothing is allocated
-  std::int32_t m_capacity = 0;
-  std::int32_t m_count = 0;
-  std::int32_t m_elementSize;
+  char* m_data = nullptr;       // null while nothing is allocated
+  std::int32_t m_capacity = 0;  // elements that fit
+  std::int32_t m_count = 0;     // elements
+  std::int32_t m_elementSize;   // bytes
 
  private:
   void MoveElement(void* destination, void* source);

@@ -15,11 +15,12 @@
 
 // The header of a shared block; the elements follow it.
 struct __STableData {
-  std::int32_t m_refs;  // tables that share the block
-  std::int32_t m_capacity;
-  std::int32_t m_count;
-  std::int32_t m_elementSize;
+  std::int32_t m_refs;         // tables that share the block
+  std::int32_t m_capacity;     // elements that fit
+  std::int32_t m_count;        // elements
+  std::int32_t m_elementSize;  // bytes
 
+  // The first element.
   char* Elements() { return reinterpret_cast<char*>(this + 1); }
   const char* Elements() const { return reinterpret_cast<const char*>(this + 1); }
 };
@@ -29,10 +30,12 @@ static_assert(sizeof(__STableData) == 16, "the layout is public");
 // Either a block, or, with its lowest bit set, the element size of a table without one.
 class _STableData {
  public:
+  // An element size, or a block, which is not null.
   explicit _STableData(int elementSize) : m_word((static_cast<std::uintptr_t>(elementSize) << 1) | 1) {}
   explicit _STableData(__STableData* data) : m_word(reinterpret_cast<std::uintptr_t>(data)) {}
 
   bool IsEmpty() const { return (m_word & 1) != 0; }
+  // Bytes of one element.
   int ElemSize() const { return IsEmpty() ? static_cast<int>(m_word >> 1) : Data()->m_elementSize; }
   // Only when not IsEmpty(); never null then.
   __STableData* Data() const { return reinterpret_cast<__STableData*>(m_word); }
@@ -49,12 +52,14 @@ class QXCORE_API __STableDumb {
  public:
   int GetCount() const { return m_data.IsEmpty() ? 0 : m_data->m_count; }
   int GetCapacity() const { return m_data.IsEmpty() ? 0 : m_data->m_capacity; }
-  int ElemSize() const { return m_data.ElemSize(); }
+  int ElemSize() const { return m_data.ElemSize(); }  // bytes of one element
+  // Whether another table has the same block.
   bool IsShared() const { return !m_data.IsEmpty() && m_data->m_refs != 1; }
 
  protected:
   friend class __STableMem;
 
+  // Empty; the size is that of one element, in bytes.
   explicit __STableDumb(int elementSize) : m_data(elementSize) {}
   __STableDumb(const __STableDumb& other);
   __STableDumb& operator=(const __STableDumb& other);
@@ -93,13 +98,16 @@ class QXCORE_API __STableDumb {
   // leaves the table empty.
   void Attach(void* block);
 
+  // The block, null while there is none; it stays the table's.
   __STableData* GetData() const { return m_data.IsEmpty() ? nullptr : m_data.Data(); }
   // A new block: one holder, no elements. Throws SEOutOfMemory.
   static __STableData* AllocData(int capacity, int elementSize);
   static void FreeData(__STableData* block);
 
+  // Exchanges the contents; both must be of one type.
   void SwapWith(__STableDumb& other) noexcept { std::swap(m_data, other.m_data); }
 
+  // For the typed shell: whether one more fits; the slot behind the last element; counts that slot in.
   bool HasRoom() const { return !m_data.IsEmpty() && m_data->m_refs == 1 && m_data->m_count < m_data->m_capacity; }
   void* EndSlot() { return m_data->Elements() + std::ptrdiff_t{m_data->m_count} * m_data->m_elementSize; }
   void CountOneMore() { ++m_data->m_count; }

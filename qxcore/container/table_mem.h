@@ -15,10 +15,12 @@ class QXCORE_API __STableMem {
  public:
   int GetCount() const { return m_table.GetCount(); }
   int GetCapacity() const { return m_table.GetCapacity(); }
-  int ElemSize() const { return m_table.ElemSize(); }
+  int ElemSize() const { return m_table.ElemSize(); }  // bytes of one element
+  // Whether another table has the same block.
   bool IsShared() const { return m_table.IsShared(); }
 
  protected:
+  // Empty; the size is that of one element, in bytes.
   explicit __STableMem(int elementSize) : m_table(elementSize) {}
   __STableMem(const __STableMem& other) : m_table(other.m_table) {}
   __STableMem& operator=(const __STableMem& other);
@@ -28,7 +30,7 @@ class QXCORE_API __STableMem {
   virtual void Destroy(void* element);                         // ends an element's life; nothing to do here
   virtual void CopyTo(void* destination, const void* source);  // constructs a copy; here of the bytes
   virtual void* Allocate(int n);                               // a block for n elements; throws SEOutOfMemory
-  virtual void Free(void* block);
+  virtual void Free(void* block);                              // gives a block of Allocate back
 
   // Writable access detaches.
   void* GetAt(int i) { return static_cast<char*>(GetArray()) + std::ptrdiff_t{i} * ElemSize(); }
@@ -40,6 +42,7 @@ class QXCORE_API __STableMem {
   }
   const void* GetArray() const { return m_table.GetArray(); }
 
+  // Sets the capacity to n, which must not be below the count.
   void GrowTo(int n);
   // Opens a slot in front of element i and gives its address; the caller constructs an element there.
   void* NewAt(int i);
@@ -57,13 +60,15 @@ class QXCORE_API __STableMem {
   void* Detach() { return m_table.Detach(); }
   void Attach(void* block);
 
+  // Exchanges the contents; both must be of one type.
   void SwapWith(__STableMem& other) noexcept { m_table.SwapWith(other.m_table); }
 
+  // For the typed shell: whether one more fits; the slot behind the last element; counts that slot in.
   bool HasRoom() const { return m_table.HasRoom(); }
   void* EndSlot() { return m_table.EndSlot(); }
   void CountOneMore() { m_table.CountOneMore(); }
 
-  __STableDumb m_table;
+  __STableDumb m_table;  // holds the block
 
  private:
   const __STableDumb& Const() const { return m_table; }

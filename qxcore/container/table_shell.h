@@ -17,6 +17,7 @@
 // Throws SECOMException with the code 0x8000000B (E_BOUNDS).
 [[noreturn]] QXCORE_API void SThrowIndexOutOfRange(int index, int count);
 
+// The typed side of a table: elements of T over the untyped Base.
 template <class T, class Base>
 class STableShell : public Base {
   static_assert(alignof(T) <= alignof(std::max_align_t), "tables do not align beyond that");

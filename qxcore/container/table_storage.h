@@ -10,7 +10,7 @@
 
 namespace table_storage {
 
-constexpr int kFirstCapacity = 4;
+constexpr int kFirstCapacity = 4;  // elements that a table has room for at first
 
 // The capacity after the given one, which is full.
 inline int NextCapacity(int capacity) {
@@ -31,6 +31,7 @@ inline std::size_t BytesFor(int n, int elementSize, std::size_t header = 0) {
 // Raw room for one element: on the stack, or on the heap for a large one. Throws SEOutOfMemory.
 class TransitSlot {
  public:
+  // For an element of that many bytes.
   explicit TransitSlot(int elementSize)
       : m_heap(static_cast<std::size_t>(elementSize) > sizeof m_inline
                    ? SMemAlloc(static_cast<std::size_t>(elementSize))
@@ -38,7 +39,7 @@ class TransitSlot {
   TransitSlot(const TransitSlot&) = delete;
   TransitSlot& operator=(const TransitSlot&) = delete;
   ~TransitSlot() { SMemFree(m_heap); }
-  void* Address() { return m_heap != nullptr ? m_heap : m_inline; }
+  void* Address() { return m_heap != nullptr ? m_heap : m_inline; }  // where the element goes
 
  private:
   alignas(std::max_align_t) std::byte m_inline[128];

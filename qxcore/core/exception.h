@@ -27,7 +27,7 @@ class QXCORE_API SException {
 
  protected:
   mutable SString m_text;  // a derived class may fetch its text on the first question
-  HRESULT m_code;
+  HRESULT m_code;          // the result code
 };
 
 // A failure of the platform or of COM, told by its HRESULT.

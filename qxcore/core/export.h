@@ -5,6 +5,7 @@
 #error "qxcore is built for Unicode: define UNICODE (and _UNICODE) for everything that includes its headers"
 #endif
 
+// Marks what the library exports.
 #ifdef _WIN32
 #ifdef QXCORE_BUILDING
 #define QXCORE_API __declspec(dllexport)

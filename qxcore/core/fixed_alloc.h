@@ -68,7 +68,8 @@ class QXCORE_API SFixedAlloc : public SIdleConsumer {
   // elements as a block holds. Always 0: no further idle time is wanted.
   int OnIdle(int count) override;
 
-  unsigned int GetAllocSize() const { return m_elementSize; }
+  unsigned int GetAllocSize() const { return m_elementSize; }  // bytes of one element
+  // Elements that are taken from the heap at a time.
   unsigned int GetElementsPerBlock() const { return m_elementsPerBlock; }
   // Bytes of all blocks held, or -1 for an allocator without a name.
   std::int32_t GetBytes() const { return m_bytes; }
@@ -100,6 +101,7 @@ static_assert(sizeof(void*) != 4 || sizeof(SFixedAlloc) == 44, "the layout is pu
 // The same, on a queue of the library's own when no list is given.
 class QXCORE_API SObjectFixedAllocatorBase : public SFixedAlloc {
  public:
+  // As SFixedAlloc.
   SObjectFixedAllocatorBase(unsigned int elementSize, unsigned int elementsPerBlock, const WCHAR* name,
                             SIdleConsumerList* list)
       : SFixedAlloc(elementSize, elementsPerBlock, name, list != nullptr ? list : IdleQueue()) {}

@@ -31,7 +31,7 @@ class QXCORE_API SIdleConsumer {
   virtual int OnIdle(int count);
 
  protected:
-  SIdleConsumerList* GetIdleList() const { return m_idleList; }
+  SIdleConsumerList* GetIdleList() const { return m_idleList; }  // null outside of any list
 
  private:
   SIdleConsumerList* m_idleList;  // null for the common list

@@ -20,23 +20,24 @@ class QXCORE_API SEIOException : public SException {
 class QXCORE_API SEEncodingException : public SEIOException {
  public:
   SEEncodingException();
+  // With a code and a text of the library's string table.
   SEEncodingException(HRESULT code, unsigned int stringId) : SEIOException(code, stringId) {}
   const WCHAR* GetExceptionName() const override;
 };
 
 // Declares one exception with a code and a text of its own.
-#define QXCORE_IO_EXCEPTION(Name)    \
-  struct QXCORE_API Name : SEIOException { \
-    Name();                          \
+#define QXCORE_IO_EXCEPTION(Name)                   \
+  struct QXCORE_API Name : SEIOException {          \
+    Name();                                         \
     const WCHAR* GetExceptionName() const override; \
   }
 // Declares one encoding exception. The second constructor is for the finer reasons of one direction,
 // e.g. an illegal byte sequence instead of a character that has no equal.
-#define QXCORE_ENCODING_EXCEPTION(Name)    \
-  struct QXCORE_API Name : SEEncodingException { \
-    Name();                                \
+#define QXCORE_ENCODING_EXCEPTION(Name)                                                \
+  struct QXCORE_API Name : SEEncodingException {                                       \
+    Name();                                                                            \
     Name(HRESULT code, unsigned int stringId) : SEEncodingException(code, stringId) {} \
-    const WCHAR* GetExceptionName() const override; \
+    const WCHAR* GetExceptionName() const override;                                    \
   }
 
 QXCORE_IO_EXCEPTION(SEEOFException);          // 0x80990041 "Unexpected end of file."

@@ -16,9 +16,9 @@ class SCodePageTable {
   // or with characters of more than two bytes. Throws SEOutOfMemory.
   static const SCodePageTable* Get(unsigned int codePage);
 
-  bool IsASCIICompatible() const { return m_isASCIICompatible; }  // bytes below 0x80 are themselves
-  bool IsLead(unsigned char byte) const { return m_isLead[byte]; }
-  bool HasLeads() const { return m_hasLeads; }
+  bool IsASCIICompatible() const { return m_isASCIICompatible; }    // bytes below 0x80 are themselves
+  bool IsLead(unsigned char byte) const { return m_isLead[byte]; }  // the first byte of two
+  bool HasLeads() const { return m_hasLeads; }                      // a double-byte page
   // The character of a byte that is no lead byte, or kNone.
   WCHAR Single(unsigned char byte) const { return m_single[byte]; }
   const WCHAR* Singles() const { return m_single; }

@@ -40,6 +40,7 @@ class QXCORE_API SMultiFormatReaderBase : public SInputStream, public SMultiForm
   int GetError() const override { return m_in->GetError(); }
 
  protected:
+  // `in` must stay alive; the second form deletes it at the end when `owns` is set.
   SMultiFormatReaderBase(SInputStream& in, Encoding requested);
   SMultiFormatReaderBase(SInputStream* in, Encoding requested, bool owns);
 
@@ -65,8 +66,8 @@ class QXCORE_API SMultiFormatReaderBase : public SInputStream, public SMultiForm
     m_hasDelivered = true;
   }
 
-  SInputStream* m_in;
-  bool m_owns;
+  SInputStream* m_in;  // where the bytes come from
+  bool m_owns;         // deletes m_in at the end
 
  private:
   // Where reading stood: the start of a decoded run in the raw block, how many of its characters were

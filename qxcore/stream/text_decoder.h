@@ -12,7 +12,7 @@
 
 class STextDecoder {
  public:
-  using Encoding = SAbstractIO::SMultiFormatSupport::Encoding;
+  using Encoding = SAbstractIO::SMultiFormatSupport::Encoding;  // see multi_format_support.h
 
   // What Decode stopped at.
   struct Run {
@@ -39,6 +39,7 @@ class STextDecoder {
   // Throws the exception for what the last Decode stopped at.
   [[noreturn]] void ThrowLoss() const;
 
+  // Characters that could not be mapped since Select or ForgetLosses, by what became of them.
   std::uint64_t GetReplaced() const { return m_replaced; }
   std::uint64_t GetDropped() const { return m_dropped; }
   void ForgetLosses() { m_replaced = m_dropped = 0; }

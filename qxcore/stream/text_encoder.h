@@ -8,10 +8,12 @@
 
 class STextEncoder {
  public:
-  using Encoding = SAbstractIO::SMultiFormatSupport::Encoding;
+  using Encoding = SAbstractIO::SMultiFormatSupport::Encoding;  // see multi_format_support.h
 
+  // The target, with the lossless policy or without.
   void Select(Encoding encoding) { m_encoding = encoding; }
   Encoding GetEncoding() const { return m_encoding; }
+  // What stands for characters that cannot be mapped; 0 drops them.
   void SetReplacement(WCHAR replacement) { m_replacement = replacement; }
   WCHAR GetReplacement() const { return m_replacement; }
 
@@ -22,6 +24,7 @@ class STextEncoder {
   // character that cannot be mapped throws, what stands before it having been written.
   void Write(const WCHAR* text, std::size_t count, SOutputStream& out);
 
+  // Characters that could not be mapped, by what became of them.
   std::uint64_t GetReplaced() const { return m_replaced; }
   std::uint64_t GetDropped() const { return m_dropped; }
 

@@ -27,4 +27,5 @@ struct SUtf8Obstacle {
   bool isIllegal;         // no UTF-8 at all
   bool isCut;             // the end came before the sequence could be judged
 };
+// Looks at the place where a decoder stopped, which is not the end.
 SUtf8Obstacle SLookAtUtf8(const unsigned char* in, const unsigned char* end);

@@ -49,8 +49,8 @@ class QXCORE_API SUnicodeString {
   SUnicodeString& operator=(const SUnicodeString&) = default;  // member by member: the pointer is copied
   ~SUnicodeString() { Done(); }
 
-  void Done();
-  WCHAR* Detach();
+  void Done();         // frees the text and clears the pointer
+  WCHAR* Detach();     // gives the pointer up without freeing the text (free with std::free)
   int Length() const;  // characters
   // The text; null where none was converted. Valid until Done.
   operator WCHAR*() { return m_text; }
