@@ -131,6 +131,14 @@ class Filter:
                 continued_macro = stripped.endswith("\\")
                 self.out.append(line)
                 continue
+            if re.match(r"struct (std::)?hash<", stripped):
+                # doxygen cannot place a specialisation of another namespace's template.
+                self.block, self.fresh = [], False
+                while not lines[i - 1].startswith("};"):
+                    i += 1
+                if self.out and self.out[-1].strip() == "template <>":
+                    self.out.pop()
+                continue
             if not stripped:
                 if not self.statement:
                     self.block, self.fresh = [], False
