@@ -1,5 +1,6 @@
 #include "qxcore/stream/utf8_decoder.h"
 
+#include "qxcore/stream/utf8_decoder_avx512.h"
 #include "qxcore/stream/widen.h"
 
 namespace {
@@ -34,6 +35,14 @@ SUtf8Run DecodeSequences(const unsigned char* in, const unsigned char* end, WCHA
 }  // namespace
 
 SUtf8Run SDecodeUtf8(const unsigned char* in, const unsigned char* end, WCHAR* out) {
+#if QXCORE_HAS_AVX512_DECODER
+  static const bool hasAvx512 = SCanDecodeUtf8Avx512();
+  if (hasAvx512) {
+    SUtf8Run run = SDecodeUtf8Avx512(in, end, out);
+    in = run.in;
+    out = run.out;
+  }
+#endif
   return DecodeSequences<true>(in, end, out);
 }
 
