@@ -26,9 +26,16 @@ const unsigned char* SkipPlain(const unsigned char* at, const unsigned char* end
 #ifdef __SSE2__
   constexpr std::ptrdiff_t kBlock = 16;
   const __m128i zero = _mm_setzero_si128();
+  const auto load = [](const unsigned char* from) { return _mm_loadu_si128(reinterpret_cast<const __m128i*>(from)); };
+  for (; end - at >= 4 * kBlock; at += 4 * kBlock) {
+    // As signed numbers the plain bytes are those above zero.
+    __m128i plain = _mm_and_si128(
+        _mm_and_si128(_mm_cmpgt_epi8(load(at), zero), _mm_cmpgt_epi8(load(at + kBlock), zero)),
+        _mm_and_si128(_mm_cmpgt_epi8(load(at + 2 * kBlock), zero), _mm_cmpgt_epi8(load(at + 3 * kBlock), zero)));
+    if (_mm_movemask_epi8(plain) != 0xFFFF) break;
+  }
   for (; end - at >= kBlock; at += kBlock) {
-    __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i*>(at));
-    if (_mm_movemask_epi8(_mm_cmpgt_epi8(block, zero)) != 0xFFFF) break;
+    if (_mm_movemask_epi8(_mm_cmpgt_epi8(load(at), zero)) != 0xFFFF) break;
   }
 #endif
   while (at != end && *at > 0 && *at < 0x80) ++at;

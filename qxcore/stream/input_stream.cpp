@@ -25,4 +25,5 @@ unsigned long SInputStream::Available() { return 0; }
 void SInputStream::Mark(unsigned long) {}
 void SInputStream::Reset() { throw SEIOResetInvalid(); }
 void SInputStream::Close() {}
+const void* SInputStream::TakeRest(unsigned long*) { return nullptr; }
 int SInputStream::GetError() const { return 0; }

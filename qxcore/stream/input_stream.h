@@ -30,6 +30,9 @@ class QXCORE_API SInputStream : public SObject {
   virtual void Reset();
   // Ends the stream. Here: nothing.
   virtual void Close();
+  // For streams that have all their data in memory: the rest of it where it lies, valid as long as the
+  // stream, which then stands at its end. Sets *size. Null where data comes from elsewhere, which is so here.
+  virtual const void* TakeRest(unsigned long* size);
 
   // The error of the source that ended or cut the data, as errno has it; 0 while there is none. A read
   // that fails in the middle looks like the end of the data: who must not lose any asks here.

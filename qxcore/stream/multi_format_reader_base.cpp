@@ -81,7 +81,20 @@ void Reader::DropConsumedRaw() {
   m_mark.runOffset -= m_hasMark ? dropped : 0;
 }
 
+// What lies in memory as a whole need not be copied.
+bool Reader::TakeRestInPlace() {
+  unsigned long size = 0;
+  const void* rest = m_in->TakeRest(&size);
+  if (rest == nullptr) return false;
+  m_raw.block = m_raw.start = const_cast<unsigned char*>(static_cast<const unsigned char*>(rest));  // never written
+  m_raw.end = m_raw.start + size;
+  m_raw.capacity = 0;
+  m_status |= kWholeInput;
+  return true;
+}
+
 void Reader::ReadWholeInput() {
+  if (m_raw.block == nullptr && TakeRestInPlace()) return;
   while ((m_status & kWholeInput) == 0 && m_raw.Size() < kLongestInput) {
     unsigned long expected = std::max(m_in->Available(), kRawBlock - 1) + 1;
     GetMoreRawData(m_raw, std::min(expected, kLongestInput - m_raw.Size()));

@@ -80,6 +80,7 @@ class QXCORE_API SMultiFormatReaderBase : public SInputStream, public SMultiForm
 
   bool FillSample();
   void CompleteCutSequence();
+  bool TakeRestInPlace();
   void ReadWholeInput();
   void SelectFormat(bool detects);
   Encoding SniffMark();

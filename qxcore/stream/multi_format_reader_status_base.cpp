@@ -26,7 +26,7 @@ SMultiFormatReaderStatusBase& StatusBase::operator=(const SMultiFormatReaderStat
 StatusBase::~SMultiFormatReaderStatusBase() { FreeBuffer(m_raw); }
 
 void StatusBase::FreeBuffer(BufferStatus& buffer) noexcept {
-  SMemFree(buffer.block);
+  if (buffer.capacity != 0) SMemFree(buffer.block);
   buffer = BufferStatus();
 }
 

@@ -16,7 +16,7 @@ class QXCORE_API SMultiFormatReaderStatusBase {
 
   // A growing buffer: bytes lie from start to end, in a block of `capacity` bytes.
   struct BufferStatus {
-    unsigned char* block = nullptr;  // owned by the reader
+    unsigned char* block = nullptr;  // owned by the reader, unless the capacity is 0
     unsigned char* start = nullptr;
     unsigned char* end = nullptr;
     unsigned long capacity = 0;

@@ -74,10 +74,9 @@ Run DecodeLittleEndian(const unsigned char* in, const unsigned char* end, WCHAR*
 }
 
 Run DecodeBigEndian(const unsigned char* in, const unsigned char* end, WCHAR* out) {
-  for (std::ptrdiff_t left = (end - in) / 2; left > 0; --left, in += 2) {
-    *out++ = static_cast<WCHAR>(in[0] << 8 | in[1]);
-  }
-  return {in, out};
+  Run run = DecodeLittleEndian(in, end, out);
+  SSwapBytes(out, static_cast<std::size_t>(run.out - out));
+  return run;
 }
 
 }  // namespace

@@ -1,4 +1,4 @@
-// Widening of 7-bit characters, sixteen at a time where the processor can.
+// Widening of 7-bit characters and swapping of bytes, a register at a time where the processor can.
 #pragma once
 
 #include <cstddef>
@@ -31,4 +31,18 @@ inline std::size_t SWidenASCII(const unsigned char* in, std::size_t size, WCHAR*
     ++done;
   }
   return done;
+}
+
+// Swaps the two bytes of each character.
+inline void SSwapBytes(WCHAR* text, std::size_t count) {
+  std::size_t done = 0;
+#ifdef __SSE2__
+  constexpr std::size_t kBlock = 8;
+  for (; count - done >= kBlock; done += kBlock) {
+    __m128i* at = reinterpret_cast<__m128i*>(text + done);
+    __m128i block = _mm_loadu_si128(at);
+    _mm_storeu_si128(at, _mm_or_si128(_mm_slli_epi16(block, 8), _mm_srli_epi16(block, 8)));
+  }
+#endif
+  for (; done < count; ++done) text[done] = static_cast<WCHAR>(text[done] << 8 | (text[done] >> 8 & 0xFF));
 }
