@@ -1,0 +1,112 @@
+// The current directory, full paths and temporary names.
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstdlib>
+#include <ctime>
+#include <new>
+
+#include "platform/posix/path.h"
+#include "platform/wide.h"
+
+namespace {
+
+using namespace platform;
+
+// The convention of all calls that fill a buffer: the length when the text fits, else the size needed.
+DWORD Deliver(const std::u16string& text, DWORD size, LPWSTR buffer) {
+  if (text.size() >= size || buffer == nullptr) return static_cast<DWORD>(text.size() + 1);
+  text.copy(buffer, text.size());
+  buffer[text.size()] = 0;
+  return static_cast<DWORD>(text.size());
+}
+
+template <class Call>
+DWORD Guarded(Call call) {
+  try {
+    return call();
+  } catch (const std::bad_alloc&) {
+    SetLastError(ERROR_NOT_ENOUGH_MEMORY);
+    return 0;
+  }
+}
+
+}  // namespace
+
+DWORD GetCurrentDirectoryW(DWORD size, LPWSTR buffer) {
+  return Guarded([&] { return Deliver(MakeFullPath(u"."), size, buffer); });
+}
+
+BOOL SetCurrentDirectoryW(LPCWSTR path) {
+  return static_cast<BOOL>(Guarded([&]() -> DWORD {
+    const Resolved entry = ResolvePath(path);
+    if (entry.error != ERROR_SUCCESS) return static_cast<DWORD>(FailWith(entry.error));
+    if (entry.exists && chdir(entry.path.c_str()) == 0) return TRUE;
+    const DWORD error = !entry.exists || errno == ENOENT ? ERROR_FILE_NOT_FOUND
+                        : errno == ENOTDIR               ? ERROR_DIRECTORY
+                                                         : ErrorFromErrno(errno);
+    return static_cast<DWORD>(FailWith(error));
+  }));
+}
+
+DWORD GetFullPathNameW(LPCWSTR path, DWORD size, LPWSTR buffer, LPWSTR* filePart) {
+  if (filePart != nullptr) *filePart = nullptr;
+  if (path == nullptr || *path == 0) {
+    SetLastError(ERROR_INVALID_NAME);
+    return 0;
+  }
+  return Guarded([&] {
+    const std::u16string full = MakeFullPath(path);
+    const DWORD length = Deliver(full, size, buffer);
+    const std::size_t name = full.find_last_of(u'\\') + 1;
+    if (filePart != nullptr && length < size && name < full.size()) *filePart = buffer + name;
+    return length;
+  });
+}
+
+DWORD GetTempPathW(DWORD size, LPWSTR buffer) {
+  return Guarded([&] {
+    const char* folder = std::getenv("TMPDIR");
+    std::u16string path = ToWindowsPath(folder != nullptr && folder[0] == '/' ? folder : "/tmp");
+    if (path.back() != '\\') path += u'\\';
+    return Deliver(path, size, buffer);
+  });
+}
+
+UINT GetTempFileNameW(LPCWSTR directory, LPCWSTR prefix, UINT unique, LPWSTR name) {
+  if (directory == nullptr || name == nullptr) {
+    SetLastError(ERROR_INVALID_PARAMETER);
+    return 0;
+  }
+  if (WideLength(directory) > MAX_PATH - 14) {
+    SetLastError(ERROR_BUFFER_OVERFLOW);
+    return 0;
+  }
+  const DWORD attributes = GetFileAttributesW(directory);
+  if (attributes == INVALID_FILE_ATTRIBUTES || (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0) {
+    SetLastError(ERROR_DIRECTORY);
+    return 0;
+  }
+  const WCHAR last = directory[0] != 0 ? directory[WideLength(directory) - 1] : u'\\';
+  const WCHAR* separator = last == '\\' || last == '/' ? u"" : u"\\";
+  timespec now;
+  clock_gettime(CLOCK_REALTIME, &now);
+  UINT number = unique & 0xFFFF;
+  if (unique == 0) number = static_cast<UINT>(now.tv_nsec / 1000 + now.tv_sec + getpid()) & 0xFFFF;
+  for (int attempt = 0; attempt < 0xFFFF; ++attempt, number = (number + 1) & 0xFFFF) {
+    if (number == 0) number = 1;
+    WideFormat(name, MAX_PATH, u"%s%s%.3s%X.tmp", directory, separator, prefix != nullptr ? prefix : u"", number);
+    if (unique != 0) return unique;
+    const HANDLE file = CreateFileW(name, GENERIC_WRITE, 0, nullptr, CREATE_NEW, FILE_ATTRIBUTE_NORMAL, nullptr);
+    if (file != INVALID_HANDLE_VALUE) {
+      CloseHandle(file);
+      return number;
+    }
+    if (GetLastError() != ERROR_FILE_EXISTS) return 0;
+  }
+  SetLastError(ERROR_FILE_EXISTS);
+  return 0;
+}

@@ -1,0 +1,52 @@
+// From Windows paths to those of the file system, and back.
+//
+// "C:\" stands for "/"; both slashes separate; "." and ".." are taken out by the text alone, before
+// links are followed, as on Windows. Where the exact spelling does not exist, each part is looked up
+// without regard to case (bmp.h), the first entry that fits being taken.
+//
+// Names are UTF-8. A byte that belongs to no valid sequence, or that Windows allows in no name (control
+// characters and "*:<>?|\), stands in a Windows name as U+F000 plus the byte and is turned back; so is
+// every byte of a real character U+F000 to U+F0FF. An unpaired surrogate is written as its three bytes.
+#pragma once
+
+#include <sys/stat.h>
+
+#include <string>
+#include <string_view>
+
+#include "platform/win32.h"
+
+namespace platform {
+
+// One name, without separators.
+std::string ToFileSystemName(std::u16string_view name);
+std::u16string ToWindowsName(std::string_view name);
+
+// A whole absolute path of the file system as a Windows path, without a trailing backslash but for the root.
+std::u16string ToWindowsPath(std::string_view path);
+
+// The absolute form of a path: drive or server, no "." and "..", backslashes. Empty for an empty path.
+std::u16string MakeFullPath(std::u16string_view path);
+
+struct Resolved {
+  std::string path;             // of the file system; the last part need not exist
+  DWORD error = ERROR_SUCCESS;  // why there is none
+  bool exists = false;
+  bool wantsFolder = false;  // the given path ended in a separator
+  struct stat info {};       // of the entry itself (links are not followed), when it exists
+};
+Resolved ResolvePath(LPCWSTR path);
+
+// The same folder as `resolved`, but the last name exactly as the caller spelled it.
+std::string SpelledAsGiven(const Resolved& resolved, LPCWSTR path);
+
+// The Win32 error for an errno value.
+DWORD ErrorFromErrno(int error);
+
+// Sets the last error and gives FALSE.
+inline BOOL FailWith(DWORD error) {
+  SetLastError(error);
+  return FALSE;
+}
+
+}  // namespace platform

@@ -1,0 +1,371 @@
+// Files and folders through the platform's calls: results and last errors are the same on both targets.
+
+#include <gtest/gtest.h>
+
+#include <set>
+#include <string>
+
+#include "tests/support/temp_folder.h"
+
+#ifndef _WIN32
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+#endif
+
+namespace {
+
+using test::ReadAll;
+using test::TempFolder;
+using test::Text;
+using test::WriteAll;
+
+// Documented, but not done by Wine 8: a read-only file opened for writing by the superuser, the new
+// spelling of a file renamed to its own name, a search handle that is none.
+#ifdef _WIN32
+constexpr bool kUnderWine = true;
+#else
+constexpr bool kUnderWine = false;
+#endif
+
+constexpr DWORD kShareAll = FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE;
+
+HANDLE Open(const Text& path, DWORD access, DWORD disposition, DWORD share = kShareAll, DWORD flags = 0) {
+  SetLastError(0xDEAD);
+  return CreateFileW(path.c_str(), access, share, nullptr, disposition, flags, nullptr);
+}
+
+// Opens, closes, and gives the last error of the opening (0 when it tells nothing).
+DWORD OpenError(const Text& path, DWORD access, DWORD disposition, DWORD share = kShareAll, DWORD flags = 0) {
+  const HANDLE file = Open(path, access, disposition, share, flags);
+  const DWORD error = GetLastError();
+  if (file == INVALID_HANDLE_VALUE) return error;
+  CloseHandle(file);
+  return error == ERROR_ALREADY_EXISTS ? error : 0;
+}
+
+TEST(Files, Dispositions) {
+  TempFolder folder;
+  const Text path = folder.File(WTEXT("a.txt"));
+  EXPECT_EQ(OpenError(path, GENERIC_READ, OPEN_EXISTING), DWORD(ERROR_FILE_NOT_FOUND));
+  EXPECT_EQ(OpenError(folder.File(WTEXT("no\\a.txt")), GENERIC_READ, OPEN_EXISTING), DWORD(ERROR_PATH_NOT_FOUND));
+  EXPECT_EQ(OpenError(path, GENERIC_WRITE, TRUNCATE_EXISTING), DWORD(ERROR_FILE_NOT_FOUND));
+  EXPECT_EQ(OpenError(path, GENERIC_WRITE, CREATE_NEW), 0u);
+  EXPECT_EQ(OpenError(path, GENERIC_WRITE, CREATE_NEW), DWORD(ERROR_FILE_EXISTS));
+  EXPECT_EQ(OpenError(path, GENERIC_WRITE, OPEN_ALWAYS), DWORD(ERROR_ALREADY_EXISTS));
+  EXPECT_TRUE(WriteAll(path, "12345"));
+  EXPECT_EQ(OpenError(path, GENERIC_WRITE, CREATE_ALWAYS), DWORD(ERROR_ALREADY_EXISTS));
+  EXPECT_EQ(ReadAll(path), "");
+  EXPECT_EQ(OpenError(folder.Path(), GENERIC_READ, OPEN_EXISTING), DWORD(ERROR_ACCESS_DENIED));
+  EXPECT_EQ(OpenError(folder.File(WTEXT("a?b")), GENERIC_WRITE, CREATE_NEW), DWORD(ERROR_INVALID_NAME));
+}
+
+TEST(Files, PositionsAndSizes) {
+  TempFolder folder;
+  const HANDLE file = Open(folder.File(WTEXT("a")), GENERIC_READ | GENERIC_WRITE, CREATE_NEW);
+  ASSERT_NE(file, INVALID_HANDLE_VALUE);
+  DWORD done = 0;
+  char bytes[16] = {};
+  EXPECT_TRUE(WriteFile(file, "0123456789", 10, &done, nullptr));
+  EXPECT_EQ(done, 10u);
+  EXPECT_EQ(SetFilePointer(file, -4, nullptr, FILE_END), 6u);
+  EXPECT_TRUE(ReadFile(file, bytes, 16, &done, nullptr));
+  EXPECT_EQ(std::string(bytes, done), "6789");
+  EXPECT_TRUE(ReadFile(file, bytes, 16, &done, nullptr));  // the end is no error
+  EXPECT_EQ(done, 0u);
+  EXPECT_EQ(SetFilePointer(file, -11, nullptr, FILE_END), DWORD(INVALID_SET_FILE_POINTER));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_NEGATIVE_SEEK));
+  EXPECT_EQ(SetFilePointer(file, 4, nullptr, FILE_BEGIN), 4u);
+  EXPECT_TRUE(SetEndOfFile(file));
+  DWORD high = 1;
+  EXPECT_EQ(GetFileSize(file, &high), 4u);
+  EXPECT_EQ(high, 0u);
+  LONG highPart = 3;  // behind 12 GiB, in a file with holes
+  EXPECT_EQ(SetFilePointer(file, 5, &highPart, FILE_BEGIN), 5u);
+  EXPECT_EQ(highPart, 3);
+  EXPECT_TRUE(FlushFileBuffers(file));
+  EXPECT_TRUE(CloseHandle(file));
+  EXPECT_FALSE(CloseHandle(file));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_INVALID_HANDLE));
+}
+
+TEST(Files, RightsOfTheHandle) {
+  TempFolder folder;
+  const Text path = folder.File(WTEXT("a"));
+  WriteAll(path, "x");
+  DWORD done;
+  char byte;
+  HANDLE file = Open(path, GENERIC_READ, OPEN_EXISTING);
+  EXPECT_FALSE(WriteFile(file, "y", 1, &done, nullptr));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_ACCESS_DENIED));
+  EXPECT_FALSE(SetEndOfFile(file));
+  CloseHandle(file);
+  file = Open(path, GENERIC_WRITE, OPEN_EXISTING);
+  EXPECT_FALSE(ReadFile(file, &byte, 1, &done, nullptr));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_ACCESS_DENIED));
+  HANDLE twin = nullptr;
+  EXPECT_TRUE(DuplicateHandle(GetCurrentProcess(), file, GetCurrentProcess(), &twin, 0, FALSE, DUPLICATE_SAME_ACCESS));
+  EXPECT_TRUE(WriteFile(file, "ab", 2, &done, nullptr));
+  CloseHandle(file);
+  EXPECT_TRUE(WriteFile(twin, "cd", 2, &done, nullptr));  // one position for both
+  CloseHandle(twin);
+  EXPECT_EQ(ReadAll(path), "abcd");
+}
+
+TEST(Files, SharingModes) {
+  TempFolder folder;
+  const Text path = folder.File(WTEXT("a"));
+  WriteAll(path, "x");
+  const HANDLE reader = Open(path, GENERIC_READ, OPEN_EXISTING, FILE_SHARE_READ);
+  EXPECT_EQ(OpenError(path, GENERIC_READ, OPEN_EXISTING, FILE_SHARE_READ), 0u);
+  EXPECT_EQ(OpenError(path, GENERIC_WRITE, OPEN_EXISTING), DWORD(ERROR_SHARING_VIOLATION));
+  EXPECT_EQ(OpenError(path, GENERIC_READ, OPEN_EXISTING, FILE_SHARE_WRITE), DWORD(ERROR_SHARING_VIOLATION));
+  EXPECT_FALSE(DeleteFileW(path.c_str()));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_SHARING_VIOLATION));
+  CloseHandle(reader);
+  const HANDLE writer = Open(path, GENERIC_WRITE, OPEN_EXISTING, FILE_SHARE_READ);
+  EXPECT_EQ(OpenError(path, GENERIC_READ, OPEN_EXISTING, FILE_SHARE_READ), DWORD(ERROR_SHARING_VIOLATION));
+  EXPECT_EQ(OpenError(path, GENERIC_READ, OPEN_EXISTING, FILE_SHARE_READ | FILE_SHARE_WRITE), 0u);
+  CloseHandle(writer);
+  EXPECT_TRUE(DeleteFileW(path.c_str()));
+}
+
+TEST(Files, AttributesAndTimes) {
+  TempFolder folder;
+  const Text path = folder.File(WTEXT("a"));
+  EXPECT_EQ(GetFileAttributesW(path.c_str()), DWORD(INVALID_FILE_ATTRIBUTES));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_FILE_NOT_FOUND));
+  WriteAll(path, "12345");
+  EXPECT_EQ(GetFileAttributesW(path.c_str()) & ~FILE_ATTRIBUTE_NORMAL, DWORD(FILE_ATTRIBUTE_ARCHIVE));
+  EXPECT_TRUE(GetFileAttributesW(folder.Path().c_str()) & FILE_ATTRIBUTE_DIRECTORY);
+  EXPECT_TRUE(SetFileAttributesW(path.c_str(), FILE_ATTRIBUTE_READONLY));
+  EXPECT_TRUE(GetFileAttributesW(path.c_str()) & FILE_ATTRIBUTE_READONLY);
+  if (!kUnderWine) {
+    EXPECT_EQ(OpenError(path, GENERIC_WRITE, OPEN_EXISTING), DWORD(ERROR_ACCESS_DENIED));
+  }
+  EXPECT_EQ(OpenError(path, GENERIC_READ, OPEN_EXISTING), 0u);
+  EXPECT_FALSE(DeleteFileW(path.c_str()));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_ACCESS_DENIED));
+  EXPECT_TRUE(SetFileAttributesW(path.c_str(), FILE_ATTRIBUTE_NORMAL));
+  WIN32_FILE_ATTRIBUTE_DATA data;
+  ASSERT_TRUE(GetFileAttributesExW(path.c_str(), GetFileExInfoStandard, &data));
+  EXPECT_EQ(data.nFileSizeLow, 5u);
+  const HANDLE file = Open(path, GENERIC_READ, OPEN_EXISTING);
+  FILETIME created, written;
+  EXPECT_TRUE(GetFileTime(file, &created, nullptr, &written));
+  CloseHandle(file);
+  EXPECT_EQ(CompareFileTime(&written, &data.ftLastWriteTime), 0);
+  EXPECT_LE(CompareFileTime(&created, &written), 0);
+  EXPECT_GT(written.dwHighDateTime, 0x01D00000u);  // later than 2014
+}
+
+TEST(Files, MovingCopyingDeleting) {
+  TempFolder folder;
+  const Text a = folder.File(WTEXT("a")), b = folder.File(WTEXT("b")), sub = folder.File(WTEXT("sub"));
+  WriteAll(a, "A");
+  WriteAll(b, "B");
+  EXPECT_FALSE(MoveFileW(a.c_str(), b.c_str()));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_ALREADY_EXISTS));
+  EXPECT_FALSE(MoveFileW(folder.File(WTEXT("no")).c_str(), b.c_str()));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_FILE_NOT_FOUND));
+  EXPECT_FALSE(CopyFileW(a.c_str(), b.c_str(), TRUE));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_FILE_EXISTS));
+  EXPECT_TRUE(CopyFileW(a.c_str(), b.c_str(), FALSE));
+  EXPECT_EQ(ReadAll(b), "A");
+  WriteAll(a, "new");
+  EXPECT_TRUE(MoveFileExW(a.c_str(), b.c_str(), MOVEFILE_REPLACE_EXISTING));
+  EXPECT_EQ(ReadAll(b), "new");
+  EXPECT_FALSE(DeleteFileW(a.c_str()));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_FILE_NOT_FOUND));
+  EXPECT_TRUE(CreateDirectoryW(sub.c_str(), nullptr));
+  EXPECT_FALSE(CreateDirectoryW(sub.c_str(), nullptr));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_ALREADY_EXISTS));
+  EXPECT_FALSE(CreateDirectoryW(folder.File(WTEXT("x\\y")).c_str(), nullptr));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_PATH_NOT_FOUND));
+  EXPECT_FALSE(DeleteFileW(sub.c_str()));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_ACCESS_DENIED));
+  EXPECT_FALSE(RemoveDirectoryW(folder.Path().c_str()));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_DIR_NOT_EMPTY));
+  EXPECT_FALSE(RemoveDirectoryW(b.c_str()));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_DIRECTORY));
+  EXPECT_TRUE(RemoveDirectoryW(sub.c_str()));
+}
+
+TEST(Files, NamesWithoutRegardToCase) {
+  TempFolder folder;
+  ASSERT_TRUE(CreateDirectoryW(folder.File(WTEXT("Sub")).c_str(), nullptr));
+  WriteAll(folder.File(WTEXT("Sub\\\x00C4rger.TXT")), "here");
+  EXPECT_EQ(ReadAll(folder.File(WTEXT("SUB\\\x00E4rger.txt"))), "here");
+  EXPECT_EQ(ReadAll(folder.File(WTEXT("sub/.././SUB/\x00E4RGER.txt"))), "here");
+  EXPECT_EQ(OpenError(folder.File(WTEXT("sub\\\x00E4rger.TXT")), GENERIC_WRITE, CREATE_NEW), DWORD(ERROR_FILE_EXISTS));
+  EXPECT_TRUE(
+      MoveFileW(folder.File(WTEXT("sub\\\x00E4rger.txt")).c_str(), folder.File(WTEXT("sub\\\x00C4RGER.txt")).c_str()));
+  WIN32_FIND_DATAW data;
+  const HANDLE search = FindFirstFileW(folder.File(WTEXT("sub\\*.txt")).c_str(), &data);
+  ASSERT_NE(search, INVALID_HANDLE_VALUE);
+  if (!kUnderWine) {
+    EXPECT_EQ(Text(data.cFileName), WTEXT("\x00C4RGER.txt"));
+  }
+  FindClose(search);
+}
+
+std::set<Text> Find(const TempFolder& folder, const WCHAR* mask) {
+  std::set<Text> names;
+  WIN32_FIND_DATAW data;
+  const HANDLE search = FindFirstFileW(folder.File(mask).c_str(), &data);
+  if (search == INVALID_HANDLE_VALUE) return names;
+  do {
+    names.insert(data.cFileName);
+  } while (FindNextFileW(search, &data));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_NO_MORE_FILES));
+  FindClose(search);
+  return names;
+}
+
+TEST(Files, Searching) {
+  TempFolder folder;
+  for (const WCHAR* name : {WTEXT("a.txt"), WTEXT("ab.txt"), WTEXT("b.tx"), WTEXT("c"), WTEXT("x.tar.gz")})
+    WriteAll(folder.File(name), "12");
+  using Names = std::set<Text>;
+  EXPECT_EQ(Find(folder, WTEXT("*")).size(), 7u);  // with "." and ".."
+  EXPECT_EQ(Find(folder, WTEXT("*.*")).size(), 7u);
+  EXPECT_EQ(Find(folder, WTEXT("*.txt")), (Names{WTEXT("a.txt"), WTEXT("ab.txt")}));
+  EXPECT_EQ(Find(folder, WTEXT("?.txt")), (Names{WTEXT("a.txt")}));
+  EXPECT_EQ(Find(folder, WTEXT("A*.T?T")), (Names{WTEXT("a.txt"), WTEXT("ab.txt")}));
+  EXPECT_EQ(Find(folder, WTEXT("x*.gz")), (Names{WTEXT("x.tar.gz")}));
+  EXPECT_EQ(Find(folder, WTEXT("c")), (Names{WTEXT("c")}));
+  EXPECT_EQ(Find(folder, WTEXT("zz*")), Names{});
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_FILE_NOT_FOUND));
+  EXPECT_EQ(Find(folder, WTEXT("no\\*")), Names{});
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_PATH_NOT_FOUND));
+  WIN32_FIND_DATAW data;
+  const HANDLE search = FindFirstFileW(folder.File(WTEXT("a.*")).c_str(), &data);
+  EXPECT_EQ(data.nFileSizeLow, 2u);
+  FindClose(search);
+  if (kUnderWine) return;
+  EXPECT_FALSE(FindClose(reinterpret_cast<HANDLE>(0x12344)));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_INVALID_HANDLE));
+}
+
+TEST(Files, CurrentDirectoryAndFullPaths) {
+  TempFolder folder;
+  WCHAR before[MAX_PATH], now[MAX_PATH], full[MAX_PATH];
+  ASSERT_GT(GetCurrentDirectoryW(MAX_PATH, before), 0u);
+  EXPECT_FALSE(SetCurrentDirectoryW(folder.File(WTEXT("none")).c_str()));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_FILE_NOT_FOUND));
+  ASSERT_TRUE(SetCurrentDirectoryW(folder.Path().c_str()));
+  const DWORD length = GetCurrentDirectoryW(MAX_PATH, now);
+  EXPECT_EQ(GetCurrentDirectoryW(length, now), length + 1);  // one too short for the terminator
+  GetCurrentDirectoryW(MAX_PATH, now);
+  EXPECT_NE(platform::WideFullPath(full, WTEXT("x\\..\\y.txt"), MAX_PATH), nullptr);
+  EXPECT_EQ(Text(full), Text(now) + WTEXT("\\y.txt"));
+  EXPECT_NE(platform::WideFullPath(full, WTEXT("C:/a/./b//c\\..\\"), MAX_PATH), nullptr);
+  EXPECT_EQ(Text(full), WTEXT("C:\\a\\b\\"));
+  EXPECT_NE(platform::WideFullPath(full, WTEXT("\\\\server\\share\\..\\x"), MAX_PATH), nullptr);
+  EXPECT_EQ(Text(full), WTEXT("\\\\server\\share\\x"));
+  EXPECT_EQ(platform::WideFullPath(full, WTEXT("C:\\abc"), 6), nullptr);
+  WriteAll(WTEXT("relative"), "r");
+  EXPECT_EQ(ReadAll(folder.File(WTEXT("relative"))), "r");
+  ASSERT_TRUE(SetCurrentDirectoryW(before));
+}
+
+TEST(Files, RuntimeStreams) {
+  TempFolder folder;
+  const Text path = folder.File(WTEXT("\x65E5.bin"));
+  std::FILE* file = platform::WideFileOpen(path.c_str(), WTEXT("wb"));
+  ASSERT_NE(file, nullptr);
+  std::fputs("line\r\n", file);
+  EXPECT_EQ(platform::FileTell(file), 6);
+  std::fclose(file);
+  EXPECT_EQ(ReadAll(path), "line\r\n");
+  EXPECT_EQ(platform::WideFileOpen(folder.Path().c_str(), WTEXT("rb")), nullptr);
+  EXPECT_EQ(errno, EACCES);
+  EXPECT_EQ(platform::WideFileOpen(folder.File(WTEXT("none")).c_str(), WTEXT("rb")), nullptr);
+  EXPECT_EQ(errno, ENOENT);
+}
+
+#ifndef _WIN32
+
+std::string NativePath(const Text& path) {
+  std::string native = test::Narrow(path).substr(2);
+  for (char& c : native)
+    if (c == '\\') c = '/';
+  return native;
+}
+
+// Names that Windows cannot hold come mapped, and every one can be opened and renamed under its mapped name.
+TEST(FilesOnLinux, ForeignNamesMapBothWays) {
+  TempFolder folder;
+  const std::string native = NativePath(folder.Path());
+  const std::string names[] = {"a:b",          "what?",  "tab\there", "latin\xE9", "back\\slash", "private\xEF\x81\x81",
+                               "\xED\xA0\x80", "trail. "};
+  for (const std::string& name : names) {
+    const int file = open((native + "/" + name).c_str(), O_CREAT | O_WRONLY, 0666);
+    ASSERT_GE(file, 0);
+    ASSERT_EQ(write(file, name.data(), name.size()), ssize_t(name.size()));
+    close(file);
+  }
+  WIN32_FIND_DATAW data;
+  std::set<std::string> seen;
+  const HANDLE search = FindFirstFileW(folder.File(WTEXT("*")).c_str(), &data);
+  do {
+    if ((data.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) == 0) seen.insert(ReadAll(folder.File(data.cFileName)));
+  } while (FindNextFileW(search, &data));
+  FindClose(search);
+  EXPECT_EQ(seen, std::set<std::string>(std::begin(names), std::end(names)));
+  EXPECT_EQ(ReadAll(folder.File(WTEXT("a\xF03A"
+                                      "b"))),
+            "a:b");
+  EXPECT_EQ(ReadAll(folder.File(WTEXT("latin\xF0E9"))), "latin\xE9");
+  EXPECT_TRUE(MoveFileW(folder.File(WTEXT("latin\xF0E9")).c_str(), folder.File(WTEXT("q\xF03F")).c_str()));
+  EXPECT_EQ(access((native + "/q?").c_str(), F_OK), 0);
+}
+
+TEST(FilesOnLinux, Links) {
+  TempFolder folder;
+  const std::string native = NativePath(folder.Path());
+  CreateDirectoryW(folder.File(WTEXT("real")).c_str(), nullptr);
+  WriteAll(folder.File(WTEXT("real\\f")), "123");
+  ASSERT_EQ(symlink("real", (native + "/linked").c_str()), 0);
+  ASSERT_EQ(symlink("nowhere", (native + "/dangling").c_str()), 0);
+  EXPECT_EQ(GetFileAttributesW(folder.File(WTEXT("linked")).c_str()),
+            DWORD(FILE_ATTRIBUTE_REPARSE_POINT | FILE_ATTRIBUTE_DIRECTORY));
+  EXPECT_TRUE(GetFileAttributesW(folder.File(WTEXT("dangling")).c_str()) & FILE_ATTRIBUTE_REPARSE_POINT);
+  EXPECT_EQ(ReadAll(folder.File(WTEXT("linked\\f"))), "123");
+  EXPECT_EQ(OpenError(folder.File(WTEXT("dangling")), GENERIC_READ, OPEN_EXISTING), DWORD(ERROR_FILE_NOT_FOUND));
+  EXPECT_TRUE(DeleteFileW(folder.File(WTEXT("dangling")).c_str()));
+  EXPECT_TRUE(RemoveDirectoryW(folder.File(WTEXT("linked")).c_str()));
+  EXPECT_EQ(ReadAll(folder.File(WTEXT("real\\f"))), "123");
+}
+
+// The sharing mode holds against another process.
+TEST(FilesOnLinux, SharingBetweenProcesses) {
+  TempFolder folder;
+  const Text path = folder.File(WTEXT("a"));
+  WriteAll(path, "x");
+  const HANDLE file = Open(path, GENERIC_WRITE, OPEN_EXISTING, 0);
+  const pid_t child = fork();
+  if (child == 0) {
+    const HANDLE other = CreateFileW(path.c_str(), GENERIC_READ, kShareAll, nullptr, OPEN_EXISTING, 0, nullptr);
+    _exit(other == INVALID_HANDLE_VALUE && GetLastError() == ERROR_SHARING_VIOLATION ? 7 : 1);
+  }
+  int status = 0;
+  waitpid(child, &status, 0);
+  EXPECT_EQ(WEXITSTATUS(status), 7);
+  CloseHandle(file);
+}
+
+TEST(FilesOnLinux, FullDiskAndOtherDevices) {
+  const HANDLE full = Open(WTEXT("C:\\dev\\full"), GENERIC_WRITE, OPEN_EXISTING);
+  ASSERT_NE(full, INVALID_HANDLE_VALUE);
+  DWORD done = 0;
+  EXPECT_FALSE(WriteFile(full, "x", 1, &done, nullptr));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_DISK_FULL));
+  CloseHandle(full);
+  EXPECT_EQ(OpenError(WTEXT("D:\\x"), GENERIC_READ, OPEN_EXISTING), DWORD(ERROR_PATH_NOT_FOUND));
+  EXPECT_EQ(OpenError(WTEXT("\\\\server\\share\\x"), GENERIC_READ, OPEN_EXISTING), DWORD(ERROR_BAD_NETPATH));
+}
+#endif
+
+}  // namespace
