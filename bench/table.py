@@ -1,0 +1,129 @@
+#!/usr/bin/env python3
+"""Runs the benchmarks and prints ours beside the peers', with the goal of each row.
+
+usage: table.py PROGRAM [FILTER]          the table of ratios; FILTER is a regular expression
+       table.py --wine PROGRAM [FILTER]   our figures alone, of a Windows program under Wine
+
+Every figure is the median of the repetitions of one run, in which the benchmarks take turns.
+"""
+
+import json
+import re
+import statistics
+import subprocess
+import sys
+
+REPETITIONS = 5
+MIN_TIME = 0.2  # seconds a repetition
+
+# work, peer, kind, goal. Kinds: "time", ours as a part of the peer's time, at most the goal; "speed",
+# how many times as fast as the peer, at least the goal; "bytes", ours as a part of the peer's bytes.
+ROWS = [
+    ("copy and drop a shared string", "QString", "time", 1.0),
+    ("make and drop 40 characters", "std::u16string", "time", 1.0),
+    ("make and drop 40 characters", "QString", "time", 0.8),
+    ("a + b + c, 10 characters each", "QString", "time", 0.8),
+    ("find a word at the end of 1 MB", "std::u16string", "time", 0.3),
+    ("find a word at the end of 1 MB, without case", "QString", "time", 1.0),
+    ("a million appends of 8 characters", "std::u16string", "time", 1.0),
+    ("MD5 of 64 MB", "OpenSSL", "time", 1.05),
+    ("allocate and free 48 bytes", "malloc", "time", 1.0),
+    ("48 bytes, two threads", "std::mutex", "time", 1.0),
+    ("100,000 keys into the string map", "std::map", "time", 0.8),
+    ("find in the string map", "std::map", "time", 1.0),
+    ("iterate the string map", "std::map", "time", 1.0),
+    ("bytes an entry of the string map", "std::map", "bytes", 1.0),
+    ("append a million to a table of int", "std::vector", "time", 1.2),
+    ("append a million to a table of strings", "std::vector", "time", 1.2),
+    ("push, walk and erase a million list nodes", "std::list", "time", 1.0),
+    ("single-byte Read over a 64 MB file", "std::ifstream", "time", 0.4),
+    ("64 MB of ASCII through the reader", "memcpy", "speed", 0.5),
+    ("64 MB of mixed UTF-8 through the reader", "memcpy", "speed", 0.3),
+    ("64 MB of mixed UTF-8 through the reader", "ICU", "speed", 2.0),
+    ("64 MB of mixed UTF-8 through the reader", "iconv", "speed", 4.0),
+    ("64 MB of UTF-16 through the reader", "memcpy", "speed", 0.5),
+    ("64 MB of windows-1252 through the reader", "ICU", "speed", 2.0),
+    ("64 MB of Shift-JIS through the reader", "ICU", "speed", 1.0),
+    ("detect 64 MB of ASCII", "memcpy", "speed", 0.25),
+    ("detect 64 MB of ASCII", "uchardet", "speed", 1.2),
+    ("detect 64 MB of mixed UTF-8", "memcpy", "speed", 0.25),
+    ("detect 64 MB of mixed UTF-8", "uchardet", "speed", 1.2),
+    ("detect 4096 bytes", "ICU", "speed", 200.0),
+    ("detect 4096 bytes", "uchardet", "speed", 2.0),
+]
+
+TO_NANOSECONDS = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}
+
+
+def run(command, pattern):
+    """The median figure of every benchmark, by name: nanoseconds, or bytes where it counts them."""
+    options = [
+        f"--benchmark_filter={pattern}",
+        "--benchmark_format=json",
+        f"--benchmark_repetitions={REPETITIONS}",
+        f"--benchmark_min_time={MIN_TIME}",
+        "--benchmark_enable_random_interleaving=true",
+    ]
+    output = subprocess.run(command + options, check=True, stdout=subprocess.PIPE).stdout
+    samples = {}
+    for one in json.loads(output)["benchmarks"]:
+        if one["run_type"] != "iteration":
+            continue
+        name = re.sub(r"/(real_time|repeats:\d+)", "", one["name"])
+        figure = one["bytes"] if "bytes" in one else one["real_time"] * TO_NANOSECONDS[one["time_unit"]]
+        samples.setdefault(name, []).append(figure)
+    return {name: statistics.median(figures) for name, figures in samples.items()}
+
+
+def show(figure, kind):
+    if kind == "bytes":
+        return f"{figure:.1f} B"
+    for unit, size in (("s", 1e9), ("ms", 1e6), ("us", 1e3)):
+        if figure >= size:
+            return f"{figure / size:.3g} {unit}"
+    return f"{figure:.3g} ns"
+
+
+def print_table(header, lines):
+    widths = [max(len(line[i]) for line in [header] + lines) for i in range(len(header))]
+    for line in [header, ["-" * width for width in widths]] + lines:
+        print("| " + " | ".join(cell.ljust(width) for cell, width in zip(line, widths)) + " |")
+
+
+def compare(figures):
+    lines = []
+    missed = 0
+    for work, peer, kind, goal in ROWS:
+        ours, theirs = figures.get(f"{work}/ours"), figures.get(f"{work}/{peer}")
+        if ours is None or theirs is None:
+            continue
+        ratio = theirs / ours if kind == "speed" else ours / theirs
+        met = ratio >= goal if kind == "speed" else ratio <= goal
+        missed += not met
+        bound = "at least" if kind == "speed" else "at most"
+        lines.append([work, peer, show(ours, kind), show(theirs, kind), f"{ratio:.3g}",
+                      f"{bound} {goal:g}", "yes" if met else "NO"])
+    print_table(["work", "peer", "ours", "peer's", "ratio", "goal", "met"], lines)
+    print(f"\nRatios: time and bytes ours / peer's; of goals with \"at least\", speed ours / peer's. "
+          f"{len(lines) - missed} of {len(lines)} goals met.")
+
+
+def main():
+    arguments = sys.argv[1:]
+    under_wine = arguments[:1] == ["--wine"]
+    if under_wine:
+        arguments = arguments[1:]
+    if not 1 <= len(arguments) <= 2:
+        sys.exit(__doc__)
+    pattern = arguments[1] if len(arguments) == 2 else "."
+    figures = run((["wine"] if under_wine else []) + arguments[:1], pattern)
+    if under_wine:
+        works = dict.fromkeys(row[0] for row in ROWS)
+        print_table(["work", "ours"], [[work, show(figures[f"{work}/ours"], "time")]
+                                       for work in works if f"{work}/ours" in figures])
+    else:
+        compare(figures)
+
+
+if __name__ == "__main__":
+    main()
