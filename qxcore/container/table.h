@@ -56,10 +56,10 @@ class QXCORE_API __STable {
   void Clear();
   void SwapWith(__STable& other) noexcept;
 
-  // For appending without a call: is there room behind the last element, and where.
+  // For appending without a call: whether there is room behind the last element.
   bool HasRoom() const { return m_count < m_capacity; }
-  void* EndSlot() { return GetAt(m_count); }
-  void CountOneMore() { ++m_count; }
+  void* Elements() { return m_data; }
+  void SetCount(int n) { m_count = n; }
 
   char* m_data = nullptr;       // null while nothing is allocated
   std::int32_t m_capacity = 0;  // elements that fit

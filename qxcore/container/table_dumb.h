@@ -13,12 +13,25 @@
 #include "qxcore/container/table_shell.h"
 #include "qxcore/core/export.h"
 
+// A 32-bit integer under a type of its own: writing an element that is an int does not touch it, so the
+// compiler may keep the header's values in registers while elements are appended.
+enum class STableInt : std::int32_t {};
+
 // The header of a shared block; the elements follow it.
 struct __STableData {
-  std::int32_t m_refs;         // tables that share the block
-  std::int32_t m_capacity;     // elements that fit
-  std::int32_t m_count;        // elements
-  std::int32_t m_elementSize;  // bytes
+  STableInt m_refs;         // tables that share the block
+  STableInt m_capacity;     // elements that fit
+  STableInt m_count;        // elements
+  STableInt m_elementSize;  // bytes
+
+  // The fields as integers.
+  int Refs() const { return static_cast<int>(m_refs); }
+  int Capacity() const { return static_cast<int>(m_capacity); }
+  int Count() const { return static_cast<int>(m_count); }
+  int ElemSize() const { return static_cast<int>(m_elementSize); }
+  void AddRefs(int n) { m_refs = static_cast<STableInt>(Refs() + n); }
+  void SetCapacity(int n) { m_capacity = static_cast<STableInt>(n); }
+  void SetCount(int n) { m_count = static_cast<STableInt>(n); }
 
   // The first element.
   char* Elements() { return reinterpret_cast<char*>(this + 1); }
@@ -36,7 +49,7 @@ class _STableData {
 
   bool IsEmpty() const { return (m_word & 1) != 0; }
   // Bytes of one element.
-  int ElemSize() const { return IsEmpty() ? static_cast<int>(m_word >> 1) : Data()->m_elementSize; }
+  int ElemSize() const { return IsEmpty() ? static_cast<int>(m_word >> 1) : Data()->ElemSize(); }
   // Only when not IsEmpty(); never null then.
   __STableData* Data() const { return reinterpret_cast<__STableData*>(m_word); }
   __STableData* operator->() const { return Data(); }
@@ -50,11 +63,11 @@ static_assert(sizeof(_STableData) == sizeof(void*));
 
 class QXCORE_API __STableDumb {
  public:
-  int GetCount() const { return m_data.IsEmpty() ? 0 : m_data->m_count; }
-  int GetCapacity() const { return m_data.IsEmpty() ? 0 : m_data->m_capacity; }
+  int GetCount() const { return m_data.IsEmpty() ? 0 : m_data->Count(); }
+  int GetCapacity() const { return m_data.IsEmpty() ? 0 : m_data->Capacity(); }
   int ElemSize() const { return m_data.ElemSize(); }  // bytes of one element
   // Whether another table has the same block.
-  bool IsShared() const { return !m_data.IsEmpty() && m_data->m_refs != 1; }
+  bool IsShared() const { return !m_data.IsEmpty() && m_data->Refs() != 1; }
 
  protected:
   friend class __STableMem;
@@ -70,7 +83,7 @@ class QXCORE_API __STableDumb {
   const void* GetAt(int i) const { return static_cast<const char*>(GetArray()) + std::ptrdiff_t{i} * ElemSize(); }
   void* GetArray() {
     if (m_data.IsEmpty()) return nullptr;
-    if (m_data->m_refs != 1) [[unlikely]]
+    if (m_data->Refs() != 1) [[unlikely]]
       DetachBlock();
     return m_data->Elements();
   }
@@ -107,14 +120,20 @@ class QXCORE_API __STableDumb {
   // Exchanges the contents; both must be of one type.
   void SwapWith(__STableDumb& other) noexcept { std::swap(m_data, other.m_data); }
 
-  // For the typed shell: whether one more fits; the slot behind the last element; counts that slot in.
-  bool HasRoom() const { return !m_data.IsEmpty() && m_data->m_refs == 1 && m_data->m_count < m_data->m_capacity; }
-  void* EndSlot() { return m_data->Elements() + std::ptrdiff_t{m_data->m_count} * m_data->m_elementSize; }
-  void CountOneMore() { ++m_data->m_count; }
+  // For the typed shell: whether one more fits without growing or detaching; the elements; their number.
+  bool HasRoom() const {
+    if (m_data.IsEmpty()) [[unlikely]]
+      return false;
+    if (m_data->Refs() != 1) [[unlikely]]
+      return false;
+    return m_data->Count() < m_data->Capacity();
+  }
+  void* Elements() { return m_data->Elements(); }
+  void SetCount(int n) { m_data->SetCount(n); }
 
  private:
-  void DetachBlock() { GrowTo(m_data->m_capacity); }
-  char* ElementAt(int i) { return m_data->Elements() + std::ptrdiff_t{i} * m_data->m_elementSize; }
+  void DetachBlock() { GrowTo(m_data->Capacity()); }
+  char* ElementAt(int i) { return m_data->Elements() + std::ptrdiff_t{i} * m_data->ElemSize(); }
   void MoveWithin(int from, int to);
   void SwapWithin(int i, int j);
 

@@ -28,22 +28,22 @@ void __STableMem::Clear() {
   __STableData* data = m_table.GetData();
   if (data == nullptr) return;
   m_table.Detach();
-  if (--data->m_refs != 0) return;
-  for (int i = data->m_count; i > 0; --i) Destroy(data->Elements() + std::ptrdiff_t{i - 1} * data->m_elementSize);
+  data->AddRefs(-1);
+  if (data->Refs() != 0) return;
+  for (int i = data->Count(); i > 0; --i) Destroy(data->Elements() + std::ptrdiff_t{i - 1} * data->ElemSize());
   Free(data);
 }
 
 // A new block with copies of n elements.
 __STableData* __STableMem::CopyBlock(const void* elements, int n, int capacity) {
   auto* data = static_cast<__STableData*>(Allocate(capacity));
-  auto at = [data](int i) { return data->Elements() + std::ptrdiff_t{i} * data->m_elementSize; };
+  auto at = [data](int i) { return data->Elements() + std::ptrdiff_t{i} * data->ElemSize(); };
   try {
-    for (; data->m_count < n; ++data->m_count) {
-      CopyTo(at(data->m_count),
-             static_cast<const char*>(elements) + std::ptrdiff_t{data->m_count} * data->m_elementSize);
+    for (; data->Count() < n; data->SetCount(data->Count() + 1)) {
+      CopyTo(at(data->Count()), static_cast<const char*>(elements) + std::ptrdiff_t{data->Count()} * data->ElemSize());
     }
   } catch (...) {
-    while (data->m_count > 0) Destroy(at(--data->m_count));
+    for (int i = data->Count(); i > 0; --i) Destroy(at(i - 1));
     Free(data);
     throw;
   }
@@ -55,10 +55,10 @@ void __STableMem::GrowTo(int n) {
   __STableData* old = m_table.GetData();
   if (old == nullptr) {
     m_table.Attach(Allocate(n));
-  } else if (old->m_refs == 1) {
+  } else if (old->Refs() == 1) {
     m_table.GrowTo(n);
-  } else if (n >= old->m_count) {
-    __STableData* data = CopyBlock(old->Elements(), old->m_count, n);
+  } else if (n >= old->Count()) {
+    __STableData* data = CopyBlock(old->Elements(), old->Count(), n);
     m_table.Attach(data);  // lets go of the shared block
   }
 }

@@ -63,10 +63,10 @@ class QXCORE_API __STableMem {
   // Exchanges the contents; both must be of one type.
   void SwapWith(__STableMem& other) noexcept { m_table.SwapWith(other.m_table); }
 
-  // For the typed shell: whether one more fits; the slot behind the last element; counts that slot in.
+  // For the typed shell: whether one more fits without growing; the elements; their number.
   bool HasRoom() const { return m_table.HasRoom(); }
-  void* EndSlot() { return m_table.EndSlot(); }
-  void CountOneMore() { m_table.CountOneMore(); }
+  void* Elements() { return m_table.Elements(); }
+  void SetCount(int n) { m_table.SetCount(n); }
 
   __STableDumb m_table;  // holds the block
 

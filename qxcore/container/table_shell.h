@@ -10,6 +10,7 @@
 #include <initializer_list>
 #include <iterator>
 #include <new>
+#include <type_traits>
 #include <utility>
 
 #include "qxcore/core/export.h"
@@ -36,8 +37,8 @@ class STableShell : public Base {
   std::size_t size() const { return static_cast<std::size_t>(this->GetCount()); }
 
   // --- access; 0 <= i < GetCount(), checked by At only, which throws SECOMException ---
-  T& operator[](int i) { return *static_cast<T*>(Base::GetAt(i)); }
-  const T& operator[](int i) const { return *static_cast<const T*>(Base::GetAt(i)); }
+  T& operator[](int i) { return GetArray()[i]; }
+  const T& operator[](int i) const { return GetArray()[i]; }
   T& GetAt(int i) { return (*this)[i]; }
   const T& GetAt(int i) const { return (*this)[i]; }
   const T& GetConst(int i) const { return (*this)[i]; }
@@ -64,8 +65,11 @@ class STableShell : public Base {
   int Add(const T& value) {
     int index = this->GetCount();
     if (this->HasRoom()) [[likely]] {
-      new (this->EndSlot()) T(value);
-      this->CountOneMore();
+      new (static_cast<T*>(this->Elements()) + index) T(value);
+      this->SetCount(index + 1);
+    } else if constexpr (std::is_trivially_copyable_v<T> && sizeof(T) <= 2 * sizeof(void*)) {
+      T copy(value);  // its address goes away, so that the caller's variable may stay in a register
+      Base::Insert(index, &copy);
     } else {
       Base::Insert(index, &value);
     }
