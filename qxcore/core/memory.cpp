@@ -41,6 +41,8 @@ void* SMemRealloc(void* block, std::size_t size) {
 
 void SMemFree(void* block) noexcept { std::free(block); }
 
+bool SMemMustFail() noexcept { return MustFail(); }
+
 void SMemFailAt(long n, bool forever) noexcept {
   g_hasFailed = false;
   g_failForever = forever;

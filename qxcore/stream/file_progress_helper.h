@@ -1,0 +1,52 @@
+// What the two file input streams share: the runtime's file handle and an optional progress indicator.
+//
+// With an indicator, a read asks before it takes anything from the file: whenever the position has moved by
+// a hundredth of the file's size since the last time, the indicator is moved and asked whether the user
+// cancelled; then SEIOAbortedException is thrown, and no byte is lost. Seeking asks each time.
+#pragma once
+
+#include <cstdint>
+#include <cstdio>
+
+#include "qxcore/core/export.h"
+#include "qxcore/stream/progress_indicator.h"
+#include "qxcore/string/string.h"
+
+class QXCORE_API SFileProgressHelper {
+ public:
+  SFileProgressHelper(const SFileProgressHelper&) = delete;
+  SFileProgressHelper& operator=(const SFileProgressHelper&) = delete;
+
+  // Moves to a position from the start; true on failure. May throw SEIOAbortedException.
+  bool SeekPos(unsigned long position);
+  // The position from the start; the largest value where it does not fit.
+  unsigned long GetPos() const;
+  // The size when the file was opened; 0 for what has none, such as pipes.
+  std::uint64_t GetFileSize() const { return m_size; }
+
+ protected:
+  // Opens the file for reading. Throws SEIOCantOpenForReading.
+  SFileProgressHelper(const SString& path, SProgressIndicatorEx* progress);
+  ~SFileProgressHelper();
+
+  int ReadByte();
+  unsigned long ReadBlock(void* buffer, unsigned long count);
+  unsigned long SkipBytes(unsigned long count);
+  unsigned long CountAvailable();
+  bool IsAtEnd() const;
+  void CloseFile() noexcept;
+
+  std::FILE* m_file;  // null when closed
+  int m_error = 0;    // errno of a read that failed
+
+ private:
+  bool IsCancelled();
+  bool GoBackTo(std::uint64_t position);
+  bool LookAhead();
+
+  SProgressIndicatorEx* m_progress;  // not owned
+  std::uint64_t m_size = 0;
+  std::uint64_t m_position = 0;
+  std::uint64_t m_step = 0;
+  std::uint64_t m_nextReport = 0;
+};

@@ -1,0 +1,52 @@
+// A filter that buffers an input stream and can go back to a mark.
+#pragma once
+
+#include "qxcore/stream/input_stream.h"
+
+class QXCORE_API SInputBufferStream : public SInputStream {
+  QXCORE_DECLARE_CLASS(SInputBufferStream)
+
+  // Reads from `in`, which must stay alive; the second form deletes it at the end when `owns` is set. `size` is
+  // the first capacity in bytes and the first limit of a mark; 0 means 256. Throws SEOutOfMemory.
+  explicit SInputBufferStream(SInputStream& in, unsigned long size = 0);
+  SInputBufferStream(SInputStream* in, unsigned long size, bool owns);
+  SInputBufferStream(const SInputBufferStream&) = delete;
+  SInputBufferStream& operator=(const SInputBufferStream&) = delete;
+  ~SInputBufferStream() override;
+
+  int Read() override {
+    if (m_position < m_count) [[likely]] return m_buffer[m_position++];
+    return ReadRefilled();
+  }
+  // Blocks as large as the buffer go straight to the caller while no mark is set.
+  unsigned long Read(void* buffer, unsigned long count) override;
+  unsigned long Skip(unsigned long count) override;
+  unsigned long Available() override;
+  // Every buffered byte was read, and the inner stream is at its end.
+  int IsEOF() override;
+  // Keeps at least `limit` bytes (0: 8192) from here on for Reset; the mark is dropped when more are read.
+  void Mark(unsigned long limit) override;
+  // Throws SEIOResetInvalid without a mark.
+  void Reset() override;
+  // Gives the buffer's content up and closes the inner stream.
+  void Close() override;
+  int GetError() const override { return m_in->GetError(); }
+
+ protected:
+  // Reads more behind what is buffered, or anew from the buffer's start while no mark is set.
+  void Fill();
+
+ private:
+  static constexpr long kNoMark = -1;
+
+  int ReadRefilled();
+
+  SInputStream* m_in;
+  bool m_owns;
+  unsigned char* m_buffer;
+  unsigned long m_capacity;
+  unsigned long m_count = 0;     // valid bytes
+  unsigned long m_position = 0;  // the next one
+  long m_mark = kNoMark;
+  unsigned long m_markLimit;  // the largest capacity while a mark is set
+};

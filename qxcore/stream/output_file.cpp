@@ -1,0 +1,63 @@
+#include "qxcore/stream/output_file.h"
+
+#include <cerrno>
+#include <limits>
+
+#include "platform/wide.h"
+#include "qxcore/core/io_exceptions.h"
+
+QXCORE_IMPLEMENT_CLASS(SOutputFile, SOutputStream, 0)
+
+SOutputFile::SOutputFile() = default;
+SOutputFile::SOutputFile(const SString& path, int flags) { Init(path, flags); }
+
+SOutputFile::~SOutputFile() {
+  if (m_file != nullptr) std::fclose(m_file);
+}
+
+void SOutputFile::Init(const SString& path, int flags) {
+  Close();
+  m_file = platform::WideFileOpen(path, (flags & kAppend) != 0 ? WTEXT("ab") : WTEXT("wb"));
+  if (m_file == nullptr) throw SEIOCantOpenForWriting();
+  constexpr std::size_t kRuntimeBuffer = 65536;
+  std::setvbuf(m_file, nullptr, _IOFBF, kRuntimeBuffer);
+}
+
+void SOutputFile::ThrowFailure() const {
+  if (errno == ENOSPC) throw SEIODiskFullException();
+  throw SEIOWriteFailed();
+}
+
+void SOutputFile::Write(int byte) {
+  errno = 0;
+  if (m_file == nullptr || std::putc(byte & 0xFF, m_file) == EOF) ThrowFailure();
+}
+
+unsigned long SOutputFile::Write(const void* buffer, unsigned long count) {
+  if (count == 0) return 0;
+  errno = 0;
+  if (m_file == nullptr || std::fwrite(buffer, 1, count, m_file) != count) ThrowFailure();
+  return count;
+}
+
+void SOutputFile::Flush() {
+  errno = 0;
+  if (m_file != nullptr && std::fflush(m_file) != 0) ThrowFailure();
+}
+
+void SOutputFile::Close() {
+  if (m_file == nullptr) return;
+  errno = 0;
+  // Flushed by itself first: closing alone hides the failure on some runtimes.
+  bool failed = std::fflush(m_file) != 0 || std::ferror(m_file) != 0;
+  int reason = errno;
+  failed = std::fclose(m_file) != 0 || failed;
+  m_file = nullptr;
+  if (reason != 0) errno = reason;
+  if (failed) ThrowFailure();
+}
+
+long SOutputFile::GetPosition() const {
+  std::int64_t position = m_file != nullptr ? platform::FileTell(m_file) : -1;
+  return position <= std::numeric_limits<long>::max() ? static_cast<long>(position) : -1;
+}
