@@ -362,6 +362,7 @@ unsigned long Reader::DecodeInto(WCHAR* out, unsigned long room) {
   unsigned long count = DecodePiece(out, room);
   m_run = {RawOffset(), 0, m_decoder};
   m_hasDelivered = m_hasDelivered || count > 0;
+  m_delivered += count;
   return count;
 }
 
@@ -402,6 +403,7 @@ void Reader::GoTo(const Position& position) {
 void Reader::Mark(unsigned long limit) {
   CheckFormat();
   m_mark = CurrentPosition();
+  m_markDelivered = m_delivered;
   m_markLimit = limit != 0 ? limit : kDefaultMarkLimit;
   m_hasMark = true;
 }
@@ -409,6 +411,7 @@ void Reader::Mark(unsigned long limit) {
 void Reader::Reset() {
   if (!m_hasMark) throw SEIOResetInvalid();
   GoTo(m_mark);
+  m_delivered = m_markDelivered;
   m_mark = CurrentPosition();
 }
 

@@ -63,11 +63,13 @@ class QXCORE_API SMultiFormatReaderBase : public SInputStream, public SMultiForm
   unsigned long TextLength() const { return m_text.Size() / sizeof(WCHAR); }
   void Deliver(unsigned long characters) {
     m_text.start += characters * sizeof(WCHAR);
+    m_delivered += characters;
     m_hasDelivered = true;
   }
 
   SInputStream* m_in;  // where the bytes come from
   bool m_owns;         // deletes m_in at the end
+  unsigned long m_delivered = 0;  // characters
 
  private:
   // Where reading stood: the start of a decoded run in the raw block, how many of its characters were
@@ -100,6 +102,7 @@ class QXCORE_API SMultiFormatReaderBase : public SInputStream, public SMultiForm
   Position m_mark;
   bool m_hasMark = false;
   unsigned long m_markLimit = 0;
+  unsigned long m_markDelivered = 0;
   unsigned long m_skippedMark = 0;  // bytes of a byte order mark that were passed over
   bool m_needsCheck = true;
   bool m_hasDelivered = false;

@@ -41,6 +41,11 @@ unsigned long Reader::Skip(unsigned long count) {
   return done;
 }
 
+bool Reader::SeekPos(unsigned long position) {
+  if (position < m_delivered) return true;
+  return Skip(position - m_delivered) < position - m_delivered;
+}
+
 SString Reader::ReadLn() {
   constexpr unsigned kFirstRoom = 256;
   SStringBuffer line(kFirstRoom);

@@ -13,8 +13,9 @@
 #pragma once
 
 #include "qxcore/stream/multi_format_reader_base.h"
+#include "qxcore/stream/seekable_char_reader.h"
 
-class QXCORE_API SMultiFormatReaderUnicode : public SMultiFormatReaderBase {
+class QXCORE_API SMultiFormatReaderUnicode : public SMultiFormatReaderBase, public SAbstractIO::SIOSeekableCharReader {
   QXCORE_DECLARE_CLASS(SMultiFormatReaderUnicode)
 
   // Reads from `in`, which must stay alive; the second form deletes it at the end when `owns` is set.
@@ -35,9 +36,17 @@ class QXCORE_API SMultiFormatReaderUnicode : public SMultiFormatReaderBase {
   unsigned long Skip(unsigned long count) override;
   // The next line, without its end: a line feed, or a carriage return and one. Empty at the end, too: ask
   // IsEOF before.
-  SString ReadLn();
+  SString ReadLn() override;
   // Everything that is left.
   SString ReadAll();
+
+  // As a character reader: positions count the characters delivered, and only forward seeking works.
+  int ReadChar() override { return SMultiFormatReaderUnicode::Read(); }
+  bool SeekPos(unsigned long position) override;
+  unsigned long GetPos() const override { return m_delivered; }
+  bool SeekSupported() const override { return false; }
+  unsigned long Available() override { return SMultiFormatReaderBase::Available(); }
+  int IsEOF() override { return SMultiFormatReaderBase::IsEOF(); }
 
   // What stands for characters that cannot be mapped; 0 drops them. Gives the former one.
   WCHAR SetReplacement(WCHAR replacement);

@@ -1,0 +1,396 @@
+// Files, memory, buffers and push-back.
+
+#include <deque>
+
+#include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/input_buffer.h"
+#include "qxcore/stream/input_buffer_stream.h"
+#include "qxcore/stream/input_file.h"
+#include "qxcore/stream/input_global.h"
+#include "qxcore/stream/input_pushback_stream.h"
+#include "qxcore/stream/output_buffer_stream.h"
+#include "qxcore/stream/output_file.h"
+#include "qxcore/stream/output_global.h"
+#include "qxcore/stream/seekable_input_ansi_file.h"
+#include "qxcore/stream/seekable_string_input_stream.h"
+#include "tests/stream/reader_fixture.h"
+#include "tests/support/failing_allocations.h"
+#include "tests/support/temporary_folder.h"
+
+using namespace std::string_literals;
+
+namespace {
+
+std::string Pattern(std::size_t size) {
+  std::string bytes(size, 0);
+  for (std::size_t i = 0; i < size; ++i) bytes[i] = static_cast<char>(i * 7 + i / 251);
+  return bytes;
+}
+
+std::string ReadRest(SInputStream& in, unsigned long piece = 1000) {
+  std::string all;
+  std::string block(piece, 0);
+  while (unsigned long got = in.Read(block.data(), piece)) all.append(block, 0, got);
+  return all;
+}
+
+// Remembers what it was told; cancels when the position passes a limit.
+class Indicator : public SProgressIndicatorEx {
+ public:
+  explicit Indicator(std::uint64_t cancelAt = ~0ull) : m_cancelAt(cancelAt) {}
+  void SetRange(std::uint64_t, std::uint64_t to) override { range = to; }
+  void SetPos(std::uint64_t position) override {
+    EXPECT_GE(position, m_position) << "progress does not go back";
+    m_position = position;
+    ++moves;
+  }
+  std::uint64_t GetPos() const override { return m_position; }
+  bool IsCancelled() override {
+    bool cancels = m_position >= m_cancelAt;
+    if (cancels) m_cancelAt = ~0ull;  // once: the user may go on
+    return cancels;
+  }
+  std::uint64_t range = 0;
+  int moves = 0;
+
+ private:
+  std::uint64_t m_cancelAt;
+  std::uint64_t m_position = 0;
+};
+
+class FileStreams : public testing::Test {
+ protected:
+  TemporaryFolder folder;
+};
+
+TEST_F(FileStreams, Input_ReadsWhatIsThereAndThenTheEnd) {
+  const std::string bytes = Pattern(200000);
+  SInputFile file(folder.Make("a", bytes));
+  EXPECT_EQ(file.Available(), 200000u);
+  EXPECT_EQ(file.Read(), static_cast<unsigned char>(bytes[0]));
+  char none;
+  EXPECT_EQ(file.Read(&none, 0), 0u);
+  EXPECT_EQ(file.Skip(10), 10u);
+  EXPECT_EQ(ReadRest(file), bytes.substr(11));
+  EXPECT_EQ(file.Read(), -1);
+  EXPECT_TRUE(file.IsEOF());
+  EXPECT_EQ(file.GetError(), 0);
+  EXPECT_FALSE(file.SeekPos(5));
+  EXPECT_EQ(file.Read(), static_cast<unsigned char>(bytes[5]));
+  file.Close();
+  EXPECT_EQ(file.Read(), -1);
+
+  SInputFile empty(folder.Make("empty", ""));
+  EXPECT_TRUE(empty.IsEOF());
+  EXPECT_EQ(empty.Available(), 0u);
+  EXPECT_EQ(empty.Read(), -1);
+}
+
+TEST_F(FileStreams, Input_ThatCannotBeOpenedThrows) {
+  EXPECT_THROW(SInputFile(folder.Path("missing")), SEIOCantOpenForReading);
+  EXPECT_THROW(SInputFile(folder.Path("")), SEIOCantOpenForReading) << "a folder";
+  EXPECT_THROW(SInputFile(SString::null), SEIOCantOpenForReading);
+  EXPECT_THROW(SOutputFile(folder.Path("no\\such\\folder")), SEIOCantOpenForWriting);
+}
+
+TEST_F(FileStreams, FilesThatDenyTheirContent_LoseNothing) {
+  if (!std::filesystem::exists("/proc/self/status")) GTEST_SKIP() << "no such file system here";
+  std::ifstream plain("/proc/self/limits", std::ios::binary);
+  std::string expected{std::istreambuf_iterator<char>(plain), std::istreambuf_iterator<char>()};
+  SInputFile file(WTEXT("C:\\proc\\self\\limits"));
+  EXPECT_EQ(file.GetFileSize(), 0u);
+  EXPECT_EQ(file.Available(), 1u);
+  EXPECT_EQ(ReadRest(file), expected);
+}
+
+TEST_F(FileStreams, Progress_MovesAndCancellingTakesNothing) {
+  const std::string bytes = Pattern(1000000);
+  SString path = folder.Make("big", bytes);
+  Indicator indicator(500000);
+  SInputFile file(path, &indicator);
+  EXPECT_EQ(indicator.range, bytes.size());
+  std::string all;
+  int cancelled = 0;
+  for (;;) {
+    std::string block(70000, 0);
+    try {
+      unsigned long got = file.Read(block.data(), 70000);
+      if (got == 0) break;
+      all.append(block, 0, got);
+    } catch (const SEIOAbortedException&) {
+      ++cancelled;
+    }
+  }
+  EXPECT_EQ(cancelled, 1);
+  EXPECT_EQ(all, bytes);
+  EXPECT_GE(indicator.moves, 10);
+  Indicator single(1000);
+  SInputFile bytewise(path, &single);
+  EXPECT_THROW(
+      {
+        while (bytewise.Read() >= 0) {
+        }
+      },
+      SEIOAbortedException);
+  Indicator seeking(0);
+  SInputFile other(path, &seeking);
+  EXPECT_THROW(other.SeekPos(10), SEIOAbortedException);
+  EXPECT_FALSE(other.SeekPos(10));
+  EXPECT_EQ(other.Read(), static_cast<unsigned char>(bytes[10]));
+}
+
+TEST_F(FileStreams, Output_CreatesCutsAndAppends) {
+  SString path = folder.Path("out");
+  {
+    SOutputFile file(path);
+    file.Write("first", 5);
+    file.Write('!');
+    EXPECT_EQ(file.GetPosition(), 6);
+    file.Close();
+    file.Close();
+    EXPECT_EQ(file.GetPosition(), -1);
+    EXPECT_THROW(file.Write('x'), SEIOWriteFailed);
+  }
+  EXPECT_EQ(folder.Content("out"), "first!");
+  {
+    SOutputFile file;
+    file.Init(path, SOutputFile::kAppend);
+    file.Write(" more", 5);
+  }
+  EXPECT_EQ(folder.Content("out"), "first! more");
+  SOutputFile(path).Close();
+  EXPECT_EQ(folder.Content("out"), "");
+}
+
+TEST_F(FileStreams, FullDisk_IsTold) {
+  if (!std::filesystem::exists("/dev/full")) GTEST_SKIP() << "no such device here";
+  SString full = WTEXT("C:\\dev\\full");
+  const std::string bytes = Pattern(200000);
+  SOutputFile file(full);
+  EXPECT_THROW(file.Write(bytes.data(), 200000), SEIODiskFullException);
+  EXPECT_THROW(file.Close(), SEIOException);
+  SOutputFile buffered(full);
+  buffered.Write('x');
+  EXPECT_THROW(buffered.Flush(), SEIODiskFullException);
+  SOutputFile closing(full);
+  closing.Write('x');
+  EXPECT_THROW(closing.Close(), SEIODiskFullException);
+  EXPECT_NO_THROW({
+    SOutputFile destroyed(full);
+    destroyed.Write('x');
+  });
+  SOutputFile inner(full);
+  SOutputBufferStream outer(inner, 16);
+  outer.Write("waiting", 7);
+  EXPECT_THROW(outer.Close(), SEIODiskFullException);
+}
+
+TEST_F(FileStreams, AnsiFile_SeeksAndReadsLines) {
+  SSeekableInputANSIFile file(folder.Make("ansi", "one\r\ntw\xE9\n\nlast\r"));
+  EXPECT_TRUE(file.SeekSupported());
+  EXPECT_EQ(file.ReadLn(), WTEXT("one"));
+  unsigned long second = file.GetPos();
+  EXPECT_EQ(file.ReadLn(), WTEXT("tw\u00E9"));
+  EXPECT_EQ(file.ReadLn(), WTEXT(""));
+  EXPECT_EQ(file.ReadLn(), WTEXT("last\r"));
+  EXPECT_TRUE(file.IsEOF());
+  EXPECT_NE(file.GetFile(), nullptr);
+  SSeekableStringInputStream text(file);
+  EXPECT_FALSE(text.SeekPos(second));
+  EXPECT_EQ(text.Read(), 't');
+  text.Mark(1);
+  WCHAR rest[2];
+  EXPECT_EQ(text.Read(rest, 5), 4u) << "whole characters only";
+  EXPECT_EQ(SStringView(rest, 2), WTEXT("w\u00E9"));
+  text.Reset();
+  EXPECT_EQ(text.Read(), 'w');
+  EXPECT_EQ(text.GetPos(), second + 2);
+}
+
+TEST(MemoryStreams, Buffer_SeeksMarksAndEnds) {
+  SInputBuffer in("abcdef", 6);
+  EXPECT_THROW(in.Reset(), SEIOResetInvalid);
+  EXPECT_EQ(in.Read(), 'a');
+  in.Mark(0);
+  EXPECT_EQ(in.Skip(100), 5u);
+  EXPECT_TRUE(in.IsEOF());
+  in.Reset();
+  EXPECT_EQ(ReadRest(in), "bcdef");
+  EXPECT_TRUE(in.SeekPos(7));
+  EXPECT_FALSE(in.SeekPos(6));
+  EXPECT_EQ(in.Available(), 0u);
+  EXPECT_EQ(SInputBuffer(nullptr, 5).Read(), -1);
+  EXPECT_EQ(SInputBuffer("x", -1).Read(), -1);
+}
+
+TEST(MemoryStreams, Global_GrowsInStepsAndChangesHands) {
+  const std::string bytes = Pattern(50000);
+  SOutputGlobal out;
+  EXPECT_EQ(out.Detach(), nullptr);
+  for (int i = 0; i < 10000; ++i) out.Write(bytes[static_cast<std::size_t>(i)]);
+  out.Write(bytes.data() + 10000, 40000);
+  EXPECT_EQ(out.UsedSize(), 50000u);
+  HGLOBAL memory = out.Detach();
+  EXPECT_GE(GlobalSize(memory), 50000u);
+  SInputGlobal in(memory);
+  std::string back(50000, 0);
+  EXPECT_EQ(in.Read(back.data(), 50000), 50000u);
+  EXPECT_EQ(back, bytes);
+  in.Close();
+  SOutputGlobal again;
+  void* handle = memory;
+  again.Attach(&handle, 3);
+  EXPECT_EQ(handle, nullptr);
+  again.Write(0);
+  EXPECT_EQ(again.UsedSize(), 4u);
+  EXPECT_EQ(std::memcmp(again.GetData(), bytes.data(), 3), 0);
+  again.Reset();
+  const WCHAR text[] = WTEXT("text");
+  again.Write(text, 8);
+  SString read;
+  EXPECT_EQ(again.GetString(&read), 1);
+  EXPECT_EQ(read, WTEXT("text"));
+  SHGlobal taken;
+  EXPECT_EQ(again.GetHGlobal(&taken), 1);
+  SInputGlobal(taken, true).Close();
+}
+
+TEST(MemoryStreams, GlobalThatCannotGrow_KeepsWhatWasWritten) {
+  SOutputGlobal out;
+  const std::string bytes = Pattern(8192);
+  SMemFailAt(1);
+  EXPECT_THROW(out.Write('x'), SEOutOfMemory);
+  out.Write(bytes.data(), 8192);
+  SMemFailAt(1);
+  EXPECT_THROW(out.Write('x'), SEOutOfMemory);
+  SMemFailAt(0);
+  EXPECT_EQ(out.UsedSize(), 8192u);
+  EXPECT_EQ(std::memcmp(out.GetData(), bytes.data(), 8192), 0);
+  out.Write('y');
+  EXPECT_EQ(static_cast<const char*>(out.GetData())[8192], 'y');
+}
+
+// Random reads, skips, marks and resets against the plain bytes.
+TEST(BufferedInput, RandomUse_AgreesWithTheBytes) {
+  RandomText random(17);
+  const std::string bytes = Pattern(30000);
+  for (unsigned long size : {0ul, 1ul, 13ul, 5000ul}) {
+    PiecewiseInput inner(bytes, 37);
+    SInputBufferStream in(inner, size);
+    std::size_t at = 0;
+    std::size_t mark = 0;
+    std::size_t limit = 0;
+    bool hasMark = false;
+    while (at < bytes.size()) {
+      unsigned long count = static_cast<unsigned long>(random.Number(100));
+      switch (random.Number(6)) {
+        case 0:
+          ASSERT_EQ(in.Read(), static_cast<unsigned char>(bytes[at++]));
+          break;
+        case 1:
+        case 2: {
+          std::string block(count, 0);
+          unsigned long got = 0;
+          while (got < count) {  // the inner stream hands out pieces
+            unsigned long more = in.Read(block.data() + got, count - got);
+            if (more == 0) break;
+            got += more;
+          }
+          ASSERT_EQ(block.substr(0, got), bytes.substr(at, got));
+          at += got;
+          break;
+        }
+        case 3:
+          at += in.Skip(count);
+          break;
+        case 4:
+          in.Mark(static_cast<unsigned long>(limit = static_cast<std::size_t>(random.Number(300) + 1)));
+          mark = at;
+          hasMark = true;
+          break;
+        default:
+          if (hasMark && at - mark <= limit) {
+            in.Reset();
+            at = mark;
+          } else if (hasMark) {
+            try {  // beyond the limit the mark may be gone, but never wrong
+              in.Reset();
+              at = mark;
+            } catch (const SEIOResetInvalid&) {
+              hasMark = false;
+            }
+          }
+      }
+    }
+    EXPECT_EQ(in.Read(), -1);
+    EXPECT_TRUE(in.IsEOF());
+  }
+}
+
+TEST(BufferedInput, DroppedMark_CannotBeResetTo) {
+  PiecewiseInput inner(Pattern(10000));
+  SInputBufferStream in(inner, 16);
+  EXPECT_THROW(in.Reset(), SEIOResetInvalid);
+  in.Mark(64);
+  for (int i = 0; i < 64; ++i) in.Read();
+  in.Reset();
+  for (int i = 0; i < 65; ++i) in.Read();
+  EXPECT_THROW(in.Reset(), SEIOResetInvalid);
+}
+
+TEST(BufferedOutput, Blocks_ArriveInOrder) {
+  RandomText random(2);
+  const std::string bytes = Pattern(20000);
+  for (unsigned long size : {0ul, 1ul, 100ul}) {
+    CollectingOutput target;
+    {
+      SOutputBufferStream out(target, size);
+      for (std::size_t at = 0; at < bytes.size();) {
+        unsigned long count = std::min<unsigned long>(static_cast<unsigned long>(random.Number(300)), static_cast<unsigned long>(bytes.size() - at));
+        EXPECT_EQ(out.Write(bytes.data() + at, count), count);
+        at += count;
+        if (at < bytes.size()) out.Write(bytes[at++]);
+        if (random.Number(50) == 0) out.Flush();
+      }
+    }
+    EXPECT_EQ(target.bytes, bytes);
+  }
+}
+
+TEST(Pushback, BytesComeBackInOrder) {
+  PiecewiseInput inner("inner");
+  SInputPushbackStream in(inner, 4);
+  in.Unread("cd", 2);
+  in.Unread('b');
+  in.Unread('a');
+  EXPECT_THROW(in.Unread('x'), SEIOPushBackFull);
+  EXPECT_THROW(in.Unread("xyz", 3), SEIOPushBackFull);
+  EXPECT_EQ(in.Read(), 'a');
+  EXPECT_EQ(ReadRest(in), "bcdinner");
+  EXPECT_TRUE(in.IsEOF());
+  SInputBuffer block("012345", 6);
+  SInputPushbackStream marked(block, 2);
+  marked.Unread("ab", 2);
+  marked.Mark(100);
+  EXPECT_EQ(marked.Skip(4), 4u);
+  marked.Unread('z');
+  marked.Reset();
+  EXPECT_EQ(ReadRest(marked), "ab012345");
+}
+
+TEST(Filters, OwnedStreams_EndWithThem) {
+  static int alive = 0;
+  class Counted : public PiecewiseInput {
+   public:
+    Counted() : PiecewiseInput("x") { ++alive; }
+    ~Counted() override { --alive; }
+  };
+  { SInputBufferStream outer(new SInputPushbackStream(new Counted, 1, true), 8, true); }
+  { SMultiFormatReaderUnicode reader(new Counted, Support::kASCII, true); }
+  EXPECT_EQ(alive, 0);
+  Counted kept;
+  { SInputBufferStream outer(&kept, 8, false); }
+  EXPECT_EQ(alive, 1);
+}
+
+}  // namespace
