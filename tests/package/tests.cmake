@@ -1,0 +1,11 @@
+# The installed package, moved and used from outside.
+find_package(Python3 REQUIRED COMPONENTS Interpreter)
+set(package_kinds cmake pkgconfig)
+if(WIN32)
+  set(package_kinds cmake imports)
+endif()
+foreach(kind ${package_kinds})
+  add_test(NAME package.${kind} COMMAND ${Python3_EXECUTABLE} ${CMAKE_CURRENT_LIST_DIR}/package_test.py
+    ${kind} ${PROJECT_SOURCE_DIR} ${PROJECT_BINARY_DIR} ${CMAKE_TOOLCHAIN_FILE})
+  set_tests_properties(package.${kind} PROPERTIES TIMEOUT 300)
+endforeach()

@@ -1,0 +1,32 @@
+// The commands of the tool and what can be asked of each. A command returns its exit code, or throws
+// Failure, SException or BrokenPipe for main to tell.
+#pragma once
+
+#include <string>
+#include <vector>
+
+struct DetectOptions {
+  std::string hint = "ANSI";
+  std::string level;  // none, quick, fair or full; empty: what the hint's suffixes say, or full
+  std::string favor;  // hint, guess or none; empty: what the hint's suffixes say, or guess
+  bool json = false;
+  std::vector<std::string> files;
+};
+int Detect(const DetectOptions& options);
+
+struct ConvertOptions {
+  std::string from;  // empty: detect as Detect does
+  std::string to = "UTF-8";
+  std::string replacement;  // one character, "drop", or empty for the library's own
+  bool lossless = false;
+  bool ifChanged = false;
+  std::string in;
+  std::string out;
+};
+int Convert(const ConvertOptions& options);
+
+struct EncodingsOptions {
+  bool installed = false;
+  bool json = false;
+};
+int ListEncodings(const EncodingsOptions& options);

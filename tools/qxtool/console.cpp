@@ -1,0 +1,125 @@
+#include "tools/qxtool/console.h"
+
+#include <cerrno>
+#include <csignal>
+#include <cstdlib>
+
+#ifdef _WIN32
+#include "platform/win32.h"
+// Order matters: these need windows.h.
+#include <fcntl.h>
+#include <io.h>
+#include <shellapi.h>
+#else
+#include <unistd.h>
+#endif
+
+namespace console {
+namespace {
+
+volatile std::sig_atomic_t g_interrupted = 0;
+
+#ifdef _WIN32
+
+const WCHAR* volatile g_removeWhenKilled = nullptr;
+UINT g_outputCodePage = 0;
+
+BOOL WINAPI OnConsoleEvent(DWORD) {
+  if (g_interrupted) {
+    if (g_removeWhenKilled) DeleteFileW(g_removeWhenKilled);
+    ExitProcess(130);
+  }
+  g_interrupted = 1;
+  return TRUE;
+}
+
+void RestoreConsole() { SetConsoleOutputCP(g_outputCodePage); }
+
+#else
+
+const char* volatile g_removeWhenKilled = nullptr;
+
+void OnSignal(int) {
+  if (g_interrupted) {
+    if (g_removeWhenKilled) unlink(g_removeWhenKilled);
+    _exit(130);
+  }
+  g_interrupted = 1;
+}
+
+#endif
+
+}  // namespace
+
+bool Interrupted() { return g_interrupted != 0; }
+
+void RemoveWhenKilled(const std::filesystem::path* path) { g_removeWhenKilled = path ? path->c_str() : nullptr; }
+
+#ifdef _WIN32
+
+void SetUp() {
+  _setmode(_fileno(stdin), _O_BINARY);
+  _setmode(_fileno(stdout), _O_BINARY);
+  _setmode(_fileno(stderr), _O_BINARY);
+  if (IsTerminal(stdout) || IsTerminal(stderr)) {
+    g_outputCodePage = GetConsoleOutputCP();
+    if (g_outputCodePage && SetConsoleOutputCP(CP_UTF8)) std::atexit(RestoreConsole);
+  }
+  SetConsoleCtrlHandler(OnConsoleEvent, TRUE);
+}
+
+std::vector<std::string> Arguments(int, char**) {
+  // The narrow arguments have lost what the ANSI code page lacks.
+  std::vector<std::string> arguments;
+  int count = 0;
+  WCHAR** wide = CommandLineToArgvW(GetCommandLineW(), &count);
+  for (int i = 1; wide && i < count; ++i) {
+    int size = WideCharToMultiByte(CP_UTF8, 0, wide[i], -1, nullptr, 0, nullptr, nullptr);
+    std::string& argument = arguments.emplace_back(static_cast<std::size_t>(size > 0 ? size - 1 : 0), '\0');
+    WideCharToMultiByte(CP_UTF8, 0, wide[i], -1, argument.data(), size, nullptr, nullptr);
+  }
+  LocalFree(wide);
+  return arguments;
+}
+
+bool IsTerminal(std::FILE* stream) { return _isatty(_fileno(stream)) != 0; }
+
+// The runtime has no number of its own for a pipe that is being closed and says EINVAL.
+bool IsBrokenPipe(int error) { return error == EPIPE || error == EINVAL; }
+
+std::FILE* OpenForWriting(const std::filesystem::path& path) { return _wfopen(path.c_str(), L"wb"); }
+
+bool Synchronise(std::FILE* file) { return std::fflush(file) == 0 && _commit(_fileno(file)) == 0; }
+
+#else
+
+void SetUp() {
+  std::signal(SIGPIPE, SIG_IGN);
+  // Without SA_RESTART a read that waits for a person ends, too.
+  struct sigaction action = {};
+  action.sa_handler = OnSignal;
+  sigaction(SIGINT, &action, nullptr);
+  sigaction(SIGTERM, &action, nullptr);
+}
+
+std::vector<std::string> Arguments(int argc, char** argv) { return {argv + (argc > 0 ? 1 : 0), argv + argc}; }
+
+bool IsTerminal(std::FILE* stream) { return isatty(fileno(stream)) != 0; }
+
+bool IsBrokenPipe(int error) { return error == EPIPE; }
+
+std::FILE* OpenForWriting(const std::filesystem::path& path) { return std::fopen(path.c_str(), "wb"); }
+
+bool Synchronise(std::FILE* file) {
+  if (std::fflush(file) != 0) return false;
+  // A pipe or a device cannot be synchronised, and need not be.
+  return fsync(fileno(file)) == 0 || errno == EINVAL || errno == EROFS || errno == ENOTSUP;
+}
+
+#endif
+
+std::filesystem::path PathOf(std::string_view utf8) {
+  return std::filesystem::path(std::u8string(utf8.begin(), utf8.end()));
+}
+
+}  // namespace console

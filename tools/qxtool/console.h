@@ -1,0 +1,40 @@
+// What the tool needs of the system around a process and what the library does not offer: arguments
+// and paths in UTF-8, binary standard streams, terminals, interruption. The only part of the tool
+// that knows which system it runs on.
+#pragma once
+
+#include <cstdio>
+#include <filesystem>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace console {
+
+// Binary standard streams, UTF-8 on the screen, no death by a broken pipe, and an interruption
+// (Ctrl-C, termination) that is remembered. Call it once, first.
+void SetUp();
+
+// The arguments behind the program's name, in UTF-8.
+std::vector<std::string> Arguments(int argc, char** argv);
+
+// True once the user asked for an end. A second request ends the process at once.
+bool Interrupted();
+
+// A file that is removed when a second interruption ends the process at once; null for none.
+void RemoveWhenKilled(const std::filesystem::path* path);
+
+bool IsTerminal(std::FILE* stream);
+
+// True when the last failed write of the C library says that the reader of a pipe has gone.
+bool IsBrokenPipe(int error);
+
+std::filesystem::path PathOf(std::string_view utf8);
+
+// Opens a file that is written from its start, in binary; null and errno on failure.
+std::FILE* OpenForWriting(const std::filesystem::path& path);
+
+// Hands everything written so far to the disk; false and errno on failure.
+bool Synchronise(std::FILE* file);
+
+}  // namespace console

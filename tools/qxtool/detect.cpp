@@ -1,0 +1,109 @@
+// qxtool detect: how files are encoded, a line a file or as JSON.
+
+#include <algorithm>
+#include <optional>
+
+#include "qxcore/core/io_exceptions.h"
+#include "tools/qxtool/commands.h"
+#include "tools/qxtool/encoding_option.h"
+#include "tools/qxtool/failure.h"
+#include "tools/qxtool/json.h"
+#include "tools/qxtool/standard_streams.h"
+#include "tools/qxtool/text_source.h"
+#include "tools/qxtool/utf8.h"
+
+namespace {
+
+struct Finding {
+  SString file;
+  SString encoding;
+  Encoding value = 0;
+  bool bom = false;
+  bool xml = false;
+  unsigned long long bytes = 0;
+  SString warning;
+  std::string error;
+};
+
+Encoding RequestOf(const DetectOptions& options) {
+  Encoding hint = EncodingOf(options.hint, "--hint");
+  Encoding level = hint & Encodings::kLevelMask;
+  if (options.level == "none") level = 0;
+  if (options.level == "quick") level = Encodings::kQuickDetect;
+  if (options.level == "fair") level = Encodings::kDetect;
+  if (options.level == "full" || (options.level.empty() && level == 0)) level = Encodings::kFullDetect;
+  constexpr Encoding kFavors = Encodings::kFavorHint | Encodings::kFavorGuess;
+  Encoding favor = hint & kFavors;
+  if (options.favor == "none") favor = 0;
+  if (options.favor == "hint") favor = Encodings::kFavorHint;
+  if (options.favor == "guess" || (options.favor.empty() && favor == 0)) favor = Encodings::kFavorGuess;
+  return (hint & ~(Encodings::kLevelMask | kFavors)) | level | favor;
+}
+
+Finding Look(const std::string& name, Encoding request) {
+  Finding finding;
+  finding.file = FromUtf8(name);
+  try {
+    TextSource source(name, request);
+    source.Select();
+    finding.encoding = ShownName(source.Reader().GetFormat());
+    finding.value = ShownValue(source.Reader().GetFormat());
+    finding.bom = source.HasMark();
+    finding.xml = (finding.value & Encodings::kXML) != 0;
+    finding.warning = source.Reader().GetDetectionWarning();
+    finding.bytes = source.CountBytes();
+  } catch (...) {
+    finding.error = ReasonOfCurrentException();
+  }
+  return finding;
+}
+
+std::string AsJson(const Finding& finding) {
+  bool failed = !finding.error.empty();
+  std::string json = "{\"file\":" + JsonString(finding.file);
+  json += ",\"encoding\":" + (failed ? "null" : JsonString(finding.encoding));
+  json += ",\"value\":" + (failed ? "null" : JsonValue(finding.value));
+  json += std::string(",\"bom\":") + (failed ? "null" : JsonBool(finding.bom));
+  json += std::string(",\"xml\":") + (failed ? "null" : JsonBool(finding.xml));
+  json += ",\"bytes\":" + (failed ? "null" : std::to_string(finding.bytes));
+  json += ",\"warning\":" + JsonStringOrNull(finding.warning);
+  return json + ",\"error\":" + JsonStringOrNull(FromUtf8(finding.error)) + "}";
+}
+
+std::string Padded(const SString& text, int width) {
+  return ToUtf8(text) + std::string(static_cast<std::size_t>(std::max(0, width - DisplayWidth(text))), ' ');
+}
+
+std::string AsLine(const Finding& finding, int nameWidth) {
+  constexpr int kEncodingWidth = 24;
+  std::string line = Padded(finding.file, nameWidth) + "  ";
+  if (finding.warning.IsEmpty()) return line + ToUtf8(finding.encoding) + "\n";
+  return line + Padded(finding.encoding, kEncodingWidth) + "  " + ToUtf8(finding.warning) + "\n";
+}
+
+}  // namespace
+
+int Detect(const DetectOptions& options) {
+  Encoding request = RequestOf(options);
+  int nameWidth = 0;
+  for (const std::string& name : options.files) nameWidth = std::max(nameWidth, DisplayWidth(FromUtf8(name)));
+  int code = kDone;
+  const char* separator = "";
+  if (options.json) Print("{\"version\":1,\"files\":[");
+  for (const std::string& name : options.files) {
+    Finding finding = Look(name, request);
+    if (!finding.error.empty()) {
+      code = kFailed;
+      FlushPrinted();  // so that both streams tell the files in the same order
+      Complain(name + ": " + finding.error);
+    }
+    if (options.json) {
+      Print(separator + std::string("\n") + AsJson(finding));
+      separator = ",";
+    } else if (finding.error.empty()) {
+      Print(AsLine(finding, nameWidth));
+    }
+  }
+  if (options.json) Print("\n]}\n");
+  return code;
+}

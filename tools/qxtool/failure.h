@@ -1,0 +1,29 @@
+// How the tool ends, and how it says what went wrong.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+enum ExitCode { kDone = 0, kFailed = 1, kWrongUsage = 2, kCancelled = 130 };
+
+// Something that ends a command, in words for the user. `place` is the file that it happened to, where
+// that is known already.
+struct Failure {
+  std::string text;
+  ExitCode code = kFailed;
+  std::string place = {};
+};
+
+// The reader of our standard output has gone; no error, there is just nobody left to write for.
+struct BrokenPipe {};
+
+// Writes "qxtool: ..." in one line to standard error.
+void Complain(std::string_view text);
+
+// The failure that is being handled, in words. Only within a catch block. Cancelling and a broken pipe
+// are thrown on; everything else is a reason that belongs to one file.
+std::string ReasonOfCurrentException();
+
+// Throws the failure that is being handled as one that happened to `place`, unless it has a place already
+// or is none that belongs to a file. Only within a catch block.
+[[noreturn]] void FailAt(const std::string& place);

@@ -1,0 +1,115 @@
+// qxtool: detects and converts the encodings of text files.
+
+#include <CLI/App.hpp>
+#include <CLI/Config.hpp>
+#include <CLI/Formatter.hpp>
+
+#include <algorithm>
+#include <cstdio>
+#include <exception>
+#include <sstream>
+
+#include "qxcore/core/io_exceptions.h"
+#include "tools/qxtool/commands.h"
+#include "tools/qxtool/console.h"
+#include "tools/qxtool/failure.h"
+#include "tools/qxtool/standard_streams.h"
+
+namespace {
+
+void AddDetect(CLI::App& app, DetectOptions& options) {
+  CLI::App* command = app.add_subcommand("detect", "Find out how text files are encoded");
+  command->add_option("--hint", options.hint, "The encoding that is expected")
+      ->type_name("NAME")
+      ->capture_default_str();
+  command->add_option("--level", options.level, "How much of a file decides: none, quick (4 KB), fair (16 KB) or full")
+      ->check(CLI::IsMember({"none", "quick", "fair", "full"}))
+      ->type_name("LEVEL");
+  command
+      ->add_option("--favor", options.favor,
+                   "What wins when both are possible: hint, guess, or none for the hint with a warning")
+      ->check(CLI::IsMember({"hint", "guess", "none"}))
+      ->type_name("WHICH");
+  command->add_flag("--json", options.json, "Print one JSON object instead of lines");
+  command->add_option("FILE", options.files, "Files; - is standard input")->required();
+}
+
+void AddConvert(CLI::App& app, ConvertOptions& options) {
+  CLI::App* command = app.add_subcommand("convert", "Convert a text file to another encoding");
+  command
+      ->add_option("--from", options.from,
+                   "The encoding of IN, with +Detect as a hint only; without it, it is detected")
+      ->type_name("NAME");
+  command->add_option("--to", options.to, "The encoding of OUT")->type_name("NAME")->capture_default_str();
+  command->add_option("--replacement", options.replacement, "The character for what cannot be converted, or drop")
+      ->type_name("C|drop");
+  command->add_flag("--lossless", options.lossless, "Fail instead of losing characters");
+  command->add_flag("--if-changed", options.ifChanged, "Leave OUT alone when it has the same content already");
+  command->add_option("IN", options.in, "The file to read; - is standard input")->required();
+  command->add_option("OUT", options.out, "The file to write; - is standard output")->required();
+}
+
+void AddEncodings(CLI::App& app, EncodingsOptions& options) {
+  CLI::App* command = app.add_subcommand("encodings", "List the encodings and their names");
+  command->add_flag("--installed", options.installed, "Only those that this machine can convert");
+  command->add_flag("--json", options.json, "Print one JSON object instead of lines");
+}
+
+// What was wrong with the arguments, in one line.
+std::string ReasonOf(const CLI::ParseError& error, const CLI::App& app) {
+  bool hasCommand = !app.get_subcommands().empty();
+  std::vector<std::string> strangers = hasCommand ? std::vector<std::string>() : app.remaining();
+  if (!strangers.empty()) return "\"" + strangers.front() + "\" is no command; qxtool --help lists them";
+  return error.what();
+}
+
+int Run(std::vector<std::string> arguments) {
+  CLI::App app("Detects and converts the encodings of text files.", "qxtool");
+  // A path may begin with a slash.
+  app.allow_windows_style_options(false);
+  app.set_version_flag("--version", "qxtool " QXTOOL_VERSION);
+  app.require_subcommand(1);
+  DetectOptions detect;
+  ConvertOptions convert;
+  EncodingsOptions encodings;
+  AddDetect(app, detect);
+  AddConvert(app, convert);
+  AddEncodings(app, encodings);
+
+  std::reverse(arguments.begin(), arguments.end());  // as the parser wants them
+  try {
+    app.parse(std::move(arguments));
+  } catch (const CLI::ParseError& e) {
+    if (e.get_exit_code() != 0) throw Failure{ReasonOf(e, app), kWrongUsage};
+    std::ostringstream help, none;
+    app.exit(e, help, none);
+    Print(help.str());
+    return kDone;
+  }
+  if (app.got_subcommand("detect")) return Detect(detect);
+  if (app.got_subcommand("convert")) return Convert(convert);
+  return ListEncodings(encodings);
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  console::SetUp();
+  try {
+    int code = Run(console::Arguments(argc, argv));
+    FlushPrinted();
+    return code;
+  } catch (const BrokenPipe&) {
+    // The buffered rest has no reader, either; leave without trying to write it.
+    std::_Exit(kDone);
+  } catch (const SEIOAbortedException&) {
+    Complain("cancelled");
+    return kCancelled;
+  } catch (const Failure& failure) {
+    Complain(failure.place.empty() ? failure.text : failure.place + ": " + failure.text);
+    return failure.code;
+  } catch (...) {
+    Complain(ReasonOfCurrentException());
+    return kFailed;
+  }
+}

@@ -1,0 +1,42 @@
+#include "tools/qxtool/progress_bar.h"
+
+#include <cstdio>
+#include <utility>
+
+#include "tools/qxtool/console.h"
+
+namespace {
+
+constexpr std::chrono::milliseconds kPatience{1000};
+constexpr std::chrono::milliseconds kBetweenDraws{100};
+constexpr const char* kEraseLine = "\r\x1b[K";
+
+}  // namespace
+
+ProgressBar::ProgressBar(std::string name)
+    : m_name(std::move(name)), m_isTerminal(console::IsTerminal(stderr)), m_nextDraw(Clock::now() + kPatience) {}
+
+void ProgressBar::Clear() {
+  if (!m_isShown) return;
+  std::fputs(kEraseLine, stderr);
+  m_isShown = false;
+}
+
+void ProgressBar::SetPos(std::uint64_t position) {
+  m_position = position;
+  Draw();
+}
+
+bool ProgressBar::IsCancelled() { return console::Interrupted(); }
+
+void ProgressBar::Draw() {
+  if (!m_isTerminal || Clock::now() < m_nextDraw) return;
+  m_nextDraw = Clock::now() + kBetweenDraws;
+  constexpr int kWidth = 30;
+  int done = m_range > 0 ? static_cast<int>(100.0 * static_cast<double>(m_position) / static_cast<double>(m_range)) : 0;
+  std::string bar(static_cast<std::size_t>(done * kWidth / 100), '#');
+  bar.resize(kWidth, '.');
+  std::fprintf(stderr, "%s[%s] %3d%%  %s", kEraseLine, bar.c_str(), done, m_name.c_str());
+  std::fflush(stderr);
+  m_isShown = true;
+}

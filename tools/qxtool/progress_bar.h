@@ -1,0 +1,36 @@
+// A bar on standard error that tells how far a file has been read. It appears on a terminal only, and
+// only when the work takes longer than a second; it also carries the user's wish to end.
+#pragma once
+
+#include <chrono>
+#include <string>
+
+#include "qxcore/stream/progress_indicator.h"
+
+class ProgressBar : public SProgressIndicatorEx {
+ public:
+  explicit ProgressBar(std::string name);
+  ProgressBar(const ProgressBar&) = delete;
+  ProgressBar& operator=(const ProgressBar&) = delete;
+  ~ProgressBar() { Clear(); }
+
+  // Takes the bar off the screen.
+  void Clear();
+
+  void SetRange(std::uint64_t from, std::uint64_t to) override { m_range = to - from; }
+  void SetPos(std::uint64_t position) override;
+  std::uint64_t GetPos() const override { return m_position; }
+  bool IsCancelled() override;
+
+ private:
+  using Clock = std::chrono::steady_clock;
+
+  void Draw();
+
+  std::string m_name;
+  std::uint64_t m_range = 0;
+  std::uint64_t m_position = 0;
+  bool m_isTerminal;
+  bool m_isShown = false;
+  Clock::time_point m_nextDraw;
+};

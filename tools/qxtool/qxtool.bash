@@ -1,0 +1,34 @@
+# bash completion for qxtool
+_qxtool_names() {
+  local IFS=$'\n'
+  mapfile -t COMPREPLY < <(qxtool encodings 2>/dev/null | sed 's/^0x[0-9A-F]*  //; s/  (not installed)$//; s/ | /\n/g' |
+    grep -i -F -- "$1" | grep -i "^$(printf '%s' "$1" | sed 's/[][\.*^$]/\\&/g')" | sed 's/[ ()&;,]/\\&/g')
+}
+
+_qxtool() {
+  local cur=${COMP_WORDS[COMP_CWORD]} prev=${COMP_WORDS[COMP_CWORD - 1]} command=${COMP_WORDS[1]}
+  COMPREPLY=()
+  if [ "$COMP_CWORD" = 1 ]; then
+    mapfile -t COMPREPLY < <(compgen -W "detect convert encodings --help --version" -- "$cur")
+    return
+  fi
+  case $prev in
+    --hint | --from | --to) _qxtool_names "$cur"; return ;;
+    --level) mapfile -t COMPREPLY < <(compgen -W "none quick fair full" -- "$cur"); return ;;
+    --favor) mapfile -t COMPREPLY < <(compgen -W "hint guess none" -- "$cur"); return ;;
+    --replacement) mapfile -t COMPREPLY < <(compgen -W "drop" -- "$cur"); return ;;
+  esac
+  if [[ $cur == -* ]]; then
+    local options=--help
+    case $command in
+      detect) options="--hint --level --favor --json --help" ;;
+      convert) options="--from --to --replacement --lossless --if-changed --help" ;;
+      encodings) options="--installed --json --help" ;;
+    esac
+    mapfile -t COMPREPLY < <(compgen -W "$options" -- "$cur")
+  elif [ "$command" != encodings ]; then
+    compopt -o filenames
+    mapfile -t COMPREPLY < <(compgen -f -- "$cur")
+  fi
+}
+complete -F _qxtool qxtool

@@ -1,0 +1,68 @@
+#include "tools/qxtool/text_source.h"
+
+#include <algorithm>
+#include <cstring>
+
+#include "tools/qxtool/console.h"
+#include "tools/qxtool/failure.h"
+#include "tools/qxtool/utf8.h"
+
+int CountingInput::Read() {
+  unsigned char byte;
+  return Read(&byte, 1) == 1 ? byte : -1;
+}
+
+unsigned long CountingInput::Read(void* buffer, unsigned long count) {
+  unsigned long got = m_inner.Read(buffer, count);
+  if (m_count < sizeof m_first) {
+    std::size_t wanted = std::min<std::size_t>(sizeof m_first - static_cast<std::size_t>(m_count), got);
+    std::memcpy(m_first + m_count, buffer, wanted);
+  }
+  m_count += got;
+  return got;
+}
+
+bool CountingInput::StartsWith(std::string_view bytes) const {
+  return m_count >= bytes.size() && std::memcmp(m_first, bytes.data(), bytes.size()) == 0;
+}
+
+TextSource::TextSource(const std::string& name, Encoding request) : m_progress(name) {
+  SInputStream* inner;
+  if (name == "-") {
+    m_standardInput = std::make_unique<StandardInput>();
+    inner = m_standardInput.get();
+  } else {
+    m_file = std::make_unique<SInputFile>(FromUtf8(name), &m_progress);
+    m_size = m_file->Available();
+    inner = m_file.get();
+  }
+  m_bytes = std::make_unique<CountingInput>(*inner);
+  m_reader = std::make_unique<SMultiFormatReaderUnicode>(*m_bytes, request);
+}
+
+void TextSource::Select() {
+  m_reader->CheckFormat();
+  CheckRead();
+}
+
+bool TextSource::HasMark() {
+  Encoding selected = m_reader->GetFormat();
+  if (Encodings::IsSameFormat(selected, Encodings::kUTF8)) return m_bytes->StartsWith("\xEF\xBB\xBF");
+  if (Encodings::IsSameFormat(selected, Encodings::kUTF16LE)) return m_bytes->StartsWith("\xFF\xFE");
+  if (Encodings::IsSameFormat(selected, Encodings::kUTF16BE)) return m_bytes->StartsWith("\xFE\xFF");
+  return false;
+}
+
+unsigned long long TextSource::CountBytes() {
+  // Some files tell no size or a wrong one; they and standard input are counted.
+  if (m_size > m_bytes->Count()) return m_size;
+  char skipped[65536];
+  while (m_bytes->Read(skipped, sizeof skipped) != 0) {
+  }
+  CheckRead();
+  return m_bytes->Count();
+}
+
+void TextSource::CheckRead() {
+  if (int error = m_bytes->GetError()) throw Failure{std::string("Cannot be read: ") + std::strerror(error)};
+}
