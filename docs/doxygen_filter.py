@@ -93,7 +93,7 @@ class Filter:
     def doc_for(self, code):
         if self.block:
             return self.block
-        if re.match(r"\s*(template.*>\s*)?(class|struct)\b[^;]*\{", code) and self.header and not self.header_used:
+        if re.match(r"\s*(template.*>\s*)?(class|struct)\b[^;]*$", code) and self.header and not self.header_used:
             self.header_used = True
             return self.header
         return self.section or by_convention(code)

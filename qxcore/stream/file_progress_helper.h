@@ -29,6 +29,7 @@ class QXCORE_API SFileProgressHelper {
   SFileProgressHelper(const SString& path, SProgressIndicatorEx* progress);
   ~SFileProgressHelper();
 
+  // The two file streams forward to these; each does what SInputStream says of its like.
   int ReadByte();
   unsigned long ReadBlock(void* buffer, unsigned long count);
   unsigned long SkipBytes(unsigned long count);

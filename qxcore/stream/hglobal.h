@@ -7,6 +7,7 @@
 class QXCORE_API SHGlobal {
  public:
   constexpr SHGlobal() = default;
+  // Holds the handle, which stays its owner's.
   explicit constexpr SHGlobal(HGLOBAL handle) : m_handle(handle) {}
 
   // Allocates movable memory, forgetting the former handle; `flags` as GlobalAlloc takes them, to which

@@ -28,6 +28,7 @@ class QXCORE_API SInputBuffer : public SInputStream {
 
  protected:
   SInputBuffer() = default;
+  // Reads the block from its start; it stays its owner's. A negative size counts as 0.
   void Init(const void* block, int size) { Init(block, static_cast<unsigned long>(size > 0 ? size : 0)); }
   void Init(const void* block, unsigned long size);
 

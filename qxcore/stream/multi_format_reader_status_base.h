@@ -11,17 +11,17 @@
 
 class QXCORE_API SMultiFormatReaderStatusBase {
  public:
-  using Support = SAbstractIO::SMultiFormatSupport;
-  using Encoding = Support::Encoding;
+  using Support = SAbstractIO::SMultiFormatSupport;  // the encodings
+  using Encoding = Support::Encoding;                // see multi_format_support.h
 
   // A growing buffer: bytes lie from start to end, in a block of `capacity` bytes.
   struct BufferStatus {
     unsigned char* block = nullptr;  // owned by the reader, unless the capacity is 0
-    unsigned char* start = nullptr;
-    unsigned char* end = nullptr;
-    unsigned long capacity = 0;
+    unsigned char* start = nullptr;  // first byte not used yet
+    unsigned char* end = nullptr;    // behind the last byte
+    unsigned long capacity = 0;      // bytes of the block
 
-    unsigned long Size() const { return static_cast<unsigned long>(end - start); }
+    unsigned long Size() const { return static_cast<unsigned long>(end - start); }  // bytes not used yet
   };
 
   // Status bits.
@@ -43,7 +43,7 @@ class QXCORE_API SMultiFormatReaderStatusBase {
   virtual void AllocRawData(BufferStatus& buffer, unsigned long size);
   virtual void AllocStrData(BufferStatus& buffer, unsigned long size);
 
-  Encoding GetRequestedFormat() const { return m_requested; }
+  Encoding GetRequestedFormat() const { return m_requested; }  // the hint and the policy
   // The selected encoding with the requested policy; 0 before the first read or check, and when it failed.
   Encoding GetFormat() const { return m_selected; }
   unsigned int GetStatus() const { return m_status; }
@@ -63,16 +63,17 @@ class QXCORE_API SMultiFormatReaderStatusBase {
   unsigned long long GetDroppedCount() const { return m_decoder.GetDropped(); }
 
  protected:
+  // Nothing is selected yet.
   explicit SMultiFormatReaderStatusBase(Encoding requested) : m_requested(requested) {}
-  static void FreeBuffer(BufferStatus& buffer) noexcept;
+  static void FreeBuffer(BufferStatus& buffer) noexcept;  // gives the block back and empties the buffer
 
-  Encoding m_requested;
-  Encoding m_selected = 0;
-  BufferStatus m_raw;
-  unsigned int m_status = 0;
-  SDataAffinity m_affinity;
-  SEncodingGuess m_guess;
-  STextDecoder m_decoder;
-  bool m_hasFailed = false;
-  int m_quickUTF8 = 0;
+  Encoding m_requested;       // hint and policy
+  Encoding m_selected = 0;    // 0 before the selection
+  BufferStatus m_raw;         // bytes not decoded yet
+  unsigned int m_status = 0;  // status bits
+  SDataAffinity m_affinity;   // the evidence of the last detection
+  SEncodingGuess m_guess;     // what was made of it
+  STextDecoder m_decoder;     // of the selected encoding; counts the losses
+  bool m_hasFailed = false;   // detection selected nothing
+  int m_quickUTF8 = 0;        // UTF-8 is taken for well-formed
 };

@@ -16,7 +16,7 @@
 // bound to references.
 class SAbstractIO::SMultiFormatSupport {
  public:
-  using Encoding = std::uint32_t;
+  using Encoding = std::uint32_t;  // kind, code page or form, and policy
 
   // Kinds.
   static constexpr Encoding kUndefined = 0;
@@ -56,6 +56,7 @@ class SAbstractIO::SMultiFormatSupport {
   static constexpr Encoding kFlagsMask = 0xFFF00000;
   static constexpr Encoding kFormatMask = 0xFFFE7;  // all but the BOM bits
 
+  // The kind of a value, whatever its policy.
   static constexpr Encoding KindOf(Encoding encoding) { return encoding & kKindMask; }
   static constexpr bool IsUnicode(Encoding encoding) { return KindOf(encoding) == kUnicode; }
   static constexpr bool IsANSI(Encoding encoding) { return KindOf(encoding) == kANSI; }
@@ -71,7 +72,8 @@ class SAbstractIO::SMultiFormatSupport {
   // number. With `withPolicy`, the policy follows in suffixes ("+Detect"). With `userFriendly`, the
   // translatable words come from the string table. A code page that is neither the active one nor
   // installed has "* NOT INSTALLED *" behind it. Value 0: "<Undefined>", or nothing with `emptyIfUndefined`.
-  QXCORE_API static SString GetEncodingName(Encoding encoding, int withPolicy = 0, int userFriendly = 0, int emptyIfUndefined = 0);
+  QXCORE_API static SString GetEncodingName(Encoding encoding, int withPolicy = 0, int userFriendly = 0,
+                                            int emptyIfUndefined = 0);
 
   // The encoding that a text names. Surrounding blanks are ignored; the longest name of the table that
   // begins the text wins, case does not matter, and suffixes of the policy may follow. "Cp" and a number
@@ -91,7 +93,7 @@ class SAbstractIO::SMultiFormatSupport {
   // Replaces the words of a table name that are translatable by their translation.
   QXCORE_API static SString MakeUserFriendly(const SString& name);
 
-  using EncodingMap = SMap<SString, Encoding, SAscStrNoC>;
+  using EncodingMap = SMap<SString, Encoding, SAscStrNoC>;  // names, ordered without regard to case
   // Adds name and value of encodings to a sorted map: the display name of each value, with `aliases` all
   // names; with `installedOnly` only those that the machine supports. Gives how many names were added.
   QXCORE_API static int ListAvailableEncodings(EncodingMap& names, int installedOnly, int aliases);

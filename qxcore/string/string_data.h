@@ -20,6 +20,7 @@ struct SStringData {
   std::int32_t m_length;       // characters before the terminator
   std::int32_t m_allocLength;  // characters that fit, the terminator not counted
 
+  // The text behind the header.
   WCHAR* Text() { return reinterpret_cast<WCHAR*>(this + 1); }
   // By way of an integer: compilers take a step back from a pointer to characters for a mistake.
   static SStringData* Of(WCHAR* text) {
@@ -27,6 +28,7 @@ struct SStringData {
   }
   static const SStringData* Of(const WCHAR* text) { return Of(const_cast<WCHAR*>(text)); }
 
+  // The count, read atomically.
   std::int32_t Refs() const { return __atomic_load_n(&m_refs, __ATOMIC_ACQUIRE); }
 };
 
@@ -37,9 +39,10 @@ static_assert(sizeof(SStringData) == 12 && offsetof(SStringData, m_length) == 4 
 // A constant string with its header in front, as every shared buffer has it.
 template <int kLength>
 struct SStaticString {
-  SStringData m_header;
-  WCHAR m_text[kLength + 2];
+  SStringData m_header;       // kStatic, and the length
+  WCHAR m_text[kLength + 2];  // terminated
 
+  // Made of a literal.
   static constexpr SStaticString Of(const WCHAR (&text)[kLength + 1]) {
     SStaticString made{{SStringData::kStatic, kLength, kLength + 1}, {}};
     for (int i = 0; i < kLength; ++i) made.m_text[i] = text[i];
