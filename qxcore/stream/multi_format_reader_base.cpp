@@ -115,7 +115,8 @@ void Reader::CompleteCutSequence() {
 // The first step of a check; true when encodings are to be detected.
 bool Reader::FillSample() {
   const Encoding level = m_requested & Support::kLevelMask;
-  const bool detects = (level & Support::kWholeInOnce) != 0 || level == Support::kQuickDetect || level == Support::kDetect;
+  const bool detects =
+      (level & Support::kWholeInOnce) != 0 || level == Support::kQuickDetect || level == Support::kDetect;
   if ((m_status & kRawPresent) != 0) {
     m_status &= ~kRawPresent;
     // Later data of an input that was long enough for detection is detected, however little is left of it.
@@ -385,13 +386,30 @@ void Reader::GoTo(const Position& position) {
   m_raw.start = m_raw.block + position.runOffset;
   m_decoder = position.decoder;
   m_isCut = false;
+  if (m_decoder.NeedsWholeInput()) {
+    // One run holds all of the text; no part of it can be decoded alone.
+    if (position.delivered > 0 && DecodeNextRun()) {
+      m_text.start += std::min(position.delivered, TextLength()) * sizeof(WCHAR);
+    }
+    return;
+  }
   for (unsigned long passed = 0; passed < position.delivered && m_raw.start != m_raw.end;) {
     STextDecoder::Run run{};
     WCHAR character[8];
+    const STextDecoder before = m_decoder;
     for (const unsigned char* end = m_raw.start + 1;; ++end) {
       bool isLast = end == m_raw.end && (m_status & kWholeInput) != 0;
       run = m_decoder.Decode(m_raw.start, end, isLast, character);
       if (run.in != m_raw.start || end == m_raw.end) break;
+    }
+    // A byte that ended an invalid sequence may have become a character of its own at once; when only what
+    // stands for the sequence was delivered, the position is in front of that byte.
+    const unsigned long wanted = position.delivered - passed;
+    for (const unsigned char* end = run.in; static_cast<unsigned long>(run.out - character) > wanted;) {
+      if (--end == m_raw.start) break;
+      m_decoder = before;
+      STextDecoder::Run shorter = m_decoder.Decode(m_raw.start, end, true, character);
+      if (shorter.in == end && static_cast<unsigned long>(shorter.out - character) == wanted) run = shorter;
     }
     if (run.in == m_raw.start) break;
     m_raw.start += run.in - m_raw.start;

@@ -129,8 +129,11 @@ Run STextDecoder::RunKernel(const unsigned char* in, const unsigned char* end, W
 
 STextDecoder::Obstacle STextDecoder::Look(const unsigned char* in, const unsigned char* end, bool isLast) const {
   switch (m_kernel) {
-    case Kernel::kUTF8:
-    case Kernel::kQuickUTF8: {
+    case Kernel::kQuickUTF8:
+      // As its continuation bytes are not looked at, a sequence stops the kernel only when some are missing.
+      if (*in >= 0xC0 && *in < 0xF0 && !isLast) return {0, false};
+      [[fallthrough]];
+    case Kernel::kUTF8: {
       SUtf8Obstacle obstacle = SLookAtUtf8(in, end);
       if (obstacle.isCut && !isLast) return {0, false};
       return {obstacle.length, obstacle.isIllegal};
