@@ -20,6 +20,14 @@ union LARGE_INTEGER {
   LONGLONG QuadPart;
 };
 
+union ULARGE_INTEGER {
+  struct {
+    DWORD LowPart;
+    DWORD HighPart;
+  } u;
+  ULONGLONG QuadPart;
+};
+
 struct SECURITY_ATTRIBUTES {
   DWORD nLength;
   LPVOID lpSecurityDescriptor;  // ignored
@@ -172,6 +180,14 @@ QXCORE_API BOOL RemoveDirectoryW(LPCWSTR path);
 QXCORE_API DWORD GetCurrentDirectoryW(DWORD size, LPWSTR buffer);
 QXCORE_API BOOL SetCurrentDirectoryW(LPCWSTR path);
 QXCORE_API DWORD GetFullPathNameW(LPCWSTR path, DWORD size, LPWSTR buffer, LPWSTR* filePart);
+// Long: each part as it is spelled on disk. Short: the same, as there are no short names.
+QXCORE_API DWORD GetLongPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size);
+QXCORE_API DWORD GetShortPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size);
+// "C:\usr\lib" and "C:\usr".
+QXCORE_API UINT GetSystemDirectoryW(LPWSTR buffer, UINT size);
+QXCORE_API UINT GetWindowsDirectoryW(LPWSTR buffer, UINT size);
+QXCORE_API BOOL GetDiskFreeSpaceExW(LPCWSTR directory, ULARGE_INTEGER* available, ULARGE_INTEGER* total,
+                                    ULARGE_INTEGER* free);
 // The folder of TMPDIR, else /tmp.
 QXCORE_API DWORD GetTempPathW(DWORD size, LPWSTR buffer);
 QXCORE_API UINT GetTempFileNameW(LPCWSTR directory, LPCWSTR prefix, UINT unique, LPWSTR name);

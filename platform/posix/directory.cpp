@@ -2,6 +2,7 @@
 
 #include <fcntl.h>
 #include <sys/stat.h>
+#include <sys/statvfs.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -109,4 +110,36 @@ UINT GetTempFileNameW(LPCWSTR directory, LPCWSTR prefix, UINT unique, LPWSTR nam
   }
   SetLastError(ERROR_FILE_EXISTS);
   return 0;
+}
+
+DWORD GetLongPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size) {
+  return Guarded([&]() -> DWORD {
+    const Resolved entry = ResolvePath(path);
+    if (entry.error != ERROR_SUCCESS || !entry.exists) {
+      SetLastError(entry.error != ERROR_SUCCESS ? entry.error : ERROR_FILE_NOT_FOUND);
+      return 0;
+    }
+    return Deliver(ToWindowsPath(entry.path), size, buffer);
+  });
+}
+
+DWORD GetShortPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size) { return GetLongPathNameW(path, buffer, size); }
+
+UINT GetSystemDirectoryW(LPWSTR buffer, UINT size) { return Deliver(u"C:\\usr\\lib", size, buffer); }
+
+UINT GetWindowsDirectoryW(LPWSTR buffer, UINT size) { return Deliver(u"C:\\usr", size, buffer); }
+
+BOOL GetDiskFreeSpaceExW(LPCWSTR directory, ULARGE_INTEGER* available, ULARGE_INTEGER* total, ULARGE_INTEGER* free) {
+  return static_cast<BOOL>(Guarded([&]() -> DWORD {
+    const Resolved entry = ResolvePath(directory != nullptr ? directory : u".");
+    if (entry.error != ERROR_SUCCESS) return static_cast<DWORD>(FailWith(entry.error));
+    struct statvfs info;
+    if (!entry.exists || statvfs(entry.path.c_str(), &info) != 0)
+      return static_cast<DWORD>(FailWith(entry.exists ? ErrorFromErrno(errno) : ERROR_PATH_NOT_FOUND));
+    const ULONGLONG block = info.f_frsize;
+    if (available != nullptr) available->QuadPart = info.f_bavail * block;
+    if (total != nullptr) total->QuadPart = info.f_blocks * block;
+    if (free != nullptr) free->QuadPart = info.f_bfree * block;
+    return TRUE;
+  }));
 }
