@@ -42,6 +42,47 @@ const unsigned char* SkipPlain(const unsigned char* at, const unsigned char* end
   return at;
 }
 
+#ifdef __SSE2__
+
+// 64 bytes, one bit each.
+struct Block {
+  static constexpr std::ptrdiff_t kSize = 64;
+
+  std::uint64_t zeros = 0;
+  std::uint64_t above = 0;         // 0x80 and more
+  std::uint64_t continuation = 0;  // 0x80 to 0xBF
+  std::uint64_t fromE0 = 0;
+  std::uint64_t fromF0 = 0;
+
+  explicit Block(const unsigned char* at) {
+    const __m128i zero = _mm_setzero_si128();
+    const __m128i c0 = _mm_set1_epi8(static_cast<char>(0xC0));
+    const __m128i e0 = _mm_set1_epi8(static_cast<char>(0xE0));
+    const __m128i f0 = _mm_set1_epi8(static_cast<char>(0xF0));
+    for (int part = 0; part < 4; ++part) {
+      const __m128i bytes = _mm_loadu_si128(reinterpret_cast<const __m128i*>(at) + part);
+      const auto put = [part](std::uint64_t& mask, __m128i found) {
+        mask |= static_cast<std::uint64_t>(static_cast<unsigned>(_mm_movemask_epi8(found))) << (part * 16);
+      };
+      put(above, bytes);
+      put(zeros, _mm_cmpeq_epi8(bytes, zero));
+      put(continuation, _mm_cmplt_epi8(bytes, c0));  // as signed numbers those below 0xC0
+      put(fromE0, _mm_cmpeq_epi8(_mm_max_epu8(bytes, e0), bytes));
+      put(fromF0, _mm_cmpeq_epi8(_mm_max_epu8(bytes, f0), bytes));
+    }
+  }
+};
+
+// Without the processor's own instruction, which not every one has.
+int CountBits(std::uint64_t bits) {
+  bits -= bits >> 1 & 0x5555555555555555u;
+  bits = (bits & 0x3333333333333333u) + (bits >> 2 & 0x3333333333333333u);
+  bits = (bits + (bits >> 4)) & 0x0F0F0F0F0F0F0F0Fu;
+  return static_cast<int>(bits * 0x0101010101010101u >> 56);
+}
+
+#endif
+
 // The walk over the bytes; counts into plain locals, which the loop keeps in registers.
 class Walk {
  public:
@@ -51,30 +92,8 @@ class Walk {
   void Run() {
     const unsigned char* at = m_begin;
     while ((at = SkipPlain(at, m_end)) != m_end) {
-      unsigned char byte = *at++;
-      switch (byte >> 4) {
-        case 0x0:
-          if (m_countsZeros && at != m_end) ++m_zeros[(at - 1 - m_begin) & 1];
-          continue;
-        case 0xC:
-        case 0xD:
-          ++m_nonAscii;
-          at = TakeContinuations(at, 1);
-          break;
-        case 0xE:
-          ++m_nonAscii;
-          at = TakeContinuations(at, 2);
-          break;
-        case 0xF:
-          // Neither evidence nor a rejection by itself; its continuation bytes count as stray ones. That
-          // is meant: readers do not support sequences of four bytes.
-          ++m_nonAscii;
-          m_mayStop = true;
-          break;
-        default:
-          ++m_nonAscii;
-          Reject();
-      }
+      const unsigned char* next = WalkBlocks(at);
+      at = next != at ? next : WalkByte(at);
       if (m_mayStop && at - m_begin > kPatience) break;
       m_mayStop = false;
     }
@@ -102,6 +121,56 @@ class Walk {
   bool WalkedAny() const { return m_walked > 0; }
 
  private:
+  const unsigned char* WalkByte(const unsigned char* at) {
+    const unsigned char byte = *at++;
+    switch (byte >> 4) {
+      case 0x0:
+        if (m_countsZeros && at != m_end) ++m_zeros[(at - 1 - m_begin) & 1];
+        return at;
+      case 0xC:
+      case 0xD:
+        ++m_nonAscii;
+        return TakeContinuations(at, 1);
+      case 0xE:
+        ++m_nonAscii;
+        return TakeContinuations(at, 2);
+      case 0xF:
+        // Neither evidence nor a rejection by itself; its continuation bytes count as stray ones. That is
+        // meant: readers do not support sequences of four bytes.
+        ++m_nonAscii;
+        m_mayStop = true;
+        return at;
+      default:
+        ++m_nonAscii;
+        Reject();
+        return at;
+    }
+  }
+
+  // Walks whole blocks of well-formed sequences up to three bytes, and zeros; gives where that ends, which is
+  // between two sequences.
+  const unsigned char* WalkBlocks(const unsigned char* at) {
+#ifdef __SSE2__
+    std::uint64_t expected = 0;  // continuation bytes that belong to the block before
+    for (; m_end - at > Block::kSize; at += Block::kSize) {
+      const Block block(at);
+      const std::uint64_t leads = block.above & ~block.continuation;
+      const std::uint64_t due = expected | leads << 1 | block.fromE0 << 2;
+      if (block.fromF0 != 0 || due != block.continuation) break;
+      m_nonAscii += CountBits(leads);
+      m_continuations += CountBits(block.continuation);
+      if (m_countsZeros && block.zeros != 0) {
+        const int first = static_cast<int>((at - m_begin) & 1);
+        m_zeros[first] += CountBits(block.zeros & 0x5555555555555555u);
+        m_zeros[first ^ 1] += CountBits(block.zeros & 0xAAAAAAAAAAAAAAAAu);
+      }
+      expected = leads >> 63 | block.fromE0 >> 62;
+    }
+    if (expected != 0) at = TakeContinuations(at, expected == 1 ? 1 : 2);
+#endif
+    return at;
+  }
+
   // A sequence that the end of the sample cuts is no rejection.
   const unsigned char* TakeContinuations(const unsigned char* at, int count) {
     for (; count > 0 && at != m_end; --count, ++at) {

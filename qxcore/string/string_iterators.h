@@ -47,6 +47,7 @@ class QXCORE_API word_iterator : public STokenIterator {
  public:
   // Stands at the first token of the string, which must outlive the iterator.
   explicit word_iterator(const SString& text) : STokenIterator(text) { reset(); }
+  explicit word_iterator(SString&&) = delete;  // it would not outlive the statement
   word_iterator& operator++();
   word_iterator operator++(int) {
     word_iterator before = *this;
@@ -64,6 +65,7 @@ class QXCORE_API line_iterator : public STokenIterator {
  public:
   // Stands at the first line of the string, which must outlive the iterator.
   explicit line_iterator(const SString& text) : STokenIterator(text) { reset(); }
+  explicit line_iterator(SString&&) = delete;  // it would not outlive the statement
   line_iterator& operator++();
   line_iterator operator++(int) {
     line_iterator before = *this;
@@ -81,6 +83,7 @@ class QXCORE_API parts_iterator : public STokenIterator {
  public:
   // Stands at the first part of the string, which must outlive the iterator.
   parts_iterator(const SString& text, WCHAR separator) : STokenIterator(text), m_separator(separator) { reset(); }
+  parts_iterator(SString&&, WCHAR) = delete;
   parts_iterator& operator++();
   parts_iterator operator++(int) {
     parts_iterator before = *this;
