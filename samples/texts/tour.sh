@@ -21,7 +21,7 @@ show() {
   local file=$1
   shift
   echo
-  echo "\$ qxtool convert $* $file OUT"
+  echo "\$ qxtool convert${*:+ $*} $file OUT"
   "$tool" convert "$@" "$file" "$out/$file"
   head -n 2 "$out/$file" | tr -d '\r' | sed 's/^/    /'
 }

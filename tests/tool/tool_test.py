@@ -330,8 +330,8 @@ class ToolTest(unittest.TestCase):
     def test_files_that_cannot_be_used(self):
         self.write("in.txt", "a")
         (self.folder / "folder").mkdir()
-        self.assert_one_line(self.run_tool("convert", "missing.txt", "out.txt"), 1, "missing.txt: Cannot open for reading")
-        self.assert_one_line(self.run_tool("convert", "folder", "out.txt"), 1, "folder: ")
+        self.assert_one_line(self.run_tool("convert", "missing.txt", "out.txt"), 1, "missing.txt: Cannot open for reading: ")
+        self.assert_one_line(self.run_tool("convert", "folder", "out.txt"), 1, "folder: Cannot open for reading: it is a folder")
         self.assert_one_line(self.run_tool("convert", "in.txt", "folder"), 1, "folder: Cannot open for writing")
         self.assert_one_line(self.run_tool("convert", "in.txt", "nowhere/out.txt"), 1, "nowhere/out.txt: Cannot open for writing")
         self.assertEqual(self.names(), ["folder", "in.txt"])
@@ -339,7 +339,7 @@ class ToolTest(unittest.TestCase):
     def test_missing_code_page_is_told(self):
         self.write("in.txt", "äöü")
         self.assert_one_line(self.run_tool("convert", "--to", "Cp12345", "in.txt", "out.txt"), 1, "Cp12345", "NOT INSTALLED")
-        self.assert_one_line(self.run_tool("convert", "--from", "Cp12345", "in.txt", "out.txt"), 1, "in.txt", "not supported by machine")
+        self.assert_one_line(self.run_tool("convert", "--from", "Cp12345", "in.txt", "out.txt"), 1, "in.txt", "not supported by machine", "Cp12345")
         self.assertEqual(self.names(), ["in.txt"])
 
     @unittest.skipIf(ON_WINE, "links and permissions of the other system")
@@ -360,6 +360,13 @@ class ToolTest(unittest.TestCase):
         entry = json.loads(self.run_tool("detect", "--json", "/proc/version").stdout)["files"][0]
         self.assertEqual((entry["encoding"], entry["bytes"]), ("ASCII", len(expected)))
         self.assertEqual(self.run_tool("convert", "/proc/version", "-").stdout, expected)
+
+    @unittest.skipIf(ON_WINE, "there is no /proc")
+    def test_failed_read_is_not_the_end_of_the_text(self):
+        # This file opens, but its first page cannot be read.
+        self.assert_one_line(self.run_tool("detect", "/proc/self/mem"), 1, "/proc/self/mem: Cannot be read")
+        self.assert_one_line(self.run_tool("convert", "/proc/self/mem", "out.txt"), 1, "/proc/self/mem: Cannot be read")
+        self.assertEqual(self.names(), [])
 
     # --- encodings ---
 

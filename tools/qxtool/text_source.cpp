@@ -1,8 +1,12 @@
 #include "tools/qxtool/text_source.h"
 
 #include <algorithm>
+#include <cerrno>
 #include <cstring>
+#include <filesystem>
+#include <fstream>
 
+#include "qxcore/core/io_exceptions.h"
 #include "tools/qxtool/console.h"
 #include "tools/qxtool/failure.h"
 #include "tools/qxtool/utf8.h"
@@ -26,13 +30,36 @@ bool CountingInput::StartsWith(std::string_view bytes) const {
   return m_count >= bytes.size() && std::memcmp(m_first, bytes.data(), bytes.size()) == 0;
 }
 
+namespace {
+
+// What the system has against opening the file; the library's exception only tells that it could not.
+std::string WhyNotOpened(const std::string& name) {
+  std::error_code error;
+  std::filesystem::file_status status = std::filesystem::status(console::PathOf(name), error);
+  if (std::filesystem::is_directory(status)) return "it is a folder";
+  if (!std::filesystem::exists(status)) return error ? error.message() : "there is no such file";
+  std::ifstream attempt(console::PathOf(name), std::ios::binary);
+  return attempt ? "" : std::strerror(errno);
+}
+
+std::unique_ptr<SInputFile> OpenFile(const std::string& name, ProgressBar& progress) {
+  try {
+    return std::make_unique<SInputFile>(FromUtf8(name), &progress);
+  } catch (const SEIOCantOpenForReading& e) {
+    std::string why = WhyNotOpened(name);
+    throw Failure{ToUtf8(e.GetText()) + (why.empty() ? why : ": " + why)};
+  }
+}
+
+}  // namespace
+
 TextSource::TextSource(const std::string& name, Encoding request) : m_progress(name) {
   SInputStream* inner;
   if (name == "-") {
     m_standardInput = std::make_unique<StandardInput>();
     inner = m_standardInput.get();
   } else {
-    m_file = std::make_unique<SInputFile>(FromUtf8(name), &m_progress);
+    m_file = OpenFile(name, m_progress);
     m_size = m_file->Available();
     inner = m_file.get();
   }
@@ -41,7 +68,12 @@ TextSource::TextSource(const std::string& name, Encoding request) : m_progress(n
 }
 
 void TextSource::Select() {
-  m_reader->CheckFormat();
+  try {
+    m_reader->CheckFormat();
+  } catch (const SEIOInvalidEncoding& e) {
+    throw Failure{ToUtf8(e.GetText()) + " (" + ToUtf8(Encodings::GetEncodingName(m_reader->GetRequestedFormat())) +
+                  ")"};
+  }
   CheckRead();
 }
 
