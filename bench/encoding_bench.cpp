@@ -9,6 +9,7 @@
 
 #include "bench/bench.h"
 #include "bench/inputs.h"
+#include "qxcore/stream/input_buffer.h"
 #include "qxcore/stream/multi_format_reader_unicode.h"
 #if BENCH_PEERS
 #include <iconv.h>
@@ -31,7 +32,7 @@ WCHAR* Piece() {
 
 void ReadThrough(benchmark::State& state, const std::string& input, Support::Encoding encoding) {
   for (auto _ : state) {
-    bench::MemoryInput in(input);
+    SInputBuffer in(input.data(), static_cast<unsigned long>(input.size()));
     SMultiFormatReaderUnicode reader(in, encoding);
     while (reader.Read(Piece(), bench::kPieceBytes) != 0) benchmark::DoNotOptimize(*Piece());
   }
@@ -40,7 +41,7 @@ void ReadThrough(benchmark::State& state, const std::string& input, Support::Enc
 
 void Detect(benchmark::State& state, std::string_view input) {
   for (auto _ : state) {
-    bench::MemoryInput in(input);
+    SInputBuffer in(input.data(), static_cast<unsigned long>(input.size()));
     SMultiFormatReaderUnicode reader(in, kDetection);
     reader.CheckFormat();
     benchmark::DoNotOptimize(reader.GetFormat());

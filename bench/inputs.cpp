@@ -1,7 +1,8 @@
-#include <cstring>
+#include "bench/inputs.h"
+
 #include <vector>
 
-#include "bench/inputs.h"
+#include "platform/win32.h"
 
 namespace bench {
 namespace {
@@ -81,27 +82,6 @@ const std::string& ShiftJis() {
   static const std::string text =
       Repeat({InCodePage(932, kJapanese), InCodePage(932, kEnglish), InCodePage(932, kJapanese), "\r\n"});
   return text;
-}
-
-int MemoryInput::Read() {
-  if (m_rest.empty()) return -1;
-  int byte = static_cast<unsigned char>(m_rest.front());
-  m_rest.remove_prefix(1);
-  return byte;
-}
-
-unsigned long MemoryInput::Read(void* buffer, unsigned long count) {
-  if (count > m_rest.size()) count = static_cast<unsigned long>(m_rest.size());
-  std::memcpy(buffer, m_rest.data(), count);
-  m_rest.remove_prefix(count);
-  return count;
-}
-
-const void* MemoryInput::TakeRest(unsigned long* size) {
-  const void* rest = m_rest.data();
-  *size = static_cast<unsigned long>(m_rest.size());
-  m_rest = {};
-  return rest;
 }
 
 }  // namespace bench

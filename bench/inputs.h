@@ -1,4 +1,4 @@
-// Texts of 64 MB that the encoding benchmarks read, and a stream over them.
+// Texts of 64 MB that the benchmarks of streams and encodings read.
 //
 // "Mixed UTF-8" repeats sentences in English, German, French, Polish, Russian, Greek, Chinese and
 // Japanese, with the shares that the sentences have by themselves: of its bytes about half are
@@ -7,10 +7,8 @@
 // Japanese ones. Four-byte sequences do not occur.
 #pragma once
 
+#include <cstddef>
 #include <string>
-
-#include "platform/win32.h"
-#include "qxcore/stream/input_stream.h"
 
 namespace bench {
 
@@ -23,19 +21,5 @@ const std::string& MixedUtf8();
 const std::string& Utf16();  // the characters of the mixed text, little-endian, without a mark
 const std::string& Windows1252();
 const std::string& ShiftJis();
-
-// Bytes in memory as an input stream.
-class MemoryInput : public SInputStream {
- public:
-  explicit MemoryInput(std::string_view bytes) : m_rest(bytes) {}
-  int Read() override;
-  unsigned long Read(void* buffer, unsigned long count) override;
-  unsigned long Available() override { return static_cast<unsigned long>(m_rest.size()); }
-  int IsEOF() override { return m_rest.empty(); }
-  const void* TakeRest(unsigned long* size) override;
-
- private:
-  std::string_view m_rest;
-};
 
 }  // namespace bench
