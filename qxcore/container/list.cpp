@@ -4,18 +4,6 @@
 
 __SList::~__SList() = default;
 
-void __SList::LinkBefore(Node* node, Node* before) {
-  node->m_next = before;
-  node->m_prev = before->m_prev;
-  before->m_prev->m_next = node;
-  before->m_prev = node;
-}
-
-void __SList::Unlink(Node* node) {
-  node->m_prev->m_next = node->m_next;
-  node->m_next->m_prev = node->m_prev;
-}
-
 __SList& __SList::operator=(const __SList& other) {
   if (this == &other) return *this;
   Clear();
@@ -34,26 +22,6 @@ void* __SList::GetAt(int position) const {
     for (int i = m_count; i > position; --i) node = node->m_prev;
   }
   return node->Payload();
-}
-
-__SList::Node* __SList::Insert(Node* before, const void* source) {
-  Node* node = AllocNode();
-  try {
-    CopyPayload(node, source);
-  } catch (...) {
-    FreeNode(node);
-    throw;
-  }
-  LinkBefore(node, before);
-  ++m_count;
-  return node;
-}
-
-void __SList::Erase(Node* node) {
-  Unlink(node);
-  --m_count;
-  DestroyPayload(node->Payload());
-  FreeNode(node);
 }
 
 void __SList::Clear() {

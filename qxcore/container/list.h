@@ -54,8 +54,8 @@ class QXCORE_API __SList {
   void* GetAt(int position) const;
 
   // A new node with a copy of the payload in front of `before`; the end node appends.
-  Node* Insert(Node* before, const void* source);
-  void Erase(Node* node);
+  Node* Insert(Node* before, const void* source) { return InsertInto(*this, before, source); }
+  void Erase(Node* node) { EraseFrom(*this, node); }
   void Clear();
   void MoveTo(Node* node, Node* before);  // relinks the node in front of `before`
   void Swap(__SList& other) noexcept;     // exchanges the contents; both must be of one type
@@ -64,9 +64,39 @@ class QXCORE_API __SList {
   Node* m_end;               // &m_sentinel
   Node m_sentinel;           // links the first and the last node into a ring
 
+  // The same for a list whose class is known, so that its element operations need no virtual call.
+  template <class List>
+  static Node* InsertInto(List& list, Node* before, const void* source) {
+    Node* node = list.AllocNode();
+    try {
+      list.CopyPayload(node, source);
+    } catch (...) {
+      list.FreeNode(node);
+      throw;
+    }
+    LinkBefore(node, before);
+    ++list.m_count;
+    return node;
+  }
+  template <class List>
+  static void EraseFrom(List& list, Node* node) {
+    Unlink(node);
+    --list.m_count;
+    list.DestroyPayload(node->Payload());
+    list.FreeNode(node);
+  }
+
  private:
-  static void LinkBefore(Node* node, Node* before);
-  static void Unlink(Node* node);
+  static void LinkBefore(Node* node, Node* before) {
+    node->m_next = before;
+    node->m_prev = before->m_prev;
+    before->m_prev->m_next = node;
+    before->m_prev = node;
+  }
+  static void Unlink(Node* node) {
+    node->m_prev->m_next = node->m_next;
+    node->m_next->m_prev = node->m_prev;
+  }
 };
 
 static_assert(sizeof(void*) != 4 || sizeof(__SList) == 20, "the layout is public");
@@ -145,18 +175,18 @@ class SList : public __SList {
   bool empty() const { return m_count == 0; }
 
   // --- modification; `value` may be an element of this list ---
-  iterator AddFront(const T& value) { return iterator(__SList::Insert(m_end->m_next, &value)); }
-  iterator AddBack(const T& value) { return iterator(__SList::Insert(m_end, &value)); }
-  iterator Insert(const_iterator before, const T& value) { return iterator(__SList::Insert(before.m_node, &value)); }
+  iterator AddFront(const T& value) { return iterator(InsertInto(*this, m_end->m_next, &value)); }
+  iterator AddBack(const T& value) { return iterator(InsertInto(*this, m_end, &value)); }
+  iterator Insert(const_iterator before, const T& value) { return iterator(InsertInto(*this, before.m_node, &value)); }
   void push_back(const T& value) { AddBack(value); }  // for std::back_inserter
   // Removes the element and gives the place behind it.
   iterator Erase(const_iterator place) {
     iterator next(place.m_node->m_next);
-    __SList::Erase(place.m_node);
+    EraseFrom(*this, place.m_node);
     return next;
   }
-  void RemoveFront() { __SList::Erase(m_end->m_next); }  // the list must not be empty
-  void RemoveBack() { __SList::Erase(m_end->m_prev); }
+  void RemoveFront() { EraseFrom(*this, m_end->m_next); }  // the list must not be empty
+  void RemoveBack() { EraseFrom(*this, m_end->m_prev); }
   void Clear() { __SList::Clear(); }
   // Moves the element without copying it; iterators stay valid.
   void MoveToFront(const_iterator place) { MoveTo(place.m_node, m_end->m_next); }
@@ -164,8 +194,9 @@ class SList : public __SList {
   void Swap(SList& other) noexcept { __SList::Swap(other); }
 
  protected:
-  Node* AllocNode() override { return static_cast<Node*>(Allocator::Alloc(sizeof(TypedNode), alignof(TypedNode))); }
-  void FreeNode(Node* node) override { Allocator::Free(node, sizeof(TypedNode), alignof(TypedNode)); }
-  void DestroyPayload(void* payload) override { static_cast<T*>(payload)->~T(); }
-  void CopyPayload(Node* node, const void* source) override { new (node->Payload()) T(*static_cast<const T*>(source)); }
+  friend class __SList;
+  Node* AllocNode() final { return static_cast<Node*>(Allocator::Alloc(sizeof(TypedNode), alignof(TypedNode))); }
+  void FreeNode(Node* node) final { Allocator::Free(node, sizeof(TypedNode), alignof(TypedNode)); }
+  void DestroyPayload(void* payload) final { static_cast<T*>(payload)->~T(); }
+  void CopyPayload(Node* node, const void* source) final { new (node->Payload()) T(*static_cast<const T*>(source)); }
 };
