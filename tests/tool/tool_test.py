@@ -8,6 +8,7 @@ With the wrapper "wine" the tool is the Windows one; the list of tests is the sa
 import json
 import os
 import pathlib
+import shlex
 import shutil
 import signal
 import subprocess
@@ -257,6 +258,34 @@ class ToolTest(unittest.TestCase):
         self.assertEqual(process.returncode, 130, errors)
         self.assertEqual(self.names(), ["out.txt"])
         self.assertEqual((self.folder / "out.txt").read_text(), "precious")
+
+    @unittest.skipIf(ON_WINE, "needs a terminal and a pipe with a name")
+    def test_progress_shows_on_a_terminal_after_a_second(self):
+        import pty
+
+        pipe = self.folder / "slow.txt"
+        os.mkfifo(pipe)
+        for pause, shows in ((0.1, True), (0.0, False)):
+            terminal, stderr = pty.openpty()
+            process = subprocess.Popen(command("convert", "--from", "UTF-8", pipe, "out.txt"), cwd=self.folder, stderr=stderr)
+            os.close(stderr)
+            with open(pipe, "wb") as writer:
+                for _ in range(16):
+                    writer.write(b"a line\n" * 10000)
+                    writer.flush()
+                    time.sleep(pause)
+            self.assertEqual(process.wait(timeout=60), 0)
+            os.set_blocking(terminal, False)
+            try:
+                shown = os.read(terminal, 65536)
+            except OSError:  # nothing was written, and nobody is left to write
+                shown = b""
+            os.close(terminal)
+            self.assertEqual(b"MB  " in shown, shows)
+            if shows:
+                self.assertTrue(shown.endswith(b"\r\x1b[K"), "the bar is still there")
+        quiet = subprocess.run(["sh", "-c", "sleep 1.3 | " + shlex.join(command("convert", "-", "out.txt"))], cwd=self.folder, stderr=subprocess.PIPE)
+        self.assertEqual(quiet.stderr, b"")
 
     # --- convert ---
 

@@ -29,14 +29,24 @@ void ProgressBar::SetPos(std::uint64_t position) {
 
 bool ProgressBar::IsCancelled() { return console::Interrupted(); }
 
-void ProgressBar::Draw() {
-  if (!m_isTerminal || Clock::now() < m_nextDraw) return;
-  m_nextDraw = Clock::now() + kBetweenDraws;
+std::string ProgressBar::Amount() const {
+  char text[32];
+  if (m_position > m_range) {  // a pipe, or a file that does not tell its size
+    std::snprintf(text, sizeof text, "%.1f MB", static_cast<double>(m_position) / 1e6);
+    return text;
+  }
   constexpr int kWidth = 30;
   int done = m_range > 0 ? static_cast<int>(100.0 * static_cast<double>(m_position) / static_cast<double>(m_range)) : 0;
   std::string bar(static_cast<std::size_t>(done * kWidth / 100), '#');
   bar.resize(kWidth, '.');
-  std::fprintf(stderr, "%s[%s] %3d%%  %s", kEraseLine, bar.c_str(), done, m_name.c_str());
+  std::snprintf(text, sizeof text, "] %3d%%", done);
+  return "[" + bar + text;
+}
+
+void ProgressBar::Draw() {
+  if (!m_isTerminal || Clock::now() < m_nextDraw) return;
+  m_nextDraw = Clock::now() + kBetweenDraws;
+  std::fprintf(stderr, "%s%s  %s", kEraseLine, Amount().c_str(), m_name.c_str());
   std::fflush(stderr);
   m_isShown = true;
 }

@@ -26,6 +26,8 @@ class ProgressBar : public SProgressIndicatorEx {
   using Clock = std::chrono::steady_clock;
 
   void Draw();
+  // The bar, or where the size is not known how much has been read.
+  std::string Amount() const;
 
   std::string m_name;
   std::uint64_t m_range = 0;
