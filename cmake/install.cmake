@@ -38,3 +38,10 @@ if(WIN32)
     install(FILES ${path} DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT runtime)
   endforeach()
 endif()
+
+# Debuggers: gdb loads the printers by itself where they lie beside the library.
+if(WIN32)
+  install(FILES tools/debug/qxcore11e.natvis tools/debug/qxcore_printers.py DESTINATION ${CMAKE_INSTALL_DATADIR}/qxcore11e COMPONENT dev)
+else()
+  install(FILES tools/debug/qxcore_printers.py DESTINATION ${CMAKE_INSTALL_LIBDIR} RENAME libqxcore11e.so.${PROJECT_VERSION}-gdb.py COMPONENT dev)
+endif()
