@@ -5,6 +5,7 @@
 #include <cstring>
 
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/single_byte_decoder.h"
 #include "qxcore/stream/utf8_decoder.h"
 #include "qxcore/stream/widen.h"
 
@@ -21,24 +22,9 @@ Run DecodeASCII(const unsigned char* in, const unsigned char* end, WCHAR* out) {
 }
 
 Run DecodeSingleByte(const SCodePageTable& table, const unsigned char* in, const unsigned char* end, WCHAR* out) {
-  const WCHAR* singles = table.Singles();
-  const bool skipsASCII = table.IsASCIICompatible();
-  while (in != end) {
-    if (skipsASCII && *in < 0x80) {
-      std::size_t plain = SWidenASCII(in, static_cast<std::size_t>(end - in), out);
-      in += plain;
-      out += plain;
-      if (in == end) break;
-    }
-    // A stretch through the table, eight bytes before looking for plain text again.
-    const unsigned char* stretch = in + std::min<std::ptrdiff_t>(end - in, 8);
-    for (; in != stretch; ++in, ++out) {
-      WCHAR c = singles[*in];
-      if (c == SCodePageTable::kNone) [[unlikely]] return {in, out};
-      *out = c;
-    }
-  }
-  return {in, out};
+  SSingleByteRun run =
+      SDecodeSingleByte(table.Singles(), SCodePageTable::kNone, table.IsASCIICompatible(), in, end, out);
+  return {run.in, run.out};
 }
 
 Run DecodeDoubleByte(const SCodePageTable& table, const unsigned char* in, const unsigned char* end, WCHAR* out) {

@@ -1,4 +1,5 @@
-// Tells Wine from Windows, for the places where Wine falls short of the published documentation.
+// Which system a test runs on: for what only one of them has, and for the places where Wine falls short
+// of the published documentation.
 #pragma once
 
 #include "platform/win32.h"
@@ -6,6 +7,14 @@
 inline bool IsWine() {
 #ifdef _WIN32
   return GetProcAddress(GetModuleHandleW(L"ntdll.dll"), "wine_get_version") != nullptr;
+#else
+  return false;
+#endif
+}
+
+inline bool IsWindows() {
+#ifdef _WIN32
+  return true;
 #else
   return false;
 #endif
