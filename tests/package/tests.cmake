@@ -1,4 +1,7 @@
-# The installed package, moved and used from outside.
+# The installed package, moved and used from outside. A build with sanitizers is not for others to link.
+if(CMAKE_CXX_FLAGS MATCHES "-fsanitize")
+  return()
+endif()
 find_package(Python3 REQUIRED COMPONENTS Interpreter)
 set(package_kinds cmake pkgconfig)
 if(WIN32)
