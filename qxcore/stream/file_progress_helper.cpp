@@ -131,7 +131,8 @@ unsigned long SFileProgressHelper::CountAvailable() {
   return LookAhead() ? 1 : 0;
 }
 
-bool SFileProgressHelper::IsAtEnd() const { return m_file == nullptr || std::feof(m_file) != 0; }
+// A file that fails has nothing more to give, either; a loop up to the end must not run for ever.
+bool SFileProgressHelper::IsAtEnd() const { return m_file == nullptr || std::feof(m_file) != 0 || m_error != 0; }
 
 void SFileProgressHelper::CloseFile() noexcept {
   if (m_file != nullptr) std::fclose(m_file);

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <limits>
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/core/memory.h"
@@ -46,7 +47,9 @@ void SInputBufferStream::Fill() {
       m_count = m_position = 0;
     }
   }
-  m_count += m_in->Read(m_buffer + m_count, m_capacity - m_count);
+  // A source that fails may give all ones: nothing came.
+  const unsigned long room = m_capacity - m_count, got = m_in->Read(m_buffer + m_count, room);
+  if (got <= room) m_count += got;
 }
 
 int SInputBufferStream::ReadRefilled() {
@@ -59,7 +62,10 @@ unsigned long SInputBufferStream::Read(void* buffer, unsigned long count) {
   unsigned long done = 0;
   while (done < count) {
     if (m_position == m_count) {
-      if (m_mark == kNoMark && count - done >= m_capacity) return done + m_in->Read(out + done, count - done);
+      if (m_mark == kNoMark && count - done >= m_capacity) {
+        const unsigned long got = m_in->Read(out + done, count - done);
+        return got <= count - done ? done + got : done;
+      }
       Fill();
       if (m_position == m_count) break;
     }
@@ -86,7 +92,11 @@ unsigned long SInputBufferStream::Skip(unsigned long count) {
   return done;
 }
 
-unsigned long SInputBufferStream::Available() { return m_count - m_position + m_in->Available(); }
+unsigned long SInputBufferStream::Available() {
+  const unsigned long buffered = m_count - m_position, behind = m_in->Available();
+  return behind <= std::numeric_limits<unsigned long>::max() - buffered ? buffered + behind
+                                                                       : std::numeric_limits<unsigned long>::max();
+}
 
 int SInputBufferStream::IsEOF() { return m_position == m_count && m_in->IsEOF(); }
 

@@ -53,7 +53,7 @@ unsigned long Reader::ReadRawData(unsigned char* buffer, unsigned long count) {
   unsigned long done = 0;
   while (done < count) {
     unsigned long got = m_in->Read(buffer + done, count - done);
-    if (got == 0) break;
+    if (got == 0 || got > count - done) break;  // all ones: the source failed
     done += got;
   }
   return done;

@@ -1,0 +1,346 @@
+// Streams on real files and over sources and targets that fail.
+
+#include <gtest/gtest.h>
+
+#include <cerrno>
+#include <random>
+#include <string>
+#include <vector>
+
+#include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/input_buffer_stream.h"
+#include "qxcore/stream/input_file.h"
+#include "qxcore/stream/input_pushback_stream.h"
+#include "qxcore/stream/output_buffer_stream.h"
+#include "qxcore/stream/output_file.h"
+#include "qxcore/stream/seekable_input_ansi_file.h"
+#include "qxcore/stream/seekable_string_input_stream.h"
+#include "tests/stream/reader_fixture.h"
+#include "tests/support/failing_allocations.h"
+#include "tests/support/temp_folder.h"
+#include "tests/support/text.h"
+
+namespace {
+
+using test::ReadAll;
+using test::TempFolder;
+using test::WriteAll;
+
+SString Path(const test::Text& path) { return SString(path.c_str()); }
+
+std::string RandomBytes(std::size_t count) {
+  std::mt19937 random(static_cast<unsigned>(count));
+  std::string bytes(count, '\0');
+  for (char& byte : bytes) byte = static_cast<char>(random());
+  return bytes;
+}
+
+// Reads to the end with a random mix of all the calls.
+std::string ReadMixed(SInputStream& in, unsigned seed) {
+  std::mt19937 random(seed);
+  std::string all;
+  char block[5000];
+  for (;;) {
+    switch (random() % 3) {
+      case 0: {
+        const int byte = in.Read();
+        if (byte < 0) return all;
+        all += static_cast<char>(byte);
+        break;
+      }
+      case 1: {
+        const unsigned long wanted = random() % sizeof block;
+        const unsigned long got = in.Read(block, wanted);
+        all.append(block, got);
+        if (got < wanted) return all;
+        break;
+      }
+      default:
+        EXPECT_EQ(in.Read(block, 0), 0u);
+    }
+  }
+}
+
+TEST(RealFiles, EveryMixOfReadsGivesTheFile) {
+  TempFolder folder;
+  for (std::size_t size : {0u, 1u, 255u, 256u, 257u, 4096u, 100000u}) {
+    const std::string bytes = RandomBytes(size);
+    const test::Text path = folder.File(WTEXT("data"));
+    ASSERT_TRUE(WriteAll(path, bytes));
+    for (unsigned seed = 0; seed < 8; ++seed) {
+      SInputFile plain(Path(path));
+      EXPECT_EQ(plain.Available(), size);
+      EXPECT_EQ(plain.IsEOF(), size == 0);
+      EXPECT_EQ(ReadMixed(plain, seed), bytes);
+      EXPECT_TRUE(plain.IsEOF());
+      EXPECT_EQ(plain.Available(), 0u);
+      EXPECT_EQ(plain.GetError(), 0);
+      SInputFile inner(Path(path));
+      SInputBufferStream buffered(inner, seed == 0 ? 0 : seed * 100);
+      EXPECT_EQ(buffered.Available(), size);
+      EXPECT_EQ(ReadMixed(buffered, seed), bytes);
+      EXPECT_TRUE(buffered.IsEOF());
+      SInputPushbackStream pushback(new SInputFile(Path(path)), 16, true);
+      EXPECT_EQ(ReadMixed(pushback, seed), bytes);
+    }
+  }
+}
+
+TEST(RealFiles, SkippingIsReading) {
+  TempFolder folder;
+  const std::string bytes = RandomBytes(10000);
+  const test::Text path = folder.File(WTEXT("data"));
+  WriteAll(path, bytes);
+  SInputFile file(Path(path));
+  SInputFile inner(Path(path));
+  SInputBufferStream buffered(inner, 64);
+  for (SInputStream* in : std::vector<SInputStream*>{&file, &buffered}) {
+    EXPECT_EQ(in->Skip(0), 0u);
+    EXPECT_EQ(in->Skip(10), 10u);
+    EXPECT_EQ(in->Read(), static_cast<unsigned char>(bytes[10]));
+    EXPECT_EQ(in->Skip(5000), 5000u);
+    EXPECT_EQ(in->Read(), static_cast<unsigned char>(bytes[5011]));
+    EXPECT_FALSE(in->IsEOF());
+    EXPECT_EQ(in->Skip(100000), 10000u - 5012u);
+    EXPECT_EQ(in->Read(), -1);
+    EXPECT_TRUE(in->IsEOF());
+  }
+}
+
+TEST(RealFiles, WritingAndAppending) {
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("out"));
+  const std::string bytes = RandomBytes(20000);
+  {
+    SOutputFile file;
+    EXPECT_EQ(file.GetPosition(), -1);
+    EXPECT_THROW(file.Write('x'), SEIOWriteFailed);  // nothing is open
+    file.Init(Path(path), 0);
+    SOutputBufferStream buffered(file, 100);
+    std::mt19937 random(1);
+    for (std::size_t at = 0; at < bytes.size();) {
+      const std::size_t piece = std::min<std::size_t>(random() % 250, bytes.size() - at);
+      if (piece == 1) {
+        buffered.Write(bytes[at]);
+      } else {
+        EXPECT_EQ(buffered.Write(bytes.data() + at, static_cast<unsigned long>(piece)), piece);
+      }
+      at += piece;
+    }
+    buffered.Flush();
+    EXPECT_EQ(file.GetPosition(), 20000);
+    EXPECT_EQ(ReadAll(path), bytes);
+    buffered.Write('!');  // the destructor hands it on
+  }
+  EXPECT_EQ(ReadAll(path), bytes + "!");
+  SOutputFile more(Path(path), SOutputFile::kAppend);
+  EXPECT_EQ(more.GetPosition(), 20001);
+  more.Write(0x141);  // the low eight bits
+  more.Close();
+  more.Close();
+  EXPECT_EQ(ReadAll(path), bytes + "!A");
+  SOutputFile(Path(path)).Close();
+  EXPECT_EQ(ReadAll(path), "");
+}
+
+TEST(RealFiles, LinesOfTheAnsiPage) {
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("lines"));
+  const std::string longLine(1000, 'x');
+  WriteAll(path, "one\r\ntwo\n\n\xE9\x80\r\r\n" + longLine + "\nlast");
+  SSeekableInputANSIFile file(Path(path));
+  EXPECT_TRUE(file.SeekSupported());
+  SSeekableStringInputStream stream(file);
+  EXPECT_EQ(file.ReadLn(), SString(WTEXT("one")));
+  const unsigned long second = file.GetPos();
+  EXPECT_EQ(second, 5u);
+  EXPECT_EQ(stream.ReadLn(), SString(WTEXT("two")));
+  EXPECT_EQ(file.ReadLn(), SString());
+  EXPECT_FALSE(stream.IsEOF());
+  EXPECT_EQ(file.ReadLn(), SString(WTEXT("\x00E9\x20AC\r")));
+  EXPECT_EQ(file.ReadLn().Length(), 1000);
+  EXPECT_EQ(stream.ReadLn(), SString(WTEXT("last")));
+  EXPECT_TRUE(stream.IsEOF());
+  EXPECT_EQ(file.ReadLn(), SString());
+  EXPECT_FALSE(stream.SeekPos(second));
+  EXPECT_FALSE(file.IsEOF());
+  stream.Mark(1);
+  EXPECT_EQ(stream.Read(), 't');
+  EXPECT_EQ(file.ReadLn(), SString(WTEXT("wo")));
+  stream.Reset();
+  EXPECT_EQ(file.ReadLn(), SString(WTEXT("two")));
+  EXPECT_NE(file.GetFile(), nullptr);
+}
+
+class Indicator : public SProgressIndicatorEx {
+ public:
+  void SetRange(std::uint64_t, std::uint64_t upper) override { range = upper; }
+  void SetPos(std::uint64_t to) override {
+    EXPECT_GE(to, position);
+    position = to;
+    ++moves;
+  }
+  std::uint64_t GetPos() const override { return position; }
+  bool IsCancelled() override { return ++questions == cancelAt; }
+
+  std::uint64_t range = 1, position = 0;
+  int moves = 0, questions = 0, cancelAt = 0;
+};
+
+TEST(RealFiles, ProgressAndCancelling) {
+  TempFolder folder;
+  const std::string bytes = RandomBytes(100000);
+  const test::Text path = folder.File(WTEXT("data"));
+  WriteAll(path, bytes);
+  {
+    Indicator indicator;
+    SInputFile file(Path(path), &indicator);
+    EXPECT_EQ(indicator.range, 100000u);
+    EXPECT_EQ(indicator.position, 0u);
+    while (file.Read() >= 0) {
+    }
+    EXPECT_EQ(indicator.position, 100000u);
+    EXPECT_GE(indicator.questions, 100);
+    EXPECT_LE(indicator.questions, 102);
+  }
+  // A cancelled read loses nothing: going on delivers the whole file.
+  for (unsigned piece : {1u, 700u, 30000u}) {
+    Indicator indicator;
+    indicator.cancelAt = 3;
+    SInputFile file(Path(path), &indicator);
+    std::string all, block(piece, '\0');
+    int cancelled = 0;
+    for (unsigned long got = 1; got > 0;) {
+      try {
+        got = file.Read(block.data(), piece);
+        all.append(block, 0, got);
+      } catch (const SEIOAbortedException&) {
+        ++cancelled;
+      }
+    }
+    EXPECT_EQ(cancelled, 1);
+    EXPECT_EQ(all, bytes);
+  }
+  Indicator indicator;
+  SSeekableInputANSIFile file(Path(path), &indicator);
+  EXPECT_FALSE(file.SeekPos(50000));
+  EXPECT_EQ(file.Read(), static_cast<unsigned char>(bytes[50000]));
+  EXPECT_FALSE(file.SeekPos(10));
+  EXPECT_EQ(indicator.position, 50001u);  // never goes back
+  EXPECT_EQ(file.Read(), static_cast<unsigned char>(bytes[10]));
+  indicator.cancelAt = indicator.questions + 1;
+  EXPECT_THROW(file.SeekPos(99), SEIOAbortedException);
+  EXPECT_EQ(file.GetPos(), 11u);
+}
+
+TEST(RealFiles, AllocationFailures) {
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("data"));
+  WriteAll(path, std::string(3000, 'l') + "\nnext");
+  const SString name = Path(path);
+  const int failures = WithEachAllocationFailing(
+      [&] {
+        SSeekableInputANSIFile lines(name);
+        EXPECT_EQ(lines.ReadLn().Length(), 3000);
+        SInputFile source(name);
+        SInputBufferStream buffered(source, 10);
+        SInputPushbackStream pushback(buffered, 20);
+        buffered.Mark(2000);
+        pushback.Mark(0);
+        EXPECT_EQ(buffered.Skip(1500), 1500u);
+        pushback.Reset();
+        EXPECT_EQ(pushback.Skip(10000), 3005u);
+      },
+      [] {});
+  EXPECT_GE(failures, 10);
+}
+
+// Fails at the n-th write.
+class FailingOutput : public CollectingOutput {
+ public:
+  explicit FailingOutput(int failAt) : m_left(failAt) {}
+  unsigned long Write(const void* buffer, unsigned long count) override {
+    if (--m_left == 0) throw SEIOWriteFailed();
+    return CollectingOutput::Write(buffer, count);
+  }
+  using CollectingOutput::Write;
+
+ private:
+  int m_left;
+};
+
+TEST(OutputBufferStream, AFailedWriteCanBeTriedAgain) {
+  FailingOutput target(1);
+  SOutputBufferStream out(target, 4);
+  out.Write("abcd", 3);
+  EXPECT_THROW(out.Flush(), SEIOWriteFailed);
+  out.Flush();
+  EXPECT_EQ(target.bytes, "abc");
+  {
+    SOutputBufferStream lost(new FailingOutput(1), 4, true);
+    lost.Write('x');
+  }  // a destructor never throws
+}
+
+// A source that fails gives all ones.
+class BrokenInput : public SInputStream {
+ public:
+  int Read() override { return -1; }
+  unsigned long Read(void*, unsigned long) override { return ~0ul; }
+  int IsEOF() override { return 1; }
+};
+
+TEST(InputPushbackStream, AFailingSourceDoesNotSwallowWhatIsHeld) {
+  BrokenInput source;
+  SInputPushbackStream in(source, 4);
+  char block[8];
+  EXPECT_EQ(in.Read(block, 8), ~0ul);
+  in.Unread("ab", 2);
+  EXPECT_EQ(in.Read(block, 8), 2u);
+  SInputBufferStream buffered(source, 4);
+  EXPECT_EQ(buffered.Read(block, 8), 0u);
+  EXPECT_EQ(buffered.Read(), -1);
+}
+
+#ifndef _WIN32
+// A read that fails is no end of the data: /proc/self/mem cannot be read at its start.
+TEST(RealFilesOnLinux, ReadErrorsAreRemembered) {
+  SInputFile file(SString(WTEXT("C:\\proc\\self\\mem")));
+  char block[16];
+  EXPECT_EQ(file.Read(block, 16), 0u);
+  EXPECT_EQ(file.GetError(), EIO);
+  EXPECT_TRUE(file.IsEOF());
+  SInputBufferStream buffered(file);
+  EXPECT_EQ(buffered.GetError(), EIO);
+}
+
+// A file that is deleted while it is read stays readable; one that is cut ends where it was cut.
+TEST(RealFilesOnLinux, VanishingFiles) {
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("data"));
+  WriteAll(path, RandomBytes(50000));
+  SInputFile file{Path(path)};
+  EXPECT_EQ(file.Skip(100), 100u);
+  EXPECT_TRUE(DeleteFileW(path.c_str()));
+  EXPECT_EQ(file.Skip(100000), 49900u);
+  EXPECT_EQ(file.GetError(), 0);
+}
+
+TEST(RealFilesOnLinux, LargePositionsAreNotWrapped) {
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("sparse"));
+  const HANDLE sparse = CreateFileW(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_NEW, 0, nullptr);
+  LONG high = 1;
+  SetFilePointer(sparse, 5, &high, FILE_BEGIN);
+  SetEndOfFile(sparse);
+  CloseHandle(sparse);
+  SInputFile file{Path(path)};
+  EXPECT_EQ(file.Available(), 0x100000005ul);
+  EXPECT_FALSE(file.SeekPos(0x100000004));
+  EXPECT_EQ(file.Read(), 0);
+  EXPECT_EQ(file.Read(), -1);
+  EXPECT_EQ(file.GetPos(), 0x100000005u);
+}
+#endif
+
+}  // namespace
