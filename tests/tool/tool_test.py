@@ -66,11 +66,12 @@ class ToolTest(unittest.TestCase):
     # --- arguments ---
 
     def test_help_and_version_are_data(self):
-        for arguments in (["--help"], ["detect", "--help"], ["convert", "--help"], ["encodings", "--help"], ["--version"]):
+        for arguments in (["--help"], ["detect", "--help"], ["convert", "--help"], ["encodings", "--help"]):
             result = self.run_tool(*arguments)
             self.assert_done(result)
             self.assertTrue(result.stdout, arguments)
-        self.assertRegex(self.run_tool("--version").stdout.decode(), r"^qxtool \d+\.\d+\.\d+\n$")
+        for arguments in (["--version"], ["detect", "--version"], ["convert", "--version"], ["encodings", "--version"]):
+            self.assertRegex(self.run_tool(*arguments).stdout.decode(), r"^qxtool \d+\.\d+\.\d+\n$")
 
     def test_wrong_usage_is_told_in_one_line(self):
         self.write("a.txt", "a")

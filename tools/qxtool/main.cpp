@@ -17,6 +17,8 @@
 
 namespace {
 
+constexpr const char* kVersion = "qxtool " QXTOOL_VERSION;
+
 void AddDetect(CLI::App& app, DetectOptions& options) {
   CLI::App* command = app.add_subcommand("detect", "Find out how text files are encoded");
   command->add_option("--hint", options.hint, "The encoding that is expected")
@@ -67,7 +69,7 @@ int Run(std::vector<std::string> arguments) {
   CLI::App app("Detects and converts the encodings of text files.", "qxtool");
   // A path may begin with a slash.
   app.allow_windows_style_options(false);
-  app.set_version_flag("--version", "qxtool " QXTOOL_VERSION);
+  app.set_version_flag("--version", kVersion);
   app.require_subcommand(1);
   DetectOptions detect;
   ConvertOptions convert;
@@ -75,6 +77,7 @@ int Run(std::vector<std::string> arguments) {
   AddDetect(app, detect);
   AddConvert(app, convert);
   AddEncodings(app, encodings);
+  for (CLI::App* command : app.get_subcommands({})) command->set_version_flag("--version", kVersion);
 
   std::reverse(arguments.begin(), arguments.end());  // as the parser wants them
   try {
