@@ -71,7 +71,7 @@ TEST(StringBuffer, RandomAppends_AgreeWithPlainString) {
       }
       ASSERT_EQ(buffer.View(), SStringView(model));
     }
-    SString copy = buffer;
+    SString copy(buffer);
     EXPECT_LE(copy.GetAllocLength(), std::max(2 * copy.Length(), 512)) << "sized for the content";
     SString detached = buffer.Detach();
     EXPECT_EQ(detached, copy);
@@ -82,7 +82,7 @@ TEST(StringBuffer, RandomAppends_AgreeWithPlainString) {
 TEST(StringBuffer, FailedGrowth_KeepsTheContent) {
   SStringBuffer buffer(3000, 5, 3);
   buffer += SString(SStringView(WideString(2999, WTEXT('a'))));
-  SString before = buffer;
+  SString before(buffer);
   SMemFailAt(1, true);
   EXPECT_THROW(buffer.Concat(WideString(4000, WTEXT('b')).c_str(), 4000), SEOutOfMemory);
   SMemFailAt(0);
