@@ -64,7 +64,12 @@ WCHAR* WideFullPath(WCHAR* buffer, const WCHAR* path, std::size_t capacity) {
   return _wfullpath(buffer, path, capacity);
 }
 
-int FileSeek(std::FILE* file, std::int64_t offset, int origin) { return fseeko64(file, offset, origin); }
+// A successful seek clears the end-of-file flag, which not every msvcrt does by itself.
+int FileSeek(std::FILE* file, std::int64_t offset, int origin) {
+  const int result = fseeko64(file, offset, origin);
+  if (result == 0 && std::feof(file) != 0 && std::ferror(file) == 0) std::clearerr(file);
+  return result;
+}
 
 std::int64_t FileTell(std::FILE* file) { return ftello64(file); }
 

@@ -21,6 +21,8 @@ void SOutputFile::Init(const SString& path, int flags) {
   if (m_file == nullptr) throw SEIOCantOpenForWriting();
   constexpr std::size_t kRuntimeBuffer = 65536;
   std::setvbuf(m_file, nullptr, _IOFBF, kRuntimeBuffer);
+  // Some runtimes go to the end with the first write only; what cannot seek has no position anyway.
+  if ((flags & kAppend) != 0) platform::FileSeek(m_file, 0, SEEK_END);
 }
 
 void SOutputFile::ThrowFailure() const {
