@@ -54,7 +54,7 @@ class QXCORE_API SString {
   SString(SStringView text);
   SString(const char* text);             // converted with the ANSI code page
   SString(const char* text, int count);  // at most `count` bytes of it, stopping at a NUL
-  SString(const SStringBuffer& buffer);
+  explicit SString(const SStringBuffer& buffer);  // explicit, for the builder converts by itself, too
   explicit SString(int truth);     // SString::Yes when not 0, else SString::No; not a number's digits
   explicit SString(bool truth) : SString(static_cast<int>(truth)) {}
   explicit SString(long number);   // "%ld"; do not pass a LONG, which is an int on some targets

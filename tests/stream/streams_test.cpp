@@ -90,7 +90,7 @@ TEST_F(FileStreams, Input_ReadsWhatIsThereAndThenTheEnd) {
 TEST_F(FileStreams, Input_ThatCannotBeOpenedThrows) {
   EXPECT_THROW(SInputFile(folder.Path("missing")), SEIOCantOpenForReading);
   EXPECT_THROW(SInputFile(folder.Path("")), SEIOCantOpenForReading) << "a folder";
-  EXPECT_THROW(SInputFile(SString::null), SEIOCantOpenForReading);
+  EXPECT_THROW(SInputFile{SString::null}, SEIOCantOpenForReading);
   EXPECT_THROW(SOutputFile(folder.Path("no\\such\\folder")), SEIOCantOpenForWriting);
 }
 

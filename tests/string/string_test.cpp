@@ -84,7 +84,8 @@ TEST(StringSharing, Copies_ShareUntilOneWrites) {
   EXPECT_EQ(RefsOf(a), 2);
   SString moved = std::move(c);
   EXPECT_TRUE(Shares(moved, a) && c.IsEmpty());
-  a = a;
+  SString& itself = a;
+  a = itself;
   EXPECT_EQ(RefsOf(a), 2);
 }
 
