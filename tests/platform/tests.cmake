@@ -1,0 +1,5 @@
+# The C library's wide characters are not the library's: none of its wide functions may be called.
+if(NOT WIN32)
+  add_test(NAME platform.no_wide_runtime COMMAND sh -c
+    "! nm -D --undefined-only '$<TARGET_FILE:qxcore11e>' | grep -E ' (wcs|wmem|wprintf|v?[fs]wprintf|isw|tow[lu]|fputw|fgetw|putw|getw|btowc|wctob|mbs|mbr|wcr)|basic_stringIw'")
+endif()
