@@ -353,7 +353,7 @@ bool Reader::DecodeNextRun() {
 
 unsigned long Reader::DecodeInto(WCHAR* out, unsigned long room) {
   CheckFormat();
-  if (room < kLeastDirect || m_decoder.NeedsWholeInput() || m_raw.Size() > 0xFFFFFFF0) {
+  if (room < kLeastDirect || m_decoder.NeedsWholeInput()) {
     if (!DecodeNextRun()) return 0;
     unsigned long count = std::min(room, TextLength());
     std::memcpy(out, m_text.start, count * sizeof(WCHAR));
