@@ -5,6 +5,10 @@
 #include <algorithm>
 #include <cstdint>
 
+#if defined(__SSE2__)
+#include <emmintrin.h>
+#endif
+
 #include "platform/win32.h"
 
 namespace {
@@ -35,24 +39,58 @@ int TestSample(const Text& text) {
   return result;
 }
 
-int TestAscii16(const Text& text) {
-  bool little = text.chars > 0, big = little, content = false;
-  for (int i = 0; i < text.chars && (little || big); ++i) {
-    little = little && text.Little(i) < 0x80;
-    big = big && text.Big(i) < 0x80;
-    content = content || text.Little(i) != 0;
+// All units joined by "or", as they lie in memory; stops early once neither order can be ASCII.
+unsigned JoinedUnits(const Text& text) {
+  int i = 0;
+  unsigned joined = 0;
+#if defined(__SSE2__)
+  constexpr int kBlock = 1024;
+  for (; i + kBlock <= text.chars; i += kBlock) {
+    const auto* block = reinterpret_cast<const __m128i*>(text.bytes + 2 * i);
+    __m128i even = _mm_setzero_si128(), odd = even;
+    for (int k = 0; k < kBlock / 8; k += 2) {
+      even = _mm_or_si128(even, _mm_loadu_si128(block + k));
+      odd = _mm_or_si128(odd, _mm_loadu_si128(block + k + 1));
+    }
+    __m128i units = _mm_or_si128(even, odd);
+    units = _mm_or_si128(units, _mm_srli_si128(units, 8));
+    units = _mm_or_si128(units, _mm_srli_si128(units, 4));
+    const unsigned two = static_cast<unsigned>(_mm_cvtsi128_si32(units));
+    joined |= (two | two >> 16) & 0xFFFF;
+    if ((joined & 0xFF80) != 0 && (joined & 0x80FF) != 0) return joined;
   }
-  if (!content) return 0;
-  return (little ? IS_TEXT_UNICODE_ASCII16 : 0) | (big ? IS_TEXT_UNICODE_REVERSE_ASCII16 : 0);
+#endif
+  for (; i < text.chars; ++i) joined |= text.Little(i);
+  return joined;
 }
+
+int TestAscii16(const Text& text) {
+  const unsigned joined = JoinedUnits(text);
+  if (joined == 0) return 0;  // nothing but NULs is no text
+  return ((joined & 0xFF80) == 0 ? IS_TEXT_UNICODE_ASCII16 : 0) |
+         ((joined & 0x80FF) == 0 ? IS_TEXT_UNICODE_REVERSE_ASCII16 : 0);
+}
+
+bool IsIllegal(unsigned c) { return c == 0xFFFF || c == 0 || c == 0x0A0D || c == 0xFFFE; }
 
 // The published list: an inner reversed byte order mark, NUL, a carriage return and a line feed packed into
 // one character, and U+FFFF.
 bool HasIllegal(const Text& text) {
-  for (int i = 0; i < text.chars; ++i) {
-    const unsigned c = text.Little(i);
-    if (c == 0xFFFF || c == 0 || c == 0x0A0D || (c == 0xFFFE && i > 0)) return true;
+  if (text.chars == 0) return false;
+  if (IsIllegal(text.Little(0)) && text.Little(0) != 0xFFFE) return true;
+  int i = 1;
+#if defined(__SSE2__)
+  const __m128i crLf = _mm_set1_epi16(0x0A0D), zero = _mm_setzero_si128(), ones = _mm_set1_epi16(-1),
+                twos = _mm_set1_epi16(-2);
+  for (; i + 8 <= text.chars; i += 8) {
+    const __m128i units = _mm_loadu_si128(reinterpret_cast<const __m128i*>(text.bytes + 2 * i));
+    const __m128i found = _mm_or_si128(_mm_or_si128(_mm_cmpeq_epi16(units, crLf), _mm_cmpeq_epi16(units, zero)),
+                                       _mm_or_si128(_mm_cmpeq_epi16(units, ones), _mm_cmpeq_epi16(units, twos)));
+    if (_mm_movemask_epi8(found) != 0) return true;
   }
+#endif
+  for (; i < text.chars; ++i)
+    if (IsIllegal(text.Little(i))) return true;
   return false;
 }
 

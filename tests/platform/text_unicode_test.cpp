@@ -62,6 +62,17 @@ TEST(TextUnicode, DocumentedTestsThatWineLacks) {
   EXPECT_EQ(Verdict(longText, all), IS_TEXT_UNICODE_ASCII16);
   longText[19999] = 0x4E;
   EXPECT_EQ(Verdict(longText, all), 0);
+  for (std::size_t at = 2; at < 5000; at += 2) {  // wherever it stands
+    std::vector<unsigned char> han(5000, 0x4E);
+    EXPECT_EQ(Verdict(han, all), 0);
+    han[at] = 0x0D, han[at + 1] = 0x0A;
+    EXPECT_EQ(Verdict(han, all), IS_TEXT_UNICODE_ILLEGAL_CHARS);
+    std::vector<unsigned char> ascii(5000, 0);
+    for (std::size_t i = 1; i < 5000; i += 2) ascii[i] = 'x';
+    EXPECT_EQ(Verdict(ascii, all), IS_TEXT_UNICODE_REVERSE_ASCII16);
+    ascii[at] = 1;
+    EXPECT_EQ(Verdict(ascii, all), 0);
+  }
   EXPECT_EQ(Verdict({0x41, 0x4E, 0xFF, 0xFF}, all), IS_TEXT_UNICODE_ILLEGAL_CHARS);
   EXPECT_EQ(Verdict({0x41, 0x4E, 0xFE, 0xFF}, all), IS_TEXT_UNICODE_ILLEGAL_CHARS);
   EXPECT_EQ(Verdict({0x41, 0x4E, 0x0D, 0x0A}, all), IS_TEXT_UNICODE_ILLEGAL_CHARS);
