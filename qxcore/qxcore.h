@@ -39,6 +39,7 @@
 #include "qxcore/stream/multi_format_support.h"
 #include "qxcore/stream/output_buffer_stream.h"
 #include "qxcore/stream/output_file.h"
+#include "qxcore/stream/output_file_on_change.h"
 #include "qxcore/stream/output_global.h"
 #include "qxcore/stream/output_stream.h"
 #include "qxcore/stream/output_string_stream.h"
@@ -54,3 +55,4 @@
 #include "qxcore/string/string_iterators.h"
 #include "qxcore/string/text_conversion.h"
 #include "qxcore/string/text_search.h"
+#include "qxcore/system/file.h"

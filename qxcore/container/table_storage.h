@@ -14,7 +14,7 @@ constexpr int kFirstCapacity = 4;  // elements that a table has room for at firs
 
 // The capacity after the given one, which is full.
 inline int NextCapacity(int capacity) {
-  constexpr std::int64_t kMost = std::numeric_limits<std::int32_t>::max();
+  constexpr std::int64_t kMost = (std::numeric_limits<std::int32_t>::max)();
   if (capacity == kMost) throw SEOutOfMemory();
   std::int64_t next = std::int64_t{capacity} * 3 / 2 + 1;
   return static_cast<int>(next < kMost ? next : kMost);
@@ -22,7 +22,7 @@ inline int NextCapacity(int capacity) {
 
 // Bytes of n elements behind a header. Throws SEOutOfMemory for more than can be addressed.
 inline std::size_t BytesFor(int n, int elementSize, std::size_t header = 0) {
-  constexpr std::size_t kMost = std::numeric_limits<std::ptrdiff_t>::max();
+  constexpr std::size_t kMost = (std::numeric_limits<std::ptrdiff_t>::max)();
   std::size_t size = static_cast<std::size_t>(elementSize);
   if (n < 0 || (size != 0 && static_cast<std::size_t>(n) > (kMost - header) / size)) throw SEOutOfMemory();
   return header + static_cast<std::size_t>(n) * size;

@@ -30,6 +30,8 @@ class QXCORE_API SException {
   HRESULT m_code;          // the result code
 };
 
+static_assert(sizeof(void*) != 4 || sizeof(SException) == 12, "the layout is public");
+
 // A failure of the platform or of COM, told by its HRESULT.
 class QXCORE_API SECOMException : public SException {
  public:

@@ -39,6 +39,8 @@ class QXCORE_API SModuleState {
   HINSTANCE m_langResInstance = nullptr;  // a satellite with localised resources, if a client sets one
 };
 
+static_assert(sizeof(void*) != 4 || sizeof(SModuleState) == 16, "the layout is public");
+
 // The library's own state, initialised with the library's handle.
 QXCORE_API SModuleState* SCoreGetModuleState();
 

@@ -75,6 +75,7 @@ class QXCORE_API SObject {
 };
 
 static_assert(sizeof(SObject) == sizeof(void*), "the root has no fields");
+static_assert(sizeof(void*) != 4 || sizeof(SClassInfo) == 28, "the layout is public");
 
 // The object as the class T when it is one, else null; null stays null.
 template <class T>

@@ -17,10 +17,10 @@ class SCodePageTable {
   static const SCodePageTable* Get(unsigned int codePage);
 
   bool IsASCIICompatible() const { return m_isASCIICompatible; }    // bytes below 0x80 are themselves
-  bool IsLead(unsigned char byte) const { return m_isLead[byte]; }  // the first byte of two
+  bool IsLead(unsigned char unit) const { return m_isLead[unit]; }  // the first byte of two
   bool HasLeads() const { return m_hasLeads; }                      // a double-byte page
   // The character of a byte that is no lead byte, or kNone.
-  WCHAR Single(unsigned char byte) const { return m_single[byte]; }
+  WCHAR Single(unsigned char unit) const { return m_single[unit]; }
   const WCHAR* Singles() const { return m_single; }
   // The 256 characters behind a lead byte, kNone where there is none. Throws SEOutOfMemory.
   const WCHAR* Trails(unsigned char lead) const {

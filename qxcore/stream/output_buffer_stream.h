@@ -15,9 +15,9 @@ class QXCORE_API SOutputBufferStream : public SOutputFilterStream {
   // Writes what waits, without flushing or closing the inner stream; a failure is lost here.
   ~SOutputBufferStream() override;
 
-  void Write(int byte) override {
+  void Write(int value) override {
     if (m_count == m_capacity) FlushBuffer();
-    m_buffer[m_count++] = static_cast<unsigned char>(byte);
+    m_buffer[m_count++] = static_cast<unsigned char>(value);
   }
   // Blocks as large as the buffer go straight to the inner stream, whose result is given.
   unsigned long Write(const void* buffer, unsigned long count) override;

@@ -80,3 +80,5 @@ class QXCORE_API SStringBuffer {
   std::uint32_t m_numerator;
   std::uint32_t m_denominator;
 };
+
+static_assert(sizeof(void*) != 4 || sizeof(SStringBuffer) == 16, "the layout is public");
