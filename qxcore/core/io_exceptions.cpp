@@ -21,7 +21,7 @@ const WCHAR* SEIOException::GetExceptionName() const { return WTEXT("SEIOExcepti
 SEEncodingException::SEEncodingException() : SEEncodingException(Code(0x80990056), 199) {}
 const WCHAR* SEEncodingException::GetExceptionName() const { return WTEXT("SEEncodingException"); }
 
-#define QXCORE_EXCEPTION(Name, Base, code, stringId)           \
+#define QXCORE_EXCEPTION(Name, Base, code, stringId)                      \
   Name::Name() : Base(Code(code), static_cast<unsigned int>(stringId)) {} \
   const WCHAR* Name::GetExceptionName() const { return WTEXT(#Name); }
 

@@ -13,7 +13,8 @@ constinit std::atomic<bool> g_failForever{false};
 constinit std::atomic<bool> g_hasFailed{false};
 
 bool MustFail() noexcept {
-  if (g_countdown.load(std::memory_order_relaxed) == 0) [[likely]] return false;
+  if (g_countdown.load(std::memory_order_relaxed) == 0) [[likely]]
+    return false;
   if (g_countdown.fetch_sub(1) > 1) return false;
   g_countdown = g_failForever ? 1 : 0;
   g_hasFailed = true;

@@ -58,7 +58,9 @@ void* SObject::operator new(std::size_t size) { return SMemAlloc(size); }
 void SObject::operator delete(void* block) noexcept { SMemFree(block); }
 
 // Takes the pointer by value, so that no compiler concludes from `this` that it cannot be null.
-static const SClassInfo* InfoOrNull(const SObject* object) { return object != nullptr ? object->GetClassInfoW() : nullptr; }
+static const SClassInfo* InfoOrNull(const SObject* object) {
+  return object != nullptr ? object->GetClassInfoW() : nullptr;
+}
 
 int SObject::IsA(const SClassInfo* info) const {
   const SClassInfo* own = InfoOrNull(this);

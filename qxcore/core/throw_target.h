@@ -69,4 +69,5 @@ class QXCORE_API SThrowTarget {
   std::int32_t m_active = 0;
 };
 
-static_assert(sizeof(void*) != 4 || (sizeof(STargetedException) == 16 && sizeof(SThrowTarget) == 8), "the layout is public");
+static_assert(sizeof(void*) != 4 || (sizeof(STargetedException) == 16 && sizeof(SThrowTarget) == 8),
+              "the layout is public");

@@ -20,7 +20,8 @@ SFileProgressHelper::SFileProgressHelper(const SString& path, SProgressIndicator
     : m_file(platform::WideFileOpen(path, WTEXT("rb"))), m_progress(progress) {
   if (m_file == nullptr) throw SEIOCantOpenForReading();
   std::setvbuf(m_file, nullptr, _IOFBF, kRuntimeBuffer);
-  if (platform::FileSeek(m_file, 0, SEEK_END) == 0) m_size = static_cast<std::uint64_t>(std::max<std::int64_t>(platform::FileTell(m_file), 0));
+  if (platform::FileSeek(m_file, 0, SEEK_END) == 0)
+    m_size = static_cast<std::uint64_t>(std::max<std::int64_t>(platform::FileTell(m_file), 0));
   if (m_size == 0) {
     LookAhead();
   } else {
@@ -113,7 +114,8 @@ bool SFileProgressHelper::SeekPos(unsigned long position) {
   bool failed;
   if (m_progress != nullptr) {
     std::int64_t current = platform::FileTell(m_file);
-    if (m_progress->GetPos() < static_cast<std::uint64_t>(current)) m_progress->SetPos(static_cast<std::uint64_t>(current));
+    if (m_progress->GetPos() < static_cast<std::uint64_t>(current))
+      m_progress->SetPos(static_cast<std::uint64_t>(current));
     if (m_progress->IsCancelled()) throw SEIOAbortedException();
     failed = platform::FileSeek(m_file, static_cast<std::int64_t>(position) - current, SEEK_CUR) != 0;
   } else {

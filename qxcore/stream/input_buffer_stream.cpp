@@ -95,7 +95,7 @@ unsigned long SInputBufferStream::Skip(unsigned long count) {
 unsigned long SInputBufferStream::Available() {
   const unsigned long buffered = m_count - m_position, behind = m_in->Available();
   return behind <= std::numeric_limits<unsigned long>::max() - buffered ? buffered + behind
-                                                                       : std::numeric_limits<unsigned long>::max();
+                                                                        : std::numeric_limits<unsigned long>::max();
 }
 
 int SInputBufferStream::IsEOF() { return m_position == m_count && m_in->IsEOF(); }

@@ -15,7 +15,8 @@ class QXCORE_API SInputBufferStream : public SInputStream {
   ~SInputBufferStream() override;
 
   int Read() override {
-    if (m_position < m_count) [[likely]] return m_buffer[m_position++];
+    if (m_position < m_count) [[likely]]
+      return m_buffer[m_position++];
     return ReadRefilled();
   }
   // Blocks as large as the buffer go straight to the caller while no mark is set.

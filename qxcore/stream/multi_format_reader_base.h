@@ -67,8 +67,8 @@ class QXCORE_API SMultiFormatReaderBase : public SInputStream, public SMultiForm
     m_hasDelivered = true;
   }
 
-  SInputStream* m_in;  // where the bytes come from
-  bool m_owns;         // deletes m_in at the end
+  SInputStream* m_in;             // where the bytes come from
+  bool m_owns;                    // deletes m_in at the end
   unsigned long m_delivered = 0;  // characters
 
  private:

@@ -160,9 +160,9 @@ BOOL CALLBACK MatchInstalledPage(LPWSTR pageDigits) {
   SStringView description(info.CodePageName);
   std::size_t open = description.find(WTEXT('('));
   std::size_t close = description.rfind(WTEXT(')'));
-  SStringView names[] = {pageDigits, description,
-                         open < close && close != SStringView::npos ? description.substr(open + 1, close - open - 1)
-                                                                    : SStringView()};
+  SStringView names[] = {
+      pageDigits, description,
+      open < close && close != SStringView::npos ? description.substr(open + 1, close - open - 1) : SStringView()};
   for (SStringView name : names) {
     bool fits = !name.empty() && name.size() > t_installed.length && StartsNoCase(t_wanted, name);
     if (fits) t_installed = {ValueOfPage(page), name.size()};
@@ -234,7 +234,8 @@ Encoding Support::MatchEncodingName(const SString& name, int installed, int* mat
       Match flags = MatchSuffixes(text.substr(match.length));
       encoding = match.value | flags.value;
       std::size_t length = match.length + flags.length;
-      understood = length == text.size() ? name.Length() : static_cast<int>(text.data() - name.GetSafePointer() + length);
+      understood =
+          length == text.size() ? name.Length() : static_cast<int>(text.data() - name.GetSafePointer() + length);
     }
   }
   if (matched != nullptr) *matched = understood;

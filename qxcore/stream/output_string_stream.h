@@ -34,7 +34,9 @@ class QXCORE_API SOutputStringStream : public SOutputStream {
   unsigned long Write(const void* buffer, unsigned long count) override;
   // `count` characters; gives their number.
   unsigned long Write(const WCHAR* text, unsigned int count);
-  unsigned long Write(const SString& text) { return Write(text.GetSafePointer(), static_cast<unsigned>(text.Length())); }
+  unsigned long Write(const SString& text) {
+    return Write(text.GetSafePointer(), static_cast<unsigned>(text.Length()));
+  }
   // The same and a line end, carriage return and line feed on every target.
   unsigned long WriteLn(const WCHAR* text, unsigned int count);
   void WriteLn();

@@ -61,7 +61,8 @@ SSingleByteRun SDecodeSingleByte(const WCHAR* table, WCHAR none, bool keepsASCII
     const unsigned char* stretch = in + std::min(end - in, kStretch);
     for (; in != stretch; ++in, ++out) {
       const WCHAR character = table[*in];
-      if (character == none) [[unlikely]] return {in, out};
+      if (character == none) [[unlikely]]
+        return {in, out};
       *out = character;
     }
   }

@@ -76,15 +76,13 @@ void STextDecoder::Select(Encoding encoding, bool quick) {
       m_kernel = Kernel::kASCII;
       break;
     case Support::kUnicode:
-      m_kernel = (encoding & Support::kUtf8Form) != 0     ? (quick ? Kernel::kQuickUTF8 : Kernel::kUTF8)
+      m_kernel = (encoding & Support::kUtf8Form) != 0    ? (quick ? Kernel::kQuickUTF8 : Kernel::kUTF8)
                  : (encoding & Support::kBigEndian) != 0 ? Kernel::kBigEndian
                                                          : Kernel::kLittleEndian;
       break;
     default:
       m_table = SCodePageTable::Get(Support::CodePageOf(encoding));
-      m_kernel = m_table == nullptr       ? Kernel::kWhole
-                 : m_table->HasLeads() ? Kernel::kDoubleByte
-                                          : Kernel::kSingleByte;
+      m_kernel = m_table == nullptr ? Kernel::kWhole : m_table->HasLeads() ? Kernel::kDoubleByte : Kernel::kSingleByte;
   }
 }
 

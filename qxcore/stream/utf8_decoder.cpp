@@ -57,13 +57,13 @@ SUtf8Obstacle SLookAtUtf8(const unsigned char* in, const unsigned char* end) {
     unsigned char secondFrom, secondTo;
   };
   const unsigned char lead = *in;
-  const Form form = lead >= 0xC2 && lead < 0xE0   ? Form{2, 0x80, 0xBF}
-                    : lead == 0xE0                ? Form{3, 0xA0, 0xBF}
-                    : lead > 0xE0 && lead < 0xF0  ? Form{3, 0x80, 0xBF}
-                    : lead == 0xF0                ? Form{4, 0x90, 0xBF}
-                    : lead > 0xF0 && lead < 0xF4  ? Form{4, 0x80, 0xBF}
-                    : lead == 0xF4                ? Form{4, 0x80, 0x8F}
-                                                  : Form{1, 0, 0};
+  const Form form = lead >= 0xC2 && lead < 0xE0  ? Form{2, 0x80, 0xBF}
+                    : lead == 0xE0               ? Form{3, 0xA0, 0xBF}
+                    : lead > 0xE0 && lead < 0xF0 ? Form{3, 0x80, 0xBF}
+                    : lead == 0xF0               ? Form{4, 0x90, 0xBF}
+                    : lead > 0xF0 && lead < 0xF4 ? Form{4, 0x80, 0xBF}
+                    : lead == 0xF4               ? Form{4, 0x80, 0x8F}
+                                                 : Form{1, 0, 0};
   if (form.length == 1) return {1, true, false};
   std::ptrdiff_t length = 1;
   for (; length < form.length; ++length) {

@@ -12,8 +12,8 @@
 #include <cstdint>
 
 bool SCanDecodeUtf8Avx512() {
-  return __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512bw") && __builtin_cpu_supports("avx512vl") &&
-         __builtin_cpu_supports("avx512vbmi2");
+  return __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512bw") &&
+         __builtin_cpu_supports("avx512vl") && __builtin_cpu_supports("avx512vbmi2");
 }
 
 #define QXCORE_TARGET __attribute__((target("avx512f,avx512bw,avx512vl,avx512vbmi2,bmi2,popcnt")))
@@ -50,7 +50,8 @@ QXCORE_TARGET inline Layout Check(const unsigned char* in, __m512i bytes, std::u
   layout.expects = leads >> 63 | fromE0 >> 62;
   layout.isGood = ((expected ^ layout.continuation) | fromF0 | overlong) == 0;
   if (layout.expects != 0) {  // the characters that reach beyond the block are decoded with it
-    layout.isGood = layout.isGood && IsContinuation(in[kBlock]) && ((layout.expects & 2) == 0 || IsContinuation(in[kBlock + 1])) &&
+    layout.isGood = layout.isGood && IsContinuation(in[kBlock]) &&
+                    ((layout.expects & 2) == 0 || IsContinuation(in[kBlock + 1])) &&
                     !(in[kBlock - 1] == 0xE0 && in[kBlock] < 0xA0);
   }
   return layout;

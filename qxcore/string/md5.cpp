@@ -21,14 +21,14 @@ std::uint32_t Word(const unsigned char* block, int i) {
 #define QXCORE_F(b, c, d) ((d) ^ ((b) & ((c) ^ (d))))
 #define QXCORE_H(b, c, d) ((b) ^ (c) ^ (d))
 #define QXCORE_I(b, c, d) ((c) ^ ((b) | ~(d)))
-#define QXCORE_STEP(f, a, b, c, d, i, shift, constant)    \
+#define QXCORE_STEP(f, a, b, c, d, i, shift, constant)        \
   a += Word(block, i) + static_cast<std::uint32_t>(constant); \
-  a += f(b, c, d);                                        \
+  a += f(b, c, d);                                            \
   a = std::rotl(a, shift) + b;
-#define QXCORE_STEP_G(a, b, c, d, i, shift, constant)     \
+#define QXCORE_STEP_G(a, b, c, d, i, shift, constant)         \
   a += Word(block, i) + static_cast<std::uint32_t>(constant); \
-  a += ~(d) & (c);                                        \
-  a += (d) & (b);                                         \
+  a += ~(d) & (c);                                            \
+  a += (d) & (b);                                             \
   a = std::rotl(a, shift) + b;
 #define QXCORE_ROUND(f, i0, i1, i2, i3, s0, s1, s2, s3, k0, k1, k2, k3) \
   QXCORE_STEP(f, a, b, c, d, i0, s0, k0)                                \

@@ -52,13 +52,13 @@ class QXCORE_API SString {
   SString(SString&& other) noexcept : m_text(other.m_text) { other.m_text = EmptyText(); }
   SString(const WCHAR* text);
   SString(SStringView text);
-  SString(const char* text);             // converted with the ANSI code page
-  SString(const char* text, int count);  // at most `count` bytes of it, stopping at a NUL
+  SString(const char* text);                      // converted with the ANSI code page
+  SString(const char* text, int count);           // at most `count` bytes of it, stopping at a NUL
   explicit SString(const SStringBuffer& buffer);  // explicit, for the builder converts by itself, too
-  explicit SString(int truth);     // SString::Yes when not 0, else SString::No; not a number's digits
+  explicit SString(int truth);                    // SString::Yes when not 0, else SString::No; not a number's digits
   explicit SString(bool truth) : SString(static_cast<int>(truth)) {}
-  explicit SString(long number);   // "%ld"; do not pass a LONG, which is an int on some targets
-  explicit SString(double number);  // "%g"
+  explicit SString(long number);                 // "%ld"; do not pass a LONG, which is an int on some targets
+  explicit SString(double number);               // "%g"
   SString(HINSTANCE instance, unsigned int id);  // LoadString(id, instance)
 
   // One character or another integer would silently become "Yes"; assign characters, cast integers.
@@ -131,7 +131,7 @@ class QXCORE_API SString {
   SStringView View() const { return SStringView(m_text, static_cast<std::size_t>(Length())); }
   const WCHAR* begin() const { return m_text; }
   const WCHAR* end() const { return m_text + Length(); }
-  void Done() { Release(); }     // gives the buffer up; the string becomes empty
+  void Done() { Release(); }  // gives the buffer up; the string becomes empty
   void Release() {
     ReleaseData();
     m_text = EmptyText();
@@ -319,8 +319,8 @@ class QXCORE_API SString {
   WCHAR* GetBufferSetTcharLength(int n);
 
   // --- the steps that writing is made of ---
-  void CopyBeforeWrite();         // makes the buffer this string's own
-  void AllocBeforeWrite(int n);   // an own buffer for n characters; the old text is not kept
+  void CopyBeforeWrite();        // makes the buffer this string's own
+  void AllocBeforeWrite(int n);  // an own buffer for n characters; the old text is not kept
   void AssignCopy(int n, const WCHAR* text);
   void ConcatInPlace(int n, const WCHAR* text) {
     SStringData* data = Data();
@@ -343,8 +343,7 @@ class QXCORE_API SString {
   struct Adopt {};  // takes over a buffer whose count is already right
   SString(Adopt, WCHAR* text) noexcept : m_text(text) {}
   template <int kLength>
-  constexpr explicit SString(const SStaticString<kLength>& text) noexcept
-      : m_text(const_cast<WCHAR*>(text.m_text)) {}
+  constexpr explicit SString(const SStaticString<kLength>& text) noexcept : m_text(const_cast<WCHAR*>(text.m_text)) {}
 
   static WCHAR* EmptyText() { return const_cast<WCHAR*>(g_emptyString.m_text); }
   static SStringView ViewOf(const WCHAR* text) { return text != nullptr ? SStringView(text) : SStringView(); }

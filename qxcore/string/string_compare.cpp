@@ -75,12 +75,12 @@ int SString::CompareBy(int start, const WCHAR* text, Order order) const {
   return order(m_text + start, text);
 }
 
-#define QXCORE_FOUR_FORMS(Member, Order)                                                                           \
-  int SString::Member(const WCHAR* text) const { return CompareBy(0, text, Order{}); }                             \
+#define QXCORE_FOUR_FORMS(Member, Order)                                                                            \
+  int SString::Member(const WCHAR* text) const { return CompareBy(0, text, Order{}); }                              \
   int SString::Member(const WCHAR* text, int count) const { return CompareBy(0, text, Order{std::max(count, 0)}); } \
-  int SString::Member(int start, const WCHAR* text) const { return CompareBy(start, text, Order{}); }              \
-  int SString::Member(int start, const WCHAR* text, int count) const {                                             \
-    return CompareBy(start, text, Order{std::max(count, 0)});                                                      \
+  int SString::Member(int start, const WCHAR* text) const { return CompareBy(start, text, Order{}); }               \
+  int SString::Member(int start, const WCHAR* text, int count) const {                                              \
+    return CompareBy(start, text, Order{std::max(count, 0)});                                                       \
   }
 
 QXCORE_FOUR_FORMS(Compare, ByCodeUnit)

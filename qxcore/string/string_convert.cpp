@@ -56,11 +56,11 @@ int SString::CanConvertToMBCS() const {
 
 // --- classification ---
 
-#define QXCORE_CLASSIFY(Member, condition)          \
-  int SString::Member(int index) const {            \
-    if (index < 0 || index >= Length()) return 0;   \
-    WCHAR c = m_text[index];                        \
-    return (condition) ? 1 : 0;                     \
+#define QXCORE_CLASSIFY(Member, condition)        \
+  int SString::Member(int index) const {          \
+    if (index < 0 || index >= Length()) return 0; \
+    WCHAR c = m_text[index];                      \
+    return (condition) ? 1 : 0;                   \
   }
 
 QXCORE_CLASSIFY(IsASCII, c < 0x80)

@@ -21,10 +21,10 @@ struct PoolSetup {
   const WCHAR* name;  // the leading blank sorts the pools before other counters
   unsigned elementsPerBlock;
 };
-constexpr PoolSetup kSetups[kPools] = {
-    {WTEXT(" Allocator Str16"), 128},  {WTEXT(" Allocator Str32"), 128}, {WTEXT(" Allocator Str64"), 64},
-    {WTEXT(" Allocator Str128"), 64},  {WTEXT(" Allocator Str256"), 64}, {WTEXT(" Allocator Str512"), 32},
-    {WTEXT(" Allocator Str1024"), 16}, {WTEXT(" Allocator Str2048"), 4}};
+constexpr PoolSetup kSetups[kPools] = {{WTEXT(" Allocator Str16"), 128},  {WTEXT(" Allocator Str32"), 128},
+                                       {WTEXT(" Allocator Str64"), 64},   {WTEXT(" Allocator Str128"), 64},
+                                       {WTEXT(" Allocator Str256"), 64},  {WTEXT(" Allocator Str512"), 32},
+                                       {WTEXT(" Allocator Str1024"), 16}, {WTEXT(" Allocator Str2048"), 4}};
 
 // The pools live in raw storage and are never destroyed: strings of other modules' static objects may
 // outlive everything here.
@@ -55,7 +55,8 @@ void MakePools() {
 [[maybe_unused]] const bool g_poolsMade = (MakePools(), true);
 
 SFixedAlloc& Pool(int index) {
-  if (g_pools[index] == nullptr) [[unlikely]] MakePools();
+  if (g_pools[index] == nullptr) [[unlikely]]
+    MakePools();
   return *g_pools[index];
 }
 

@@ -181,8 +181,8 @@ int SString::ReplaceAll(WCHAR oldCharacter, WCHAR newCharacter) {
 // Writes the source with its matches replaced; `firstAt` is the first of them. With texts of one length
 // the source may be where it is written: what is searched lies behind what was written.
 template <class Finder>
-static void ReplaceOnto(SStringView source, std::size_t firstAt, SStringView wanted, SStringView replacement, WCHAR* out,
-                        Finder find) {
+static void ReplaceOnto(SStringView source, std::size_t firstAt, SStringView wanted, SStringView replacement,
+                        WCHAR* out, Finder find) {
   const WCHAR* from = source.data();
   const WCHAR* end = from + source.size();
   for (const WCHAR* at = from + firstAt; at != nullptr;) {
@@ -220,7 +220,9 @@ int SString::ReplaceEvery(const WCHAR* oldText, const WCHAR* newText, Finder fin
   return count;
 }
 
-int SString::ReplaceAll(const WCHAR* oldText, const WCHAR* newText) { return ReplaceEvery(oldText, newText, SFindText); }
+int SString::ReplaceAll(const WCHAR* oldText, const WCHAR* newText) {
+  return ReplaceEvery(oldText, newText, SFindText);
+}
 
 int SString::ReplaceAllNoCase(const WCHAR* oldText, const WCHAR* newText) {
   return ReplaceEvery(oldText, newText, SFindTextNoCase);

@@ -55,7 +55,8 @@ int Swcstombsz(char* dst, const WCHAR* src, unsigned int n) {
     written = WideCharToMultiByte(CP_UTF8, 0, src, -1, dst, size, nullptr, nullptr);
   } else {
     BOOL usedDefault = FALSE;
-    written = WideCharToMultiByte(CP_ACP, WC_COMPOSITECHECK | WC_DEFAULTCHAR, src, -1, dst, size, nullptr, &usedDefault);
+    written =
+        WideCharToMultiByte(CP_ACP, WC_COMPOSITECHECK | WC_DEFAULTCHAR, src, -1, dst, size, nullptr, &usedDefault);
     g_bSwcstombszHadLoss = usedDefault;
   }
   if (written == 0 && dst != nullptr) *dst = 0;

@@ -32,10 +32,13 @@ TEST(Exceptions, EachHasItsCodeTextAndName) {
   Expect<SEIOCantOpenForWriting>(0x80990051, WTEXT("Cannot open for writing"), WTEXT("SEIOCantOpenForWriting"));
   Expect<SEIOResetInvalid>(0x80990055, WTEXT("Resetting to invalid mark"), WTEXT("SEIOResetInvalid"));
   Expect<SEEncodingException>(0x80990056, WTEXT("Unexpected UTF encoding!"), WTEXT("SEEncodingException"));
-  Expect<SEIONoUnicodeBOM>(0x80990057, WTEXT("There is no known Unicode BOM (Byte Order Mark) in input"), WTEXT("SEIONoUnicodeBOM"));
+  Expect<SEIONoUnicodeBOM>(0x80990057, WTEXT("There is no known Unicode BOM (Byte Order Mark) in input"),
+                           WTEXT("SEIONoUnicodeBOM"));
   Expect<SEIONonASCII>(0x8099005B, WTEXT("Illegal non ASCII character"), WTEXT("SEIONonASCII"));
   Expect<SEIOCantMap_UTF16_UTF8>(
-      0x80990066, WTEXT("Some characters could not be mapped through UTF-16 --> UTF8 conversion (would cause a loss of information)"),
+      0x80990066,
+      WTEXT(
+          "Some characters could not be mapped through UTF-16 --> UTF8 conversion (would cause a loss of information)"),
       WTEXT("SEIOCantMap_UTF16_UTF8"));
   EXPECT_THROW(throw SEEOFException(), SEIOException);
   EXPECT_THROW(throw SEIOMismatchedBOM(), SEEncodingException);

@@ -65,7 +65,9 @@ TEST(ClassInfo, Creation_NeedsAFactory) {
 }
 
 TEST(ClassInfo, List_LosesRecordsThatEnd) {
-  auto make = [](const char* name) { return std::make_unique<SClassInfo>(name, 0, 4, &SObject::classSObject, nullptr); };
+  auto make = [](const char* name) {
+    return std::make_unique<SClassInfo>(name, 0, 4, &SObject::classSObject, nullptr);
+  };
   auto a = make("A");
   auto b = make("B");
   auto c = make("C");

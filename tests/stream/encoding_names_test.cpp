@@ -31,7 +31,8 @@ TEST(EncodingNames, EveryRow_NamesItsValueInAnyCase) {
     int matched = 0;
     EXPECT_EQ(Support::MatchEncodingName(name, 0, &matched), row.value) << testing::PrintToString(name);
     EXPECT_EQ(matched, name.Length());
-    EXPECT_EQ(Support::MatchEncodingName(WTEXT(" \t") + upper + WTEXT("\r\n")), row.value) << testing::PrintToString(name);
+    EXPECT_EQ(Support::MatchEncodingName(WTEXT(" \t") + upper + WTEXT("\r\n")), row.value)
+        << testing::PrintToString(name);
     name.ToLower();
     EXPECT_TRUE(seen.insert(name.GetSafePointer()).second) << "twice: " << testing::PrintToString(name);
     unsigned page = row.value & 0xFFFF;
@@ -104,7 +105,8 @@ TEST(EncodingNames, Listing_IsSortedAndKeepsToWhatIsInstalled) {
   EXPECT_LT(Support::ListAvailableEncodings(installed, 1, 0), count);
   ASSERT_NE(installed.Retrieve(SString(WTEXT("utf-8"))), nullptr);
   EXPECT_EQ(installed.Retrieve(SString(WTEXT("UTF8"))), nullptr) << "an alias";
-  for (const auto& [name, value] : installed) EXPECT_TRUE(Support::MachineSupports(value)) << testing::PrintToString(name);
+  for (const auto& [name, value] : installed)
+    EXPECT_TRUE(Support::MachineSupports(value)) << testing::PrintToString(name);
 }
 
 }  // namespace

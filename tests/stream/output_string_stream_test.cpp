@@ -30,9 +30,9 @@ TEST(TextOutput, EveryFormat_ReadsBackWhatWasWritten) {
   const struct {
     Encoding format;
     SString text;
-  } kCases[] = {{Support::kASCII, ascii}, {Support::kANSI, latin},   {0x20000 | 932, kana}, {Support::kOEM, ascii},
-                {Support::kUTF8, any},    {0x4000C, any},            {0x4001C, any},        {Support::kUTF16LE, any},
-                {0x4001A, any},           {Support::kUTF16BE, any},  {0x40019, any}};
+  } kCases[] = {{Support::kASCII, ascii}, {Support::kANSI, latin},  {0x20000 | 932, kana}, {Support::kOEM, ascii},
+                {Support::kUTF8, any},    {0x4000C, any},           {0x4001C, any},        {Support::kUTF16LE, any},
+                {0x4001A, any},           {Support::kUTF16BE, any}, {0x40019, any}};
   for (const auto& one : kCases) {
     SString longText;
     for (int i = 0; i < 500; ++i) longText += one.text;
@@ -52,7 +52,9 @@ TEST(TextOutput, MarksStandAtTheBeginningOnly) {
   stream.SetFormat(0x40019);
   stream.Write('b');
   stream.Close();
-  EXPECT_EQ(out.bytes, std::string("\xEF\xBB\xBF" "a\r\n\0b", 8));
+  EXPECT_EQ(out.bytes, std::string("\xEF\xBB\xBF"
+                                   "a\r\n\0b",
+                                   8));
   EXPECT_THROW(stream.SetFormat(0x20000 | 9999), SEIOInvalidEncoding);
 }
 
@@ -69,12 +71,15 @@ TEST(TextOutput, Losses_AreToldOrThrown) {
   CollectingOutput out;
   SOutputStringStream stream(out, Support::kANSI);
   stream.Write(SString(WTEXT("a\u4E2Db")));
-  EXPECT_EQ(stream.GetEncodingWarning(),
-            WTEXT("Some characters were replaced by '?' during write because they could not be mapped from character set used ")
-            WTEXT("by the application \"Unicode\" to write encoding format \"ANSI (Active Code Page)\"."));
+  EXPECT_EQ(
+      stream.GetEncodingWarning(),
+      WTEXT(
+          "Some characters were replaced by '?' during write because they could not be mapped from character set used ")
+          WTEXT("by the application \"Unicode\" to write encoding format \"ANSI (Active Code Page)\"."));
   EXPECT_EQ(out.bytes, "a?b");
   EXPECT_EQ(Written(WTEXT("a\u4E2Db"), Support::kANSI, 0), "ab");
-  EXPECT_EQ(Written(WTEXT("a\u4E2Db"), Support::kASCII, WTEXT('\u00E9')), "a?b") << "a replacement that cannot be mapped either";
+  EXPECT_EQ(Written(WTEXT("a\u4E2Db"), Support::kASCII, WTEXT('\u00E9')), "a?b")
+      << "a replacement that cannot be mapped either";
   SOutputStringStream lossless(out, Support::kOEM | Support::kLossless);
   EXPECT_THROW(lossless.Write(SString(WTEXT("x\u4E2D"))), SEIOCantMap_UTF16_MBCS);
   EXPECT_EQ(out.bytes, "a?bx");

@@ -32,7 +32,8 @@ TEST(Selection, MarksAndDeclarations_Decide) {
   EXPECT_EQ(ReadBytes("\xFF\xFE" + Utf16Bytes(WTEXT("text")), kAnsi | kFull).selected, 0xE4000Au);
   EXPECT_EQ(ReadBytes("\xFE\xFF" + Utf16Bytes(WTEXT("text"), true), kAnsi | kFull).text, WTEXT("text"));
   EXPECT_EQ(ReadBytes("<?xml version='1.0'?>", kAnsi | kFull).selected, 0x2E10000u);
-  EXPECT_EQ(ReadBytes("<?xml version='1.0'?>\xC3\xA9", kAnsi | kFull | Support::kFavorGuess).selected, 0x6E40004u) << "the guess keeps the XML flag";
+  EXPECT_EQ(ReadBytes("<?xml version='1.0'?>\xC3\xA9", kAnsi | kFull | Support::kFavorGuess).selected, 0x6E40004u)
+      << "the guess keeps the XML flag";
   EXPECT_EQ(ReadBytes("\xEF\xBB\xBF<?xml version='1.0'?>", kAnsi | kFull).selected, 0x2E4000Cu);
   EXPECT_EQ(ReadBytes(Utf16Bytes(WTEXT("<?xml version='1.0'?>")), kAnsi | kFull).selected, 0x2E40002u);
   EXPECT_EQ(ReadBytes(Utf16Bytes(WTEXT("<?xml version='1.0'?>"), true), kAnsi | kFull).selected, 0x2E40001u);
@@ -56,8 +57,16 @@ TEST(Selection, LevelsWithoutMeaning_DetectNothing) {
 
 TEST(Selection, RequiredMark_MustBeThereAndFit) {
   EXPECT_EQ(ReadBytes("abc", 0x4001C).failure, std::to_string(0x80990057u) + "SEIONoUnicodeBOM");
-  EXPECT_EQ(ReadBytes("\xFE\xFF" "ab", 0x4001A).failure, std::to_string(0x80990058u) + "SEIOMismatchedBOM");
-  EXPECT_EQ(ReadBytes("\xFF\xFE" "a\0"s, 0x4001A).text, WTEXT("a"));
+  EXPECT_EQ(ReadBytes("\xFE\xFF"
+                      "ab",
+                      0x4001A)
+                .failure,
+            std::to_string(0x80990058u) + "SEIOMismatchedBOM");
+  EXPECT_EQ(ReadBytes("\xFF\xFE"
+                      "a\0"s,
+                      0x4001A)
+                .text,
+            WTEXT("a"));
   EXPECT_EQ(ReadBytes("\xFE\xFF\0a"s, 0x4001A | kFull).selected, 0xE40009u) << "with detection the mark wins";
   // Nothing is lost by a failed check: another request reads everything.
   PiecewiseInput in("plain");
@@ -70,9 +79,22 @@ TEST(Selection, RequiredMark_MustBeThereAndFit) {
 }
 
 TEST(Selection, OptionalMark_IsDroppedAlsoWithoutDetection) {
-  EXPECT_EQ(ReadBytes("\xEF\xBB\xBF" "abc", 0x4000C).text, WTEXT("abc"));
-  EXPECT_EQ(ReadBytes("\xEF\xBB\xBF" "abc", Support::kUTF8).text, WTEXT("\uFEFFabc"));
-  EXPECT_EQ(ReadBytes("\xFE\xFF" "ab", 0x4000A).text.Length(), 2) << "a mark of another form is data";
+  EXPECT_EQ(ReadBytes("\xEF\xBB\xBF"
+                      "abc",
+                      0x4000C)
+                .text,
+            WTEXT("abc"));
+  EXPECT_EQ(ReadBytes("\xEF\xBB\xBF"
+                      "abc",
+                      Support::kUTF8)
+                .text,
+            WTEXT("\uFEFFabc"));
+  EXPECT_EQ(ReadBytes("\xFE\xFF"
+                      "ab",
+                      0x4000A)
+                .text.Length(),
+            2)
+      << "a mark of another form is data";
 }
 
 TEST(Selection, UnsupportedRequests_SayWhich) {
@@ -99,7 +121,8 @@ TEST(Selection, Evidence_DecidesBetweenCandidates) {
 }
 
 TEST(Selection, Utf16WithoutMark_IsFoundByThePlatformsTests) {
-  const std::string greek = Utf16Bytes(WTEXT("\u03BA\u03B1\u03BB\u03B7\u03BC\u03AD\u03C1\u03B1 \u03BA\u03CC\u03C3\u03BC\u03B5\r\n"));
+  const std::string greek =
+      Utf16Bytes(WTEXT("\u03BA\u03B1\u03BB\u03B7\u03BC\u03AD\u03C1\u03B1 \u03BA\u03CC\u03C3\u03BC\u03B5\r\n"));
   Encoding ascii = ReadBytes(Utf16Bytes(WTEXT("Hello, world of plain letters\r\n")), kAnsi | kFull).selected & 0xFFFFF;
   if (IsWine()) {
     EXPECT_EQ(ascii, Support::kASCII) << "Wine 8 never reports the ASCII16 tests";
@@ -115,12 +138,15 @@ TEST(Selection, Utf16WithoutMark_IsFoundByThePlatformsTests) {
 TEST(Reports, SayHowTheSelectionCameAbout) {
   const std::string latin = Repeat("\xE9t\xE9 ", 20);
   const std::string utf8 = Repeat("\xC3\xA9t\xC3\xA9 ", 20);
-  EXPECT_EQ(ReadBytes("plain", kAnsi | kFull).report,
-            WTEXT("Autodetection found that all data could be read with \"ASCII\" encoding even though \"ANSI (Active Code ")
-            WTEXT("Page)\" encoding was expected"));
-  EXPECT_EQ(ReadBytes(latin, Support::kUTF8 | kFull).report,
-            WTEXT("Autodetection found that most probable encoding was \"ANSI (Active Code Page)\" and selected it since the ")
-            WTEXT("expected \"UTF-8\" encoding was not acceptable"));
+  EXPECT_EQ(
+      ReadBytes("plain", kAnsi | kFull).report,
+      WTEXT("Autodetection found that all data could be read with \"ASCII\" encoding even though \"ANSI (Active Code ")
+          WTEXT("Page)\" encoding was expected"));
+  EXPECT_EQ(
+      ReadBytes(latin, Support::kUTF8 | kFull).report,
+      WTEXT(
+          "Autodetection found that most probable encoding was \"ANSI (Active Code Page)\" and selected it since the ")
+          WTEXT("expected \"UTF-8\" encoding was not acceptable"));
   SString favored = ReadBytes(utf8, kAnsi | kFull).detection;
   EXPECT_EQ(favored.Left(58), WTEXT("Autodetection found that most probable encoding was \"UTF-8"));
   EXPECT_NE(favored.Find(WTEXT("the hint was favored over detection's guess")), nullptr);
@@ -142,7 +168,8 @@ TEST(Selection, ProvisionalASCII_IsLookedAtAgain) {
   ReadResult ascii = ReadBytes(std::string(50000, 'a'), kAnsi | Support::kQuickDetect);
   EXPECT_EQ(ascii.selected & 0xFFFFF, Support::kASCII);
   // A mark in the middle of the data is a character.
-  ReadResult late = ReadBytes(std::string(4096, 'a') + "\xEF\xBB\xBFz", kAnsi | Support::kQuickDetect | Support::kFavorGuess);
+  ReadResult late =
+      ReadBytes(std::string(4096, 'a') + "\xEF\xBB\xBFz", kAnsi | Support::kQuickDetect | Support::kFavorGuess);
   EXPECT_EQ(late.text.Right(2), WTEXT("\uFEFFz"));
 }
 
@@ -163,7 +190,8 @@ std::vector<std::string> Samples() {
   for (const auto& alphabet : alphabets) {
     for (std::size_t length : {20u, 5000u, 40000u}) {
       std::string bytes;
-      while (bytes.size() < length) bytes += alphabet[static_cast<std::size_t>(random.Number(static_cast<int>(alphabet.size())))];
+      while (bytes.size() < length)
+        bytes += alphabet[static_cast<std::size_t>(random.Number(static_cast<int>(alphabet.size())))];
       samples.push_back(bytes);
       samples.push_back(std::string(4090, 'x') + bytes);
     }
@@ -171,12 +199,22 @@ std::vector<std::string> Samples() {
   return samples;
 }
 
-constexpr Encoding kRequests[] = {
-    kAnsi | kFull,          kAnsi | Support::kQuickDetect,           kAnsi | Support::kDetect | Support::kFavorGuess,
-    Support::kUTF8,         Support::kUTF8 | kFull,                  Support::kUTF8 | Support::kLossless,
-    Support::kUTF16LE,      Support::kUTF16BE | Support::kLossless,  Support::kOEM | Support::kFavorHint | kFull,
-    0x20000 | 932,          0x20000 | 932 | Support::kLossless,      Support::kASCII,
-    Support::kASCII | Support::kLossless, 0x4001C, 0x20000 | 932 | kFull, 0x204E4 | Support::kQuickDetect};
+constexpr Encoding kRequests[] = {kAnsi | kFull,
+                                  kAnsi | Support::kQuickDetect,
+                                  kAnsi | Support::kDetect | Support::kFavorGuess,
+                                  Support::kUTF8,
+                                  Support::kUTF8 | kFull,
+                                  Support::kUTF8 | Support::kLossless,
+                                  Support::kUTF16LE,
+                                  Support::kUTF16BE | Support::kLossless,
+                                  Support::kOEM | Support::kFavorHint | kFull,
+                                  0x20000 | 932,
+                                  0x20000 | 932 | Support::kLossless,
+                                  Support::kASCII,
+                                  Support::kASCII | Support::kLossless,
+                                  0x4001C,
+                                  0x20000 | 932 | kFull,
+                                  0x204E4 | Support::kQuickDetect};
 
 TEST(Reading, PiecesOfTheSource_NeverShow) {
   for (const std::string& sample : Samples()) {
@@ -185,7 +223,8 @@ TEST(Reading, PiecesOfTheSource_NeverShow) {
       for (unsigned long piece : {1ul, 7ul, 4096ul}) {
         if (piece == 1 && sample.size() > 6000) continue;
         ASSERT_EQ(ReadBytes(sample, request, piece, static_cast<int>(piece % 3)), whole)
-            << "request " << std::hex << request << std::dec << ", pieces of " << piece << ", " << sample.size() << " bytes";
+            << "request " << std::hex << request << std::dec << ", pieces of " << piece << ", " << sample.size()
+            << " bytes";
       }
     }
   }
@@ -211,7 +250,8 @@ TEST(Reading, CutSequences_DecodeLikeUncutOnes) {
         ASSERT_TRUE(result.loss.IsEmpty());
         if (Support::IsUnicode(sequence.encoding) && sequence.bytes.size() < 4) {
           for (Encoding level : {Support::kQuickDetect, Support::kDetect}) {
-            ASSERT_EQ(ReadBytes(bytes, kAnsi | level | Support::kFavorGuess).text, result.text) << edge << ' ' << before;
+            ASSERT_EQ(ReadBytes(bytes, kAnsi | level | Support::kFavorGuess).text, result.text)
+                << edge << ' ' << before;
           }
         }
       }
@@ -328,8 +368,11 @@ TEST(Positions, MarkAndReset_ReadTheSameAgain) {
       int length = random.Number(1500) + 1;
       for (int round = 0; round < 2; ++round) {
         std::vector<WCHAR> block(static_cast<std::size_t>(length));
-        ASSERT_EQ(reader.Read(block.data(), static_cast<unsigned long>(length) * 2), static_cast<unsigned long>(length) * 2);
-        ASSERT_EQ(SStringView(block.data(), block.size()), whole.View().substr(static_cast<std::size_t>(at), block.size())) << at;
+        ASSERT_EQ(reader.Read(block.data(), static_cast<unsigned long>(length) * 2),
+                  static_cast<unsigned long>(length) * 2);
+        ASSERT_EQ(SStringView(block.data(), block.size()),
+                  whole.View().substr(static_cast<std::size_t>(at), block.size()))
+            << at;
         if (round == 0) reader.Reset();
       }
       at += length;

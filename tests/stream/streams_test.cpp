@@ -95,7 +95,8 @@ TEST_F(FileStreams, Input_ThatCannotBeOpenedThrows) {
 }
 
 TEST_F(FileStreams, FilesThatDenyTheirContent_LoseNothing) {
-  if (GetFileAttributesW(WTEXT("C:\\proc\\self\\limits")) == INVALID_FILE_ATTRIBUTES) GTEST_SKIP() << "no such file system here";
+  if (GetFileAttributesW(WTEXT("C:\\proc\\self\\limits")) == INVALID_FILE_ATTRIBUTES)
+    GTEST_SKIP() << "no such file system here";
   std::ifstream plain("/proc/self/limits", std::ios::binary);
   std::string expected{std::istreambuf_iterator<char>(plain), std::istreambuf_iterator<char>()};
   SInputFile file(WTEXT("C:\\proc\\self\\limits"));
@@ -347,7 +348,8 @@ TEST(BufferedOutput, Blocks_ArriveInOrder) {
     {
       SOutputBufferStream out(target, size);
       for (std::size_t at = 0; at < bytes.size();) {
-        unsigned long count = std::min<unsigned long>(static_cast<unsigned long>(random.Number(300)), static_cast<unsigned long>(bytes.size() - at));
+        unsigned long count = std::min<unsigned long>(static_cast<unsigned long>(random.Number(300)),
+                                                      static_cast<unsigned long>(bytes.size() - at));
         EXPECT_EQ(out.Write(bytes.data() + at, count), count);
         at += count;
         if (at < bytes.size()) out.Write(bytes[at++]);

@@ -2,10 +2,10 @@
 
 #include <vector>
 
-#include "qxcore/string/string_buffer.h"
-#include "qxcore/string/string_iterators.h"
 #include "qxcore/core/exception.h"
 #include "qxcore/core/memory.h"
+#include "qxcore/string/string_buffer.h"
+#include "qxcore/string/string_iterators.h"
 #include "tests/support/text.h"
 
 namespace {

@@ -75,12 +75,14 @@ TEST(NaturalOrder, RandomTexts_FollowTheRulesAndAreTotallyOrdered) {
   for (const WideString& a : texts) {
     for (const WideString& b : texts) {
       int order = _tcscmpi(a.c_str(), b.c_str());
-      ASSERT_EQ(Sign(order), NaturalModel(a, b)) << testing::PrintToString(SString(a.c_str())) << testing::PrintToString(SString(b.c_str()));
+      ASSERT_EQ(Sign(order), NaturalModel(a, b))
+          << testing::PrintToString(SString(a.c_str())) << testing::PrintToString(SString(b.c_str()));
       ASSERT_EQ(Sign(_tcscmpi(b.c_str(), a.c_str())), -Sign(order));
       ASSERT_EQ(order == 0, a == b);
     }
   }
-  std::sort(texts.begin(), texts.end(), [](const WideString& a, const WideString& b) { return _tcscmpi(a.c_str(), b.c_str()) < 0; });
+  std::sort(texts.begin(), texts.end(),
+            [](const WideString& a, const WideString& b) { return _tcscmpi(a.c_str(), b.c_str()) < 0; });
   for (std::size_t i = 0; i < texts.size(); ++i) {
     for (std::size_t j = i; j < texts.size(); ++j) ASSERT_LE(_tcscmpi(texts[i].c_str(), texts[j].c_str()), 0);
   }

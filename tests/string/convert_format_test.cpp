@@ -87,10 +87,10 @@ TEST(Numbers, TextsAreReadAsStated) {
   const struct {
     const WCHAR* text;
     int isInteger, isNumber, truth;
-  } kCases[] = {{WTEXT("+"), 0, 0, 0},    {WTEXT("-12"), 1, 1, 1},  {WTEXT("1.0"), 0, 1, 1},  {WTEXT(""), 0, 0, 0},
-                {WTEXT("yes"), 0, 0, 1},  {WTEXT("YES"), 0, 0, 1},  {WTEXT("7"), 1, 1, 1},    {WTEXT("0"), 1, 1, 0},
-                {WTEXT("no"), 0, 0, 0},   {WTEXT("1e"), 0, 0, 1},   {WTEXT(".5e-3"), 0, 1, 0}, {WTEXT("."), 0, 0, 0},
-                {WTEXT("12a"), 0, 0, 1},  {WTEXT("1e+5"), 0, 1, 1}};
+  } kCases[] = {{WTEXT("+"), 0, 0, 0},   {WTEXT("-12"), 1, 1, 1}, {WTEXT("1.0"), 0, 1, 1},   {WTEXT(""), 0, 0, 0},
+                {WTEXT("yes"), 0, 0, 1}, {WTEXT("YES"), 0, 0, 1}, {WTEXT("7"), 1, 1, 1},     {WTEXT("0"), 1, 1, 0},
+                {WTEXT("no"), 0, 0, 0},  {WTEXT("1e"), 0, 0, 1},  {WTEXT(".5e-3"), 0, 1, 0}, {WTEXT("."), 0, 0, 0},
+                {WTEXT("12a"), 0, 0, 1}, {WTEXT("1e+5"), 0, 1, 1}};
   for (const auto& one : kCases) {
     SString text = one.text;
     EXPECT_EQ(text.IsInteger(), one.isInteger) << testing::PrintToString(text);
@@ -143,7 +143,8 @@ TEST(Format, Conversions_AgreeWithTheNarrowRuntime) {
 
 TEST(Format, TextOfAnyKindAndLength_Fits) {
   SString text;
-  text.Format(WTEXT("%s|%S|%hs|%ls|%c|%5.2s|%%|%-4s|"), WTEXT("wide"), "narrow", "short", WTEXT("long"), 'x', WTEXT("abc"), WTEXT("z"));
+  text.Format(WTEXT("%s|%S|%hs|%ls|%c|%5.2s|%%|%-4s|"), WTEXT("wide"), "narrow", "short", WTEXT("long"), 'x',
+              WTEXT("abc"), WTEXT("z"));
   EXPECT_EQ(text, WTEXT("wide|narrow|short|long|x|   ab|%|z   |"));
   SString longText(SStringView(WideString(100000, WTEXT('y'))));
   text.Format(WTEXT("%s%s"), longText.GetSafePointer(), longText.GetSafePointer());
@@ -194,7 +195,8 @@ TEST(Digest, KnownMessagesAndPieces) {
     for (std::size_t piece : {1u, 7u, 64u, 100u}) {
       SMd5 md5;
       std::string message = one.message;
-      for (std::size_t at = 0; at < message.size(); at += piece) md5.Add(message.data() + at, std::min(piece, message.size() - at));
+      for (std::size_t at = 0; at < message.size(); at += piece)
+        md5.Add(message.data() + at, std::min(piece, message.size() - at));
       unsigned char digest[16];
       md5.Finish(digest);
       char digits[33];

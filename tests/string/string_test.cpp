@@ -13,7 +13,9 @@
 
 namespace {
 
-SString Repeated(int length, WCHAR c = WTEXT('x')) { return SString(SStringView(WideString(static_cast<std::size_t>(length), c))); }
+SString Repeated(int length, WCHAR c = WTEXT('x')) {
+  return SString(SStringView(WideString(static_cast<std::size_t>(length), c)));
+}
 std::int32_t RefsOf(const SString& text) { return SStringData::Of(text.GetSafePointer())->m_refs; }
 bool Shares(const SString& a, const SString& b) { return a.GetSafePointer() == b.GetSafePointer(); }
 
@@ -38,9 +40,9 @@ TEST(StringConstruction, NumbersAndTruth_HaveTheirStatedForms) {
 TEST(StringBuffers, Length_DecidesTheSizeClass) {
   const struct {
     int length, allocated;
-  } kCases[] = {{1, 16},     {16, 16},     {17, 32},     {32, 32},     {33, 64},    {64, 64},     {65, 128},
-                {128, 128},  {129, 256},   {257, 512},   {513, 1024},  {1025, 2048}, {2048, 2048}, {2049, 2560},
-                {2560, 2560}, {2561, 3072}};
+  } kCases[] = {{1, 16},      {16, 16},     {17, 32},     {32, 32},    {33, 64},    {64, 64},
+                {65, 128},    {128, 128},   {129, 256},   {257, 512},  {513, 1024}, {1025, 2048},
+                {2048, 2048}, {2049, 2560}, {2560, 2560}, {2561, 3072}};
   for (const auto& one : kCases) {
     SString text = Repeated(one.length);
     EXPECT_EQ(text.GetAllocLength(), one.allocated) << one.length;

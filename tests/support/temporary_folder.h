@@ -14,8 +14,8 @@ class TemporaryFolder {
  public:
   TemporaryFolder() {
     static int number = 0;
-    m_path = std::filesystem::temp_directory_path() /
-             ("qxcore-test-" + std::to_string(std::rand()) + "-" + std::to_string(GetTick()) + "-" + std::to_string(++number));
+    m_path = std::filesystem::temp_directory_path() / ("qxcore-test-" + std::to_string(std::rand()) + "-" +
+                                                       std::to_string(GetTick()) + "-" + std::to_string(++number));
     std::filesystem::create_directories(m_path);
   }
   ~TemporaryFolder() {
