@@ -23,17 +23,54 @@ unsigned long Reader::Read(void* buffer, unsigned long count) {
     std::memcpy(out, TextStart(), done * sizeof(WCHAR));
     Deliver(done);
   }
-  while (done < wanted) {
-    unsigned long got = DecodeInto(out + done, wanted - done);
-    if (got == 0) break;
-    done += got;
+  if (done < wanted && m_pending != nullptr) {
+    if (done == 0) ThrowPending();
+    return done * static_cast<unsigned long>(sizeof(WCHAR));
+  }
+  try {
+    while (done < wanted) {
+      unsigned long got = DecodeInto(out + done, wanted - done);
+      if (got == 0) break;
+      done += got;
+    }
+  } catch (...) {
+    if (done == 0) throw;
+    m_pending = std::current_exception();
   }
   return done * static_cast<unsigned long>(sizeof(WCHAR));
 }
 
+// True when characters are there. A failure after `hasSome` is kept for the next read.
+bool Reader::FetchMore(bool hasSome) {
+  if (TextLength() > 0) return true;
+  try {
+    return fetch();
+  } catch (...) {
+    if (!hasSome) throw;
+    m_pending = std::current_exception();
+    return false;
+  }
+}
+
+void Reader::ThrowPending() {
+  std::exception_ptr pending = m_pending;
+  m_pending = nullptr;
+  std::rethrow_exception(pending);
+}
+
+void Reader::SetFormat(Encoding requested) {
+  m_pending = nullptr;
+  SMultiFormatReaderBase::SetFormat(requested);
+}
+
+void Reader::Reset() {
+  SMultiFormatReaderBase::Reset();
+  m_pending = nullptr;
+}
+
 unsigned long Reader::Skip(unsigned long count) {
   unsigned long done = 0;
-  while (done < count && (TextLength() > 0 || fetch())) {
+  while (done < count && FetchMore(done > 0)) {
     unsigned long passed = std::min(count - done, TextLength());
     Deliver(passed);
     done += passed;
@@ -49,7 +86,9 @@ bool Reader::SeekPos(unsigned long position) {
 SString Reader::ReadLn() {
   constexpr unsigned kFirstRoom = 256;
   SStringBuffer line(kFirstRoom);
-  while (TextLength() > 0 || fetch()) {
+  bool hasSome = false;
+  while (FetchMore(hasSome)) {
+    hasSome = true;
     const WCHAR* start = TextStart();
     const WCHAR* lineFeed = SFindCharacter(start, TextLength(), WTEXT('\n'));
     const WCHAR* end = lineFeed != nullptr ? lineFeed : start + TextLength();
@@ -65,7 +104,7 @@ SString Reader::ReadLn() {
 
 SString Reader::ReadAll() {
   SStringBuffer text(8192, 2, 1);
-  while (TextLength() > 0 || fetch()) {
+  while (FetchMore(!text.IsEmpty())) {
     text.Concat(TextStart(), TextStart() + TextLength());
     Deliver(TextLength());
   }

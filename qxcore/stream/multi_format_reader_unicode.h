@@ -8,9 +8,12 @@
 //
 // A character that cannot be mapped is replaced (U+FFFD unless changed) or dropped, and the encoding
 // warning tells of it; with the lossless policy it throws an exception of the SEIOCantMap family, after
-// everything before it was delivered, and again at each further read.
+// everything before it was delivered, and again at each further read. Whatever throws in the middle of a
+// block, a line or the rest: the read gives what it has, and the next one throws.
 // Read errors of the source look like the end of the data; ask GetError.
 #pragma once
+
+#include <exception>
 
 #include "qxcore/stream/multi_format_reader_base.h"
 #include "qxcore/stream/seekable_char_reader.h"
@@ -46,7 +49,9 @@ class QXCORE_API SMultiFormatReaderUnicode : public SMultiFormatReaderBase, publ
   unsigned long GetPos() const override { return m_delivered; }
   bool SeekSupported() const override { return false; }
   unsigned long Available() override { return SMultiFormatReaderBase::Available(); }
-  int IsEOF() override { return SMultiFormatReaderBase::IsEOF(); }
+  int IsEOF() override { return m_pending == nullptr && SMultiFormatReaderBase::IsEOF(); }
+  void SetFormat(Encoding requested) override;
+  void Reset() override;
 
   // What stands for characters that cannot be mapped; 0 drops them. Gives the former one.
   WCHAR SetReplacement(WCHAR replacement);
@@ -54,7 +59,16 @@ class QXCORE_API SMultiFormatReaderUnicode : public SMultiFormatReaderBase, publ
 
  protected:
   // Decodes the next run of raw bytes; false at the end.
-  bool fetch() { return DecodeNextRun(); }
+  bool fetch() {
+    if (m_pending != nullptr) ThrowPending();
+    return DecodeNextRun();
+  }
   // The next character, or -1.
   int get_char() { return SMultiFormatReaderUnicode::Read(); }
+
+ private:
+  bool FetchMore(bool hasSome);
+  [[noreturn]] void ThrowPending();
+
+  std::exception_ptr m_pending;  // what the next read throws
 };

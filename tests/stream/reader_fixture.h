@@ -69,7 +69,9 @@ inline ReadResult ReadFrom(SInputStream& in, Encoding requested, int way = 0) {
   try {
     switch (way) {
       case 0:
-        result.text = reader.ReadAll();
+        do {
+          result.text += reader.ReadAll();
+        } while (!reader.IsEOF());
         break;
       case 1:
         for (int c; (c = reader.Read()) >= 0;) result.text += static_cast<WCHAR>(c);

@@ -309,6 +309,24 @@ TEST(Losses, Lossless_DeliversWhatStandsBefore) {
   EXPECT_EQ(reader.ReadAll(), WTEXT("\uFFFD second"));
 }
 
+TEST(Losses, Lossless_BlocksAndLinesGiveWhatTheyHaveAndThenThrow) {
+  const std::string bytes = "ab\ncd\xC3(";
+  PiecewiseInput in(bytes);
+  SMultiFormatReaderUnicode blocks(in, Support::kUTF8 | Support::kLossless);
+  WCHAR block[4096];
+  EXPECT_EQ(blocks.Read(block, sizeof block), 10u);
+  EXPECT_FALSE(blocks.IsEOF());
+  EXPECT_THROW(blocks.Read(block, sizeof block), SEIOCantMap_UTF8_UTF16);
+  EXPECT_THROW(blocks.Read(block, sizeof block), SEIOCantMap_UTF8_UTF16);
+  PiecewiseInput again(bytes);
+  SMultiFormatReaderUnicode lines(again, Support::kUTF8 | Support::kLossless);
+  EXPECT_EQ(lines.ReadLn(), WTEXT("ab"));
+  EXPECT_EQ(lines.ReadLn(), WTEXT("cd"));
+  EXPECT_THROW(lines.ReadLn(), SEIOCantMap_UTF8_UTF16);
+  lines.SetFormat(Support::kUTF8);
+  EXPECT_EQ(lines.ReadAll(), WTEXT("\uFFFD("));
+}
+
 TEST(Losses, QuickUtf8_TrustsItsInput) {
   PiecewiseInput in("a\xE2(b)\xC3\xA9");
   SMultiFormatReaderUnicode reader(in, Support::kUTF8);
