@@ -118,7 +118,11 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
       auto format = ToText(input.Rest());
       bool takesPointers = false;
       int integers = 0;
+      int digitsInARow = 0;
       for (WCHAR c : format) {
+        // A width of a gigabyte only costs time and memory.
+        digitsInARow = c >= '0' && c <= '9' ? digitsInARow + 1 : 0;
+        if (digitsInARow > 5) return 0;
         if (c == '%' || c == '*') ++integers;
         if (c < 0x80 &&
             std::string_view("sSZncCaAeEfFgGhlLIwzjtq").find(static_cast<char>(c)) != std::string_view::npos) {
