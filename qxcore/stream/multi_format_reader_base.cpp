@@ -209,13 +209,14 @@ void Reader::DropOwnMark() {
 }
 
 Encoding Reader::SniffXML(Encoding sniffed) {
-  if (m_raw.Size() + m_skippedMark < kLeastXML || m_raw.Size() < 2 * kXMLLength) return sniffed;
+  if (m_raw.Size() + m_skippedMark < kLeastXML) return sniffed;
   const unsigned char* at = m_raw.start;
-  if (StartsWithXML(at, 1, 0)) {
+  if (StartsWithXML(at, 1, 0)) {  // eight bytes at least stand behind any mark
     if (sniffed != 0) return sniffed | Support::kXML;
     m_status |= kProvisional;
     return Support::kXML | Support::kASCII;
   }
+  if (m_raw.Size() < 2 * kXMLLength) return sniffed;
   const struct {
     std::size_t significant;
     Encoding format;
@@ -245,7 +246,8 @@ void Reader::Detect(Encoding sniffed) {
 
   const unsigned char* sampleEnd = m_raw.start + std::min(m_raw.Size(), kQuickSample);
   Encoding result = DataAffinity(m_raw.start, sampleEnd, m_affinity, page);
-  if (result == 0 && sampleEnd != m_raw.end) result = DataAffinity(m_raw.start, m_raw.end, m_affinity, page);
+  const unsigned char* wholeEnd = m_raw.start + std::min(m_raw.Size(), kLongestInput);  // the platform counts in an int
+  if (result == 0 && sampleEnd != wholeEnd) result = DataAffinity(m_raw.start, wholeEnd, m_affinity, page);
   if (result != 0) {
     if (Support::KindOf(result) != Support::kASCII) m_status &= ~kProvisional;
     m_guess = SEncodingGuess();
@@ -342,7 +344,11 @@ unsigned long Reader::DecodePiece(WCHAR* out, unsigned long room) {
 
 bool Reader::DecodeNextRun() {
   CheckFormat();
-  if (m_decoder.NeedsWholeInput()) ReadWholeInput();
+  if (m_decoder.NeedsWholeInput()) {
+    ReadWholeInput();
+    const bool isWhole = (m_status & kWholeInput) != 0 && m_raw.Size() <= kLongestInput;
+    if (!isWhole) throw SEOutOfMemory();  // more than the platform converts at once
+  }
   const unsigned long room = m_decoder.NeedsWholeInput() ? std::max(m_raw.Size(), 1ul) : kTextRun;
   m_text.start = m_text.end = m_text.block;
   AllocStrData(m_text, room * sizeof(WCHAR));

@@ -2,6 +2,7 @@
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/core/module_state.h"
+#include "qxcore/string/surrogates.h"
 
 QXCORE_IMPLEMENT_CLASS(SOutputStringStream, SOutputStream, 0)
 
@@ -10,9 +11,6 @@ using Stream = SOutputStringStream;
 namespace {
 
 constexpr unsigned kFirstRoom = 1024;
-
-bool IsHigh(WCHAR c) { return (c & 0xFC00) == 0xD800; }
-bool IsLow(WCHAR c) { return (c & 0xFC00) == 0xDC00; }
 
 }  // namespace
 
@@ -58,12 +56,12 @@ unsigned long Stream::Write(const WCHAR* text, unsigned int count) {
   const WCHAR* end = text + count;
   if (m_waitingHalf != 0) {
     const WCHAR pair[2] = {m_waitingHalf, *at};
-    bool isPair = IsLow(*at);
+    bool isPair = SIsLowSurrogate(*at);
     m_waitingHalf = 0;
     m_encoder.Write(pair, isPair ? 2 : 1, *m_out);
     if (isPair) ++at;
   }
-  if (at != end && IsHigh(end[-1])) m_waitingHalf = *--end;
+  if (at != end && SIsHighSurrogate(end[-1])) m_waitingHalf = *--end;
   m_encoder.Write(at, static_cast<std::size_t>(end - at), *m_out);
   return count;
 }

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "qxcore/stream/widen.h"
+#include "qxcore/string/widen.h"
 
 #if defined(__x86_64__) || defined(__i386__)
 #include <immintrin.h>

@@ -7,7 +7,7 @@
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/stream/single_byte_decoder.h"
 #include "qxcore/stream/utf8_decoder.h"
-#include "qxcore/stream/widen.h"
+#include "qxcore/string/widen.h"
 
 using Support = SAbstractIO::SMultiFormatSupport;
 using Run = STextDecoder::Run;
@@ -163,7 +163,10 @@ Run STextDecoder::DecodeWhole(const unsigned char* in, const unsigned char* end,
   constexpr WCHAR kPlatformReplacement = 0xFFFD;
   int room = static_cast<int>(end - in);
   unsigned page = Support::CodePageOf(m_encoding);
+  SetLastError(0);
   int length = MultiByteToWideChar(page, 0, reinterpret_cast<const char*>(in), room, out, room);
+  // Escapes alone are no text; an error is one that must not pass for the end of the data.
+  if (length == 0 && GetLastError() != 0) throw SEEncodingException(static_cast<HRESULT>(0x80990067), 217);
   WCHAR* written = out;
   for (int i = 0; i < length; ++i) {
     if (out[i] != kPlatformReplacement) {

@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/string/surrogates.h"
 
 using Support = SAbstractIO::SMultiFormatSupport;
 
@@ -13,12 +14,9 @@ constexpr std::size_t kPiece = 1024;
 constexpr std::size_t kBytesPerUnit = 8;  // the escapes of stateful code pages included
 constexpr std::size_t kUnmappable = static_cast<std::size_t>(-1);
 
-bool IsHigh(WCHAR c) { return (c & 0xFC00) == 0xD800; }
-bool IsLow(WCHAR c) { return (c & 0xFC00) == 0xDC00; }
-
 // Characters that the first unit begins: a whole surrogate pair counts as one.
 std::size_t UnitsOfCharacter(const WCHAR* text, std::size_t count) {
-  return count >= 2 && IsHigh(text[0]) && IsLow(text[1]) ? 2 : 1;
+  return count >= 2 && SIsHighSurrogate(text[0]) && SIsLowSurrogate(text[1]) ? 2 : 1;
 }
 
 // Each encoder gives the number of bytes, or kUnmappable when a character of the piece cannot be mapped.
@@ -40,7 +38,7 @@ std::size_t EncodeUtf8(const WCHAR* text, std::size_t count, char* bytes) {
     } else if (c < 0x800) {
       *out++ = static_cast<char>(0xC0 | c >> 6);
       *out++ = static_cast<char>(0x80 | (c & 0x3F));
-    } else if (!IsHigh(text[i]) && !IsLow(text[i])) {
+    } else if (!SIsHighSurrogate(text[i]) && !SIsLowSurrogate(text[i])) {
       *out++ = static_cast<char>(0xE0 | c >> 12);
       *out++ = static_cast<char>(0x80 | (c >> 6 & 0x3F));
       *out++ = static_cast<char>(0x80 | (c & 0x3F));
@@ -103,7 +101,7 @@ void STextEncoder::Write(const WCHAR* text, std::size_t count, SOutputStream& ou
   char bytes[kPiece * kBytesPerUnit];
   while (count > 0) {
     std::size_t piece = std::min(count, kPiece);
-    if (piece < count && IsHigh(text[piece - 1])) --piece;
+    if (piece < count && SIsHighSurrogate(text[piece - 1])) --piece;
     std::size_t size = EncodePiece(text, piece, bytes);
     if (size != kUnmappable) {
       out.Write(bytes, static_cast<unsigned long>(size));

@@ -1,7 +1,7 @@
 #include "qxcore/stream/utf8_decoder.h"
 
 #include "qxcore/stream/utf8_decoder_avx512.h"
-#include "qxcore/stream/widen.h"
+#include "qxcore/string/widen.h"
 
 namespace {
 

@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "qxcore/string/string.h"
+#include "qxcore/string/widen.h"
 
 char* ST2UTF8Helper(char* dst, const WCHAR* src, int max) {
   char* out = dst;
@@ -71,16 +72,6 @@ int Smbstowcsz(WCHAR* dst, const char* src, unsigned int n) {
   return written;
 }
 
-static bool WidenASCII(WCHAR* dst, const char* src, int count) {
-  unsigned seen = 0;
-  for (int i = 0; i < count; ++i) {
-    unsigned byte = static_cast<unsigned char>(src[i]);
-    dst[i] = static_cast<WCHAR>(byte);
-    seen |= byte;
-  }
-  return seen < 0x80;
-}
-
 SString SAnsiToString(const char* text, int count) {
   SString converted;
   if (text == nullptr || count <= 0) return converted;
@@ -88,7 +79,9 @@ SString SAnsiToString(const char* text, int count) {
     count = static_cast<int>(static_cast<const char*>(end) - text);
   }
   if (count == 0) return converted;
-  if (!WidenASCII(converted.GetBufferSetLength(count), text, count)) {
+  const std::size_t size = static_cast<std::size_t>(count);
+  const auto* bytes = reinterpret_cast<const unsigned char*>(text);
+  if (SWidenASCII(bytes, size, converted.GetBufferSetLength(count)) < size) {
     int length = MultiByteToWideChar(CP_ACP, 0, text, count, nullptr, 0);
     WCHAR* buffer = converted.Lock(length);
     converted.Unlock(MultiByteToWideChar(CP_ACP, 0, text, count, buffer, length));

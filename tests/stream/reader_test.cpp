@@ -37,6 +37,7 @@ TEST(Selection, MarksAndDeclarations_Decide) {
   EXPECT_EQ(ReadBytes("\xEF\xBB\xBF<?xml version='1.0'?>", kAnsi | kFull).selected, 0x2E4000Cu);
   EXPECT_EQ(ReadBytes(Utf16Bytes(WTEXT("<?xml version='1.0'?>")), kAnsi | kFull).selected, 0x2E40002u);
   EXPECT_EQ(ReadBytes(Utf16Bytes(WTEXT("<?xml version='1.0'?>"), true), kAnsi | kFull).selected, 0x2E40001u);
+  EXPECT_EQ(ReadBytes("\xEF\xBB\xBF<?xml v?", kAnsi | kFull).selected, 0x2E4000Cu) << "eleven bytes, the mark included";
   EXPECT_EQ(ReadBytes("<?xml", kAnsi | kFull).selected, 0xE10000u) << "too short for a declaration";
 }
 
