@@ -7,6 +7,7 @@
 #include "qxcore/container/map.h"
 #include "qxcore/container/node_pool.h"
 #include "qxcore/container/string_map.h"
+#include "qxcore/container/string_table.h"
 #include "qxcore/container/table.h"
 #include "qxcore/container/table_dumb.h"
 #include "qxcore/container/table_mem.h"

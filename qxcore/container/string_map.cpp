@@ -2,6 +2,8 @@
 
 #include <new>
 
+#include "qxcore/container/list_escape.h"
+
 const SStringMap SStringMap::null;
 const SStringMapNoCase SStringMapNoCase::null;
 const SStringUnsortedMap SStringUnsortedMap::null;
@@ -21,24 +23,12 @@ SFixedAlloc& SStringMapAllocator::MakePool() {
 
 // --- the list form ---
 
-void SMapListFormat::WriteEscaped(SStringView text, WCHAR separator) {
-  const WCHAR* end = text.data() + text.size();
-  const WCHAR* run = text.data();  // what need not be escaped is appended in one piece
-  for (const WCHAR* at = run; at != end; ++at) {
-    if (m_escape == 0 || (*at != m_escape && *at != separator)) continue;
-    m_text.Concat(run, at);
-    m_text += m_escape;
-    run = at;
-  }
-  m_text.Concat(run, end);
-}
-
 void SMapListFormat::Write(const SString& key, const SString& value) {
   if (!m_isFirst) m_text += m_item;
   m_isFirst = false;
-  WriteEscaped(key.View(), m_pair);
+  AppendEscaped(m_text, key.View(), m_pair, m_escape);
   m_text += m_pair;
-  WriteEscaped(value.View(), m_item);
+  AppendEscaped(m_text, value.View(), m_item, m_escape);
 }
 
 namespace {

@@ -45,8 +45,6 @@ class QXCORE_API SMapListFormat {
                    bool* hasValue);
 
  private:
-  void WriteEscaped(SStringView text, WCHAR separator);
-
   SStringBuffer m_text{256};
   WCHAR m_item, m_pair, m_escape;
   bool m_isFirst = true;

@@ -2,10 +2,13 @@
 
 #include <algorithm>
 #include <climits>
+#include <cstddef>
 
 #include "platform/wide.h"
 
 namespace {
+
+bool IsDigit(WCHAR c) { return c >= WTEXT('0') && c <= WTEXT('9'); }
 
 // A text that ends at its NUL or at a count, whichever comes first.
 class Cursor {
@@ -14,7 +17,7 @@ class Cursor {
       : m_at(text != nullptr ? text : WTEXT("")), m_left(text != nullptr ? count : 0) {}
 
   WCHAR Get() const { return m_left > 0 ? *m_at : WCHAR(0); }
-  bool IsDigit() const { return Get() >= WTEXT('0') && Get() <= WTEXT('9'); }
+  bool IsDigit() const { return ::IsDigit(Get()); }
   void Next() {
     ++m_at;
     --m_left;
@@ -75,17 +78,29 @@ int CompareNatural(Cursor a, Cursor b, Fold fold) {
   }
 }
 
+// The same for whole texts. Most of a comparison of names is their common start: it is passed over without a
+// look at digits, and then the run of digits that it may end in is read again.
+template <class Fold>
+int CompareWhole(const WCHAR* a, const WCHAR* b, Fold fold) {
+  if (a == b) return 0;
+  if (a == nullptr || b == nullptr) return CompareNatural(Cursor(a, LLONG_MAX), Cursor(b, LLONG_MAX), fold);
+  std::ptrdiff_t same = 0;
+  while (fold(a[same]) == fold(b[same]) && a[same] != 0) ++same;
+  if (!IsDigit(a[same]) && !IsDigit(b[same])) {
+    // Neither a longer run of digits nor a new one begins here: the runs before are equal.
+    return static_cast<int>(fold(a[same])) - static_cast<int>(fold(b[same]));
+  }
+  while (same > 0 && IsDigit(a[same - 1])) --same;
+  return CompareNatural(Cursor(a + same, LLONG_MAX), Cursor(b + same, LLONG_MAX), fold);
+}
+
 WCHAR Same(WCHAR c) { return c; }
 WCHAR Lower(WCHAR c) { return platform::ToLowerBmp(c); }
 
 }  // namespace
 
-int _tcscmpi(const WCHAR* a, const WCHAR* b) {
-  return a == b ? 0 : CompareNatural(Cursor(a, LLONG_MAX), Cursor(b, LLONG_MAX), Same);
-}
-int _tcsicmpi(const WCHAR* a, const WCHAR* b) {
-  return a == b ? 0 : CompareNatural(Cursor(a, LLONG_MAX), Cursor(b, LLONG_MAX), Lower);
-}
+int _tcscmpi(const WCHAR* a, const WCHAR* b) { return CompareWhole(a, b, Same); }
+int _tcsicmpi(const WCHAR* a, const WCHAR* b) { return CompareWhole(a, b, Lower); }
 int _tcsncmpi(const WCHAR* a, const WCHAR* b, int count) {
   return a == b ? 0 : CompareNatural(Cursor(a, count), Cursor(b, count), Same);
 }
