@@ -105,6 +105,7 @@ using HRSRC = HRSRC__*;
 #define GetSystemDirectory GetSystemDirectoryW
 #define GetWindowsDirectory GetWindowsDirectoryW
 #define GetTempFileName GetTempFileNameW
+#define GetCurrentTime() GetTickCount()
 
 #include "platform/win32_functions.h"
 

@@ -66,6 +66,12 @@
 #define MAKEINTRESOURCEW(id) ((LPWSTR)(ULONG_PTR)(WORD)(id))
 #define RT_STRING MAKEINTRESOURCEW(6)
 
+// --- time ---
+
+#define LOCALE_USER_DEFAULT 0x0400u
+#define DATE_SHORTDATE 0x00000001u
+#define DATE_LONGDATE 0x00000002u
+
 // --- code pages ---
 
 #define MB_PRECOMPOSED 0x00000001u

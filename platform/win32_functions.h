@@ -12,6 +12,17 @@ struct FILETIME {
   DWORD dwHighDateTime;
 };
 
+struct SYSTEMTIME {
+  WORD wYear;
+  WORD wMonth;
+  WORD wDayOfWeek;
+  WORD wDay;
+  WORD wHour;
+  WORD wMinute;
+  WORD wSecond;
+  WORD wMilliseconds;
+};
+
 union LARGE_INTEGER {
   struct {
     DWORD LowPart;
@@ -96,6 +107,33 @@ QXCORE_API int MulDiv(int number, int numerator, int denominator);
 QXCORE_API UINT GetACP();
 QXCORE_API UINT GetOEMCP();
 
+// --- time ---
+
+QXCORE_API void GetSystemTime(SYSTEMTIME* time);
+QXCORE_API void GetLocalTime(SYSTEMTIME* time);
+QXCORE_API void GetSystemTimeAsFileTime(FILETIME* time);
+// Milliseconds since the system started; begins anew after 49.7 days.
+QXCORE_API DWORD GetTickCount();
+// ERROR_INVALID_PARAMETER for file times from 0x8000000000000000 on, and for records that are no date
+// of the years 1601 to 30827; the day of the week is not looked at.
+QXCORE_API BOOL FileTimeToSystemTime(const FILETIME* fileTime, SYSTEMTIME* time);
+QXCORE_API BOOL SystemTimeToFileTime(const SYSTEMTIME* time, FILETIME* fileTime);
+// With the bias from UTC that is in force now, whatever the date that is converted.
+QXCORE_API BOOL FileTimeToLocalFileTime(const FILETIME* fileTime, FILETIME* localTime);
+QXCORE_API BOOL LocalFileTimeToFileTime(const FILETIME* localTime, FILETIME* fileTime);
+// The packed date and time of the FAT file system, without regard to zones; odd seconds are cut to even.
+QXCORE_API BOOL DosDateTimeToFileTime(WORD date, WORD time, FILETIME* fileTime);
+QXCORE_API BOOL FileTimeToDosDateTime(const FILETIME* fileTime, WORD* date, WORD* time);
+QXCORE_API LONG CompareFileTime(const FILETIME* a, const FILETIME* b);
+
+// Dates and times in the style of the user's locale (the environment's LC_ALL, LC_TIME or LANG), with
+// LOCALE_USER_DEFAULT only. Dates: DATE_SHORTDATE (or no flag), with all four digits of the year, or
+// DATE_LONGDATE. No pictures of the caller's own: `format` must be null.
+QXCORE_API int GetDateFormatW(LCID locale, DWORD flags, const SYSTEMTIME* date, LPCWSTR format, LPWSTR text,
+                              int capacity);
+QXCORE_API int GetTimeFormatW(LCID locale, DWORD flags, const SYSTEMTIME* time, LPCWSTR format, LPWSTR text,
+                              int capacity);
+
 // --- code pages; which are there and how they map: docs/portable-layer.md ---
 
 QXCORE_API int MultiByteToWideChar(UINT page, DWORD flags, LPCSTR bytes, int count, LPWSTR text, int capacity);
@@ -160,7 +198,6 @@ QXCORE_API BOOL FlushFileBuffers(HANDLE file);
 QXCORE_API DWORD GetFileSize(HANDLE file, LPDWORD high);
 QXCORE_API BOOL GetFileSizeEx(HANDLE file, LARGE_INTEGER* size);
 QXCORE_API BOOL GetFileTime(HANDLE file, FILETIME* creation, FILETIME* access, FILETIME* write);
-QXCORE_API LONG CompareFileTime(const FILETIME* a, const FILETIME* b);
 // The process only duplicates its own handles.
 QXCORE_API BOOL DuplicateHandle(HANDLE sourceProcess, HANDLE source, HANDLE targetProcess, HANDLE* target, DWORD access,
                                 BOOL inherit, DWORD options);

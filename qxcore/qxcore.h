@@ -57,3 +57,6 @@
 #include "qxcore/string/text_conversion.h"
 #include "qxcore/string/text_search.h"
 #include "qxcore/system/file.h"
+#include "qxcore/system/locale_time.h"
+#include "qxcore/system/time.h"
+#include "qxcore/system/time_span.h"

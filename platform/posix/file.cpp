@@ -232,13 +232,6 @@ BOOL GetFileTime(HANDLE handle, FILETIME* creation, FILETIME* access, FILETIME* 
   return TRUE;
 }
 
-LONG CompareFileTime(const FILETIME* a, const FILETIME* b) {
-  const auto value = [](const FILETIME* time) {
-    return static_cast<ULONGLONG>(time->dwHighDateTime) << 32 | time->dwLowDateTime;
-  };
-  return value(a) < value(b) ? -1 : value(a) > value(b) ? 1 : 0;
-}
-
 HANDLE GetCurrentProcess() { return reinterpret_cast<HANDLE>(static_cast<std::intptr_t>(-1)); }
 
 BOOL DuplicateHandle(HANDLE sourceProcess, HANDLE source, HANDLE targetProcess, HANDLE* target, DWORD access, BOOL,
