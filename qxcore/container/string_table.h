@@ -26,7 +26,9 @@ class SStringTable;
 template <class Element, int kStep>
 class SStringTableIterator {
  public:
+  // What it walks over.
   using Table = std::conditional_t<std::is_const_v<Element>, const SStringTable, SStringTable>;
+  // For the standard algorithms.
   using iterator_category = std::random_access_iterator_tag;
   using value_type = SString;
   using difference_type = std::ptrdiff_t;
@@ -48,18 +50,20 @@ class SStringTableIterator {
   int GetIndex() const { return m_index; }
   Table* GetTable() const { return m_table; }
 
+  // The element, the one that is n steps away, and steps in the iterator's direction.
   Element& operator*() const { return (*m_table)[m_index]; }
   Element* operator->() const { return &**this; }
   Element& operator[](std::ptrdiff_t n) const { return *(*this + n); }
-
   SStringTableIterator& operator++() { return *this += 1; }
   SStringTableIterator& operator--() { return *this += -1; }
   SStringTableIterator operator++(int) { return std::exchange(*this, *this + 1); }
   SStringTableIterator operator--(int) { return std::exchange(*this, *this - 1); }
+  // By n steps on.
   SStringTableIterator& operator+=(std::ptrdiff_t n) {
     m_index += static_cast<int>(n) * kStep;
     return *this;
   }
+  // By n steps back; n steps from an iterator; the number of steps between two.
   SStringTableIterator& operator-=(std::ptrdiff_t n) { return *this += -n; }
   friend SStringTableIterator operator+(SStringTableIterator at, std::ptrdiff_t n) { return at += n; }
   friend SStringTableIterator operator+(std::ptrdiff_t n, SStringTableIterator at) { return at += n; }
@@ -103,6 +107,7 @@ class QXCORE_API SStringTable : public __STable {
   explicit SStringTable(const WCHAR* const* texts);  // pointers to texts, up to a null pointer; null: empty
   ~SStringTable() override { SStringTable::Clear(); }
 
+  // Instead of the former elements; the right side may be an element of this table.
   SStringTable& operator=(const SStringTable& other);
   SStringTable& operator=(SStringTable&& other) noexcept { return SwapWith(other), *this; }
   SStringTable& operator=(const SString& text);

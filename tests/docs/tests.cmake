@@ -1,9 +1,23 @@
-# The examples of the guides, run as a reader would run them.
+# The examples of the guides, run as a reader would run them. A guide with C++ examples has them all
+# in one program.
+set(guides README.md docs/text-encodings.md docs/containers.md)
 if(TARGET qxtool)
   find_package(Python3 REQUIRED COMPONENTS Interpreter)
-  foreach(guide README.md docs/text-encodings.md)
+  foreach(guide ${guides})
     string(MAKE_C_IDENTIFIER ${guide} name)
-    add_test(NAME docs.${name} COMMAND ${Python3_EXECUTABLE} ${CMAKE_CURRENT_LIST_DIR}/run_examples.py
+    set(program)
+    file(STRINGS ${PROJECT_SOURCE_DIR}/${guide} cpp_blocks REGEX "^```cpp$")
+    if(cpp_blocks)
+      set(source ${CMAKE_CURRENT_BINARY_DIR}/${name}.cpp)
+      add_custom_command(OUTPUT ${source}
+        COMMAND ${Python3_EXECUTABLE} ${CMAKE_CURRENT_LIST_DIR}/make_program.py ${PROJECT_SOURCE_DIR}/${guide} ${source}
+        DEPENDS ${PROJECT_SOURCE_DIR}/${guide} ${CMAKE_CURRENT_LIST_DIR}/make_program.py ${CMAKE_CURRENT_LIST_DIR}/guide_blocks.py)
+      add_executable(examples_${name} ${source})
+      target_link_libraries(examples_${name} PRIVATE qxcore11e qxcore_options)
+      set_target_properties(examples_${name} PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR})
+      set(program --program $<TARGET_FILE:examples_${name}>)
+    endif()
+    add_test(NAME docs.${name} COMMAND ${Python3_EXECUTABLE} ${CMAKE_CURRENT_LIST_DIR}/run_examples.py ${program}
       ${PROJECT_SOURCE_DIR}/${guide} ${PROJECT_SOURCE_DIR}/samples/texts/files $<TARGET_FILE:qxtool>
       $<$<BOOL:${WIN32}>:wine>
       COMMAND_EXPAND_LISTS)
