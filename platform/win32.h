@@ -65,6 +65,12 @@ using LPINT = int*;
 using LPCCH = const char*;
 using LPCWCH = const WCHAR*;
 
+struct GUID {
+  DWORD Data1;
+  WORD Data2, Data3;
+  BYTE Data4[8];
+};
+
 struct HINSTANCE__;
 using HINSTANCE = HINSTANCE__*;
 using HMODULE = HINSTANCE;
@@ -84,6 +90,7 @@ using HRSRC = HRSRC__*;
 #define S_OK ((HRESULT)0)
 #define S_FALSE ((HRESULT)1)
 #define E_OUTOFMEMORY ((HRESULT)0x8007000E)
+#define E_NOINTERFACE ((HRESULT)0x80004002)
 #define E_ABORT ((HRESULT)0x80004004)
 #define E_FAIL ((HRESULT)0x80004005)
 #define WINAPI
