@@ -22,8 +22,8 @@ QXCORE_API bool BreakDownUtc(std::int32_t time, std::tm& fields);
 
 // The time of a record in local time (mktime): fields out of range carry over into the next, and the
 // record is normalised. tm_isdst says whether daylight saving is meant; negative: whatever is in force then.
-// -1 when the time is out of range, which is also the second before 1970.
-QXCORE_API std::int32_t LocalToTime(std::tm& fields);
+// False, and a time of -1, when it is out of range.
+QXCORE_API bool LocalToTime(std::tm& fields, std::int32_t& time);
 
 // strftime: at most capacity - 1 characters and the terminator. Gives their number; 0 when they do not
 // fit, for an unknown code and for an empty result, and the buffer holds an empty text then.

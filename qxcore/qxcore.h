@@ -60,5 +60,6 @@
 #include "qxcore/system/file.h"
 #include "qxcore/system/locale_time.h"
 #include "qxcore/system/notification_manager.h"
+#include "qxcore/system/ole_date_time.h"
 #include "qxcore/system/time.h"
 #include "qxcore/system/time_span.h"

@@ -201,9 +201,13 @@ bool BreakDownLocal(std::int32_t time, std::tm& fields) { return BreakDown(local
 
 bool BreakDownUtc(std::int32_t time, std::tm& fields) { return BreakDown(gmtime_r, time, fields); }
 
-std::int32_t LocalToTime(std::tm& fields) {
-  const std::time_t time = std::mktime(&fields);
-  return time < INT32_MIN || time > INT32_MAX ? -1 : static_cast<std::int32_t>(time);
+bool LocalToTime(std::tm& fields, std::int32_t& time) {
+  // -1 is a failure unless the day of the week was worked out for it.
+  fields.tm_wday = -1;
+  const std::time_t value = std::mktime(&fields);
+  const bool isTime = (value != -1 || fields.tm_wday >= 0) && value >= INT32_MIN && value <= INT32_MAX;
+  time = isTime ? static_cast<std::int32_t>(value) : -1;
+  return isTime;
 }
 
 std::size_t FormatCalendar(WCHAR* buffer, std::size_t capacity, const WCHAR* format, const std::tm& fields) {

@@ -19,7 +19,9 @@ std::int32_t FromLocalFields(int year, int month, int day, int hour, int minute,
   fields.tm_min = minute;
   fields.tm_sec = second;
   fields.tm_isdst = dst;
-  return platform::LocalToTime(fields);
+  std::int32_t time;
+  platform::LocalToTime(fields, time);
+  return time;
 }
 
 std::int32_t FromSystemTime(const SYSTEMTIME& time, int dst) {
@@ -70,10 +72,7 @@ int STime::GetLocalTm(std::tm* fields) const { return platform::BreakDownLocal(m
 int STime::GetGmtTm(std::tm* fields) const { return platform::BreakDownUtc(m_time, *fields); }
 
 int STime::SetLocalTm(std::tm* fields) {
-  // The runtime's -1 is a failure unless it has worked out the day of the week for it.
-  fields->tm_wday = -1;
-  m_time = platform::LocalToTime(*fields);
-  return m_time != -1 || fields->tm_wday >= 0;
+  return platform::LocalToTime(*fields, m_time);
 }
 
 int STime::SetGmtTm(std::tm* fields) {
@@ -88,10 +87,10 @@ namespace {
 
 using BreakDown = int (STime::*)(std::tm*) const;
 
-// 0 where the time cannot be broken down.
+// -1 where the time cannot be broken down.
 int Field(const STime& time, BreakDown breakDown, int std::tm::*field, int base = 0) {
   std::tm fields;
-  return (time.*breakDown)(&fields) ? fields.*field + base : 0;
+  return (time.*breakDown)(&fields) ? fields.*field + base : -1;
 }
 
 }  // namespace

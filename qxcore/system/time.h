@@ -2,7 +2,7 @@
 //
 // Calendar fields and texts come from the runtime library, in its local time or in UTC. The range is
 // 13 December 1901 to 19 January 2038; on Windows the runtime breaks down no time before 1970: fields
-// are 0 and texts empty there. Arithmetic wraps around at the ends of the range. Differences between
+// are -1 and texts empty there. Arithmetic wraps around at the ends of the range. Differences between
 // the targets: docs/time.md.
 #pragma once
 
@@ -41,7 +41,7 @@ class QXCORE_API STime {
 
   std::int32_t GetTime() const { return m_time; }
 
-  // --- fields; 0 where the runtime cannot break the time down ---
+  // --- fields; -1 where the runtime cannot break the time down ---
   int GetYear() const;       // all four digits
   int GetMonth() const;      // 1 to 12
   int GetDay() const;        // 1 to 31
@@ -76,7 +76,7 @@ class QXCORE_API STime {
   SString GetShortDateString() const;
   SString GetLongDateString() const;
   SString GetTimeStr() const;
-  SString GetShortDateTimeString() const;  // short date, a space, time
+  SString GetShortDateTimeString() const;  // short date, a space, time; the space alone on failure
   SString GetLongDateTimeString() const;   // long date, a space, time
 
   // --- arithmetic and order ---
