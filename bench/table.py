@@ -52,6 +52,8 @@ ROWS = [
     ("detect 64 MB of mixed UTF-8", "uchardet", "speed", 1.2),
     ("detect 4096 bytes", "ICU", "speed", 200.0),
     ("detect 4096 bytes", "uchardet", "speed", 2.0),
+    ("format a time", "strftime", "time", 1.2),
+    ("format a time", "QDateTime", "time", 0.5),
 ]
 
 TO_NANOSECONDS = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}
