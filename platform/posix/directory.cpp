@@ -18,9 +18,9 @@ namespace {
 using namespace platform;
 
 // The convention of all calls that fill a buffer: the length when the text fits, else the size needed.
-DWORD Deliver(const std::u16string& text, DWORD size, LPWSTR buffer) {
+DWORD Deliver(std::u16string_view text, DWORD size, LPWSTR buffer) {
   if (text.size() >= size || buffer == nullptr) return static_cast<DWORD>(text.size() + 1);
-  text.copy(buffer, text.size());
+  std::char_traits<WCHAR>::move(buffer, text.data(), text.size());  // it may be the same place
   buffer[text.size()] = 0;
   return static_cast<DWORD>(text.size());
 }
@@ -60,10 +60,11 @@ DWORD GetFullPathNameW(LPCWSTR path, DWORD size, LPWSTR buffer, LPWSTR* filePart
     return 0;
   }
   return Guarded([&] {
-    const std::u16string full = MakeFullPath(path);
-    const DWORD length = Deliver(full, size, buffer);
-    const std::size_t name = full.find_last_of(u'\\') + 1;
-    if (filePart != nullptr && length < size && name < full.size()) *filePart = buffer + name;
+    const FullPath full(path);
+    const DWORD length = Deliver(full.View(), size, buffer);
+    if (filePart == nullptr || length >= size) return length;
+    const std::size_t name = full.View().find_last_of(u'\\') + 1;
+    if (name < full.View().size()) *filePart = buffer + name;
     return length;
   });
 }

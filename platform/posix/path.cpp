@@ -3,8 +3,9 @@
 #include <dirent.h>
 #include <unistd.h>
 
+#include <algorithm>
+#include <array>
 #include <cerrno>
-#include <climits>
 #include <vector>
 
 #include "platform/wide.h"
@@ -13,15 +14,25 @@ namespace platform {
 namespace {
 
 bool IsSeparator(WCHAR c) { return c == '\\' || c == '/'; }
+bool IsDriveLetter(WCHAR c) { return (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z'); }
 
 // Windows allows these bytes in no name; the slash cannot stand in one here either.
-bool IsForbidden(unsigned byte) {
+constexpr bool IsForbidden(unsigned byte) {
   return (byte > 0 && byte < 0x20) || byte == '"' || byte == '*' || byte == ':' || byte == '<' || byte == '>' ||
          byte == '?' || byte == '|' || byte == '\\';
 }
 
 // A byte that stands mapped in a Windows name.
 bool IsMappedByte(unsigned byte) { return byte >= 0x80 || IsForbidden(byte); }
+
+// The bytes that stand for themselves in both kinds of names.
+constexpr std::array<bool, 256> kPlain = [] {
+  std::array<bool, 256> plain{};
+  for (unsigned byte = 0; byte < 0x80; ++byte) plain[byte] = !IsForbidden(byte);
+  return plain;
+}();
+
+bool IsPlain(char16_t c) { return c < 0x80 && kPlain[c]; }
 
 // Length of the valid UTF-8 sequence at the start, 0 for none.
 std::size_t Utf8Length(std::string_view text) {
@@ -60,6 +71,53 @@ void AppendUtf8(std::string& name, char32_t c) {
   }
 }
 
+// One name as bytes of the file system.
+void AppendName(std::string& bytes, std::u16string_view name) {
+  for (std::size_t i = 0; i < name.size(); ++i) {
+    char32_t c = name[i];
+    if (c >= 0xF000 && c <= 0xF0FF && IsMappedByte(c & 0xFF)) {
+      bytes += static_cast<char>(c & 0xFF);
+      continue;
+    }
+    if (c >= 0xD800 && c < 0xDC00 && i + 1 < name.size() && name[i + 1] >= 0xDC00 && name[i + 1] <= 0xDFFF)
+      c = 0x10000 + ((c - 0xD800) << 10) + (name[++i] - 0xDC00u);
+    AppendUtf8(bytes, c);
+  }
+}
+
+WCHAR* PutMapped(std::string_view bytes, WCHAR* at) {
+  for (const char byte : bytes) *at++ = static_cast<WCHAR>(0xF000 + static_cast<unsigned char>(byte));
+  return at;
+}
+
+// What is not plain: one byte that is mapped, or one UTF-8 sequence.
+WCHAR* PutForeign(std::string_view sequence, WCHAR* at) {
+  if (sequence.size() == 1) return PutMapped(sequence, at);
+  char32_t c = static_cast<unsigned char>(sequence[0]) & (0x7Fu >> sequence.size());
+  for (const char trail : sequence.substr(1)) c = c << 6 | (static_cast<unsigned char>(trail) & 0x3F);
+  if (c >= 0xF000 && c <= 0xF0FF) return PutMapped(sequence, at);
+  if (c >= 0x10000) {
+    *at++ = static_cast<WCHAR>(0xD7C0 + (c >> 10));
+    c = 0xDC00 + (c & 0x3FF);
+  }
+  *at++ = static_cast<WCHAR>(c);
+  return at;
+}
+
+// Absolute on a drive, with backslashes only, and without empty, "." and ".." parts: its own full path.
+bool IsFull(std::u16string_view path) {
+  if (path.size() < 3 || path[1] != ':' || path[2] != '\\' || !IsDriveLetter(path[0])) return false;
+  for (std::size_t i = 3; i < path.size(); ++i) {
+    if (path[i] == '/') return false;
+    if (path[i - 1] != '\\') continue;
+    if (path[i] == '\\') return false;
+    if (path[i] != '.') continue;
+    const std::u16string_view part = path.substr(i, std::min(path.find(u'\\', i), path.size()) - i);
+    if (part.find('/') != std::u16string_view::npos || part == u"." || part == u"..") return false;
+  }
+  return true;
+}
+
 std::u16string CurrentDirectory() {
   std::vector<char> buffer(256);
   while (getcwd(buffer.data(), buffer.size()) == nullptr) {
@@ -87,8 +145,6 @@ void AppendParts(std::u16string& full, std::size_t root, std::u16string_view res
   }
 }
 
-bool IsDriveLetter(WCHAR c) { return (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z'); }
-
 // The entry of a folder that has this name but for case; empty when none does.
 std::string FindNoCase(const std::string& folder, const std::u16string& name) {
   DIR* stream = opendir(folder.c_str());
@@ -105,12 +161,11 @@ std::string FindNoCase(const std::string& folder, const std::u16string& name) {
   return found;
 }
 
-std::vector<std::u16string> SplitParts(const std::u16string& full) {
+std::vector<std::u16string> SplitParts(std::u16string_view full) {
   std::vector<std::u16string> parts;
   for (std::size_t at = 3; at < full.size();) {
-    std::size_t end = full.find(u'\\', at);
-    if (end == std::u16string::npos) end = full.size();
-    parts.emplace_back(full, at, end - at);
+    const std::size_t end = std::min(full.find(u'\\', at), full.size());
+    parts.emplace_back(full.substr(at, end - at));
     at = end + 1;
   }
   return parts;
@@ -152,43 +207,29 @@ void Walk(const std::vector<std::u16string>& parts, Resolved& resolved) {
 std::string ToFileSystemName(std::u16string_view name) {
   std::string result;
   result.reserve(name.size());
-  for (std::size_t i = 0; i < name.size(); ++i) {
-    char32_t c = name[i];
-    if (c >= 0xF000 && c <= 0xF0FF && IsMappedByte(c & 0xFF)) {
-      result += static_cast<char>(c & 0xFF);
-      continue;
-    }
-    if (c >= 0xD800 && c < 0xDC00 && i + 1 < name.size() && name[i + 1] >= 0xDC00 && name[i + 1] <= 0xDFFF)
-      c = 0x10000 + ((c - 0xD800) << 10) + (name[++i] - 0xDC00u);
-    AppendUtf8(result, c);
-  }
+  AppendName(result, name);
   return result;
 }
 
-std::u16string ToWindowsName(std::string_view name) {
-  std::u16string result;
-  result.reserve(name.size());
-  while (!name.empty()) {
-    std::size_t size = Utf8Length(name);
-    const unsigned lead = static_cast<unsigned char>(name[0]);
-    if (size <= 1) {
-      const bool mapped = size == 0 || IsForbidden(lead);
-      result += static_cast<WCHAR>(mapped ? 0xF000 + lead : lead);
-      name.remove_prefix(1);
-      continue;
-    }
-    char32_t c = lead & (0x7Fu >> size);
-    for (std::size_t i = 1; i < size; ++i) c = c << 6 | (static_cast<unsigned char>(name[i]) & 0x3F);
-    if (c >= 0xF000 && c <= 0xF0FF) {
-      for (std::size_t i = 0; i < size; ++i) result += static_cast<WCHAR>(0xF000 + static_cast<unsigned char>(name[i]));
-    } else if (c >= 0x10000) {
-      result += static_cast<WCHAR>(0xD7C0 + (c >> 10));
-      result += static_cast<WCHAR>(0xDC00 + (c & 0x3FF));
+std::size_t ToWindowsName(std::string_view name, WCHAR* buffer) {
+  WCHAR* at = buffer;
+  for (std::size_t i = 0; i < name.size();) {
+    const unsigned lead = static_cast<unsigned char>(name[i]);
+    if (kPlain[lead]) {
+      *at++ = static_cast<WCHAR>(lead);
+      ++i;
     } else {
-      result += static_cast<WCHAR>(c);
+      const std::size_t size = std::max<std::size_t>(Utf8Length(name.substr(i)), 1);
+      at = PutForeign(name.substr(i, size), at);
+      i += size;
     }
-    name.remove_prefix(size);
   }
+  return static_cast<std::size_t>(at - buffer);
+}
+
+std::u16string ToWindowsName(std::string_view name) {
+  std::u16string result(name.size(), u'\0');
+  result.resize(ToWindowsName(name, result.data()));
   return result;
 }
 
@@ -237,37 +278,52 @@ std::u16string MakeFullPath(std::u16string_view path) {
   return full;
 }
 
+FullPath::FullPath(std::u16string_view path) {
+  if (!IsFull(path)) m_made = MakeFullPath(path);
+  m_view = m_made.empty() ? path : std::u16string_view(m_made);
+}
+
+DWORD SpellExactly(std::u16string_view full, std::string& exact) {
+  exact.clear();
+  if (full[0] == '\\') return ERROR_BAD_NETPATH;
+  if (full[0] != 'C' && full[0] != 'c') return ERROR_PATH_NOT_FOUND;
+  if (full.back() == '\\') full.remove_suffix(1);
+  exact.reserve(full.size());
+  for (std::size_t i = 2; i < full.size(); ++i) {
+    if (full[i] == '\\') {
+      exact += '/';
+    } else if (IsPlain(full[i])) {
+      exact += static_cast<char>(full[i]);
+    } else if (full[i] < 0x80) {
+      return ERROR_INVALID_NAME;
+    } else {
+      const std::size_t start = i;
+      while (i + 1 < full.size() && full[i + 1] >= 0x80) ++i;
+      AppendName(exact, full.substr(start, i + 1 - start));
+    }
+  }
+  if (exact.empty()) exact = "/";
+  return ERROR_SUCCESS;
+}
+
 Resolved ResolvePath(LPCWSTR given) {
   Resolved resolved;
   if (given == nullptr || *given == 0) {
     resolved.error = ERROR_PATH_NOT_FOUND;
     return resolved;
   }
-  std::u16string full = MakeFullPath(given);
-  if (full[0] == '\\') {
-    resolved.error = ERROR_BAD_NETPATH;
-    return resolved;
-  }
-  if (full[0] != 'C' && full[0] != 'c') {
-    resolved.error = ERROR_PATH_NOT_FOUND;
-    return resolved;
-  }
-  for (std::size_t i = 3; i < full.size(); ++i)
-    if (full[i] != '\\' && full[i] < 0x80 && IsForbidden(full[i])) {
-      resolved.error = ERROR_INVALID_NAME;
-      return resolved;
-    }
+  const FullPath path(given);
+  std::u16string_view full = path.View();
+  std::string exact;
+  resolved.error = SpellExactly(full, exact);
+  if (resolved.error != ERROR_SUCCESS) return resolved;
   if (full.size() > 3 && full.back() == '\\') {
     resolved.wantsFolder = true;
-    full.pop_back();
+    full.remove_suffix(1);
   }
   // The exact spelling first, in one look.
-  const std::vector<std::u16string> parts = SplitParts(full);
-  std::string exact;
-  for (const std::u16string& part : parts) exact += "/" + ToFileSystemName(part);
-  if (exact.empty()) exact = "/";
   if (lstat(exact.c_str(), &resolved.info) == 0) {
-    resolved.path = exact;
+    resolved.path = std::move(exact);
     resolved.exists = true;
     return resolved;
   }
@@ -275,7 +331,7 @@ Resolved ResolvePath(LPCWSTR given) {
     resolved.error = ErrorFromErrno(errno);
     return resolved;
   }
-  Walk(parts, resolved);
+  Walk(SplitParts(full), resolved);
   return resolved;
 }
 

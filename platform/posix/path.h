@@ -21,12 +21,31 @@ namespace platform {
 // One name, without separators.
 std::string ToFileSystemName(std::u16string_view name);
 std::u16string ToWindowsName(std::string_view name);
+// The same into a buffer with room for as many characters as the name has bytes. Gives the length.
+std::size_t ToWindowsName(std::string_view name, WCHAR* buffer);
 
 // A whole absolute path of the file system as a Windows path, without a trailing backslash but for the root.
 std::u16string ToWindowsPath(std::string_view path);
 
 // The absolute form of a path: drive or server, no "." and "..", backslashes. Empty for an empty path.
 std::u16string MakeFullPath(std::u16string_view path);
+
+// That form, without a copy when the path has it already.
+class FullPath {
+ public:
+  explicit FullPath(std::u16string_view path);
+  FullPath(const FullPath&) = delete;
+  FullPath& operator=(const FullPath&) = delete;
+  std::u16string_view View() const { return m_view; }
+
+ private:
+  std::u16string m_made;
+  std::u16string_view m_view;
+};
+
+// The path of the file system for a full path in its exact spelling, without a trailing slash but for the
+// root. ERROR_SUCCESS, or why there can be none.
+DWORD SpellExactly(std::u16string_view full, std::string& exact);
 
 struct Resolved {
   std::string path;             // of the file system; the last part need not exist
