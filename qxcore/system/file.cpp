@@ -121,7 +121,7 @@ HRESULT SFile::Done() {
 HRESULT SFile::OpenAlways(unsigned long attributes, unsigned long share, Status failure) {
   if (const HRESULT status = Close()) return status;
   DWORD wanted = static_cast<DWORD>(attributes);
-  if (attributes == kCurrentAttributes) {
+  if (wanted == kCurrentAttributes) {
     wanted = ::GetFileAttributesW(m_fullName);
     if (wanted == INVALID_FILE_ATTRIBUTES) wanted = kNormal;
   }

@@ -78,8 +78,9 @@ class QXCORE_API SFile {
   int CheckFilename() const;
   // The full name into its parts (see SplitPath). 1 when there is a name.
   int SplitFilename();
-  // The parts into the full name. An empty drive and an empty directory become the current ones, the
-  // directory gets its backslash.
+  // The parts into the full name. An empty drive becomes the current one, and with it an empty directory the
+  // current one; an empty directory on a given drive is the drive's root, so that what SplitFilename took
+  // apart is put together again. Drive and directory get their backslashes.
   void MakeFilename();
 
   const SString& GetDrive() const { return m_drive; }          // "C:\" or "\\server\"
@@ -176,7 +177,8 @@ class QXCORE_API SFile {
   static HRESULT GetSize(const SString& name, unsigned long& low, unsigned long& high);
   static HRESULT Delete(const SString& name);
   // 1 when Windows keeps the name for a device, whatever folder and extension: CON, AUX, NUL, PRN, COM1 to
-  // COM9, LPT1 to LPT9 (superscript 1 to 3 count as digits), in any case. The same on every target.
+  // COM9, LPT1 to LPT9 (superscript 1 to 3 count as digits), in any case, and when the platform says that the
+  // name is that of a device (FILE_ATTRIBUTE_DEVICE).
   static int IsReserved(const SString& name);
 
   // --- folders ---

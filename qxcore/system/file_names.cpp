@@ -86,8 +86,11 @@ int SFile::SplitPath(const SString& path, SString& drive, SString& directory, SS
 }
 
 void SFile::MakeFilename() {
-  if (m_drive.IsEmpty()) m_drive = GetCurrentDrive();
-  if (m_directory.IsEmpty()) m_directory = GetCurrentDirectoryW();
+  // Without a drive only: an empty directory on a given drive is its root, as SplitFilename has it.
+  if (m_drive.IsEmpty()) {
+    m_drive = GetCurrentDrive();
+    if (m_directory.IsEmpty()) m_directory = GetCurrentDirectoryW();
+  }
   if (m_drive[m_drive.Length() - 1] != '\\') m_drive += WCHAR('\\');
   // The drive has the backslash between them.
   DropLeadingBackslash(m_directory);
@@ -154,6 +157,11 @@ SString SFile::PathToURL(const SString& path) {
 }
 
 int SFile::IsReserved(const SString& name) {
+  // The platform knows devices that are there; of others the name alone tells.
+  WIN32_FILE_ATTRIBUTE_DATA data;
+  if (!name.IsEmpty() && ::GetFileAttributesExW(name, GetFileExInfoStandard, &data) &&
+      (data.dwFileAttributes & FILE_ATTRIBUTE_DEVICE) != 0)
+    return 1;
   const SStringView view = name.View();
   const std::size_t start = view.find_last_of(WTEXT("\\/:"));
   SStringView base = view.substr(start == SStringView::npos ? 0 : start + 1);

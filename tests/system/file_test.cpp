@@ -66,6 +66,9 @@ TEST(FileNames, MakingAndChecking) {
   EXPECT_EQ(file.GetFullName(), SString(WTEXT("C:\\dir\\name")));
   file.Init(SString(), SString(), WTEXT("n"), WTEXT("x"));
   EXPECT_EQ(file.GetFullName(), SFile::GetCurrentDrive() + Here() + WTEXT("\\n.x"));
+  file.Init(WTEXT("C:\\"), SString(), WTEXT("n"), WTEXT("x"));
+  EXPECT_EQ(file.GetFullName(), SString(WTEXT("C:\\n.x")));  // of a given drive, the root
+  file.Init(SString(), SString(), WTEXT("n"), WTEXT("x"));
   // Round trip: what was made splits into the same parts.
   const SString made = file.GetFullName();
   EXPECT_EQ(SFile(made).GetDirectory(), file.GetDirectory());
@@ -81,6 +84,9 @@ TEST(FileNames, MakingAndChecking) {
   SString directory, name;
   EXPECT_EQ(SFile::CheckSplitValidPath(WTEXT("C:\\a\\b.c"), &directory, &name), 1);
   EXPECT_EQ(directory, SString(WTEXT("C:\\a\\")));
+  EXPECT_EQ(name, SString(WTEXT("b.c")));
+  EXPECT_EQ(SFile::CheckSplitValidPath(WTEXT("C:\\b.c"), &directory, &name), 1);
+  EXPECT_EQ(directory, SString(WTEXT("C:\\")));
   EXPECT_EQ(name, SString(WTEXT("b.c")));
   EXPECT_EQ(SFile::CheckSplitValidPath(WTEXT("C:\\a\\b|c"), &directory, nullptr), 0);
   EXPECT_TRUE(directory.IsEmpty());
