@@ -41,11 +41,13 @@ class QXCORE_API SAttrFindFilter : public SFinder {
 // Yields the entries that share a bit with the mask: FindFile(L"C:\\*.*", FILE_ATTRIBUTE_READONLY).
 class QXCORE_API SAttrMatchFindFilter : public SAttrFindFilter {
  public:
+  // The finder is not owned.
   explicit SAttrMatchFindFilter(SFinder& finder) : SAttrFindFilter(finder, true) {}
 };
 
 // Yields the entries that share no bit with the mask.
 class QXCORE_API SAttrRejectFindFilter : public SAttrFindFilter {
  public:
+  // The finder is not owned.
   explicit SAttrRejectFindFilter(SFinder& finder) : SAttrFindFilter(finder, false) {}
 };
