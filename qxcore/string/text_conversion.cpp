@@ -1,47 +1,85 @@
 #include "qxcore/string/text_conversion.h"
 
+#include <algorithm>
 #include <cstring>
 
 #include "qxcore/string/string.h"
 #include "qxcore/string/widen.h"
 
+// A text that ends at its NUL is at most as long as `max`.
+template <class Character>
+static std::basic_string_view<Character> UpToNUL(const Character* text, int max) {
+  std::size_t length = 0;
+  while (length < static_cast<std::size_t>((std::max)(max, 0)) && text[length] != 0) ++length;
+  return {text, length};
+}
+
 char* ST2UTF8Helper(char* dst, const WCHAR* src, int max) {
+  SEncodeUTF8(dst, UpToNUL(src, max));
+  return dst;
+}
+
+char* SEncodeUTF8(char* dst, SStringView src) {
   char* out = dst;
-  for (int i = 0; i < max && src[i] != 0; ++i) {
-    unsigned c = static_cast<unsigned>(src[i]);
-    if (c < 0x80) {
-      *out++ = static_cast<char>(c);
-    } else if (c < 0x800) {
+  const WCHAR* at = src.data();
+  const WCHAR* end = at + src.size();
+  for (;;) {
+    const std::size_t plain = SNarrowASCII<0>(at, static_cast<std::size_t>(end - at), out);
+    out += plain;
+    at += plain;
+    if (at == end || *at == 0) break;
+    const unsigned c = *at++;
+    if (c < 0x800) {
       *out++ = static_cast<char>(0xC0 | c >> 6);
-      *out++ = static_cast<char>(0x80 | (c & 0x3F));
     } else {
       *out++ = static_cast<char>(0xE0 | c >> 12);
       *out++ = static_cast<char>(0x80 | (c >> 6 & 0x3F));
-      *out++ = static_cast<char>(0x80 | (c & 0x3F));
     }
+    *out++ = static_cast<char>(0x80 | (c & 0x3F));
   }
   *out = 0;
-  return dst;
+  return out;
+}
+
+// Decodes one sequence, which begins before its text's NUL or `end` (null: only a NUL ends it); false when that
+// cuts the sequence.
+static bool DecodeSequence(const char*& at, const char* end, WCHAR*& out) {
+  const unsigned lead = static_cast<unsigned char>(*at++);
+  if (lead < 0x80) {
+    *out++ = static_cast<WCHAR>(lead);
+  } else if (lead >= 0xC0 && lead < 0xF0) {
+    unsigned value = lead < 0xE0 ? lead & 0x1F : lead & 0x0F;
+    for (int more = lead < 0xE0 ? 1 : 2; more > 0; --more) {
+      if (at == end || *at == 0) return false;
+      value = value << 6 | (static_cast<unsigned char>(*at++) & 0x3F);
+    }
+    *out++ = static_cast<WCHAR>(value);
+  }
+  return true;
 }
 
 WCHAR* SUTF82THelper(WCHAR* dst, const char* src, int max) {
   WCHAR* out = dst;
   for (int i = 0; i < max && *src != 0; ++i) {
-    unsigned lead = static_cast<unsigned char>(*src++);
-    if (lead < 0x80) {
-      *out++ = static_cast<WCHAR>(lead);
-    } else if (lead >= 0xC0 && lead < 0xF0) {
-      unsigned value = lead < 0xE0 ? lead & 0x1F : lead & 0x0F;
-      for (int more = lead < 0xE0 ? 1 : 2; more > 0; --more) {
-        if (*src == 0) goto cut;
-        value = value << 6 | (static_cast<unsigned char>(*src++) & 0x3F);
-      }
-      *out++ = static_cast<WCHAR>(value);
-    }
+    if (!DecodeSequence(src, nullptr, out)) break;
   }
-cut:
   *out = 0;
   return dst;
+}
+
+WCHAR* SDecodeUTF8(WCHAR* dst, std::string_view src) {
+  WCHAR* out = dst;
+  const char* at = src.data();
+  const char* end = at + src.substr(0, src.find('\0')).size();
+  while (at != end) {
+    const std::size_t plain =
+        SWidenASCII(reinterpret_cast<const unsigned char*>(at), static_cast<std::size_t>(end - at), out);
+    out += plain;
+    at += plain;
+    if (at == end || !DecodeSequence(at, end, out)) break;
+  }
+  *out = 0;
+  return out;
 }
 
 int g_bSwcstombszHadLoss = 0;

@@ -1,6 +1,8 @@
 // Conversions between UTF-16, UTF-8 and the ANSI code page on plain buffers.
 #pragma once
 
+#include <string_view>
+
 #include "platform/win32.h"
 #include "qxcore/core/export.h"
 
@@ -16,6 +18,11 @@ QXCORE_API char* ST2UTF8Helper(char* dst, const WCHAR* src, int max);
 // or a lead byte from 0xF0 on is dropped, but counts. Always terminates; dst needs max + 1 characters.
 // Gives dst.
 QXCORE_API WCHAR* SUTF82THelper(WCHAR* dst, const char* src, int max);
+
+// The same for texts of a known length, up to their first NUL; they give the end of what was written, where the
+// terminator is. dst needs 3 * size + 1 bytes, or size + 1 characters.
+QXCORE_API char* SEncodeUTF8(char* dst, SStringView src);
+QXCORE_API WCHAR* SDecodeUTF8(WCHAR* dst, std::string_view src);
 
 // Not 0 when the last Swcstombsz had to use a default character. Process-wide, not locked.
 extern QXCORE_API int g_bSwcstombszHadLoss;

@@ -144,7 +144,7 @@ TEST(NotificationManager, APassGoesOverTheRegistrationsItBeganWith) {
   const int kind = NewKind(), inner = NewKind();
   SNotificationManager::Advise(&c, inner);
   a.onCall = [&] {
-    SNotificationManager::UnadviseAll(&b);       // still called in this pass
+    SNotificationManager::UnadviseAll(&b);        // still called in this pass
     SNotificationManager::AdviseFirst(&c, kind);  // not called in this pass
     SNotificationManager::Notify(inner, nullptr, 0);
     SNotificationManager::UnadviseAll(&a);

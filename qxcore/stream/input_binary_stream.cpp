@@ -1,0 +1,85 @@
+#include "qxcore/stream/input_binary_stream.h"
+
+#include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/working_buffer.h"
+#include "qxcore/string/text_conversion.h"
+
+QXCORE_IMPLEMENT_CLASS(SInputBinaryStream, SObject, 0)
+
+SInputBinaryStream::~SInputBinaryStream() {
+  if (m_owns) delete m_in;
+}
+
+namespace {
+
+// An unsigned little-endian number; throws SEEOFException where it is cut.
+std::uint32_t ReadNumber(SInputStream& in, unsigned long bytes) {
+  unsigned char number[4] = {};
+  if (in.Read(number, bytes) != bytes) throw SEEOFException();
+  return number[0] | std::uint32_t{number[1]} << 8 | std::uint32_t{number[2]} << 16 | std::uint32_t{number[3]} << 24;
+}
+
+std::int32_t ReadLength(SInputStream& in) {
+  std::uint32_t n = ReadNumber(in, 1);
+  if (n == 0xFF) n = ReadNumber(in, 2);
+  if (n == 0xFFFF) n = ReadNumber(in, 4);
+  return static_cast<std::int32_t>(n);
+}
+
+bool IsPlausible(SInputStream& in, std::int32_t n) {
+  if (n < 0) return false;
+  return n <= SInputBinaryStream::kConfirmAbove || in.Available() >= static_cast<unsigned long>(n);
+}
+
+SString ReadText(SInputStream& in, int n) {
+  SWorkingBuffer<char> bytes(static_cast<std::size_t>(n));
+  unsigned long got = in.Read(bytes.Get(), static_cast<unsigned long>(n));
+  if (got > static_cast<unsigned long>(n)) got = 0;  // all ones: the source has failed
+  SWorkingBuffer<WCHAR> text(got + 1);
+  const WCHAR* end = SDecodeUTF8(text.Get(), std::string_view(bytes.Get(), got));
+  return SString(SStringView(text.Get(), static_cast<std::size_t>(end - text.Get())));
+}
+
+template <class Map>
+SInputBinaryStream& ReadMap(SInputBinaryStream& stream, Map& map) {
+  map.Clear();
+  SString key, value;
+  for (std::int32_t left = SReadCount(stream); left > 0; --left) {
+    stream >> key >> value;
+    map.Add(key, value);
+  }
+  return stream;
+}
+
+}  // namespace
+
+std::int32_t SReadCount(SInputBinaryStream& stream) {
+  return static_cast<std::int32_t>(ReadNumber(SGetStream(stream), 4));
+}
+
+SInputBinaryStream& operator>>(SInputBinaryStream& stream, SString& text) {
+  SInputStream& in = SGetStream(stream);
+  const std::int32_t n = ReadLength(in);
+  if (!IsPlausible(in, n)) {
+    throw SEIOException(static_cast<HRESULT>(0x80990040), WTEXT("Invalid string in binary stream"));
+  }
+  text = n == 0 ? SString() : ReadText(in, n);
+  return stream;
+}
+
+SInputBinaryStream& operator>>(SInputBinaryStream& stream, SStringTable& table) {
+  table.Clear();
+  SString text;
+  for (std::int32_t left = SReadCount(stream); left > 0; --left) {
+    stream >> text;
+    table.Add(text);
+  }
+  return stream;
+}
+
+SInputBinaryStream& operator>>(SInputBinaryStream& stream, SStringMap& map) { return ReadMap(stream, map); }
+SInputBinaryStream& operator>>(SInputBinaryStream& stream, SStringMapNoCase& map) { return ReadMap(stream, map); }
+SInputBinaryStream& operator>>(SInputBinaryStream& stream, SStringUnsortedMap& map) { return ReadMap(stream, map); }
+SInputBinaryStream& operator>>(SInputBinaryStream& stream, SStringUnsortedMapNoCase& map) {
+  return ReadMap(stream, map);
+}
