@@ -39,6 +39,7 @@
 #include "qxcore/stream/input_global.h"
 #include "qxcore/stream/input_pushback_stream.h"
 #include "qxcore/stream/input_stream.h"
+#include "qxcore/stream/java_unicode_escape_filter_stream.h"
 #include "qxcore/stream/multi_format_reader_base.h"
 #include "qxcore/stream/multi_format_reader_status_base.h"
 #include "qxcore/stream/multi_format_reader_unicode.h"

@@ -27,3 +27,10 @@ void SInputStream::Reset() { throw SEIOResetInvalid(); }
 void SInputStream::Close() {}
 const void* SInputStream::TakeRest(unsigned long*) { return nullptr; }
 int SInputStream::GetError() const { return 0; }
+
+unsigned long SInputStream::ReadCharacters(WCHAR* buffer, unsigned long) {
+  const int character = Read();
+  if (character < 0) return 0;
+  *buffer = static_cast<WCHAR>(character);
+  return 1;
+}

@@ -38,6 +38,11 @@ class QXCORE_API SInputStream : public SObject {
   // that fails in the middle looks like the end of the data: who must not lose any asks here.
   virtual int GetError() const;
 
+  // Up to `count` characters, which is not 0, as the single Read gives them one by one: 16-bit characters of a
+  // reader of text, else bytes. Gives how many, at least one but at the end. Here: one, through Read(), so that
+  // nothing is lost when that throws.
+  virtual unsigned long ReadCharacters(WCHAR* buffer, unsigned long count);
+
  protected:
   SInputStream() = default;
 };

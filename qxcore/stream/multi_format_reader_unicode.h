@@ -35,6 +35,9 @@ class QXCORE_API SMultiFormatReaderUnicode : public SMultiFormatReaderBase, publ
   }
   // Up to `count` bytes of 16-bit characters, whole ones only; gives the number of bytes.
   unsigned long Read(void* buffer, unsigned long count) override;
+  unsigned long ReadCharacters(WCHAR* buffer, unsigned long count) override {
+    return SMultiFormatReaderUnicode::Read(buffer, count * sizeof(WCHAR)) / sizeof(WCHAR);
+  }
   // Passes over characters; gives how many.
   unsigned long Skip(unsigned long count) override;
   // The next line, without its end: a line feed, or a carriage return and one. Empty at the end, too: ask

@@ -33,6 +33,22 @@ inline std::size_t SWidenASCII(const unsigned char* in, std::size_t size, WCHAR*
   return done;
 }
 
+// Copies bytes to the characters of the same value.
+inline void SWidenBytes(const unsigned char* in, std::size_t size, WCHAR* out) {
+  std::size_t done = 0;
+#ifdef __SSE2__
+  constexpr std::size_t kBlock = 16;
+  const __m128i zero = _mm_setzero_si128();
+  for (; size - done >= kBlock; done += kBlock) {
+    const __m128i block = _mm_loadu_si128(reinterpret_cast<const __m128i*>(in + done));
+    __m128i* target = reinterpret_cast<__m128i*>(out + done);
+    _mm_storeu_si128(target, _mm_unpacklo_epi8(block, zero));
+    _mm_storeu_si128(target + 1, _mm_unpackhi_epi8(block, zero));
+  }
+#endif
+  for (; done < size; ++done) out[done] = in[done];
+}
+
 // The other way: copies characters below 0x80 to bytes, and stops at the first other one, and at kStop. Gives
 // their number. `out` has room for `size` bytes.
 template <WCHAR kStop>

@@ -42,9 +42,9 @@ TEST(BinaryStream, StringPrefixes_GrowAtTheirLimits) {
     int bytes;
     std::string prefix;
   };
-  for (const Case& one : {Case{253, "\xFE"}, Case{254, std::string("\xFF\xFF\x00", 3)},
-                          Case{65533, std::string("\xFF\xFE\xFF", 3)},
-                          Case{65534, std::string("\xFF\xFF\xFF\xFF\xFF\x00\x00", 7)}}) {
+  for (const Case& one :
+       {Case{253, "\xFE"}, Case{254, std::string("\xFF\xFF\x00", 3)}, Case{65533, std::string("\xFF\xFE\xFF", 3)},
+        Case{65534, std::string("\xFF\xFF\xFF\xFF\xFF\x00\x00", 7)}}) {
     const SString text = Repeated('x', one.bytes);
     const std::string bytes = BytesOf(text);
     EXPECT_EQ(bytes, one.prefix + std::string(static_cast<std::size_t>(one.bytes), 'x') + '\0') << one.bytes;
@@ -55,15 +55,11 @@ TEST(BinaryStream, StringPrefixes_GrowAtTheirLimits) {
 }
 
 TEST(BinaryStream, FileOfAnotherProgram_IsReadAndWrittenToTheByte) {
-  const SStringTable strings{WTEXT(""),
-                             WTEXT("AB"),
-                             WTEXT("\x00E9\x20AC\xD83D\xDE00"),
-                             Repeated('x', 253),
-                             Repeated('y', 254),
-                             Repeated(0xFC, 32767) + WTEXT("z"),
+  const SStringTable strings{WTEXT(""),           WTEXT("AB"),        WTEXT("\x00E9\x20AC\xD83D\xDE00"),
+                             Repeated('x', 253),  Repeated('y', 254), Repeated(0xFC, 32767) + WTEXT("z"),
                              Repeated('w', 65534)};
-  SStringUnsortedMap unsorted{{WTEXT("b"), WTEXT("2")}, {WTEXT("B"), WTEXT("two")}, {WTEXT("a"), WTEXT("1")},
-                              {WTEXT(""), WTEXT("nothing")}};
+  SStringUnsortedMap unsorted{
+      {WTEXT("b"), WTEXT("2")}, {WTEXT("B"), WTEXT("two")}, {WTEXT("a"), WTEXT("1")}, {WTEXT(""), WTEXT("nothing")}};
   SStringUnsortedMapNoCase unsortedNoCase;
   SStringMap sorted;
   SStringMapNoCase sortedNoCase;
@@ -102,14 +98,19 @@ TEST(BinaryStream, AnyText_ComesBack) {
 
 TEST(BinaryStream, ZeroBytesEndATextEarly) {
   SString text;
-  ReadFrom(std::string("\x04" "a\0b\0", 5), text);
+  ReadFrom(std::string("\x04"
+                       "a\0b\0",
+                       5),
+           text);
   EXPECT_EQ(text, WTEXT("a"));
   ReadFrom(std::string("\x03\0bc", 4), text);
   EXPECT_EQ(text, SString::null);
   text = WTEXT("former");
   ReadFrom(std::string(1, '\0'), text);
   EXPECT_EQ(text, SString::null);
-  EXPECT_EQ(BytesOf(SString(SStringView(WTEXT("a\0b"), 3))), std::string("\x02" "a\0", 3));
+  EXPECT_EQ(BytesOf(SString(SStringView(WTEXT("a\0b"), 3))), std::string("\x02"
+                                                                         "a\0",
+                                                                         3));
 }
 
 // The name of the exception that reading one value throws; empty for none.
@@ -139,12 +140,23 @@ TEST(BinaryStream, BadInput_IsTold) {
   EXPECT_EQ(text, large);
 
   SStringTable table{WTEXT("former")};
-  EXPECT_EQ(FailureOf(std::string("\xFF\xFF\xFF\x7F\x02" "a\0\x02" "b\0", 10), table), end) << "a count of two thousand million";
+  EXPECT_EQ(FailureOf(std::string("\xFF\xFF\xFF\x7F\x02"
+                                  "a\0\x02"
+                                  "b\0",
+                                  10),
+                      table),
+            end)
+      << "a count of two thousand million";
   EXPECT_EQ(table.GetCount(), 2);
   EXPECT_EQ(FailureOf("\xFE\xFF\xFF\xFF", table), SString::null);
   EXPECT_TRUE(table.IsEmpty()) << "a negative count";
   SStringMap map{{WTEXT("former"), WTEXT("")}};
-  EXPECT_EQ(FailureOf(std::string("\x01\x00\x00\x00\x02" "a\0", 7), map), end) << "a key without a value";
+  EXPECT_EQ(FailureOf(std::string("\x01\x00\x00\x00\x02"
+                                  "a\0",
+                                  7),
+                      map),
+            end)
+      << "a key without a value";
   EXPECT_TRUE(map.IsEmpty());
 }
 
@@ -184,8 +196,8 @@ TEST(BinaryStream, OwnedStreams_AreDeleted) {
 TEST(BinaryStream, FailedAllocation_KeepsTheText) {
   const std::string bytes = BytesOf(Repeated('x', 200'000));
   SString text = WTEXT("former");
-  const int failures =
-      WithEachAllocationFailing([&] { ReadFrom(bytes, text = WTEXT("former")); }, [&] { EXPECT_EQ(text, WTEXT("former")); });
+  const int failures = WithEachAllocationFailing([&] { ReadFrom(bytes, text = WTEXT("former")); },
+                                                 [&] { EXPECT_EQ(text, WTEXT("former")); });
   EXPECT_GE(failures, 3);
 }
 
