@@ -41,8 +41,8 @@ class QXCORE_API SJavaUnicodeEscapeFilterStream : public SInputStream {
 
   // The text without its escapes, up to the NUL, or up to `end` if that comes first. A backslash, one "u" and
   // four hexadecimal digits of either case are one character; with more than one "u", one of them goes.
-  // Everything else stands for itself, bytes above 127 as U+0080 to U+00FF. A null text gives an empty string. The result
-  // is also put into *copy, unless that is null. Throws SEOutOfMemory.
+  // Everything else stands for itself, bytes above 127 as U+0080 to U+00FF. A null text gives an empty string. The
+  // result is also put into *copy, unless that is null. Throws SEOutOfMemory.
   static SString Unescape(const char* text, SString* copy = nullptr);
   static SString Unescape(const char* begin, const char* end, SString* copy = nullptr);
 
@@ -58,11 +58,11 @@ class QXCORE_API SJavaUnicodeEscapeFilterStream : public SInputStream {
 
   SInputStream* m_in;
   bool m_owns;
-  int m_next = kNone;        // the look-ahead character
-  int m_letters = 0;         // "u" still to be delivered
-  int m_digitCount = 0;      // digits still to be delivered, 0 to 4
-  char m_digits[4] = {};     // the first one is next
-  const WCHAR* m_at = nullptr;   // characters taken from the inner stream in one go, within a block read
+  int m_next = kNone;           // the look-ahead character
+  int m_letters = 0;            // "u" still to be delivered
+  int m_digitCount = 0;         // digits still to be delivered, 0 to 4
+  char m_digits[4] = {};        // the first one is next
+  const WCHAR* m_at = nullptr;  // characters taken from the inner stream in one go, within a block read
   const WCHAR* m_end = nullptr;
   std::exception_ptr m_pending;  // what the next read throws
 };

@@ -71,9 +71,7 @@ int STime::GetLocalTm(std::tm* fields) const { return platform::BreakDownLocal(m
 
 int STime::GetGmtTm(std::tm* fields) const { return platform::BreakDownUtc(m_time, *fields); }
 
-int STime::SetLocalTm(std::tm* fields) {
-  return platform::LocalToTime(*fields, m_time);
-}
+int STime::SetLocalTm(std::tm* fields) { return platform::LocalToTime(*fields, m_time); }
 
 int STime::SetGmtTm(std::tm* fields) {
   const std::int64_t seconds = UtcSeconds(*fields);

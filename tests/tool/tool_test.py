@@ -8,6 +8,7 @@ With the wrapper "wine" the tool is the Windows one; the list of tests is the sa
 import json
 import os
 import pathlib
+import re
 import shlex
 import shutil
 import signal
@@ -399,6 +400,30 @@ class ToolTest(unittest.TestCase):
         self.assertEqual(self.names(), [])
 
     # --- encodings ---
+
+    # --- escape and unescape ---
+
+    def test_escapes_are_those_of_the_rules_and_go_round(self):
+        text = "Größe \\u00e9 \\uu0041 \\u004 日本 \\\n" * 9000  # more than a piece, and cut anywhere
+        marked = re.sub(r"\\(u+)(?=[0-9A-Fa-f]{4})", r"\\u\1", text)
+        units = memoryview(marked.encode("utf-16-le")).cast("H")
+        escaped = "".join(chr(unit) if unit < 128 else f"\\u{unit:04X}" for unit in units)
+        self.write("in.txt", text)
+        self.assert_done(self.run_tool("escape", "in.txt", "escaped.txt"))
+        self.assertEqual((self.folder / "escaped.txt").read_bytes(), escaped.encode("ascii"))
+        self.assert_done(self.run_tool("unescape", "escaped.txt", "out.txt"))
+        self.assertEqual((self.folder / "out.txt").read_text(encoding="utf-8"), text)
+        self.assert_done(self.run_tool("escape", "--to", "UTF-16", "in.txt", "escaped16.txt"))
+        self.assert_done(self.run_tool("unescape", "--to", "GB18030", "escaped16.txt", "out.txt"))
+        if not ON_WINE:
+            self.assertEqual((self.folder / "out.txt").read_text(encoding="gb18030"), text)
+
+    def test_unescape_takes_text_that_is_only_partly_escaped(self):
+        self.write("in.txt", "é\\u00e9日\\u65e5\\uu0041\\u00")
+        self.assert_done(self.run_tool("unescape", "--from", "UTF-8", "in.txt", "-", stdin=b""))
+        self.assertEqual(self.run_tool("unescape", "--from", "UTF-8", "in.txt", "-").stdout.decode("utf-8"), "éé日日\\u0041\\u00")
+        self.assert_one_line(self.run_tool("unescape", "missing.txt", "out.txt"), 1, "missing.txt")
+        self.assertEqual(self.names(), ["in.txt"])
 
     def test_encodings_are_listed(self):
         result = self.run_tool("encodings", "--json")

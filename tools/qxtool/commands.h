@@ -14,7 +14,8 @@ struct DetectOptions {
 };
 int Detect(const DetectOptions& options);
 
-struct ConvertOptions {
+// One text file to another: convert, and with the text changed escape and unescape.
+struct TextPipeOptions {
   std::string from;  // empty: detect as Detect does
   std::string to = "UTF-8";
   std::string replacement;  // one character, "drop", or empty for the library's own
@@ -23,7 +24,9 @@ struct ConvertOptions {
   std::string in;
   std::string out;
 };
-int Convert(const ConvertOptions& options);
+int Convert(const TextPipeOptions& options);
+int Escape(const TextPipeOptions& options);
+int Unescape(const TextPipeOptions& options);
 
 struct EncodingsOptions {
   bool installed = false;

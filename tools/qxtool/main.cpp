@@ -36,8 +36,8 @@ void AddDetect(CLI::App& app, DetectOptions& options) {
   command->add_option("FILE", options.files, "Files; - is standard input")->required();
 }
 
-void AddConvert(CLI::App& app, ConvertOptions& options) {
-  CLI::App* command = app.add_subcommand("convert", "Convert a text file to another encoding");
+void AddTextPipe(CLI::App& app, TextPipeOptions& options, const char* name, const char* description) {
+  CLI::App* command = app.add_subcommand(name, description);
   command
       ->add_option("--from", options.from,
                    "The encoding of IN, with +Detect as a hint only; without it, it is detected")
@@ -72,10 +72,12 @@ int Run(std::vector<std::string> arguments) {
   app.set_version_flag("--version", kVersion);
   app.require_subcommand(1);
   DetectOptions detect;
-  ConvertOptions convert;
+  TextPipeOptions convert, escape, unescape;
   EncodingsOptions encodings;
   AddDetect(app, detect);
-  AddConvert(app, convert);
+  AddTextPipe(app, convert, "convert", "Convert a text file to another encoding");
+  AddTextPipe(app, escape, "escape", "Turn a text file into 7-bit text with Unicode escapes");
+  AddTextPipe(app, unescape, "unescape", "Turn Unicode escapes back into text");
   AddEncodings(app, encodings);
   for (CLI::App* command : app.get_subcommands({})) command->set_version_flag("--version", kVersion);
 
@@ -91,6 +93,8 @@ int Run(std::vector<std::string> arguments) {
   }
   if (app.got_subcommand("detect")) return Detect(detect);
   if (app.got_subcommand("convert")) return Convert(convert);
+  if (app.got_subcommand("escape")) return Escape(escape);
+  if (app.got_subcommand("unescape")) return Unescape(unescape);
   return ListEncodings(encodings);
 }
 

@@ -9,7 +9,7 @@ _qxtool() {
   local cur=${COMP_WORDS[COMP_CWORD]} prev=${COMP_WORDS[COMP_CWORD - 1]} command=${COMP_WORDS[1]}
   COMPREPLY=()
   if [ "$COMP_CWORD" = 1 ]; then
-    mapfile -t COMPREPLY < <(compgen -W "detect convert encodings --help --version" -- "$cur")
+    mapfile -t COMPREPLY < <(compgen -W "detect convert escape unescape encodings --help --version" -- "$cur")
     return
   fi
   case $prev in
@@ -22,7 +22,7 @@ _qxtool() {
     local options=--help
     case $command in
       detect) options="--hint --level --favor --json --help" ;;
-      convert) options="--from --to --replacement --lossless --if-changed --help" ;;
+      convert | escape | unescape) options="--from --to --replacement --lossless --if-changed --help" ;;
       encodings) options="--installed --json --help" ;;
     esac
     mapfile -t COMPREPLY < <(compgen -W "$options" -- "$cur")
