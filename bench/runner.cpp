@@ -36,6 +36,8 @@ State::Iterator State::begin() {
 }
 
 void State::Stop() { m_seconds = Now() - m_start; }
+void State::PauseTiming() { m_pauseStart = Now(); }
+void State::ResumeTiming() { m_start += Now() - m_pauseStart; }
 
 Registration* RegisterBenchmark(const char* name, void (*function)(State&)) {
   All().push_back(std::make_unique<Registration>(Registration{name, function}));

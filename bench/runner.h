@@ -33,6 +33,9 @@ class State {
   void SetBytesProcessed(std::int64_t) {}
   void SetItemsProcessed(std::int64_t) {}
   double Seconds() const { return m_seconds; }
+  // What lies between the two does not count.
+  void PauseTiming();
+  void ResumeTiming();
 
   std::map<std::string, double> counters;
 
@@ -41,6 +44,7 @@ class State {
 
   std::int64_t m_iterations;
   double m_start = 0;
+  double m_pauseStart = 0;
   double m_seconds = 0;
 };
 

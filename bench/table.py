@@ -56,6 +56,16 @@ ROWS = [
     ("format a time", "QDateTime", "time", 0.5),
     ("walk 200,000 files of a tree", "std::filesystem", "time", 2.0),
     ("walk one level of 50,000 files", "std::filesystem", "time", 1.1),
+    ("sort 100,000 lines", "std::u16string", "time", 0.8),
+    ("sort 100,000 lines in natural order", "strverscmp", "time", 1.0),
+    ("join a million strings", "QStringList", "time", 0.7),
+    ("split into a million strings", "QString", "time", 0.7),
+    ("notify eight sinks", "Qt signal", "time", 1.0),
+    ("a million strings in binary form", "QDataStream", "time", 0.5),
+    ("escape 64 MB of plain UTF-16", "memcpy", "speed", 0.5),
+    ("escape 64 MB of mixed UTF-16", "memcpy", "speed", 0.1),
+    ("unescape 64 MB without escapes", "memcpy", "speed", 0.5),
+    ("unescape 64 MB with escapes", "memcpy", "speed", 0.1),
 ]
 
 TO_NANOSECONDS = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}
