@@ -2,6 +2,7 @@
 // Failure, SException or BrokenPipe for main to tell.
 #pragma once
 
+#include <cstdint>
 #include <string>
 #include <vector>
 
@@ -33,3 +34,16 @@ struct EncodingsOptions {
   bool json = false;
 };
 int ListEncodings(const EncodingsOptions& options);
+
+struct ZipOptions {
+  std::string archive;
+  std::string entry;                           // of extract: the name as list shows it
+  std::string out;                             // of extract: a file, or "-"; of extract-all: a folder
+  std::uint64_t maxBytes = ~std::uint64_t{0};  // of extract-all
+  bool force = false;                          // of extract-all: replace files
+  bool json = false;                           // of list
+};
+int ListZip(const ZipOptions& options);
+int TestZip(const ZipOptions& options);
+int ExtractZipEntry(const ZipOptions& options);
+int ExtractZip(const ZipOptions& options);

@@ -10,7 +10,8 @@
 
 void Complain(std::string_view text) {
   std::string line = "qxtool: ";
-  for (char c : text) line += c == '\n' || c == '\r' ? ' ' : c;
+  // Names come from outside; control characters in them could steer the screen.
+  for (char c : text) line += c == '\n' || c == '\r' ? ' ' : (c >= 0 && c < ' ') || c == '\x7F' ? '?' : c;
   line += '\n';
   std::fwrite(line.data(), 1, line.size(), stderr);
 }

@@ -1,4 +1,4 @@
-// qxtool: detects and converts the encodings of text files.
+// qxtool: the library's services for files on the command line.
 
 #include <CLI/App.hpp>
 #include <CLI/Config.hpp>
@@ -57,12 +57,44 @@ void AddEncodings(CLI::App& app, EncodingsOptions& options) {
   command->add_flag("--json", options.json, "Print one JSON object instead of lines");
 }
 
+CLI::App* AddZipCommand(CLI::App* zip, ZipOptions& options, const char* name, const char* description) {
+  CLI::App* command = zip->add_subcommand(name, description);
+  command->set_version_flag("--version", kVersion);
+  command->add_option("ARCHIVE", options.archive, "The zip archive")->required();
+  return command;
+}
+
+void AddZip(CLI::App& app, ZipOptions& options) {
+  CLI::App* zip = app.add_subcommand("zip", "List, test and extract zip archives");
+  zip->require_subcommand(1);
+  AddZipCommand(zip, options, "list", "List the entries as the central directory has them")
+      ->add_flag("--json", options.json, "Print one JSON object instead of lines");
+  AddZipCommand(zip, options, "test", "Read all entries in sequence and compare them with the central directory");
+  CLI::App* extract = AddZipCommand(zip, options, "extract", "Write the data of one entry to a file");
+  extract->add_option("ENTRY", options.entry, "The entry's name, as list shows it")->required();
+  extract->add_option("OUT", options.out, "The file to write; - is standard output")->required();
+  CLI::App* all = AddZipCommand(zip, options, "extract-all", "Write all entries below a folder, and nothing elsewhere");
+  all->add_option("DIR", options.out, "The folder; it is made when it is missing")->required();
+  all->add_option("--max-bytes", options.maxBytes, "Fail rather than write more than N bytes")->type_name("N");
+  all->add_flag("--force", options.force, "Replace files that exist");
+}
+
+int RunZip(const CLI::App& zip, const ZipOptions& options) {
+  if (zip.got_subcommand("list")) return ListZip(options);
+  if (zip.got_subcommand("test")) return TestZip(options);
+  if (zip.got_subcommand("extract")) return ExtractZipEntry(options);
+  return ExtractZip(options);
+}
+
 // What was wrong with the arguments, in one line.
 std::string ReasonOf(const CLI::ParseError& error, const CLI::App& app) {
-  bool hasCommand = !app.get_subcommands().empty();
-  std::vector<std::string> strangers = hasCommand ? std::vector<std::string>() : app.remaining();
-  if (!strangers.empty()) return "\"" + strangers.front() + "\" is no command; qxtool --help lists them";
-  return error.what();
+  const CLI::App* innermost = &app;
+  while (!innermost->get_subcommands().empty()) innermost = innermost->get_subcommands().front();
+  const bool wantsCommand = !innermost->get_subcommands([](const CLI::App*) { return true; }).empty();
+  const std::vector<std::string> strangers = wantsCommand ? app.remaining(true) : std::vector<std::string>();
+  if (strangers.empty()) return error.what();
+  const std::string place = innermost == &app ? "" : " " + innermost->get_name();
+  return "\"" + strangers.front() + "\" is no command; qxtool" + place + " --help lists them";
 }
 
 int Run(std::vector<std::string> arguments) {
@@ -79,6 +111,8 @@ int Run(std::vector<std::string> arguments) {
   AddTextPipe(app, escape, "escape", "Turn a text file into 7-bit text with Unicode escapes");
   AddTextPipe(app, unescape, "unescape", "Turn Unicode escapes back into text");
   AddEncodings(app, encodings);
+  ZipOptions zip;
+  AddZip(app, zip);
   for (CLI::App* command : app.get_subcommands({})) command->set_version_flag("--version", kVersion);
 
   std::reverse(arguments.begin(), arguments.end());  // as the parser wants them
@@ -95,6 +129,7 @@ int Run(std::vector<std::string> arguments) {
   if (app.got_subcommand("convert")) return Convert(convert);
   if (app.got_subcommand("escape")) return Escape(escape);
   if (app.got_subcommand("unescape")) return Unescape(unescape);
+  if (app.got_subcommand("zip")) return RunZip(*app.get_subcommand("zip"), zip);
   return ListEncodings(encodings);
 }
 

@@ -9,7 +9,11 @@ _qxtool() {
   local cur=${COMP_WORDS[COMP_CWORD]} prev=${COMP_WORDS[COMP_CWORD - 1]} command=${COMP_WORDS[1]}
   COMPREPLY=()
   if [ "$COMP_CWORD" = 1 ]; then
-    mapfile -t COMPREPLY < <(compgen -W "detect convert escape unescape encodings --help --version" -- "$cur")
+    mapfile -t COMPREPLY < <(compgen -W "detect convert escape unescape encodings zip --help --version" -- "$cur")
+    return
+  fi
+  if [ "$command" = zip ] && [ "$COMP_CWORD" = 2 ]; then
+    mapfile -t COMPREPLY < <(compgen -W "list test extract extract-all --help" -- "$cur")
     return
   fi
   case $prev in
@@ -24,6 +28,12 @@ _qxtool() {
       detect) options="--hint --level --favor --json --help" ;;
       convert | escape | unescape) options="--from --to --replacement --lossless --if-changed --help" ;;
       encodings) options="--installed --json --help" ;;
+      zip)
+        case ${COMP_WORDS[2]} in
+          list) options="--json --help" ;;
+          extract-all) options="--max-bytes --force --help" ;;
+        esac
+        ;;
     esac
     mapfile -t COMPREPLY < <(compgen -W "$options" -- "$cur")
   elif [ "$command" != encodings ]; then

@@ -55,7 +55,8 @@ bool IsSameContent(const fs::path& a, const fs::path& b) {
 
 }  // namespace
 
-ReplacementFile::ReplacementFile(std::string_view target) : m_target(BehindLinks(console::PathOf(target))) {
+ReplacementFile::ReplacementFile(std::string_view target, Durability durability)
+    : m_durability(durability), m_target(BehindLinks(console::PathOf(target))) {
   std::error_code error;
   fs::file_status status = fs::status(m_target, error);
   if (fs::is_directory(status)) Refuse("Cannot open for writing", "it is a folder");
@@ -82,7 +83,7 @@ ReplacementFile::~ReplacementFile() {
 }
 
 void ReplacementFile::Close() {
-  bool isWritten = console::Synchronise(m_file);
+  bool isWritten = m_durability == Durability::kOnDisk ? console::Synchronise(m_file) : std::fflush(m_file) == 0;
   int why = errno;
   if (std::fclose(m_file) != 0 && isWritten) {
     isWritten = false;

@@ -12,8 +12,11 @@
 
 class ReplacementFile {
  public:
+  // Whether the content is on the disk when Commit comes back, or whenever the system likes.
+  enum class Durability { kOnDisk, kLater };
+
   // Throws Failure when the target's folder does not let itself be written.
-  explicit ReplacementFile(std::string_view target);
+  explicit ReplacementFile(std::string_view target, Durability durability = Durability::kOnDisk);
   ReplacementFile(const ReplacementFile&) = delete;
   ReplacementFile& operator=(const ReplacementFile&) = delete;
   // Removes the temporary file unless it was committed.
@@ -22,13 +25,14 @@ class ReplacementFile {
   // What to write to; owned by this object.
   std::FILE* File() { return m_file; }
 
-  // Hands the content to the disk and puts it in the target's place. With `ifChanged` a target that has
+  // Hands the content over and puts it in the target's place. With `ifChanged` a target that has
   // the same bytes already is left alone. Throws Failure.
   void Commit(bool ifChanged);
 
  private:
   void Close();
 
+  Durability m_durability;
   std::filesystem::path m_target;
   std::filesystem::path m_temporary;  // empty when the target is written directly
   std::FILE* m_file = nullptr;

@@ -42,7 +42,9 @@ std::string WhyNotOpened(const std::string& name) {
   return attempt ? "" : std::strerror(errno);
 }
 
-std::unique_ptr<SInputFile> OpenFile(const std::string& name, ProgressBar& progress) {
+}  // namespace
+
+std::unique_ptr<SInputFile> OpenInput(const std::string& name, ProgressBar& progress) {
   try {
     return std::make_unique<SInputFile>(FromUtf8(name), &progress);
   } catch (const SEIOCantOpenForReading& e) {
@@ -51,15 +53,13 @@ std::unique_ptr<SInputFile> OpenFile(const std::string& name, ProgressBar& progr
   }
 }
 
-}  // namespace
-
 TextSource::TextSource(const std::string& name, Encoding request) : m_progress(name) {
   SInputStream* inner;
   if (name == "-") {
     m_standardInput = std::make_unique<StandardInput>();
     inner = m_standardInput.get();
   } else {
-    m_file = OpenFile(name, m_progress);
+    m_file = OpenInput(name, m_progress);
     m_size = m_file->Available();
     inner = m_file.get();
   }

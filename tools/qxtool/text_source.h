@@ -31,6 +31,9 @@ class CountingInput : public SInputStream {
   unsigned char m_first[3] = {};
 };
 
+// Opens a file for reading. Throws Failure that says what the system has against it.
+std::unique_ptr<SInputFile> OpenInput(const std::string& name, ProgressBar& progress);
+
 class TextSource {
  public:
   // Opens the file, or standard input for "-". Throws SEIOCantOpenForReading.

@@ -1,0 +1,90 @@
+// qxtool zip extract-all: all entries of an archive, below one folder and nowhere else.
+
+#include <filesystem>
+#include <vector>
+
+#include "tools/qxtool/commands.h"
+#include "tools/qxtool/console.h"
+#include "tools/qxtool/entry_path.h"
+#include "tools/qxtool/failure.h"
+#include "tools/qxtool/replacement_file.h"
+#include "tools/qxtool/standard_streams.h"
+#include "tools/qxtool/zip_archive.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+class Extraction {
+ public:
+  Extraction(const ZipOptions& options, ZipArchive& archive) : m_options(options), m_archive(archive), m_data(65536) {}
+
+  // What can be seen before anything is written: names that lead elsewhere, too much data.
+  void CheckBefore() const {
+    std::uint64_t total = 0;
+    for (const SZipEntry& entry : m_archive.Entries()) {
+      PartsOfEntry(entry.GetName());
+      total += static_cast<std::uint64_t>(entry.GetSize());
+    }
+    if (total > m_options.maxBytes) FailOfSize();
+  }
+
+  void Run() {
+    fs::create_directories(console::PathOf(m_options.out));
+    while (const SZipEntry* entry = m_archive.Next()) Extract(*entry);
+  }
+
+ private:
+  [[noreturn]] void FailOfSize() const {
+    throw Failure{"it holds more than " + std::to_string(m_options.maxBytes) + " bytes", kFailed, m_options.archive};
+  }
+
+  void Extract(const SZipEntry& entry) {
+    const std::vector<std::string> parts = PartsOfEntry(entry.GetName());
+    if (entry.IsDirectory() || parts.empty()) {
+      FolderForParts(m_options.out, parts, parts.size());
+      CopyTo(nullptr);
+      return;
+    }
+    ExtractFile(FolderForParts(m_options.out, parts, parts.size() - 1) + "/" + parts.back());
+  }
+
+  void ExtractFile(const std::string& path) try {
+    RequireFileCanBeAt(path, m_options.force);
+    ReplacementFile target(path, ReplacementFile::Durability::kLater);
+    FileOutput output(target.File());
+    CopyTo(&output);
+    output.Flush();
+    target.Commit(false);
+  } catch (...) {
+    FailAt(path);
+  }
+
+  // The entry's data, checked; to nowhere for null.
+  void CopyTo(FileOutput* output) {
+    while (const unsigned long count = m_archive.Read(m_data.data(), static_cast<unsigned long>(m_data.size()))) {
+      // The directory may have told less than there is.
+      if (count > m_options.maxBytes - m_written) FailOfSize();
+      m_written += count;
+      if (output != nullptr) output->Write(m_data.data(), count);
+    }
+    m_archive.CheckRead();
+  }
+
+  const ZipOptions& m_options;
+  ZipArchive& m_archive;
+  std::vector<unsigned char> m_data;
+  std::uint64_t m_written = 0;
+};
+
+}  // namespace
+
+int ExtractZip(const ZipOptions& options) try {
+  ZipArchive archive(options.archive);
+  Extraction extraction(options, archive);
+  extraction.CheckBefore();
+  extraction.Run();
+  return kDone;
+} catch (...) {
+  FailAt(options.archive);
+}
