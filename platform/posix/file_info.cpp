@@ -25,8 +25,9 @@ FILETIME ToFileTime(Ticks ticks) { return {static_cast<DWORD>(ticks), static_cas
 
 FileTimes TimesOf(const struct statx& data) {
   const Ticks access = ToTicks(data.stx_atime), write = ToTicks(data.stx_mtime);
-  const Ticks creation =
-      (data.stx_mask & STATX_BTIME) != 0 ? ToTicks(data.stx_btime) : std::min({access, write, ToTicks(data.stx_ctime)});
+  // Some images of file systems hold zeros for it.
+  const bool hasCreation = (data.stx_mask & STATX_BTIME) != 0 && data.stx_btime.tv_sec != 0;
+  const Ticks creation = hasCreation ? ToTicks(data.stx_btime) : std::min({access, write, ToTicks(data.stx_ctime)});
   return {ToFileTime(creation), ToFileTime(access), ToFileTime(write)};
 }
 

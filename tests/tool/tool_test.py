@@ -24,6 +24,7 @@ import wine  # noqa: E402
 TOOL = []
 ON_WINE = "wine" in sys.argv[2:]
 SAMPLES = pathlib.Path(__file__).resolve().parents[2] / "samples/texts/files"
+COMMANDS = ["detect", "convert", "escape", "unescape", "encodings", "find", "sort", "info", "zip"]
 GERMAN = "Größe, Übermaß und Äpfel\nfür jeden 5 €\n"
 
 
@@ -67,11 +68,11 @@ class ToolTest(unittest.TestCase):
     # --- arguments ---
 
     def test_help_and_version_are_data(self):
-        for arguments in (["--help"], ["detect", "--help"], ["convert", "--help"], ["encodings", "--help"]):
+        for arguments in (["--help"], *([name, "--help"] for name in COMMANDS)):
             result = self.run_tool(*arguments)
             self.assert_done(result)
             self.assertTrue(result.stdout, arguments)
-        for arguments in (["--version"], ["detect", "--version"], ["convert", "--version"], ["encodings", "--version"]):
+        for arguments in (["--version"], *([name, "--version"] for name in COMMANDS)):
             self.assertRegex(self.run_tool(*arguments).stdout.decode(), r"^qxtool \d+\.\d+\.\d+\n$")
 
     def test_wrong_usage_is_told_in_one_line(self):

@@ -47,3 +47,29 @@ int ListZip(const ZipOptions& options);
 int TestZip(const ZipOptions& options);
 int ExtractZipEntry(const ZipOptions& options);
 int ExtractZip(const ZipOptions& options);
+
+struct FindOptions {
+  std::string folder;
+  std::string mask = "*.*";
+  bool folders = false;
+  bool sorted = false;
+  std::string match;   // attributes, see attributes.h; empty: all entries
+  std::string reject;  // empty: none
+  bool json = false;
+};
+int Find(const FindOptions& options);
+
+struct SortOptions {
+  std::string by = "text";  // text, number or length
+  bool ignoreCase = false;
+  bool reverse = false;
+  std::string from;  // empty: detect as Detect does
+  std::string file;
+};
+int Sort(const SortOptions& options);
+
+struct InfoOptions {
+  bool json = false;
+  std::vector<std::string> files;
+};
+int Info(const InfoOptions& options);

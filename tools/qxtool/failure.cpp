@@ -16,6 +16,24 @@ void Complain(std::string_view text) {
   std::fwrite(line.data(), 1, line.size(), stderr);
 }
 
+namespace {
+
+std::string TrimmedUtf8(SStringView text) {
+  std::string trimmed = ToUtf8(text);
+  while (!trimmed.empty() && (trimmed.back() == '\n' || trimmed.back() == '\r' || trimmed.back() == ' '))
+    trimmed.pop_back();
+  return trimmed;
+}
+
+}  // namespace
+
+std::string SystemText(unsigned long error) {
+  WCHAR text[512];
+  const DWORD length = FormatMessageW(FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS, nullptr,
+                                      static_cast<DWORD>(error), 0, text, 512, nullptr);
+  return length > 0 ? TrimmedUtf8({text, length}) : "error " + std::to_string(error);
+}
+
 std::string ReasonOfCurrentException() {
   try {
     throw;
@@ -26,8 +44,7 @@ std::string ReasonOfCurrentException() {
   } catch (const Failure& failure) {
     return failure.text;
   } catch (const SException& e) {
-    std::string text = ToUtf8(e.GetText());
-    while (!text.empty() && (text.back() == '\n' || text.back() == '\r' || text.back() == ' ')) text.pop_back();
+    const std::string text = TrimmedUtf8(e.GetText());
     if (!text.empty()) return text;
     char code[32];
     std::snprintf(code, sizeof code, " 0x%08lX", static_cast<unsigned long>(static_cast<unsigned>(e.GetCode())));

@@ -27,3 +27,6 @@ std::string ReasonOfCurrentException();
 // Throws the failure that is being handled as one that happened to `place`, unless it has a place already
 // or is none that belongs to a file. Only within a catch block.
 [[noreturn]] void FailAt(const std::string& place);
+
+// What the system says about one of its last-error values.
+std::string SystemText(unsigned long error);

@@ -86,6 +86,40 @@ int RunZip(const CLI::App& zip, const ZipOptions& options) {
   return ExtractZip(options);
 }
 
+void AddFind(CLI::App& app, FindOptions& options) {
+  CLI::App* command = app.add_subcommand("find", "List the files, or the folders, of a tree");
+  command->add_flag("--folders", options.folders, "List folders instead of files");
+  command->add_flag("--sorted", options.sorted, "List in order of the paths");
+  command->add_option("--match", options.match, "Only entries with one of these attributes: letters, or a number")
+      ->type_name("ATTRS");
+  command->add_option("--reject", options.reject, "Only entries with none of these attributes")->type_name("ATTRS");
+  command->add_flag("--json", options.json, "Print one JSON object instead of lines");
+  command->add_option("DIR", options.folder, "The folder to look in")->required();
+  command->add_option("MASK", options.mask, "Only names that fit, * and ? standing for any characters")
+      ->capture_default_str();
+}
+
+void AddSort(CLI::App& app, SortOptions& options) {
+  CLI::App* command = app.add_subcommand("sort", "Sort the lines of a text file");
+  command->add_option("--by", options.by, "The order: text, number (natural order) or length")
+      ->check(CLI::IsMember({"text", "number", "length"}))
+      ->type_name("ORDER")
+      ->capture_default_str();
+  command->add_flag("--ignore-case", options.ignoreCase, "Take capital and small letters as the same");
+  command->add_flag("--reverse", options.reverse, "The last line first");
+  command
+      ->add_option("--from", options.from,
+                   "The encoding of FILE, with +Detect as a hint only; without it, it is detected")
+      ->type_name("NAME");
+  command->add_option("FILE", options.file, "The file to read; - is standard input")->required();
+}
+
+void AddInfo(CLI::App& app, InfoOptions& options) {
+  CLI::App* command = app.add_subcommand("info", "Tell size, times, attributes and names of files");
+  command->add_flag("--json", options.json, "Print one JSON object instead of lines");
+  command->add_option("FILE", options.files, "Files or folders")->required();
+}
+
 // What was wrong with the arguments, in one line.
 std::string ReasonOf(const CLI::ParseError& error, const CLI::App& app) {
   const CLI::App* innermost = &app;
@@ -98,7 +132,7 @@ std::string ReasonOf(const CLI::ParseError& error, const CLI::App& app) {
 }
 
 int Run(std::vector<std::string> arguments) {
-  CLI::App app("Detects and converts the encodings of text files.", "qxtool");
+  CLI::App app("Converts text files, reads zip archives, and finds, sorts and describes files.", "qxtool");
   // A path may begin with a slash.
   app.allow_windows_style_options(false);
   app.set_version_flag("--version", kVersion);
@@ -106,6 +140,9 @@ int Run(std::vector<std::string> arguments) {
   DetectOptions detect;
   TextPipeOptions convert, escape, unescape;
   EncodingsOptions encodings;
+  FindOptions find;
+  SortOptions sort;
+  InfoOptions info;
   AddDetect(app, detect);
   AddTextPipe(app, convert, "convert", "Convert a text file to another encoding");
   AddTextPipe(app, escape, "escape", "Turn a text file into 7-bit text with Unicode escapes");
@@ -113,6 +150,9 @@ int Run(std::vector<std::string> arguments) {
   AddEncodings(app, encodings);
   ZipOptions zip;
   AddZip(app, zip);
+  AddFind(app, find);
+  AddSort(app, sort);
+  AddInfo(app, info);
   for (CLI::App* command : app.get_subcommands({})) command->set_version_flag("--version", kVersion);
 
   std::reverse(arguments.begin(), arguments.end());  // as the parser wants them
@@ -130,6 +170,9 @@ int Run(std::vector<std::string> arguments) {
   if (app.got_subcommand("escape")) return Escape(escape);
   if (app.got_subcommand("unescape")) return Unescape(unescape);
   if (app.got_subcommand("zip")) return RunZip(*app.get_subcommand("zip"), zip);
+  if (app.got_subcommand("find")) return Find(find);
+  if (app.got_subcommand("sort")) return Sort(sort);
+  if (app.got_subcommand("info")) return Info(info);
   return ListEncodings(encodings);
 }
 

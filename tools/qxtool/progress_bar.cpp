@@ -13,8 +13,11 @@ constexpr const char* kEraseLine = "\r\x1b[K";
 
 }  // namespace
 
-ProgressBar::ProgressBar(std::string name)
-    : m_name(std::move(name)), m_isTerminal(console::IsTerminal(stderr)), m_nextDraw(Clock::now() + kPatience) {}
+ProgressBar::ProgressBar(std::string name, std::string unit)
+    : m_name(std::move(name)),
+      m_unit(std::move(unit)),
+      m_isTerminal(console::IsTerminal(stderr)),
+      m_nextDraw(Clock::now() + kPatience) {}
 
 void ProgressBar::Clear() {
   if (!m_isShown) return;
@@ -30,6 +33,7 @@ void ProgressBar::SetPos(std::uint64_t position) {
 bool ProgressBar::IsCancelled() { return console::Interrupted(); }
 
 std::string ProgressBar::Amount() const {
+  if (!m_unit.empty()) return std::to_string(m_position) + " " + m_unit;
   char text[32];
   if (m_position > m_range) {  // a pipe, or a file that does not tell its size
     std::snprintf(text, sizeof text, "%.1f MB", static_cast<double>(m_position) / 1e6);

@@ -1,5 +1,6 @@
-// A bar on standard error that tells how far a file has been read. It appears on a terminal only, and
-// only when the work takes longer than a second; it also carries the user's wish to end.
+// A bar on standard error that tells how far a file has been read, or how many files a walk has seen. It
+// appears on a terminal only, and only when the work takes longer than a second; it also carries the
+// user's wish to end.
 #pragma once
 
 #include <chrono>
@@ -9,7 +10,8 @@
 
 class ProgressBar : public SProgressIndicatorEx {
  public:
-  explicit ProgressBar(std::string name);
+  // `unit` is what is counted where the end is not known: empty for bytes.
+  explicit ProgressBar(std::string name, std::string unit = {});
   ProgressBar(const ProgressBar&) = delete;
   ProgressBar& operator=(const ProgressBar&) = delete;
   ~ProgressBar() { Clear(); }
@@ -26,10 +28,11 @@ class ProgressBar : public SProgressIndicatorEx {
   using Clock = std::chrono::steady_clock;
 
   void Draw();
-  // The bar, or where the size is not known how much has been read.
+  // The bar, or where the size is not known how much has been done.
   std::string Amount() const;
 
   std::string m_name;
+  std::string m_unit;
   std::uint64_t m_range = 0;
   std::uint64_t m_position = 0;
   bool m_isTerminal;

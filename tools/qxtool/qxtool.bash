@@ -9,7 +9,7 @@ _qxtool() {
   local cur=${COMP_WORDS[COMP_CWORD]} prev=${COMP_WORDS[COMP_CWORD - 1]} command=${COMP_WORDS[1]}
   COMPREPLY=()
   if [ "$COMP_CWORD" = 1 ]; then
-    mapfile -t COMPREPLY < <(compgen -W "detect convert escape unescape encodings zip --help --version" -- "$cur")
+    mapfile -t COMPREPLY < <(compgen -W "detect convert escape unescape encodings find sort info zip --help --version" -- "$cur")
     return
   fi
   if [ "$command" = zip ] && [ "$COMP_CWORD" = 2 ]; then
@@ -20,6 +20,8 @@ _qxtool() {
     --hint | --from | --to) _qxtool_names "$cur"; return ;;
     --level) mapfile -t COMPREPLY < <(compgen -W "none quick fair full" -- "$cur"); return ;;
     --favor) mapfile -t COMPREPLY < <(compgen -W "hint guess none" -- "$cur"); return ;;
+    --by) mapfile -t COMPREPLY < <(compgen -W "text number length" -- "$cur"); return ;;
+    --match | --reject) mapfile -t COMPREPLY < <(compgen -W "r h s d a v l" -- "$cur"); return ;;
     --replacement) mapfile -t COMPREPLY < <(compgen -W "drop" -- "$cur"); return ;;
   esac
   if [[ $cur == -* ]]; then
@@ -34,6 +36,9 @@ _qxtool() {
           extract-all) options="--max-bytes --force --help" ;;
         esac
         ;;
+      find) options="--folders --sorted --match --reject --json --help" ;;
+      sort) options="--by --ignore-case --reverse --from --help" ;;
+      info) options="--json --help" ;;
     esac
     mapfile -t COMPREPLY < <(compgen -W "$options" -- "$cur")
   elif [ "$command" != encodings ]; then

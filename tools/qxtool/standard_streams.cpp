@@ -47,6 +47,7 @@ void FileOutput::Flush() {
 
 void FileOutput::Fail() {
   int error = errno;
+  if (console::Interrupted()) throw SEIOAbortedException();
   if (m_file == stdout && console::IsBrokenPipe(error)) throw BrokenPipe();
   if (error == ENOSPC) throw SEIODiskFullException();
   throw SEIOWriteFailed();

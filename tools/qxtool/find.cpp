@@ -1,0 +1,192 @@
+// qxtool find: the files or the folders of a tree, a line a path or as JSON.
+
+#include <algorithm>
+#include <vector>
+
+#include "qxcore/core/io_exceptions.h"
+#include "qxcore/system/file.h"
+#include "qxcore/system/recurse_find.h"
+#include "tools/qxtool/attributes.h"
+#include "tools/qxtool/commands.h"
+#include "tools/qxtool/console.h"
+#include "tools/qxtool/failure.h"
+#include "tools/qxtool/file_time.h"
+#include "tools/qxtool/json.h"
+#include "tools/qxtool/progress_bar.h"
+#include "tools/qxtool/standard_streams.h"
+#include "tools/qxtool/utf8.h"
+
+namespace {
+
+constexpr const WCHAR* kEverything = WTEXT("*.*");
+constexpr unsigned long kBits[] = {FILE_ATTRIBUTE_READONLY,     FILE_ATTRIBUTE_HIDDEN,  FILE_ATTRIBUTE_SYSTEM,
+                                   FILE_ATTRIBUTE_DIRECTORY,    FILE_ATTRIBUTE_ARCHIVE, FILE_ATTRIBUTE_DEVICE,
+                                   FILE_ATTRIBUTE_REPARSE_POINT};
+
+struct Entry {
+  SString path;
+  std::string json;  // what is printed instead of the path; empty without --json
+};
+
+struct Unread {
+  SString folder;
+  unsigned long error;
+};
+
+// Keeps what could not be read until it can be told.
+class UnreadFolders final : public SFindFailureSink {
+ public:
+  void OnFolderNotRead(const SString& folder, unsigned long error) override {
+    try {
+      m_all.push_back({folder, error});
+    } catch (...) {
+      m_isComplete = false;
+    }
+  }
+  // Says on standard error what came since the last time.
+  void Tell() {
+    for (; m_told < m_all.size(); ++m_told) {
+      FlushPrinted();  // so that both streams tell things in the same order
+      Complain(ToUtf8(m_all[m_told].folder) + ": " + SystemText(m_all[m_told].error));
+    }
+    if (!m_isComplete) throw Failure{"memory is out"};
+  }
+  const std::vector<Unread>& All() const { return m_all; }
+
+ private:
+  std::vector<Unread> m_all;
+  std::size_t m_told = 0;
+  bool m_isComplete = true;
+};
+
+unsigned long AttributesOf(const SFinder& finder) {
+  unsigned long attributes = 0;
+  for (const unsigned long bit : kBits)
+    if (finder.MatchesMask(bit)) attributes |= bit;
+  return attributes;
+}
+
+std::string AsJson(const SFinder& finder) {
+  const SFile file(finder.GetFilePath());
+  FILETIME time;
+  const TimeTexts written = file.GetDateTime(&time) == SFile::kOk ? TimeTexts(time) : TimeTexts();
+  return "{\"path\":" + JsonString(file.GetFullName()) + ",\"bytes\":" + std::to_string(finder.GetLength()) +
+         ",\"written\":" + JsonStringOrNull(written.utc) + ",\"attributes\":" + JsonValue(AttributesOf(finder)) + "}";
+}
+
+// Prints entries, at once or, to be sorted, at the end.
+class Output {
+ public:
+  explicit Output(const FindOptions& options) : m_options(options), m_separator(options.json ? "\n" : "") {}
+
+  void Add(const SFinder& finder) {
+    Entry entry{finder.GetFilePath(), m_options.json ? AsJson(finder) : std::string()};
+    if (m_options.sorted) {
+      m_entries.push_back(std::move(entry));
+    } else {
+      Put(entry);
+    }
+  }
+  void Finish() {
+    std::sort(m_entries.begin(), m_entries.end(), [](const Entry& a, const Entry& b) { return a.path < b.path; });
+    for (const Entry& entry : m_entries) Put(entry);
+  }
+
+ private:
+  void Put(const Entry& entry) {
+    if (!m_options.json) return Print(ToUtf8(entry.path) + "\n");
+    Print(m_separator + entry.json);
+    m_separator = ",\n";
+  }
+
+  const FindOptions& m_options;
+  std::string m_separator;
+  std::vector<Entry> m_entries;
+};
+
+// What a name must be like to be listed, as far as the finders leave that to their caller.
+class Wanted {
+ public:
+  explicit Wanted(const FindOptions& options)
+      : m_match(AttributesOf(options.match, "--match")),
+        m_reject(AttributesOf(options.reject, "--reject")),
+        m_mask(IsFoundByFinder(options) ? SString(kEverything) : FromUtf8(options.mask)) {
+    if (options.mask.find_first_of("\\/") != std::string::npos)
+      throw Failure{"MASK: \"" + options.mask + "\" is a path; names are looked for in every folder", kWrongUsage};
+  }
+  // The finder of folders asks the mask in the first folder only, and for the finder of files a mask without
+  // wildcards may be a folder.
+  static bool IsFoundByFinder(const FindOptions& options) {
+    return !options.folders && options.mask.find('*') != std::string::npos;
+  }
+  unsigned long Rejected() const { return m_reject; }
+  bool Fits(const SFinder& finder) const {
+    if (m_match != 0 && !finder.MatchesMask(m_match)) return false;
+    if (finder.MatchesMask(m_reject)) return false;
+    return m_mask == kEverything || finder.GetFileName().MatchNoCase(m_mask);
+  }
+
+ private:
+  static unsigned long AttributesOf(const std::string& text, const char* option) {
+    return text.empty() ? 0 : ::AttributesOf(text, option);
+  }
+
+  unsigned long m_match, m_reject;
+  SString m_mask;
+};
+
+template <class Finder>
+void Walk(const SString& mask, const FindOptions& options, const Wanted& wanted, Output& output,
+          UnreadFolders& unread) {
+  // Entries that are printed on a terminal show by themselves how far it is.
+  const bool showsProgress = options.sorted || !console::IsTerminal(stdout);
+  ProgressBar progress(options.folder, options.folders ? "folders" : "files");
+  Finder finder;
+  finder.SetFailureSink(&unread);
+  std::uint64_t count = 0;
+  for (int found = finder.FindFile(mask, wanted.Rejected()); found; found = finder.FindNextFileW()) {
+    if (console::Interrupted()) throw SEIOAbortedException();
+    if (wanted.Fits(finder)) output.Add(finder);
+    if (unread.All().size() > 0) {
+      progress.Clear();
+      unread.Tell();
+    }
+    if (showsProgress) progress.SetPos(++count);
+  }
+}
+
+void PrintErrors(const std::vector<Unread>& unread) {
+  const char* separator = "";
+  for (const Unread& one : unread) {
+    Print(separator + std::string("\n{\"folder\":") + JsonString(one.folder) +
+          ",\"error\":" + JsonString(FromUtf8(SystemText(one.error))) + "}");
+    separator = ",";
+  }
+}
+
+}  // namespace
+
+int Find(const FindOptions& options) {
+  const Wanted wanted(options);
+  const SString folder = SFile::NormalizeDirectoryName(FromUtf8(options.folder));
+  if (!SFile::IsDirectory(folder)) throw Failure{"there is no such folder", kFailed, options.folder};
+  const bool isRoot = folder[folder.Length() - 1] == '\\';
+  const SString mask = folder + (isRoot ? WTEXT("") : WTEXT("\\")) +
+                       (Wanted::IsFoundByFinder(options) ? FromUtf8(options.mask) : SString(kEverything));
+  Output output(options);
+  UnreadFolders unread;
+  if (options.json) Print("{\"version\":1,\"entries\":[");
+  if (options.folders) {
+    Walk<SRecurseFindFolders>(mask, options, wanted, output, unread);
+  } else {
+    Walk<SRecurseFindFiles>(mask, options, wanted, output, unread);
+  }
+  unread.Tell();
+  output.Finish();
+  if (options.json) {
+    Print("\n],\"errors\":[");
+    PrintErrors(unread.All());
+    Print("\n]}\n");
+  }
+  return unread.All().empty() ? kDone : kFailed;
+}
