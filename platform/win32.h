@@ -76,6 +76,10 @@ using HINSTANCE = HINSTANCE__*;
 using HMODULE = HINSTANCE;
 struct HRSRC__;
 using HRSRC = HRSRC__*;
+struct HKEY__;
+using HKEY = HKEY__*;
+using LSTATUS = LONG;
+using REGSAM = DWORD;
 
 // --- constants ---
 
@@ -92,7 +96,9 @@ using HRSRC = HRSRC__*;
 #define E_OUTOFMEMORY ((HRESULT)0x8007000E)
 #define E_NOINTERFACE ((HRESULT)0x80004002)
 #define E_ABORT ((HRESULT)0x80004004)
+#define E_POINTER ((HRESULT)0x80004003)
 #define E_FAIL ((HRESULT)0x80004005)
+#define E_INVALIDARG ((HRESULT)0x80070057)
 #define WINAPI
 #define CALLBACK
 #include "platform/win32_constants.h"

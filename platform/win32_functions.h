@@ -178,6 +178,39 @@ QXCORE_API SIZE_T GlobalSize(HGLOBAL block);
 QXCORE_API UINT GlobalFlags(HGLOBAL block);
 QXCORE_API HGLOBAL GlobalFree(HGLOBAL block);
 
+// --- the registry: one database under the user's data folder (docs/settings.md) ---
+
+// The roots are trees of their own. Sub-keys come in the order of their upper-case names, values in the
+// order in which they were made. Names: up to 255 characters a key, 16383 a value. Times of the last
+// write are not kept; they are 0. Security, options and class texts are ignored.
+QXCORE_API LSTATUS RegOpenKeyExW(HKEY key, LPCWSTR path, DWORD options, REGSAM access, HKEY* result);
+QXCORE_API LSTATUS RegCreateKeyExW(HKEY key, LPCWSTR path, DWORD reserved, LPWSTR className, DWORD options,
+                                   REGSAM access, const SECURITY_ATTRIBUTES* security, HKEY* result,
+                                   LPDWORD disposition);
+QXCORE_API LSTATUS RegCloseKey(HKEY key);
+QXCORE_API LSTATUS RegDeleteKeyW(HKEY key, LPCWSTR path);
+QXCORE_API LSTATUS RegQueryInfoKeyW(HKEY key, LPWSTR className, LPDWORD classLength, LPDWORD reserved, LPDWORD subKeys,
+                                    LPDWORD longestSubKey, LPDWORD longestClass, LPDWORD values,
+                                    LPDWORD longestValueName, LPDWORD longestValue, LPDWORD securityDescriptor,
+                                    FILETIME* lastWrite);
+QXCORE_API LSTATUS RegEnumKeyExW(HKEY key, DWORD index, LPWSTR name, LPDWORD nameLength, LPDWORD reserved,
+                                 LPWSTR className, LPDWORD classLength, FILETIME* lastWrite);
+QXCORE_API LSTATUS RegEnumValueW(HKEY key, DWORD index, LPWSTR name, LPDWORD nameLength, LPDWORD reserved, LPDWORD type,
+                                 BYTE* data, LPDWORD size);
+QXCORE_API LSTATUS RegSetValueExW(HKEY key, LPCWSTR name, DWORD reserved, DWORD type, const BYTE* data, DWORD size);
+QXCORE_API LSTATUS RegQueryValueExW(HKEY key, LPCWSTR name, LPDWORD reserved, LPDWORD type, BYTE* data, LPDWORD size);
+QXCORE_API LSTATUS RegDeleteValueW(HKEY key, LPCWSTR name);
+// Names of variables are looked up as written, then without regard to case.
+QXCORE_API DWORD ExpandEnvironmentStringsW(LPCWSTR text, LPWSTR expanded, DWORD capacity);
+
+// --- initialisation files ---
+
+// A name without a folder is one in the system directory's place on Windows; here in the folder
+// "qxcore" of the user's configuration.
+QXCORE_API DWORD GetPrivateProfileStringW(LPCWSTR section, LPCWSTR key, LPCWSTR standard, LPWSTR text, DWORD capacity,
+                                          LPCWSTR file);
+QXCORE_API BOOL WritePrivateProfileStringW(LPCWSTR section, LPCWSTR key, LPCWSTR text, LPCWSTR file);
+
 // --- files; how paths are read: docs/portable-layer.md ---
 
 // No overlapped access. Sharing modes hold against everybody who opens through this layer, in other

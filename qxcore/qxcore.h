@@ -80,5 +80,7 @@
 #include "qxcore/system/ole_date_time.h"
 #include "qxcore/system/ordered_recurse_find_files.h"
 #include "qxcore/system/recurse_find.h"
+#include "qxcore/system/profile.h"
+#include "qxcore/system/registry.h"
 #include "qxcore/system/time.h"
 #include "qxcore/system/time_span.h"
