@@ -3,3 +3,11 @@ if(NOT WIN32)
   add_test(NAME platform.no_wide_runtime COMMAND sh -c
     "! nm -D --undefined-only '$<TARGET_FILE:qxcore11e>' | grep -E ' (wcs|wmem|wprintf|v?[fs]wprintf|isw|tow[lu]|fputw|fgetw|putw|getw|btowc|wctob|mbs|mbr|wcr)|basic_stringIw'")
 endif()
+
+# Each in a process of its own.
+if(NOT WIN32)
+  foreach(case RegistryProcesses.EveryAcknowledgedWriteIsThere RegistryProcesses.ReadersSeeWritesAtOnce
+      RegistryProcesses.ReadersOfAForeignDatabase ProfileProcesses.EveryAcknowledgedWriteIsThere)
+    add_test(NAME platform.${case} COMMAND test_platform --gtest_also_run_disabled_tests --gtest_filter=DISABLED_${case})
+  endforeach()
+endif()
