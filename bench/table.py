@@ -54,6 +54,8 @@ ROWS = [
     ("detect 4096 bytes", "uchardet", "speed", 2.0),
     ("format a time", "strftime", "time", 1.2),
     ("format a time", "QDateTime", "time", 0.5),
+    ("100,000 settings read", "QSettings", "time", 6.0),
+    ("a setting written", "QSettings", "time", 0.05),
     ("walk 200,000 files of a tree", "std::filesystem", "time", 2.0),
     ("walk one level of 50,000 files", "std::filesystem", "time", 1.1),
     ("sort 100,000 lines", "std::u16string", "time", 0.8),
