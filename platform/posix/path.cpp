@@ -251,7 +251,8 @@ std::u16string ToWindowsPath(std::string_view path) {
 std::u16string MakeFullPath(std::u16string_view path) {
   if (path.empty()) return std::u16string();
   std::u16string full;
-  if (path.size() >= 4 && path.substr(0, 4) == u"\\\\?\\") path.remove_prefix(4);
+  if (path.size() >= 6 && path.substr(0, 4) == u"\\\\?\\" && IsDriveLetter(path[4]) && path[5] == ':')
+    path.remove_prefix(4);
   if (path.size() >= 2 && IsSeparator(path[0]) && IsSeparator(path[1])) {
     // The server and the share are the root.
     full = u"\\\\";
