@@ -30,7 +30,8 @@ const std::vector<StdText>& Names() {
     std::mt19937 random(3);
     std::vector<StdText> made(1'000'000);
     for (StdText& name : made) {
-      for (int letters = 5 + static_cast<int>(random() % 26); letters > 0; --letters) name += static_cast<WCHAR>('a' + random() % 26);
+      for (int letters = 5 + static_cast<int>(random() % 26); letters > 0; --letters)
+        name += static_cast<WCHAR>('a' + random() % 26);
     }
     return made;
   }();
@@ -57,18 +58,18 @@ void Escape(benchmark::State& state, const std::string& utf16) {
   std::vector<char> piece(bench::kPieceBytes);
   for (auto _ : state) {
     SInputBuffer bytes(utf16.data(), static_cast<unsigned long>(utf16.size()));
-    SMultiFormatReaderUnicode reader(bytes, Encodings::kUTF16Little);
+    SMultiFormatReaderUnicode reader(bytes, Encodings::kUTF16LE);
     SJavaUnicodeEscapeFilterStream filter(reader);
     while (filter.Read(piece.data(), bench::kPieceBytes) != 0) benchmark::DoNotOptimize(piece.data());
   }
 }
 
-// Text with its escapes, taken back in pieces that end between lines.
+// Text with its escapes, taken back in pieces that end between words.
 void Unescape(benchmark::State& state, const std::string& text) {
   for (auto _ : state) {
     for (std::size_t at = 0; at < text.size();) {
       std::size_t end = std::min(text.size(), at + bench::kPieceBytes);
-      if (end != text.size()) end = text.rfind('\n', end) + 1;
+      if (end != text.size()) end = text.rfind(' ', end) + 1;
       const SString back = SJavaUnicodeEscapeFilterStream::Unescape(text.data() + at, text.data() + end);
       benchmark::DoNotOptimize(back.GetSafePointer());
       at = end;
@@ -88,7 +89,7 @@ const std::string& PlainUtf16() {
 const std::string& EscapedText() {
   static const std::string text = [] {
     SInputBuffer bytes(bench::Utf16().data(), static_cast<unsigned long>(bench::Utf16().size()));
-    SMultiFormatReaderUnicode reader(bytes, Encodings::kUTF16Little);
+    SMultiFormatReaderUnicode reader(bytes, Encodings::kUTF16LE);
     SJavaUnicodeEscapeFilterStream filter(reader);
     std::string made(bench::kInputBytes, 0);
     made.resize(filter.Read(made.data(), bench::kInputBytes));

@@ -28,7 +28,8 @@ const std::vector<StdText>& Lines() {
     std::vector<StdText> made;
     for (int i = 0; i < kLines; ++i) {
       std::string line = kStarts[random() % std::size(kStarts)] + std::to_string(random() % 5000) + '_';
-      for (int letters = static_cast<int>(random() % 20); letters >= 0; --letters) line += static_cast<char>('a' + random() % 26);
+      for (int letters = static_cast<int>(random() % 20); letters >= 0; --letters)
+        line += static_cast<char>('a' + random() % 26);
       line += std::to_string(random() % 100) + ".txt";
       made.emplace_back(line.begin(), line.end());
     }
@@ -49,7 +50,8 @@ const std::vector<StdText>& Pieces() {
     std::mt19937 random(2);
     std::vector<StdText> made(kPieces);
     for (StdText& piece : made) {
-      for (int letters = 3 + static_cast<int>(random() % 10); letters > 0; --letters) piece += static_cast<WCHAR>('a' + random() % 26);
+      for (int letters = 3 + static_cast<int>(random() % 10); letters > 0; --letters)
+        piece += static_cast<WCHAR>('a' + random() % 26);
     }
     return made;
   }();
@@ -120,7 +122,8 @@ BENCH("sort 100,000 lines/std::u16string") { SortPeer(state, Lines(), std::less<
 BENCH("sort 100,000 lines in natural order/strverscmp") {
   std::vector<std::string> lines;
   for (const StdText& line : Lines()) lines.emplace_back(line.begin(), line.end());
-  SortPeer(state, lines, [](const std::string& a, const std::string& b) { return strverscmp(a.c_str(), b.c_str()) < 0; });
+  SortPeer(state, lines,
+           [](const std::string& a, const std::string& b) { return strverscmp(a.c_str(), b.c_str()) < 0; });
 }
 
 QString ToQt(const StdText& text) { return QString::fromUtf16(text.data(), static_cast<int>(text.size())); }
