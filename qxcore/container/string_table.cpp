@@ -158,11 +158,20 @@ void Prefetch(const SStringTable& table, int i) {
   if (i < table.GetCount()) __builtin_prefetch(table[i].GetSafePointer());
 }
 
+// Room for the joined text, if all elements are about as long as the first ones.
+unsigned LikelyLength(const SStringTable& table, int separatorLength) {
+  const int sample = (std::min)(table.GetCount(), 64);
+  double length = 0;
+  for (int i = 0; i < sample; ++i) length += table[i].Length() + separatorLength;
+  length *= 1.05 * table.GetCount() / sample;
+  return static_cast<unsigned>((std::clamp)(length, 256.0, 256.0 * 1024 * 1024));
+}
+
 }  // namespace
 
 SString SStringTable::Format(const SString& prefix, const SString& separator, const SString& suffix) const {
   if (IsEmpty()) return SString();
-  SStringBuffer text(256);
+  SStringBuffer text(LikelyLength(*this, separator.Length()));
   text += prefix;
   for (int i = 0; i < m_count; ++i) {
     Prefetch(*this, i + kAhead);

@@ -31,13 +31,16 @@ bool IsPlausible(SInputStream& in, std::int32_t n) {
   return n <= SInputBinaryStream::kConfirmAbove || in.Available() >= static_cast<unsigned long>(n);
 }
 
+// Most texts are plain, and then have as many characters as bytes but for the zero.
 SString ReadText(SInputStream& in, int n) {
   SWorkingBuffer<char> bytes(static_cast<std::size_t>(n));
   unsigned long got = in.Read(bytes.Get(), static_cast<unsigned long>(n));
   if (got > static_cast<unsigned long>(n)) got = 0;  // all ones: the source has failed
-  SWorkingBuffer<WCHAR> text(got + 1);
-  const WCHAR* end = SDecodeUTF8(text.Get(), std::string_view(bytes.Get(), got));
-  return SString(SStringView(text.Get(), static_cast<std::size_t>(end - text.Get())));
+  SString text;
+  WCHAR* characters = text.GetBufferSetLength(n);
+  const int length = static_cast<int>(SDecodeUTF8(characters, std::string_view(bytes.Get(), got)) - characters);
+  text.Unlock(length);
+  return length >= n - 1 ? text : SString(text.View());  // gives back what was too much
 }
 
 template <class Map>

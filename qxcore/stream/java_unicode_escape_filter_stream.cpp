@@ -1,6 +1,8 @@
 #include "qxcore/stream/java_unicode_escape_filter_stream.h"
 
 #include <algorithm>
+#include <array>
+#include <cstdint>
 #include <cstring>
 #include <limits>
 #include <utility>
@@ -14,20 +16,33 @@ using Filter = SJavaUnicodeEscapeFilterStream;
 
 namespace {
 
-constexpr char kAlphabet[] = "0123456789ABCDEF";
 constexpr int kDigits = 4;
 constexpr unsigned long kEscapeLength = 2 + kDigits;
 
+// The four digits at once: a nibble to a byte, and 7 more for those above 9.
 void PutDigits(unsigned character, char* digits) {
-  for (int i = 0; i < kDigits; ++i) digits[i] = kAlphabet[character >> (12 - 4 * i) & 15];
+  const std::uint32_t nibbles =
+      (character >> 12 & 0xF) | (character & 0xF00) | (character << 12 & 0xF0000) | (character << 24 & 0xF000000);
+  const std::uint32_t letters = (nibbles + 0x06060606) >> 4 & 0x01010101;
+  const std::uint32_t text = nibbles + 0x30303030 + 7 * letters;
+  for (int i = 0; i < kDigits; ++i) digits[i] = static_cast<char>(text >> 8 * i);
 }
 
-// The value of a hexadecimal digit, or -1.
-int DigitValue(int c) {
-  if (c >= '0' && c <= '9') return c - '0';
-  if (c >= 'A' && c <= 'F') return c - 'A' + 10;
-  if (c >= 'a' && c <= 'f') return c - 'a' + 10;
-  return -1;
+// Values of the hexadecimal digits by character; 16 for others.
+constexpr auto kDigitValues = [] {
+  std::array<unsigned char, 256> values{};
+  for (unsigned char& value : values) value = 16;
+  for (unsigned char i = 0; i < 10; ++i) values['0' + i] = i;
+  for (unsigned char i = 0; i < 6; ++i) values['A' + i] = values['a' + i] = static_cast<unsigned char>(10 + i);
+  return values;
+}();
+
+// The value of a hexadecimal digit, or 16; of four of them, or more than 0xFFFF.
+unsigned DigitValue(int c) { return c >= 0 && c < 256 ? kDigitValues[static_cast<unsigned>(c)] : 16; }
+unsigned ValueOf(const char* digits) {
+  const auto* at = reinterpret_cast<const unsigned char*>(digits);
+  const unsigned a = kDigitValues[at[0]], b = kDigitValues[at[1]], c = kDigitValues[at[2]], d = kDigitValues[at[3]];
+  return (a | b | c | d) < 16 ? a << 12 | b << 8 | c << 4 | d : 0x10000;
 }
 
 }  // namespace
@@ -79,7 +94,7 @@ int Filter::EscapeBackslash() {
   m_next = TakeAhead();
   for (; m_next == 'u'; m_next = TakeAhead()) ++m_letters;
   if (m_letters == 0) return '\\';
-  while (m_digitCount < kDigits && DigitValue(m_next) >= 0) {
+  while (m_digitCount < kDigits && DigitValue(m_next) < 16) {
     m_digits[m_digitCount++] = static_cast<char>(m_next);
     m_next = m_digitCount < kDigits ? TakeAhead() : kNone;
   }
@@ -126,10 +141,12 @@ unsigned long Filter::ReadRun(char* out, unsigned long room) {
     m_at += plain;
     if (m_at == m_end) break;
     if (*m_at != '\\') {
-      to[0] = '\\';
-      to[1] = 'u';
-      PutDigits(*m_at++, to + 2);
-      to += kEscapeLength;
+      do {
+        to[0] = '\\';
+        to[1] = 'u';
+        PutDigits(*m_at++, to + 2);
+        to += kEscapeLength;
+      } while (m_at != m_end && *m_at >= 128);
       continue;
     }
     // One by one, and perhaps with characters behind these, so that what waits may exceed the room.
@@ -170,55 +187,35 @@ void Filter::Close() {
 
 namespace {
 
-// What a backslash begins: its letters, and the value of four digits behind them, or -1.
-struct Escape {
-  const char* afterLetters;
-  long letters;
-  int value;
-};
-
-Escape LookAt(const char* backslash, const char* end) {
-  const char* at = backslash + 1;
-  while (at != end && *at == 'u') ++at;
-  const long letters = static_cast<long>(at - backslash - 1);
-  int value = -1;
-  if (letters > 0 && end - at >= kDigits) {
-    value = 0;
-    for (int i = 0; i < kDigits && value >= 0; ++i) {
-      const int digit = DigitValue(at[i]);
-      value = digit < 0 ? -1 : value << 4 | digit;
-    }
-  }
-  return {at, letters, value};
+// Copies what begins with a backslash but is no plain escape; `at` is moved behind it. Gives the end.
+WCHAR* CopyBackslash(WCHAR* out, const char*& at, const char* end) {
+  const char* afterLetters = at + 1;
+  while (afterLetters != end && *afterLetters == 'u') ++afterLetters;
+  const bool isMarked = afterLetters - at > 2 && end - afterLetters >= kDigits && ValueOf(afterLetters) <= 0xFFFF;
+  *out++ = WTEXT('\\');
+  for (at += isMarked ? 2 : 1; at < afterLetters; ++at) *out++ = WTEXT('u');  // these need no second look
+  return out;
 }
 
-// Writes the text to `out`, which has room for as many characters as there are bytes; gives the end.
+// Writes the text up to its NUL to `out`, which has room for as many characters as there are bytes; gives the end.
 WCHAR* UnescapeTo(WCHAR* out, const char* at, const char* end) {
-  auto copy = [&out](const char* from, const char* to) {
-    const std::size_t size = static_cast<std::size_t>(to - from);
-    SWidenBytes(reinterpret_cast<const unsigned char*>(from), size, out);
-    out += size;
-  };
+  constexpr std::ptrdiff_t kLength = kEscapeLength;
   for (;;) {
-    const void* found = at != end ? std::memchr(at, '\\', static_cast<std::size_t>(end - at)) : nullptr;
-    if (found == nullptr) break;
-    const char* backslash = static_cast<const char*>(found);
-    copy(at, backslash);
-    const Escape escape = LookAt(backslash, end);
-    if (escape.letters == 1 && escape.value >= 0) {
-      *out++ = static_cast<WCHAR>(escape.value);
-      at = escape.afterLetters + kDigits;
-    } else {
-      *out++ = WTEXT('\\');
-      at = backslash + (escape.value >= 0 ? 2 : 1);
-    }
-    if (escape.letters > 1) {  // the letters that stay need no second look
-      copy(at, escape.afterLetters);
-      at = escape.afterLetters;
-    }
+    const std::size_t plain = SWidenUntil<SStopAtBackslashAndNUL>(reinterpret_cast<const unsigned char*>(at),
+                                                                  static_cast<std::size_t>(end - at), out);
+    out += plain;
+    at += plain;
+    if (at == end || *at == 0) return out;
+    do {
+      const unsigned value = end - at >= kLength && at[1] == 'u' ? ValueOf(at + 2) : 0x10000;
+      if (value > 0xFFFF) {
+        out = CopyBackslash(out, at, end);
+        break;
+      }
+      *out++ = static_cast<WCHAR>(value);
+      at += kLength;
+    } while (at != end && *at == '\\');
   }
-  copy(at, end);
-  return out;
 }
 
 }  // namespace
@@ -230,14 +227,12 @@ SString Filter::Unescape(const char* text, SString* copy) {
 SString Filter::Unescape(const char* begin, const char* end, SString* copy) {
   SString result;
   if (begin != nullptr && begin < end) {
-    const char* last = static_cast<const char*>(std::memchr(begin, 0, static_cast<std::size_t>(end - begin)));
-    if (last == nullptr) last = end;
-    const std::ptrdiff_t size = last - begin;
+    const std::ptrdiff_t size = end - begin;
     if (size > (std::numeric_limits<int>::max)() - 1) throw SEOutOfMemory();
     WCHAR* out = result.GetBufferSetLength(static_cast<int>(size));
-    const std::ptrdiff_t length = UnescapeTo(out, begin, last) - out;
+    const std::ptrdiff_t length = UnescapeTo(out, begin, end) - out;
     result.Unlock(static_cast<int>(length));
-    if (length < size / 2) result = SString(SStringView(result.View()));  // gives back what the escapes took
+    if (length < size / 2) result = SString(result.View());  // gives back what the escapes took
   }
   if (copy != nullptr) *copy = result;
   return result;

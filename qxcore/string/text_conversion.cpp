@@ -70,13 +70,13 @@ WCHAR* SUTF82THelper(WCHAR* dst, const char* src, int max) {
 WCHAR* SDecodeUTF8(WCHAR* dst, std::string_view src) {
   WCHAR* out = dst;
   const char* at = src.data();
-  const char* end = at + src.substr(0, src.find('\0')).size();
-  while (at != end) {
-    const std::size_t plain =
-        SWidenASCII(reinterpret_cast<const unsigned char*>(at), static_cast<std::size_t>(end - at), out);
+  const char* end = at + src.size();
+  for (;;) {
+    const std::size_t plain = SWidenUntil<SStopAtHighAndNUL>(reinterpret_cast<const unsigned char*>(at),
+                                                             static_cast<std::size_t>(end - at), out);
     out += plain;
     at += plain;
-    if (at == end || !DecodeSequence(at, end, out)) break;
+    if (at == end || *at == 0 || !DecodeSequence(at, end, out)) break;
   }
   *out = 0;
   return out;
