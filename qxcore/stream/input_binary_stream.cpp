@@ -20,8 +20,10 @@ std::uint32_t ReadNumber(SInputStream& in, unsigned long bytes) {
 }
 
 std::int32_t ReadLength(SInputStream& in) {
-  std::uint32_t n = ReadNumber(in, 1);
-  if (n == 0xFF) n = ReadNumber(in, 2);
+  unsigned char first;
+  if (in.Read(&first, 1) != 1) throw SEEOFException();
+  if (first != 0xFF) return first;
+  std::uint32_t n = ReadNumber(in, 2);
   if (n == 0xFFFF) n = ReadNumber(in, 4);
   return static_cast<std::int32_t>(n);
 }

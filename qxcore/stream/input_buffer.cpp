@@ -20,6 +20,10 @@ void SInputBuffer::Init(const void* block, unsigned long size) {
 
 unsigned long SInputBuffer::Read(void* buffer, unsigned long count) {
   count = std::min(count, m_size - m_position);
+  if (count == 1) {  // lengths and flags: not worth a call
+    *static_cast<unsigned char*>(buffer) = m_block[m_position++];
+    return 1;
+  }
   if (count > 0) std::memcpy(buffer, m_block + m_position, count);
   m_position += count;
   return count;

@@ -19,13 +19,16 @@ namespace {
 constexpr int kDigits = 4;
 constexpr unsigned long kEscapeLength = 2 + kDigits;
 
-// The four digits at once: a nibble to a byte, and 7 more for those above 9.
+// Two digits for each byte.
+constexpr auto kPairs = [] {
+  std::array<std::array<char, 2>, 256> pairs{};
+  for (unsigned i = 0; i < 256; ++i) pairs[i] = {"0123456789ABCDEF"[i >> 4], "0123456789ABCDEF"[i & 15]};
+  return pairs;
+}();
+
 void PutDigits(unsigned character, char* digits) {
-  const std::uint32_t nibbles =
-      (character >> 12 & 0xF) | (character & 0xF00) | (character << 12 & 0xF0000) | (character << 24 & 0xF000000);
-  const std::uint32_t letters = (nibbles + 0x06060606) >> 4 & 0x01010101;
-  const std::uint32_t text = nibbles + 0x30303030 + 7 * letters;
-  for (int i = 0; i < kDigits; ++i) digits[i] = static_cast<char>(text >> 8 * i);
+  std::memcpy(digits, kPairs[character >> 8].data(), 2);
+  std::memcpy(digits + 2, kPairs[character & 0xFF].data(), 2);
 }
 
 // Values of the hexadecimal digits by character; 16 for others.
@@ -132,29 +135,27 @@ unsigned long Filter::ReadRun(char* out, unsigned long room) {
   WCHAR characters[2048];
   const unsigned long wanted = (std::min)(room / kEscapeLength, static_cast<unsigned long>(std::size(characters)));
   if (m_pending != nullptr) Take();  // throws
-  m_at = characters;
-  m_end = characters + m_in->ReadCharacters(characters, wanted);
+  const WCHAR* at = characters;
+  const WCHAR* end = characters + m_in->ReadCharacters(characters, wanted);
   char* to = out;
-  while (m_at != m_end) {
-    const std::size_t plain = SNarrowASCII<WTEXT('\\')>(m_at, static_cast<std::size_t>(m_end - m_at), to);
+  while (at != end) {
+    const std::size_t plain = SNarrowASCII<WTEXT('\\')>(at, static_cast<std::size_t>(end - at), to);
     to += plain;
-    m_at += plain;
-    if (m_at == m_end) break;
-    if (*m_at != '\\') {
-      do {
-        to[0] = '\\';
-        to[1] = 'u';
-        PutDigits(*m_at++, to + 2);
-        to += kEscapeLength;
-      } while (m_at != m_end && *m_at >= 128);
-      continue;
+    at += plain;
+    for (; at != end && *at >= 128; ++at, to += kEscapeLength) {
+      std::memcpy(to, "\\u", 2);
+      PutDigits(*at, to + 2);
     }
+    if (at == end || *at != '\\') continue;
     // One by one, and perhaps with characters behind these, so that what waits may exceed the room.
+    m_at = at;
+    m_end = end;
     do {
       *to++ = static_cast<char>(Read());
     } while (HasPending() && static_cast<unsigned long>(to - out) < room);
+    at = std::exchange(m_at, nullptr);
+    m_end = nullptr;
   }
-  m_at = m_end = nullptr;
   return static_cast<unsigned long>(to - out);
 }
 
