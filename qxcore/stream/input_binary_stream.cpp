@@ -42,7 +42,8 @@ SString ReadText(SInputStream& in, int n) {
   WCHAR* characters = text.GetBufferSetLength(n);
   const int length = static_cast<int>(SDecodeUTF8(characters, std::string_view(bytes.Get(), got)) - characters);
   text.Unlock(length);
-  return length >= n - 1 ? text : SString(text.View());  // gives back what was too much
+  // Another form of a zero, in two or three bytes, ends the text, too; and the room that was too much goes back.
+  return length >= n - 1 ? text : SString(text.GetSafePointer());
 }
 
 template <class Map>

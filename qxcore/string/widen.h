@@ -9,20 +9,26 @@
 #include <emmintrin.h>
 #endif
 
-// Where widening stops, as a test of one byte and as a mask of the bytes of a register.
+// Where widening stops: at bytes from 0x80 on.
 struct SStopAtHigh {
+  // Whether it stops at the byte.
   static constexpr bool Is(unsigned char c) { return c >= 0x80; }
 #ifdef __SSE2__
-  static __m128i Mask(__m128i bytes) { return bytes; }  // only the highest bits count
+  // The same for the bytes of a register: the highest bit of each counts.
+  static __m128i Mask(__m128i bytes) { return bytes; }
 #endif
 };
+// At these and at NUL.
 struct SStopAtHighAndNUL {
+  // Whether it stops at the byte.
   static constexpr bool Is(unsigned char c) { return c >= 0x80 || c == 0; }
 #ifdef __SSE2__
   static __m128i Mask(__m128i bytes) { return _mm_or_si128(bytes, _mm_cmpeq_epi8(bytes, _mm_setzero_si128())); }
 #endif
 };
+// At a backslash and at NUL.
 struct SStopAtBackslashAndNUL {
+  // Whether it stops at the byte.
   static constexpr bool Is(unsigned char c) { return c == 0x5C || c == 0; }
 #ifdef __SSE2__
   static __m128i Mask(__m128i bytes) {

@@ -105,6 +105,12 @@ TEST(BinaryStream, ZeroBytesEndATextEarly) {
   EXPECT_EQ(text, WTEXT("a"));
   ReadFrom(std::string("\x03\0bc", 4), text);
   EXPECT_EQ(text, SString::null);
+  ReadFrom(std::string("\x05"
+                       "a\xC0\x80"
+                       "b\0",
+                       6),
+           text);
+  EXPECT_EQ(text, WTEXT("a"));
   text = WTEXT("former");
   ReadFrom(std::string(1, '\0'), text);
   EXPECT_EQ(text, SString::null);
