@@ -79,7 +79,9 @@ struct Naturally {
   static std::uint64_t Key(Text text) {
     if (IsDigit(*text)) {
       const Run run(text);
-      const auto zeros = static_cast<std::uint64_t>((std::min)(run.zeros, Run::kMostZeros));
+      // Beyond the most, values are not told apart, and so zeros must not be, either.
+      const auto zeros =
+          run.value == Run::kMost ? 0 : static_cast<std::uint64_t>((std::min)(run.zeros, Run::kMostZeros));
       return UnitAt(0, WTEXT('0')) | run.value << 16 | zeros;
     }
     std::uint64_t key = 0;

@@ -42,8 +42,9 @@ SString ReadText(SInputStream& in, int n) {
   WCHAR* characters = text.GetBufferSetLength(n);
   const int length = static_cast<int>(SDecodeUTF8(characters, std::string_view(bytes.Get(), got)) - characters);
   text.Unlock(length);
-  // Another form of a zero, in two or three bytes, ends the text, too; and the room that was too much goes back.
-  return length >= n - 1 ? text : SString(text.GetSafePointer());
+  const bool isPlain = length == n - 1 && got == static_cast<unsigned long>(n) && bytes.Get()[length] == 0;
+  // Else a zero in two or three bytes ends the text, too, and the room that was too much goes back.
+  return isPlain ? text : SString(text.GetSafePointer());
 }
 
 template <class Map>
