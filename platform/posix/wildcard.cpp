@@ -1,6 +1,8 @@
 #include "platform/posix/wildcard.h"
 
-#include <vector>
+#include <algorithm>
+#include <memory>
+#include <utility>
 
 #include "platform/bmp.h"
 
@@ -41,7 +43,12 @@ bool MatchesWildcard(std::u16string_view compiled, std::u16string_view name) {
   if (compiled.size() == 1 && compiled[0] == kStar) return true;
   const std::size_t places = compiled.size() + 1;
   const std::size_t lastDot = name.find_last_of(u'.');
-  std::vector<char> now(places, 0), next;
+  char local[2 * 256];
+  std::unique_ptr<char[]> heap;
+  if (2 * places > sizeof local) heap = std::make_unique<char[]>(2 * places);
+  char* now = heap != nullptr ? heap.get() : local;
+  char* next = now + places;
+  std::fill_n(now, places, 0);
   now[0] = 1;
   for (std::size_t i = 0; i <= name.size(); ++i) {
     const bool atEnd = i == name.size();
@@ -54,18 +61,22 @@ bool MatchesWildcard(std::u16string_view compiled, std::u16string_view name) {
       if (nothing) now[p + 1] = 1;
     }
     if (atEnd) break;
-    next.assign(places, 0);
+    std::fill_n(next, places, 0);
+    bool isAlive = false;
     const char16_t c = ToLowerBmp(name[i]);
     for (std::size_t p = 0; p < compiled.size(); ++p) {
       if (!now[p]) continue;
       const char16_t sign = compiled[p];
       if (sign == kStar || (sign == kDosStar && i != lastDot)) {
         next[p] = 1;
+        isAlive = true;
       } else if (sign == kDosQuestion ? c != '.' : sign == kDosDot ? c == '.' : sign == c) {
         next[p + 1] = 1;
+        isAlive = true;
       }
     }
-    now.swap(next);
+    if (!isAlive) return false;
+    std::swap(now, next);
   }
   return now[compiled.size()] != 0;
 }

@@ -235,6 +235,7 @@ TEST(Files, Searching) {
   EXPECT_EQ(Find(folder, WTEXT("A*.T?T")), (Names{WTEXT("a.txt"), WTEXT("ab.txt")}));
   EXPECT_EQ(Find(folder, WTEXT("x*.gz")), (Names{WTEXT("x.tar.gz")}));
   EXPECT_EQ(Find(folder, WTEXT("c")), (Names{WTEXT("c")}));
+  EXPECT_EQ(Find(folder, (Text(400, '*') + WTEXT(".gz")).c_str()), (Names{WTEXT("x.tar.gz")}));
   EXPECT_EQ(Find(folder, WTEXT("zz*")), Names{});
   EXPECT_EQ(GetLastError(), DWORD(ERROR_FILE_NOT_FOUND));
   EXPECT_EQ(Find(folder, WTEXT("no\\*")), Names{});
@@ -337,6 +338,19 @@ TEST(FilesOnLinux, Links) {
   EXPECT_TRUE(DeleteFileW(folder.File(WTEXT("dangling")).c_str()));
   EXPECT_TRUE(RemoveDirectoryW(folder.File(WTEXT("linked")).c_str()));
   EXPECT_EQ(ReadAll(folder.File(WTEXT("real\\f"))), "123");
+}
+
+// The prefix for long paths means nothing more in front of a drive; alone it is a server's name.
+TEST(FilesOnLinux, ThePrefixForLongPaths) {
+  WCHAR full[MAX_PATH];
+  const auto fullPath = [&full](const WCHAR* path) {
+    EXPECT_GT(GetFullPathNameW(path, MAX_PATH, full, nullptr), 0u);
+    return Text(full);
+  };
+  EXPECT_EQ(fullPath(WTEXT("\\\\?\\C:\\a\\..\\b")), WTEXT("C:\\b"));
+  EXPECT_EQ(fullPath(WTEXT("\\\\?\\")), WTEXT("\\\\?\\"));
+  EXPECT_EQ(fullPath(WTEXT("\\\\?\\x\\y")), WTEXT("\\\\?\\x\\y"));
+  EXPECT_EQ(fullPath(WTEXT("C:\\..\\.a\\b.\\..c\\")), WTEXT("C:\\.a\\b.\\..c\\"));
 }
 
 // The sharing mode holds against another process.
