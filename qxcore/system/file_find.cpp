@@ -42,6 +42,7 @@ SFileFind::~SFileFind() { SFileFind::Close(); }
 int SFileFind::Close() {
   m_data.cFileName[0] = 0;
   m_data.dwFileAttributes = 0;
+  m_root.Release();
   if (m_search == nullptr) return 1;
   const HANDLE search = m_search;
   m_search = nullptr;

@@ -11,13 +11,12 @@
 // Is told of every folder that a walk could not read, at the moment when the walk meets it.
 class QXCORE_API SFindFailureSink {
  public:
+  virtual ~SFindFailureSink() = default;
+
   // `error` is the platform's: ERROR_ACCESS_DENIED, ERROR_PATH_NOT_FOUND for a folder that was removed
   // meanwhile, ERROR_INVALID_NAME for one whose path is too long (more than 255 characters), ... Must not
   // throw, and must leave the finder alone.
   virtual void OnFolderNotRead(const SString& folder, unsigned long error) = 0;
-
- protected:
-  ~SFindFailureSink() = default;
 };
 
 class QXCORE_API SFindFailures {

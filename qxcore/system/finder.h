@@ -42,8 +42,9 @@ class QXCORE_API SFinder {
   virtual SString GetFilePath() const = 0;  // absolute
   // The name without its extension: up to its last dot. A name that would be empty then (".profile") stays whole.
   virtual SString GetFileTitleW() const = 0;
-  virtual SString GetFileURL() const = 0;       // SFile::PathToURL of the path
-  virtual SString GetRoot() const = 0;          // the folder, without a backslash at its end ("C:" for "C:\")
+  virtual SString GetFileURL() const = 0;  // SFile::PathToURL of the path
+  // The folder of the search, also at its end; without a backslash behind it ("C:" for "C:\").
+  virtual SString GetRoot() const = 0;
   virtual std::uint64_t GetLength() const = 0;  // bytes; 0 for folders
   // Give the time in *time, in whole seconds; 0, and *time as it was, without an entry.
   virtual int GetCreationTime(STime* time) const = 0;

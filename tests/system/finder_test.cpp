@@ -112,6 +112,7 @@ TEST(FileFind, OneFolder) {
   EXPECT_EQ(find.Close(), 1);
   EXPECT_EQ(find.Close(), 1);
   EXPECT_EQ(find.GetCreationTime(&created), 0);
+  EXPECT_EQ(find.GetRoot(), SString());
 
   find.FindFile(tree.Path(WTEXT("*.gz")));
   EXPECT_EQ(find.GetFileTitleW(), SString(WTEXT("b.tar")));
