@@ -150,9 +150,10 @@ std::string FindNoCase(const std::string& folder, const std::u16string& name) {
   DIR* stream = opendir(folder.c_str());
   if (stream == nullptr) return std::string();
   std::string found;
+  WCHAR candidate[sizeof(dirent::d_name) + 1];
   while (const dirent* entry = readdir(stream)) {
-    const std::u16string candidate = ToWindowsName(entry->d_name);
-    if (WideCompareNoCase(candidate.c_str(), name.c_str()) == 0) {
+    candidate[ToWindowsName(entry->d_name, candidate)] = 0;
+    if (WideCompareNoCase(candidate, name.c_str()) == 0) {
       found = entry->d_name;
       break;
     }

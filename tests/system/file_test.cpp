@@ -8,7 +8,6 @@
 #include <string>
 #include <tuple>
 
-#include "tests/support/failing_allocations.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"
 
@@ -400,22 +399,6 @@ TEST(Files, FolderPaths) {
   EXPECT_GT(SFile::GetFreeDiskSpace(Str(folder.Path())), 0u);
   EXPECT_GE(SFile::GetTotalDiskSpace(Str(folder.Path())), SFile::GetFreeDiskSpace(Str(folder.Path())));
   EXPECT_EQ(SFile::GetFreeDiskSpace(Str(folder.File(WTEXT("none")))), 0u);
-}
-
-TEST(Files, AllocationFailuresLeakNoHandle) {
-  TempFolder folder;
-  WriteAll(folder.File(WTEXT("a.txt")), "A");
-  const SString path = Str(folder.File(WTEXT("a.txt")));
-  WithEachAllocationFailing(
-      [&] {
-        SFile file(path);
-        file.OpenExisting(0);
-        SFile second(path + WTEXT("2"));
-        second.Init(file);
-        file.FindFirst(path);
-      },
-      [] {});
-  EXPECT_EQ(SFile::Delete(path), Code(SFile::kOk));  // nobody holds it open any more
 }
 
 #ifndef _WIN32

@@ -155,6 +155,25 @@ class FilesTest(unittest.TestCase):
         self.assertEqual(process.returncode, 130, errors)
         self.assertIn("cancelled", errors.decode("utf-8"))
 
+    @unittest.skipIf(ON_WINE, "needs a terminal")
+    def test_progress_shows_on_a_long_walk(self):
+        import pty
+
+        terminal, stderr = pty.openpty()
+        process = subprocess.Popen(TOOL + ["find", "--sorted", "/"], stdout=subprocess.DEVNULL, stderr=stderr)
+        os.close(stderr)
+        shown = b""
+        try:
+            while b" files  " not in shown:
+                shown += os.read(terminal, 65536)
+            process.send_signal(signal.SIGINT)
+            self.assertEqual(process.wait(timeout=60), 130)
+        except OSError:  # the walk ended within the second that shows nothing
+            self.assertIn(process.wait(timeout=60), (0, 1))
+        finally:
+            process.kill()
+            os.close(terminal)
+
     def test_wrong_usage(self):
         self.make("file")
         for arguments, code, word in ((["find"], 2, "DIR"), (["find", "none"], 1, "no such folder"),
