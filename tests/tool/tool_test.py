@@ -24,7 +24,7 @@ import wine  # noqa: E402
 TOOL = []
 ON_WINE = "wine" in sys.argv[2:]
 SAMPLES = pathlib.Path(__file__).resolve().parents[2] / "samples/texts/files"
-COMMANDS = ["detect", "convert", "escape", "unescape", "encodings", "find", "sort", "info", "zip"]
+COMMANDS = ["detect", "convert", "escape", "unescape", "encodings", "find", "sort", "info", "zip", "settings", "ini"]
 GERMAN = "Größe, Übermaß und Äpfel\nfür jeden 5 €\n"
 
 

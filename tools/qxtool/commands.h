@@ -48,6 +48,33 @@ int TestZip(const ZipOptions& options);
 int ExtractZipEntry(const ZipOptions& options);
 int ExtractZip(const ZipOptions& options);
 
+// Settings below the library's key of the registry.
+struct SettingsOptions {
+  std::string path;
+  std::string name;  // empty: the unnamed value
+  bool hasName = false;
+  std::string value;
+  std::string type = "text";  // text, number, binary or expand
+  bool recursive = false;
+  bool json = false;
+};
+int GetSetting(const SettingsOptions& options);
+int SetSetting(const SettingsOptions& options);
+int ListSettings(const SettingsOptions& options);
+int DeleteSetting(const SettingsOptions& options);
+
+// Initialisation files.
+struct IniOptions {
+  std::string file;
+  std::string section;  // of list: empty for the sections themselves
+  std::string key;
+  std::string value;
+  bool json = false;
+};
+int GetIni(const IniOptions& options);
+int SetIni(const IniOptions& options);
+int ListIni(const IniOptions& options);
+
 struct FindOptions {
   std::string folder;
   std::string mask = "*.*";

@@ -86,6 +86,77 @@ int RunZip(const CLI::App& zip, const ZipOptions& options) {
   return ExtractZip(options);
 }
 
+CLI::App* AddSettingsCommand(CLI::App* settings, SettingsOptions& options, const char* name, const char* description) {
+  CLI::App* command = settings->add_subcommand(name, description);
+  command->set_version_flag("--version", kVersion);
+  command->add_option("PATH", options.path, "The key below the library's own, its parts separated by backslashes")
+      ->required();
+  return command;
+}
+
+void AddSettings(CLI::App& app, SettingsOptions& options) {
+  CLI::App* settings = app.add_subcommand("settings", "Read and change settings in the registry");
+  settings->require_subcommand(1);
+  const auto name = [&](CLI::App* command, const char* description) {
+    return command->add_option("NAME", options.name, description)->each([&](const std::string&) {
+      options.hasName = true;
+    });
+  };
+  CLI::App* get = AddSettingsCommand(settings, options, "get", "Print a value; references to variables are replaced");
+  name(get, "The value; without it, the key's unnamed one");
+  get->add_flag("--json", options.json, "Print one JSON object instead of a line");
+  CLI::App* set = AddSettingsCommand(settings, options, "set", "Write a value; the key is made when it is missing");
+  name(set, "The value; an empty one is the key's unnamed one")->required();
+  set->add_option("VALUE", options.value, "What it becomes: a text, a number, or bytes as hexadecimal digits")
+      ->required();
+  set->add_option("--type", options.type, "The kind of value: text, number, binary or expand")
+      ->check(CLI::IsMember({"text", "number", "binary", "expand"}))
+      ->type_name("TYPE")
+      ->capture_default_str();
+  CLI::App* list = AddSettingsCommand(settings, options, "list", "List the keys and values of a key");
+  list->add_flag("--recursive", options.recursive, "And of the keys below it");
+  list->add_flag("--json", options.json, "Print one JSON object instead of lines");
+  CLI::App* remove = AddSettingsCommand(settings, options, "delete", "Delete a value or a key");
+  name(remove, "A value of the key, or else a key below it; without it, the key itself");
+  remove->add_flag("--recursive", options.recursive, "A key with everything below it");
+}
+
+int RunSettings(const CLI::App& settings, const SettingsOptions& options) {
+  if (settings.got_subcommand("get")) return GetSetting(options);
+  if (settings.got_subcommand("set")) return SetSetting(options);
+  if (settings.got_subcommand("list")) return ListSettings(options);
+  return DeleteSetting(options);
+}
+
+CLI::App* AddIniCommand(CLI::App* ini, IniOptions& options, const char* name, const char* description) {
+  CLI::App* command = ini->add_subcommand(name, description);
+  command->set_version_flag("--version", kVersion);
+  command->add_option("FILE", options.file, "The initialisation file")->required();
+  return command;
+}
+
+void AddIni(CLI::App& app, IniOptions& options) {
+  CLI::App* ini = app.add_subcommand("ini", "Read and change initialisation files");
+  ini->require_subcommand(1);
+  CLI::App* get = AddIniCommand(ini, options, "get", "Print the value of a key");
+  get->add_option("SECTION", options.section, "The section")->required();
+  get->add_option("KEY", options.key, "The key")->required();
+  get->add_flag("--json", options.json, "Print one JSON object instead of a line");
+  CLI::App* set = AddIniCommand(ini, options, "set", "Write a key; file and section are made when they are missing");
+  set->add_option("SECTION", options.section, "The section")->required();
+  set->add_option("KEY", options.key, "The key")->required();
+  set->add_option("VALUE", options.value, "What its value becomes")->required();
+  CLI::App* list = AddIniCommand(ini, options, "list", "List the keys of a section with their values");
+  list->add_option("SECTION", options.section, "The section; without it, the sections are listed");
+  list->add_flag("--json", options.json, "Print one JSON object instead of lines");
+}
+
+int RunIni(const CLI::App& ini, const IniOptions& options) {
+  if (ini.got_subcommand("get")) return GetIni(options);
+  if (ini.got_subcommand("set")) return SetIni(options);
+  return ListIni(options);
+}
+
 void AddFind(CLI::App& app, FindOptions& options) {
   CLI::App* command = app.add_subcommand("find", "List the files, or the folders, of a tree");
   command->add_flag("--folders", options.folders, "List folders instead of files");
@@ -132,7 +203,8 @@ std::string ReasonOf(const CLI::ParseError& error, const CLI::App& app) {
 }
 
 int Run(std::vector<std::string> arguments) {
-  CLI::App app("Converts text files, reads zip archives, and finds, sorts and describes files.", "qxtool");
+  CLI::App app("Converts text files, reads zip archives, finds, sorts and describes files, and keeps settings.",
+               "qxtool");
   // A path may begin with a slash.
   app.allow_windows_style_options(false);
   app.set_version_flag("--version", kVersion);
@@ -150,6 +222,10 @@ int Run(std::vector<std::string> arguments) {
   AddEncodings(app, encodings);
   ZipOptions zip;
   AddZip(app, zip);
+  SettingsOptions settings;
+  IniOptions ini;
+  AddSettings(app, settings);
+  AddIni(app, ini);
   AddFind(app, find);
   AddSort(app, sort);
   AddInfo(app, info);
@@ -170,6 +246,8 @@ int Run(std::vector<std::string> arguments) {
   if (app.got_subcommand("escape")) return Escape(escape);
   if (app.got_subcommand("unescape")) return Unescape(unescape);
   if (app.got_subcommand("zip")) return RunZip(*app.get_subcommand("zip"), zip);
+  if (app.got_subcommand("settings")) return RunSettings(*app.get_subcommand("settings"), settings);
+  if (app.got_subcommand("ini")) return RunIni(*app.get_subcommand("ini"), ini);
   if (app.got_subcommand("find")) return Find(find);
   if (app.got_subcommand("sort")) return Sort(sort);
   if (app.got_subcommand("info")) return Info(info);

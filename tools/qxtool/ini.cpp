@@ -1,0 +1,98 @@
+// qxtool ini: keys of initialisation files, as the platform's functions read and write them.
+
+#include <algorithm>
+#include <string>
+#include <vector>
+
+#include "qxcore/system/file.h"
+#include "qxcore/system/profile.h"
+#include "tools/qxtool/commands.h"
+#include "tools/qxtool/failure.h"
+#include "tools/qxtool/json.h"
+#include "tools/qxtool/standard_streams.h"
+#include "tools/qxtool/utf8.h"
+
+namespace {
+
+using Text = std::basic_string<WCHAR>;
+
+// The whole path; a name without a folder would be looked for elsewhere.
+SString PathOf(const IniOptions& options) {
+  const SString path = SFile::NormalizeFileName(FromUtf8(options.file), 1);
+  if (path.IsEmpty())
+    throw Failure{ToUtf8(SFile::GetStatusText(static_cast<HRESULT>(SFile::kInvalidFilename))), kFailed, options.file};
+  return path;
+}
+
+SString ExistingPath(const IniOptions& options) {
+  const SString path = PathOf(options);
+  if (!SFile::IsFile(path))
+    throw Failure{ToUtf8(SFile::GetStatusText(static_cast<HRESULT>(SFile::kNotFound))), kFailed, options.file};
+  return path;
+}
+
+// Whatever its length. Null names ask for lists, whose items end with NUL.
+Text Read(const SString& path, const WCHAR* section, const WCHAR* key, const WCHAR* standard) {
+  const DWORD cut = key == nullptr || section == nullptr ? 2 : 1;
+  for (DWORD room = 1024;; room *= 4) {
+    Text text(room, 0);
+    const DWORD length = GetPrivateProfileStringW(section, key, standard, text.data(), room, path);
+    text.resize(length);
+    if (length < room - cut) return text;
+  }
+}
+
+std::vector<SString> ReadList(const SString& path, const WCHAR* section) {
+  std::vector<SString> names;
+  const Text list = Read(path, section, nullptr, WTEXT(""));
+  for (std::size_t start = 0; start < list.size();) {
+    const std::size_t end = std::min(list.find(WCHAR{0}, start), list.size());
+    names.emplace_back(SStringView(list).substr(start, end - start));
+    start = end + 1;
+  }
+  return names;
+}
+
+// False when there is no such key, which only shows in whatever stands in for its value.
+bool Find(const SString& path, const SString& section, const SString& key, SString& value) {
+  const Text one = Read(path, section, key, WTEXT("1")), two = Read(path, section, key, WTEXT("2"));
+  value = SStringView(one);
+  return one == two;
+}
+
+}  // namespace
+
+int GetIni(const IniOptions& options) {
+  SString value;
+  if (!Find(ExistingPath(options), FromUtf8(options.section), FromUtf8(options.key), value))
+    throw Failure{"there is no such key", kFailed, options.file};
+  Print(options.json ? "{\"version\":1,\"value\":" + JsonString(value) + "}\n" : ToUtf8(value) + "\n");
+  return kDone;
+}
+
+int SetIni(const IniOptions& options) {
+  for (const std::string* text : {&options.section, &options.key, &options.value})
+    if (text->find_first_of("\r\n") != std::string::npos) throw Failure{"a line end cannot be kept", kWrongUsage};
+  SProfile profile(PathOf(options), FromUtf8(options.section), 0);
+  if (profile.WriteProfile(FromUtf8(options.key), FromUtf8(options.value)) != S_OK)
+    throw Failure{SystemText(GetLastError()), kFailed, options.file};
+  return kDone;
+}
+
+int ListIni(const IniOptions& options) {
+  const SString path = ExistingPath(options);
+  const SString section = FromUtf8(options.section);
+  const bool isOfKeys = !options.section.empty();
+  std::string json = isOfKeys ? "{\"version\":1,\"entries\":[" : "{\"version\":1,\"sections\":[";
+  const char* separator = "\n";
+  for (const SString& name : ReadList(path, isOfKeys ? section.GetSafePointer() : nullptr)) {
+    SString value;
+    if (isOfKeys) Find(path, section, name, value);
+    if (!options.json) Print(ToUtf8(name) + (isOfKeys ? "=" + ToUtf8(value) : "") + "\n");
+    json += separator +
+            (isOfKeys ? "{\"key\":" + JsonString(name) + ",\"value\":" + JsonString(value) + "}" : JsonString(name));
+    separator = ",\n";
+  }
+  if (options.json) Print(json + "\n]}\n");
+  return kDone;
+}
