@@ -15,6 +15,7 @@
 
 class QXCORE_API SOleDateTime {
  public:
+  // Whether the value is a date.
   enum Status : int { kValid = 0, kInvalid = 1 };
 
   // --- construction and assignment: as the operators and SetDateTime do ---

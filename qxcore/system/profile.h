@@ -15,6 +15,7 @@
 
 class QXCORE_API SProfile {
  public:
+  // What the operations give.
   enum Status : std::uint32_t {
     kOk = 0,
     kWriteFailed = 0xC0000000,  // GetLastError tells why
@@ -28,8 +29,8 @@ class QXCORE_API SProfile {
   HRESULT Init(const SString& file, const SString& section, int unused);
   void Done();
 
-  const SString& GetFile() const { return m_file; }
-  const SString& GetSection() const { return m_section; }
+  const SString& GetFile() const { return m_file; }        // as it was given
+  const SString& GetSection() const { return m_section; }  // without brackets
 
   // Decimal digits (so a truth value becomes 1 or 0), or the text. The file and the section are made where
   // they are missing, the folder is not.

@@ -18,6 +18,7 @@
 
 class QXCORE_API SRegistry {
  public:
+  // What the operations give besides the platform-wide codes.
   enum Status : std::uint32_t {
     kOk = 0,
     kDefaultUsed = 1,  // the value or the key is not there

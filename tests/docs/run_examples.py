@@ -113,7 +113,9 @@ def main():
         commands.mkdir()
         (commands / "qxtool").write_text(f'#!/bin/sh\nexec {command_line} "$@"\n')
         (commands / "qxtool").chmod(0o755)
-        environment = dict(os.environ, PATH=f"{commands}:{os.environ['PATH']}")
+        # A zone, a locale and a registry of the examples' own.
+        environment = dict(os.environ, PATH=f"{commands}:{os.environ['PATH']}", TZ="UTC", LC_ALL="C.UTF-8",
+                           QXCORE_REGISTRY=str(pathlib.Path(folder) / "registry.db"))
         runner = Runner(options, lines, work, environment)
         found = [block for block in blocks(lines) if block.kind != "cpp global"]
         examples = 0
