@@ -40,11 +40,12 @@ volatile sig_atomic_t g_mustStop = 0;
 class Writer {
  public:
   explicit Writer(const std::function<bool(int)>& write) {
+    // Before the fork, so that a child that has not run yet knows it, too.
+    signal(SIGTERM, [](int) { g_mustStop = 1; });
     int ends[2];
     if (pipe(ends) != 0) return;
     m_process = fork();
     if (m_process == 0) {
-      signal(SIGTERM, [](int) { g_mustStop = 1; });
       close(ends[0]);
       for (int n = 1; g_mustStop == 0; ++n) {
         if (!write(n)) _exit(1);
@@ -70,6 +71,7 @@ class Writer {
   }
   // It ended in good order.
   bool IsWell() const { return WIFEXITED(m_status) && WEXITSTATUS(m_status) == 0; }
+  int Status() const { return m_status; }
 
  private:
   pid_t m_process = -1;
@@ -95,7 +97,7 @@ void RunRounds(int rounds, const std::function<bool(int round, int writer, int n
     for (std::size_t i = 0; i < kWriters; ++i) {
       counts[i] = writers[i].Count();
       total += counts[i];
-      ASSERT_TRUE(i == victim || writers[i].IsWell()) << "round " << round;
+      ASSERT_TRUE(i == victim || writers[i].IsWell()) << "round " << round << ", status " << writers[i].Status();
     }
     ASSERT_TRUE(InChild([&] { return check(round, counts); })) << "round " << round;
   }
@@ -124,9 +126,14 @@ TEST(DISABLED_RegistryProcesses, EveryAcknowledgedWriteIsThere) {
       100,
       [&](int round, int writer, int n) {
         static HKEY key = nullptr;
-        if (key == nullptr && !open(round, writer, &key)) return false;
-        return RegSetValueExW(key, Name(u"value %d", n).c_str(), 0, REG_DWORD, reinterpret_cast<const BYTE*>(&n),
-                              sizeof n) == 0;
+        if (key == nullptr && !open(round, writer, &key)) {
+          std::fprintf(stderr, "the key cannot be made\n");
+          return false;
+        }
+        const LSTATUS result = RegSetValueExW(key, Name(u"value %d", n).c_str(), 0, REG_DWORD,
+                                              reinterpret_cast<const BYTE*>(&n), sizeof n);
+        if (result != 0) std::fprintf(stderr, "writing gives %d\n", static_cast<int>(result));
+        return result == 0;
       },
       [&](int round, const std::array<int, kWriters>& counts) {
         for (int writer = 0; writer < kWriters; ++writer) {
