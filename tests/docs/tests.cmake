@@ -1,8 +1,7 @@
 # The examples of the guides, run as a reader would run them. A guide with C++ examples has them all
 # in one program.
-set(guides README.md docs/text-encodings.md docs/containers.md docs/binary-format.md docs/notifications.md docs/files-and-finders.md)
-set(guides README.md docs/text-encodings.md docs/containers.md docs/binary-format.md docs/files-and-finders.md)
-set(guides README.md docs/text-encodings.md docs/containers.md docs/binary-format.md docs/time.md docs/settings.md)
+set(guides README.md docs/text-encodings.md docs/containers.md docs/binary-format.md docs/notifications.md
+  docs/files-and-finders.md docs/time.md docs/settings.md)
 if(TARGET qxtool)
   find_package(Python3 REQUIRED COMPONENTS Interpreter)
   foreach(guide ${guides})
