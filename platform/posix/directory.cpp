@@ -37,9 +37,7 @@ DWORD Guarded(Call call) {
 
 }  // namespace
 
-DWORD GetCurrentDirectoryW(DWORD size, LPWSTR buffer) {
-  return Guarded([&] { return Deliver(MakeFullPath(u"."), size, buffer); });
-}
+DWORD GetCurrentDirectoryW(DWORD size, LPWSTR buffer) { return GetFullPathNameW(u".", size, buffer, nullptr); }
 
 BOOL SetCurrentDirectoryW(LPCWSTR path) {
   return static_cast<BOOL>(Guarded([&]() -> DWORD {
@@ -61,6 +59,10 @@ DWORD GetFullPathNameW(LPCWSTR path, DWORD size, LPWSTR buffer, LPWSTR* filePart
   }
   return Guarded([&] {
     const FullPath full(path);
+    if (full.View().empty()) {
+      SetLastError(ERROR_PATH_NOT_FOUND);
+      return DWORD{0};
+    }
     const DWORD length = Deliver(full.View(), size, buffer);
     if (filePart == nullptr || length >= size) return length;
     const std::size_t name = full.View().find_last_of(u'\\') + 1;

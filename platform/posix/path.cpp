@@ -118,10 +118,11 @@ bool IsFull(std::u16string_view path) {
   return true;
 }
 
+// Empty when there is none: somebody may have removed it.
 std::u16string CurrentDirectory() {
   std::vector<char> buffer(256);
   while (getcwd(buffer.data(), buffer.size()) == nullptr) {
-    if (errno != ERANGE) return u"C:\\";
+    if (errno != ERANGE) return std::u16string();
     buffer.resize(buffer.size() * 2);
   }
   return ToWindowsPath(buffer.data());
@@ -267,13 +268,13 @@ std::u16string MakeFullPath(std::u16string_view path) {
     const bool rooted = path.size() >= 3 && IsSeparator(path[2]);
     const bool thisDrive = path[0] == 'C' || path[0] == 'c';
     full = !rooted && thisDrive ? CurrentDirectory() : std::u16string{path[0], u':', u'\\'};
-    AppendParts(full, 3, path.substr(2));
+    if (!full.empty()) AppendParts(full, 3, path.substr(2));
   } else if (IsSeparator(path[0])) {
     full = u"C:\\";
     AppendParts(full, 3, path);
   } else {
     full = CurrentDirectory();
-    AppendParts(full, 3, path);
+    if (!full.empty()) AppendParts(full, 3, path);
   }
   const bool trailing = IsSeparator(path.back()) && full.size() > 3 && full.back() != '\\';
   if (trailing) full += u'\\';
@@ -281,12 +282,17 @@ std::u16string MakeFullPath(std::u16string_view path) {
 }
 
 FullPath::FullPath(std::u16string_view path) {
-  if (!IsFull(path)) m_made = MakeFullPath(path);
-  m_view = m_made.empty() ? path : std::u16string_view(m_made);
+  if (IsFull(path)) {
+    m_view = path;
+  } else {
+    m_made = MakeFullPath(path);
+    m_view = m_made;
+  }
 }
 
 DWORD SpellExactly(std::u16string_view full, std::string& exact) {
   exact.clear();
+  if (full.empty()) return ERROR_PATH_NOT_FOUND;
   if (full[0] == '\\') return ERROR_BAD_NETPATH;
   if (full[0] != 'C' && full[0] != 'c') return ERROR_PATH_NOT_FOUND;
   if (full.back() == '\\') full.remove_suffix(1);
@@ -339,7 +345,7 @@ Resolved ResolvePath(LPCWSTR given) {
 
 std::string SpelledAsGiven(const Resolved& resolved, LPCWSTR path) {
   std::u16string full = MakeFullPath(path);
-  if (full.back() == '\\') full.pop_back();
+  if (!full.empty() && full.back() == '\\') full.pop_back();
   const std::size_t slash = resolved.path.find_last_of('/');
   return resolved.path.substr(0, slash + 1) + ToFileSystemName(full.substr(full.find_last_of(u'\\') + 1));
 }

@@ -27,7 +27,8 @@ std::size_t ToWindowsName(std::string_view name, WCHAR* buffer);
 // A whole absolute path of the file system as a Windows path, without a trailing backslash but for the root.
 std::u16string ToWindowsPath(std::string_view path);
 
-// The absolute form of a path: drive or server, no "." and "..", backslashes. Empty for an empty path.
+// The absolute form of a path: drive or server, no "." and "..", backslashes. Empty for an empty path,
+// and for one that leans on a current directory that is gone.
 std::u16string MakeFullPath(std::u16string_view path);
 
 // That form, without a copy when the path has it already.
@@ -44,7 +45,7 @@ class FullPath {
 };
 
 // The path of the file system for a full path in its exact spelling, without a trailing slash but for the
-// root. ERROR_SUCCESS, or why there can be none.
+// root. ERROR_SUCCESS, or why there can be none; ERROR_PATH_NOT_FOUND for an empty one.
 DWORD SpellExactly(std::u16string_view full, std::string& exact);
 
 struct Resolved {

@@ -185,7 +185,7 @@ class QXCORE_API SFile {
 
   // The current directory behind its drive: "\dir\sub", "\" for the root. Empty on failure.
   static SString GetCurrentDirectoryW();
-  // "C:\", or "\\server\".
+  // "C:\", or "\\server\". Empty on failure.
   static SString GetCurrentDrive();
   static HRESULT SetCurrentDirectoryW(const SString& path);
   static HRESULT SetCurrentDrive(const SString& path) { return SetCurrentDirectoryW(path); }

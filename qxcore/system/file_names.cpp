@@ -91,7 +91,8 @@ void SFile::MakeFilename() {
     m_drive = GetCurrentDrive();
     if (m_directory.IsEmpty()) m_directory = GetCurrentDirectoryW();
   }
-  if (m_drive[m_drive.Length() - 1] != '\\') m_drive += WCHAR('\\');
+  // Without a current drive the name stays relative, and leads nowhere.
+  if (!m_drive.IsEmpty() && m_drive[m_drive.Length() - 1] != '\\') m_drive += WCHAR('\\');
   // The drive has the backslash between them.
   DropLeadingBackslash(m_directory);
   if (!m_directory.IsEmpty() && m_directory[m_directory.Length() - 1] != '\\') m_directory += WCHAR('\\');

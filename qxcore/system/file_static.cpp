@@ -81,7 +81,7 @@ SString SFile::GetCurrentDirectoryW() {
 
 SString SFile::GetCurrentDrive() {
   const SString path = CurrentPath();
-  return path.Left(DriveLength(path)) + WTEXT("\\");
+  return path.IsEmpty() ? path : path.Left(DriveLength(path)) + WTEXT("\\");
 }
 
 HRESULT SFile::SetCurrentDirectoryW(const SString& path) {

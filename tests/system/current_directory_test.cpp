@@ -4,7 +4,10 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
+
 #include "qxcore/system/file.h"
+#include "qxcore/system/file_find.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"
 
@@ -129,6 +132,30 @@ TEST_F(CurrentDirectory, TheEndOfTheGuardRestores) {
 }
 
 #ifndef _WIN32
+// Somebody removed it: relative names lead nowhere then, least of all to the root.
+TEST_F(CurrentDirectory, ThatIsGone) {
+  ASSERT_EQ(Guard::Set(m_two), 1);
+  std::string native = test::Narrow(test::Text(m_two)).substr(2);
+  std::replace(native.begin(), native.end(), '\\', '/');
+  ASSERT_EQ(rmdir(native.c_str()), 0);
+  EXPECT_EQ(Guard::Get(), SString());
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_PATH_NOT_FOUND));
+  EXPECT_EQ(SFile::GetCurrentDrive(), SString());
+  EXPECT_EQ(SFile::Exists(WTEXT("etc")), 0);
+  EXPECT_EQ(SFile::Exists(WTEXT("C:etc")), 0);
+  EXPECT_EQ(SFile::Exists(WTEXT("\\etc")), 1);
+  EXPECT_EQ(SFile::NormalizeFileName(WTEXT("etc")), SString());
+  EXPECT_EQ(SFile().Init(SString(WTEXT("etc"))), static_cast<HRESULT>(SFile::kInvalidFilename));
+  EXPECT_EQ(SFile(SString(), SString(), WTEXT("etc"), SString()).Exists(), 0);
+  SFileFind find;
+  EXPECT_EQ(find.FindFile(), 0);
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_PATH_NOT_FOUND));
+  Guard guard;
+  EXPECT_EQ(guard.Assign(m_one), 1);
+  EXPECT_EQ(guard.Restore(), 0);  // there is nothing to return to
+  EXPECT_EQ(Guard::Get(), m_one);
+}
+
 // The system tells the folder behind a link; that is no moving on.
 TEST_F(CurrentDirectory, BehindALink) {
   const std::string native = test::Narrow(m_folder.Path()).substr(2);
