@@ -1,5 +1,7 @@
 #include "qxcore/system/file_find.h"
 
+#include <algorithm>
+
 #include "platform/wide.h"
 #include "qxcore/system/file.h"
 #include "qxcore/system/time.h"
@@ -9,14 +11,12 @@ namespace {
 bool IsDotName(const WCHAR* name) { return name[0] == '.' && (name[1] == 0 || (name[1] == '.' && name[2] == 0)); }
 
 // "folder\name", in one allocation.
-SString JoinPath(const SString& folder, const WCHAR* name) {
-  const SStringView tail(name);
-  const std::size_t length = static_cast<std::size_t>(folder.Length()) + 1 + tail.size();
+SString JoinPath(const SString& folder, const SString& name) {
   SString path;
-  WCHAR* at = path.GetBufferSetLength(static_cast<int>(length));
-  at += folder.View().copy(at, length);
+  WCHAR* at = path.GetBufferSetLength(folder.Length() + 1 + name.Length());
+  at = std::copy(folder.begin(), folder.end(), at);
   *at++ = '\\';
-  tail.copy(at, tail.size());
+  std::copy(name.begin(), name.end(), at);
   return path;
 }
 
@@ -91,10 +91,6 @@ int SFileFind::FindNextFileW() {
 
 SString SFileFind::GetFileName() const { return SString(m_data.cFileName); }
 
-SString SFileFind::GetFilePath() const {
-  return m_data.cFileName[0] != 0 ? JoinPath(m_root, m_data.cFileName) : SString();
-}
-
 std::uint64_t SFileFind::GetLength() const {
   if (m_data.cFileName[0] == 0) return 0;
   return static_cast<std::uint64_t>(m_data.nFileSizeHigh) << 32 | m_data.nFileSizeLow;
@@ -111,5 +107,3 @@ int SFileFind::GetLastAccessTime(STime* time) const { return GiveTime(m_data.ftL
 int SFileFind::GetLastWriteTime(STime* time) const { return GiveTime(m_data.ftLastWriteTime, time); }
 
 int SFileFind::MatchesMask(unsigned long mask) const { return (m_data.dwFileAttributes & mask) != 0; }
-
-int SFileFind::IsDots() const { return MatchesMask(FILE_ATTRIBUTE_DIRECTORY) && IsDotName(m_data.cFileName); }

@@ -27,14 +27,12 @@ class QXCORE_API SFileFind : public SBaseFind {
   int FindNextFileW() override;
 
   SString GetFileName() const override;
-  SString GetFilePath() const override;
   SString GetRoot() const override { return m_root; }
   std::uint64_t GetLength() const override;
   int GetCreationTime(STime* time) const override;
   int GetLastAccessTime(STime* time) const override;
   int GetLastWriteTime(STime* time) const override;
   int MatchesMask(unsigned long mask) const override;
-  int IsDots() const override;
 
   // As it was given to FindFile.
   const SString& GetMask() const { return m_mask; }

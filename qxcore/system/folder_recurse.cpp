@@ -76,7 +76,6 @@ int SFolderRecurse::FindNextFileW() {
 }
 
 SString SFolderRecurse::GetFileName() const { return m_current != nullptr ? m_current->GetFileName() : SString(); }
-SString SFolderRecurse::GetFilePath() const { return m_current != nullptr ? m_current->GetFilePath() : SString(); }
 SString SFolderRecurse::GetRoot() const { return m_current != nullptr ? m_current->GetRoot() : SString(); }
 std::uint64_t SFolderRecurse::GetLength() const { return m_current != nullptr ? m_current->GetLength() : 0; }
 
@@ -95,5 +94,3 @@ int SFolderRecurse::GetLastWriteTime(STime* time) const {
 int SFolderRecurse::MatchesMask(unsigned long mask) const {
   return m_current != nullptr ? m_current->MatchesMask(mask) : 0;
 }
-
-int SFolderRecurse::IsDots() const { return m_current != nullptr ? m_current->IsDots() : 0; }

@@ -39,14 +39,12 @@ class QXCORE_API SFolderRecurse : public SBaseFind {
   int FindNextFileW() override;
 
   SString GetFileName() const override;
-  SString GetFilePath() const override;
   SString GetRoot() const override;  // the folder of the current entry
   std::uint64_t GetLength() const override;
   int GetCreationTime(STime* time) const override;
   int GetLastAccessTime(STime* time) const override;
   int GetLastWriteTime(STime* time) const override;
   int MatchesMask(unsigned long mask) const override;
-  int IsDots() const override;
 
   // What this walk could not read so far; FindFile begins anew.
   const SFindFailures& GetFailures() const { return m_failures; }
