@@ -236,6 +236,16 @@ QXCORE_API BOOL DuplicateHandle(HANDLE sourceProcess, HANDLE source, HANDLE targ
                                 BOOL inherit, DWORD options);
 QXCORE_API HANDLE GetCurrentProcess();
 
+// --- file mappings; named ones: docs/mapped-files.md ---
+
+// Of a file, or, for INVALID_HANDLE_VALUE, of memory. PAGE_READONLY, PAGE_READWRITE and PAGE_WRITECOPY only.
+QXCORE_API HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD protection, DWORD sizeHigh,
+                                     DWORD sizeLow, LPCWSTR name);
+QXCORE_API LPVOID MapViewOfFile(HANDLE mapping, DWORD access, DWORD offsetHigh, DWORD offsetLow, SIZE_T size);
+QXCORE_API BOOL UnmapViewOfFile(LPCVOID view);
+// Waits until the data is on the device.
+QXCORE_API BOOL FlushViewOfFile(LPCVOID view, SIZE_T size);
+
 // Attributes: folder, link (of the entry itself; joined with those of what it leads to), read-only (no
 // one may write), archive (every other file). Only read-only can be set; the others are ignored.
 QXCORE_API DWORD GetFileAttributesW(LPCWSTR path);
