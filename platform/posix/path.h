@@ -3,10 +3,6 @@
 // "C:\" stands for "/"; both slashes separate; "." and ".." are taken out by the text alone, before
 // links are followed, as on Windows. Where the exact spelling does not exist, each part is looked up
 // without regard to case (bmp.h), the first entry that fits being taken.
-//
-// Names are UTF-8. A byte that belongs to no valid sequence, or that Windows allows in no name (control
-// characters and "*:<>?|\), stands in a Windows name as U+F000 plus the byte and is turned back; so is
-// every byte of a real character U+F000 to U+F0FF. An unpaired surrogate is written as its three bytes.
 #pragma once
 
 #include <sys/stat.h>
@@ -14,15 +10,9 @@
 #include <string>
 #include <string_view>
 
-#include "platform/win32.h"
+#include "platform/posix/file_name.h"
 
 namespace platform {
-
-// One name, without separators.
-std::string ToFileSystemName(std::u16string_view name);
-std::u16string ToWindowsName(std::string_view name);
-// The same into a buffer with room for as many characters as the name has bytes. Gives the length.
-std::size_t ToWindowsName(std::string_view name, WCHAR* buffer);
 
 // A whole absolute path of the file system as a Windows path, without a trailing backslash but for the root.
 std::u16string ToWindowsPath(std::string_view path);
