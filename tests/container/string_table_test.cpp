@@ -107,7 +107,7 @@ TEST(StringTable, CopiesAndAssignments_TakeEveryForm) {
   copy[0] = WTEXT("other");
   EXPECT_EQ(table[0], WTEXT("x"));
   EXPECT_EQ(table[2].GetSafePointer(), copy[2].GetSafePointer()) << "the text itself is shared";
-  table = table;
+  table = *&table;
   EXPECT_EQ(table.GetCount(), 3);
   table = SString(WTEXT("one"));
   EXPECT_EQ(TextsOf(table), Texts{WTEXT("one")});
