@@ -1,8 +1,8 @@
 // Input from global memory.
 #pragma once
 
-#include "qxcore/stream/hglobal.h"
 #include "qxcore/stream/input_buffer.h"
+#include "qxcore/system/hglobal.h"
 
 class QXCORE_API SInputGlobal : public SInputBuffer {
   QXCORE_DECLARE_CLASS(SInputGlobal)

@@ -1,9 +1,9 @@
 // Output into global memory that grows in steps of 8192 bytes.
 #pragma once
 
-#include "qxcore/stream/hglobal.h"
 #include "qxcore/stream/output_stream.h"
 #include "qxcore/string/string.h"
+#include "qxcore/system/hglobal.h"
 
 class QXCORE_API SOutputGlobal : public SOutputStream {
   QXCORE_DECLARE_CLASS(SOutputGlobal)

@@ -6,7 +6,7 @@
 #include <cstring>
 
 #include "qxcore/core/memory.h"
-#include "qxcore/stream/hglobal.h"
+#include "qxcore/system/hglobal.h"
 
 namespace {
 

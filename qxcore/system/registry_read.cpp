@@ -4,7 +4,7 @@
 #include <cstring>
 
 #include "qxcore/core/memory.h"
-#include "qxcore/stream/hglobal.h"
+#include "qxcore/system/hglobal.h"
 #include "qxcore/system/registry.h"
 
 namespace {

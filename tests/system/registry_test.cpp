@@ -6,7 +6,7 @@
 
 #include <cstring>
 
-#include "qxcore/stream/hglobal.h"
+#include "qxcore/system/hglobal.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/registry_root.h"
 #include "tests/support/text.h"

@@ -3,7 +3,7 @@
 #include <cstring>
 #include <vector>
 
-#include "qxcore/stream/hglobal.h"
+#include "qxcore/system/hglobal.h"
 #include "qxcore/system/registry.h"
 #include "tools/qxtool/commands.h"
 #include "tools/qxtool/failure.h"

@@ -1,4 +1,4 @@
-#include "qxcore/stream/hglobal.h"
+#include "qxcore/system/hglobal.h"
 
 #include "qxcore/core/exception.h"
 #include "qxcore/core/memory.h"
