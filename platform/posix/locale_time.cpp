@@ -4,9 +4,12 @@
 #include <unicode/udat.h>
 #include <unicode/udatpg.h>
 
+#include <algorithm>
+#include <cctype>
 #include <chrono>
 #include <cstdlib>
 #include <string>
+#include <string_view>
 
 #include "platform/posix/path.h"
 
@@ -22,6 +25,22 @@ std::string UserLocale() {
     if (name != nullptr && *name != 0) return name;
   }
   return "C";
+}
+
+// Language and region of a locale's name; what is no such name, which not every version of ICU survives, and
+// the "C" locale are those of the United States.
+std::string LanguageAndRegion(const std::string& name) {
+  const std::string base = name.substr(0, name.find_first_of(".@"));
+  const std::size_t language = base.find('_');
+  const std::string_view region =
+      language == std::string::npos ? std::string_view() : std::string_view(base).substr(language + 1);
+  const auto isOf = [](std::string_view text, std::size_t least, std::size_t most) {
+    return text.size() >= least && text.size() <= most &&
+           std::all_of(text.begin(), text.end(), [](unsigned char c) { return std::isalnum(c) != 0 && c < 0x80; });
+  };
+  const bool isName =
+      isOf(std::string_view(base).substr(0, language), 2, 3) && (language == std::string::npos || isOf(region, 2, 3));
+  return isName ? base : "en_US";
 }
 
 // One set of formatters a thread, made anew when the user's locale changes.
@@ -42,9 +61,8 @@ class Formatters {
   }
 
  private:
-  static UDateFormat* Open(const std::string& localeWithCharset, Style style) {
-    std::string locale = localeWithCharset.substr(0, localeWithCharset.find('.'));
-    if (locale == "C" || locale == "POSIX") locale = "en_US";
+  static UDateFormat* Open(const std::string& userLocale, Style style) {
+    const std::string locale = LanguageAndRegion(userLocale);
     UErrorCode error = U_ZERO_ERROR;
     if (style != kShortDate) {
       const UDateFormatStyle date = style == kLongDate ? UDAT_FULL : UDAT_NONE;

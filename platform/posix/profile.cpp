@@ -13,6 +13,7 @@
 
 #include "platform/posix/path.h"
 #include "platform/posix/profile_file.h"
+#include "platform/posix/user_folders.h"
 
 namespace {
 
@@ -38,20 +39,14 @@ class Descriptor {
   int m_descriptor;
 };
 
-// Where files without a folder in their name are kept.
-std::string ConfigurationFolder() {
-  const char* config = std::getenv("XDG_CONFIG_HOME");
-  const char* home = std::getenv("HOME");
-  if (config != nullptr && config[0] == '/') return std::string(config) + "/qxcore/";
-  return std::string(home == nullptr ? "" : home) + "/.config/qxcore/";
-}
+// Files without a folder in their name are kept in one of their own.
+bool HasFolder(LPCWSTR file) { return std::u16string_view(file).find_first_of(u"\\/:") != std::u16string_view::npos; }
 
 // The file's path, links followed; empty, with the error set, when there is no such place.
 std::string PathOf(LPCWSTR file) {
   std::string path;
-  const std::u16string_view name(file);
-  if (name.find_first_of(u"\\/:") == std::u16string_view::npos) {
-    path = ConfigurationFolder() + ToFileSystemName(name);
+  if (!HasFolder(file)) {
+    path = UserConfigurationFolder() + "/qxcore/" + ToFileSystemName(file);
   } else {
     Resolved resolved = ResolvePath(file);
     if (resolved.error != ERROR_SUCCESS) {
@@ -115,7 +110,7 @@ BOOL ChangeFile(LPCWSTR file, Change change) {
   const std::string path = PathOf(file);
   if (path.empty()) return FALSE;
   const std::string folder = path.substr(0, path.rfind('/') + 1);
-  if (std::u16string_view(file).find_first_of(u"\\/:") == std::u16string_view::npos) {
+  if (!HasFolder(file)) {
     mkdir(folder.substr(0, folder.rfind('/', folder.size() - 2)).c_str(), 0700);
     mkdir(folder.c_str(), 0700);
   }

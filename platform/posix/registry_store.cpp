@@ -8,6 +8,7 @@
 #include <thread>
 
 #include "platform/bmp.h"
+#include "platform/posix/user_folders.h"
 
 namespace platform {
 namespace {
@@ -55,11 +56,7 @@ const char* Environment(const char* name) {
 }
 
 std::string DatabasePath(const std::string& environment) {
-  if (!environment.empty()) return environment;
-  const std::string data = Environment("XDG_DATA_HOME");
-  // Relative paths there are to be ignored.
-  if (!data.empty() && data[0] == '/') return data + "/qxcore/registry.db";
-  return std::string(Environment("HOME")) + "/.local/share/qxcore/registry.db";
+  return environment.empty() ? UserDataFolder() + "/qxcore/registry.db" : environment;
 }
 
 void MakeFoldersOf(const std::string& path) {

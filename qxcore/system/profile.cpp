@@ -41,7 +41,8 @@ HRESULT SProfile::GetProfile(const SString& key, long* out, long standard) const
 
 HRESULT SProfile::GetProfile(const SString& key, SString* out, const SString& standard) const {
   if (out == nullptr) return E_POINTER;
-  const SString value = Read(key, standard);
+  // The platform would cut the default, too.
+  const SString value = Read(key, SString::null);
   *out = value.IsEmpty() ? standard : value;
   return S_OK;
 }

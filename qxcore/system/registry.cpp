@@ -125,10 +125,11 @@ HRESULT SRegistry::DeleteKey(const SString& name, int recursive) {
       below.Init(m_key, name, 0);
       subKey = &below;
     }
-    SString child;
-    // What is deleted makes room for the next at the same index.
-    for (long index = 0; subKey->GetEnumKey(index, &child) == 0;)
-      if (subKey->DeleteKey(child, recursive) != S_OK) ++index;
+    SString child, last;
+    // What is deleted makes room for the next at the same index. A name that comes again cannot be deleted
+    // whatever the platform says: one with a NUL inside, which only the system itself can make.
+    for (long index = 0; subKey->GetEnumKey(index, &child) == 0; last = child)
+      if (child == last || subKey->DeleteKey(child, recursive) != S_OK) ++index;
   }
   const LSTATUS result = RegDeleteKeyW(m_key, name);
   return Is(result, ERROR_FILE_NOT_FOUND) || Is(result, ERROR_PATH_NOT_FOUND) ? S_OK : Result(result);

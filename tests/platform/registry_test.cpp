@@ -4,7 +4,9 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <atomic>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "platform/wide.h"
@@ -220,6 +222,27 @@ TEST(Registry, DeletedKeysAnswerSo) {
   EXPECT_EQ(Get(deep, WTEXT("x")), "error 1018");
   EXPECT_EQ(RegDeleteKeyW(again, WTEXT("")), 0);
   EXPECT_TRUE(SubKeys(child).empty());
+}
+
+TEST(Registry, ThreadsShareIt) {
+  const RegistryRoot root;
+  Key key;
+  ASSERT_EQ(key.Create(HKEY_CURRENT_USER, RegistryRoot::Path()), 0);
+  std::atomic<int> wrong = 0;
+  std::vector<std::thread> threads;
+  for (int id = 0; id < 4; ++id) {
+    threads.emplace_back([&, id] {
+      const WCHAR own[] = {static_cast<WCHAR>('a' + id), 0};
+      for (int i = 0; i < 200; ++i) {
+        const std::string text = std::to_string(i);
+        Key sub;
+        wrong += sub.Create(key, own) != 0 || Set(sub, own, REG_BINARY, text) != 0 || Get(sub, own) != text;
+        if (i % 50 == 0) wrong += RegDeleteKeyW(key, own) != 0 || Get(sub, own) != "error 1018";
+      }
+    });
+  }
+  for (std::thread& thread : threads) thread.join();
+  EXPECT_EQ(wrong, 0);
 }
 
 TEST(Environment, ReferencesAreExpanded) {

@@ -4,6 +4,10 @@
 
 #include <gtest/gtest.h>
 
+#ifndef _WIN32
+#include <sqlite3.h>
+#endif
+
 #include <cstring>
 
 #include "qxcore/system/hglobal.h"
@@ -320,6 +324,37 @@ TEST_F(Registry, DeletionOfTrees) {
   EXPECT_EQ(m_key.DeleteKey(SString(), 1), S_OK);  // the key itself
   EXPECT_FALSE(SRegistry(HKEY_CURRENT_USER, RegistryRoot::Path(), 0).IsOpen());
 }
+
+#ifndef _WIN32
+// A key that cannot be deleted: the database refuses. The others go all the same.
+TEST_F(Registry, DeletionGoesOnPastAKeyThatStays) {
+  for (const WCHAR* path : {WTEXT("tree\\a\\x"), WTEXT("tree\\keep\\y"), WTEXT("tree\\z")})
+    SRegistry(m_key.GetKey(), path, 1).WriteProfile(WTEXT("v"), 1);
+  sqlite3* database = nullptr;
+  ASSERT_EQ(sqlite3_open(m_root.File().c_str(), &database), SQLITE_OK);
+  ASSERT_EQ(sqlite3_exec(database,
+                         "CREATE TRIGGER keeps BEFORE DELETE ON keys WHEN old.name = x'6B00650065007000'"
+                         " BEGIN SELECT RAISE(ABORT, 'kept'); END",
+                         nullptr, nullptr, nullptr),
+            SQLITE_OK);
+  EXPECT_EQ(m_key.DeleteKey(WTEXT("tree"), 1), E_FAIL);
+  SRegistry tree(m_key.GetKey(), WTEXT("tree"), 0);
+  SString name;
+  EXPECT_EQ(tree.GetEnumKey(0, &name), 0);
+  EXPECT_EQ(name, SString(WTEXT("keep")));
+  EXPECT_EQ(tree.GetEnumKey(1, &name), static_cast<long>(ERROR_NO_MORE_ITEMS));
+  SRegistry kept(tree.GetKey(), WTEXT("keep"), 0);
+  EXPECT_NE(kept.GetEnumKey(0, &name), 0);  // what is below it is gone
+  // A name that no path can reach comes again and again.
+  sqlite3_exec(database, "DROP TRIGGER keeps; UPDATE keys SET name = x'61005C006200' WHERE name = x'6B00650065007000'",
+               nullptr, nullptr, nullptr);
+  EXPECT_EQ(m_key.DeleteKey(WTEXT("tree"), 1), E_FAIL);
+  sqlite3_exec(database, "UPDATE keys SET name = x'6B00650065007000' WHERE name = x'61005C006200'", nullptr, nullptr,
+               nullptr);
+  sqlite3_close(database);
+  EXPECT_EQ(m_key.DeleteKey(WTEXT("tree"), 1), S_OK);
+}
+#endif
 
 TEST_F(Registry, EachAllocationFailing) {
   const SString longText(WideString(3000, 'x').c_str());

@@ -8,6 +8,7 @@
 #include <climits>
 #include <random>
 
+#include "tests/support/registry_root.h"
 #include "tests/support/text.h"
 #include "tests/support/wine.h"
 #include "tests/support/zone_peer.h"
@@ -199,6 +200,25 @@ TEST(Times, LocaleTexts) {
   EXPECT_GT(longDate.Length(), shortDate.Length());
   EXPECT_EQ(time.GetShortDateTimeString(), shortDate + WTEXT(" ") + clock);
   EXPECT_EQ(time.GetLongDateTimeString(), longDate + WTEXT(" ") + clock);
+}
+
+TEST(Times, LocaleOfTheUser) {
+  if (IsWindows()) GTEST_SKIP() << "the locale is the system's there";
+  const char* former = std::getenv("LC_ALL");
+  const std::string kept = former == nullptr ? "" : former;
+  const STime time(2003, 4, 5, 16, 7, 8);
+  const auto texts = [&](const char* locale) {
+    test::SetVariable("LC_ALL", locale);
+    return time.GetShortDateString() + WTEXT("|") + time.GetLongDateString() + WTEXT("|") + time.GetTimeStr();
+  };
+  EXPECT_EQ(texts("C"), SString(WTEXT("4/5/2003|Saturday, April 5, 2003|4:07:08 PM")));
+  EXPECT_EQ(texts("de_DE.UTF-8"), SString(WTEXT("5.4.2003|Samstag, 5. April 2003|16:07:08")));
+  EXPECT_EQ(texts("ja_JP.UTF-8"), SString(WTEXT("2003/4/5|2003\x5E74"
+                                                "4\x6708"
+                                                "5\x65E5\x571F\x66DC\x65E5|16:07:08")));
+  EXPECT_EQ(texts("en_US"), SString(WTEXT("4/5/2003|Saturday, April 5, 2003|4:07:08 PM")));
+  EXPECT_FALSE(texts("no such locale").IsEmpty());
+  test::SetVariable("LC_ALL", kept);
 }
 
 TEST(Times, ArithmeticWraps) {
