@@ -18,7 +18,6 @@
 #ifndef _WIN32
 #include <sys/mount.h>
 #include <sys/resource.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -336,68 +335,6 @@ TEST(FilesOnFullDisks, ASmallDisk) {
     EXPECT_EQ(SFile::Exists(disk + WTEXT("\\b")), 0);  // half a copy is none
   }
   umount(native.c_str());
-}
-
-// --- other processes ---
-
-// Another process with the file open in this way, until the object ends.
-class Holder {
- public:
-  Holder(const SString& path, DWORD access, DWORD share) {
-    int ready[2], done[2];
-    if (pipe(ready) != 0 || pipe(done) != 0) return;
-    m_child = fork();
-    if (m_child == 0) {
-      ::close(done[1]);
-      const HANDLE file = CreateFileW(path, access, share, nullptr, OPEN_EXISTING, 0, nullptr);
-      char byte = file != INVALID_HANDLE_VALUE ? 'y' : 'n';
-      if (::write(ready[1], &byte, 1) == 1) [[maybe_unused]]
-        const ssize_t end = ::read(done[0], &byte, 1);
-      _exit(0);
-    }
-    ::close(ready[1]);
-    ::close(done[0]);
-    char byte = 'n';
-    EXPECT_EQ(::read(ready[0], &byte, 1), 1);
-    EXPECT_EQ(byte, 'y');
-    ::close(ready[0]);
-    m_done = done[1];
-  }
-  ~Holder() {
-    ::close(m_done);
-    waitpid(m_child, nullptr, 0);
-  }
-
- private:
-  pid_t m_child = -1;
-  int m_done = -1;
-};
-
-TEST(FilesOfOthers, WhatAnotherProcessHolds) {
-  TempFolder folder;
-  const SString path = Str(folder.File(WTEXT("a")));
-  WriteAll(test::Text(path), "x");
-  SFile file(path);
-  {
-    Holder alone(path, GENERIC_READ | GENERIC_WRITE, 0);
-    EXPECT_EQ(file.OpenExisting(), Code(SFile::kOpenFailed));
-    EXPECT_EQ(GetLastError(), DWORD(ERROR_SHARING_VIOLATION));
-    EXPECT_EQ(file.IsOpen(), 0);
-    EXPECT_EQ(file.GetAccess(), 0u);
-    EXPECT_EQ(file.Open(), Code(SFile::kOpenFailed));
-    EXPECT_EQ(file.Delete(), Code(SFile::kDeleteFailed));
-    EXPECT_EQ(file.Rename(path + WTEXT("2")), Code(SFile::kMoveFailed));
-    EXPECT_EQ(file.CanBeWritten(), 0);
-  }
-  {
-    Holder writer(path, GENERIC_WRITE, FILE_SHARE_READ);
-    EXPECT_EQ(file.OpenExisting(), Code(SFile::kRestricted));
-    EXPECT_EQ(file.GetAccess(), static_cast<unsigned long>(GENERIC_READ));
-    file.Close();
-  }
-  EXPECT_EQ(file.OpenExisting(), 0);
-  file.Close();
-  EXPECT_EQ(file.Delete(), 0);
 }
 
 #endif
