@@ -46,7 +46,8 @@ class QXCORE_API SFinder {
   // The folder of the search, also at its end; without a backslash behind it ("C:" for "C:\").
   virtual SString GetRoot() const = 0;
   virtual std::uint64_t GetLength() const = 0;  // bytes; 0 for folders
-  // Give the time in *time, in whole seconds; 0, and *time as it was, without an entry.
+  // Give the time in *time, in whole seconds, by way of today's difference to UTC (see STime's constructor from
+  // file times; SFile::GetDateTime has the exact one). 0, and *time as it was, without an entry.
   virtual int GetCreationTime(STime* time) const = 0;
   virtual int GetLastAccessTime(STime* time) const = 0;
   virtual int GetLastWriteTime(STime* time) const = 0;
