@@ -22,7 +22,7 @@ class NewFile {
     } catch (...) {
       // It is given up anyway.
     }
-    SFile::Delete(m_path);
+    TakeBack();
   }
 
   SOutputStream& Stream() { return m_file; }
@@ -32,6 +32,21 @@ class NewFile {
   }
 
  private:
+  void TakeBack() noexcept {
+    const DWORD attributes = ::GetFileAttributesW(m_path);
+    if (attributes == INVALID_FILE_ATTRIBUTES || (attributes & FILE_ATTRIBUTE_DEVICE) != 0) return;
+    if ((attributes & FILE_ATTRIBUTE_REPARSE_POINT) == 0) {
+      SFile::Delete(m_path);
+      return;
+    }
+    // Without the link nobody would find what it leads to.
+    try {
+      SOutputFile emptied(m_path);
+    } catch (...) {
+      // There is nothing to empty.
+    }
+  }
+
   SString m_path;
   SOutputFile m_file;
   bool m_isFinished = false;

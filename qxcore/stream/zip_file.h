@@ -61,7 +61,7 @@ class QXCORE_API SZipFile {
   // An archive that ends too early gives SEEOFException; those of `out` pass.
   static void ExtractTo(const SString& archive, const SString& entry, SOutputStream& out);
   // The same into the file `target`, which is created or replaced once the entry was found; what was begun
-  // and failed is deleted.
+  // and failed is deleted (behind a link: emptied).
   static void ExtractFile(const SString& archive, const SString& entry, const SString& target);
 
  private:

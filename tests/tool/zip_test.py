@@ -54,6 +54,9 @@ class ZipTest(unittest.TestCase):
                     archive.writestr(info, data)
         return name
 
+    def write_archive(self, name, content, end):
+        (self.folder / name).write_bytes(content + b"PK\x05\x06" + end)
+
     def sound(self):
         return self.make([
             (entry("stored.txt", zipfile.ZIP_STORED), b"stored text"),
@@ -273,6 +276,26 @@ class ZipTest(unittest.TestCase):
         self.patch(name, data.index(b"PK\x03\x04", 1) + 20000, b"\xff" * 400)
         self.assert_fails(self.run_tool("extract-all", name, "out"), "second")
         self.assertEqual(self.tree(self.folder / "out"), ["first"])
+
+    @unittest.skipIf(ON_WINE, "needs a device that is full")
+    def test_a_full_device_is_told(self):
+        self.assert_fails(self.run_tool("extract", self.sound(), "folder/deflated.txt", "/dev/full"), "/dev/full", "Disk Full")
+        self.assertTrue(pathlib.Path("/dev/full").is_char_device())
+
+    def test_entries_that_share_their_data_fail_at_once(self):
+        # Each directory entry leads to the same local header: little data that looks like much.
+        name = self.make([(entry("a"), bytes(1_000_000))])
+        data = (self.folder / name).read_bytes()
+        central = data.index(b"PK\x01\x02")
+        end = data.index(b"PK\x05\x06")
+        count = 60000
+        more = data[central:end] * count
+        self.write_archive("many.zip", data[:central] + more, struct.pack("<HHHHLLH", 0, 0, count, count, len(more), central, 0))
+        began = time.monotonic()
+        self.assert_fails(self.run_tool("test", "many.zip"), "not met in sequence")
+        self.assert_fails(self.run_tool("extract-all", "many.zip", "out", "--max-bytes", 2_000_000), "more than 2000000 bytes")
+        self.assert_fails(self.run_tool("extract-all", "many.zip", "out"), "not met in sequence")
+        self.assertLess(time.monotonic() - began, 30)
 
     @unittest.skipIf(ON_WINE, "no signals reach a program under Wine")
     def test_interruption_ends_cleanly(self):

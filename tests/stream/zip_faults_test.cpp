@@ -1,0 +1,132 @@
+// Archives whose file, source or target fails: every call of the system in turn, every read, every write.
+
+#include <gtest/gtest.h>
+
+#include <cerrno>
+#include <string>
+
+#include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/input_buffer.h"
+#include "qxcore/stream/output_stream.h"
+#include "qxcore/stream/zip_file.h"
+#include "qxcore/stream/zip_input_stream.h"
+#include "tests/stream/zip_builder.h"
+#include "tests/support/open_handles.h"
+#include "tests/support/temp_folder.h"
+
+#ifndef _WIN32
+#include "tests/support/failing_calls.h"
+#endif
+
+namespace {
+
+std::string SomeArchive() {
+  test::ZipBuilder zip;
+  std::string text;
+  for (int i = 0; i < 3000; ++i) text += std::to_string(i * 7919 % 10007) + " ";
+  zip.parts.emplace_back("stored", text, false);
+  zip.parts.emplace_back("deflated", text);
+  zip.parts.emplace_back("later", text);
+  zip.parts.back().flags = 8;
+  return zip.Make();
+}
+
+// Ends, as a stream does whose source fails, at the n-th read, and for ever after.
+class FailingSource : public SInputBuffer {
+ public:
+  FailingSource(const std::string& bytes, long failAt)
+      : SInputBuffer(bytes.data(), static_cast<unsigned long>(bytes.size())), m_left(failAt) {}
+  using SInputBuffer::Read;
+  unsigned long Read(void* buffer, unsigned long count) override {
+    if (m_left > 0 && --m_left == 0) m_error = EIO;
+    return m_error != 0 ? 0 : SInputBuffer::Read(buffer, count < 500 ? count : 500);
+  }
+  int GetError() const override { return m_error; }
+
+ private:
+  long m_left;
+  int m_error = 0;
+};
+
+TEST(ZipFaults, AFailedReadNeverPassesAsTheEnd) {
+  const std::string archive = SomeArchive();
+  int failures = 0;
+  for (long n = 1;; ++n) {
+    FailingSource source(archive, n);
+    SZipInputStream zip(source);
+    int entries = 0;
+    bool thrown = false;
+    try {
+      for (; zip.GetNextEntry() != nullptr; ++entries) zip.CloseEntry();
+    } catch (const SException&) {
+      thrown = true;
+    }
+    EXPECT_EQ(thrown, zip.GetError() != 0) << n;
+    if (!thrown) {
+      EXPECT_EQ(entries, 3);
+      break;
+    }
+    ++failures;
+  }
+  EXPECT_GT(failures, 50);
+}
+
+// Throws at the n-th write.
+class FailingTarget : public SOutputStream {
+ public:
+  explicit FailingTarget(long failAt) : m_left(failAt) {}
+  void Write(int) override {}
+  unsigned long Write(const void*, unsigned long count) override {
+    if (--m_left == 0) throw SEIODiskFullException();
+    return count;
+  }
+
+ private:
+  long m_left;
+};
+
+TEST(ZipFaults, AFailedWriteIsTheWritersException) {
+  test::TempFolder folder;
+  ASSERT_TRUE(test::WriteAll(folder.File(WTEXT("a.zip")), SomeArchive()));
+  const SString path(folder.File(WTEXT("a.zip")).c_str());
+  FailingTarget first(1), never(0);
+  EXPECT_THROW(SZipFile::ExtractTo(path, WTEXT("deflated"), first), SEIODiskFullException);
+  SZipFile::ExtractTo(path, WTEXT("deflated"), never);
+}
+
+#ifndef _WIN32
+
+TEST(ZipFaults, ADirectoryThatCannotBeReadIsNeverShort) {
+  test::TempFolder folder;
+  ASSERT_TRUE(test::WriteAll(folder.File(WTEXT("a.zip")), SomeArchive()));
+  const SString path(folder.File(WTEXT("a.zip")).c_str());
+  const int before = CountOpenHandles();
+  for (const int error : {EIO, ENOMEM}) {
+    int entries = 0;
+    bool told = false;
+    WithEachCallFailing(
+        error,
+        [&] {
+          entries = 0;
+          told = false;
+          try {
+            SZipFile zip(path);
+            for (int found = zip.FindFile(nullptr, 0); found; found = zip.FindNextFileW()) ++entries;
+            told = zip.HasFailed() != 0;
+          } catch (const SEZipException&) {
+            told = true;
+          }
+        },
+        [&](bool failed) {
+          EXPECT_TRUE(told || entries == 3);
+          if (!failed) {
+            EXPECT_FALSE(told);
+          }
+          EXPECT_EQ(CountOpenHandles(), before);
+        });
+  }
+}
+
+#endif
+
+}  // namespace
