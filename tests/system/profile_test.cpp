@@ -8,6 +8,7 @@
 
 #include "platform/wide.h"
 #include "tests/support/failing_allocations.h"
+#include "tests/support/file_size_limit.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"
 #include "tests/support/wine.h"
@@ -203,6 +204,30 @@ TEST_F(Profile, RandomWritesAgainstAMap) {
     }
   }
 }
+
+#ifndef _WIN32
+TEST_F(Profile, AFullDiskLeavesTheFileAsItWas) {
+  const std::string before = "[Section]\n; " + std::string(5000, 'x') + "\nkey=old\n";
+  WriteAll(m_path, before);
+  HRESULT result;
+  DWORD error;
+  {
+    const test::FileSizeLimit limit(4096);
+    result = Section().WriteProfile(WTEXT("key"), SString(WTEXT("new")));
+    error = GetLastError();
+  }
+  EXPECT_EQ(result, static_cast<HRESULT>(0xC0000000));
+  EXPECT_NE(error, 0u);
+  EXPECT_EQ(ReadAll(m_path), before);
+  // And no temporary file.
+  WIN32_FIND_DATAW data;
+  const HANDLE search = FindFirstFileW(m_folder.File(WTEXT("a.ini*")).c_str(), &data);
+  EXPECT_FALSE(FindNextFileW(search, &data));
+  FindClose(search);
+  EXPECT_EQ(Section().WriteProfile(WTEXT("key"), SString(WTEXT("new"))), S_OK);
+  EXPECT_EQ(Text(WTEXT("key")), SString(WTEXT("new")));
+}
+#endif
 
 TEST_F(Profile, EachAllocationFailing) {
   const SString value(WideString(200, 'v').c_str());

@@ -12,6 +12,7 @@
 
 #include "qxcore/system/hglobal.h"
 #include "tests/support/failing_allocations.h"
+#include "tests/support/file_size_limit.h"
 #include "tests/support/registry_root.h"
 #include "tests/support/text.h"
 
@@ -326,6 +327,21 @@ TEST_F(Registry, DeletionOfTrees) {
 }
 
 #ifndef _WIN32
+TEST_F(Registry, AFullDiskIsToldAndLosesNothing) {
+  m_key.WriteProfile(WTEXT("before"), SString(WTEXT("kept")));
+  const SString large(WideString(500000, 'x').c_str());
+  HRESULT result;
+  {
+    const test::FileSizeLimit limit(200000);
+    result = m_key.WriteProfile(WTEXT("large"), large);
+  }
+  EXPECT_EQ(result, E_FAIL);
+  EXPECT_EQ(Text(WTEXT("before")), SString(WTEXT("kept")));
+  EXPECT_EQ(Text(WTEXT("large")), SString(WTEXT("default")));
+  EXPECT_EQ(m_key.WriteProfile(WTEXT("large"), large), S_OK);
+  EXPECT_EQ(Text(WTEXT("large")), large);
+}
+
 // A key that cannot be deleted: the database refuses. The others go all the same.
 TEST_F(Registry, DeletionGoesOnPastAKeyThatStays) {
   for (const WCHAR* path : {WTEXT("tree\\a\\x"), WTEXT("tree\\keep\\y"), WTEXT("tree\\z")})
