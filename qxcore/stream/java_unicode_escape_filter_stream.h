@@ -2,8 +2,8 @@
 //
 // Characters above 127 become escapes of six: a backslash, "u" and four upper-case hexadecimal digits; those above
 // U+FFFF are two escapes, one for each surrogate. What looks like an escape already gets one more "u", so that Unescape
-// gives back what went in, for every text without NUL. (The scheme is that of the Java language
-// specification, section 3.3.)
+// gives back what went in, for every text without NUL. (The scheme is that of
+// Java source files, JLS 3.3.)
 //
 // The inner stream gives 16-bit characters, as SMultiFormatReaderUnicode does; those of a stream of bytes
 // count as U+0000 to U+00FF. At most one character more is taken from it than the output needs. When it throws in
