@@ -158,8 +158,9 @@ BENCH("list a zip archive of 60,000 entries/ours") {
     std::uint64_t sum = 0;
     for (int found = zip.FindFile(WTEXT("*"), ~0ul); found != 0; found = zip.FindNextFile()) {
       const SZipEntry& entry = zip.GetEntry();
-      sum += static_cast<std::uint64_t>(entry.GetName().Length() + entry.GetSize() + entry.GetCompressedSize()) +
-             entry.GetCRC() + entry.GetTime().dwLowDateTime;
+      sum += static_cast<std::uint64_t>(entry.GetName().Length() + entry.GetSize() + entry.GetCompressedSize() +
+                                        entry.GetCRC()) +
+             entry.GetTime().dwLowDateTime;
     }
     benchmark::DoNotOptimize(sum);
   }

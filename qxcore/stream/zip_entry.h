@@ -13,7 +13,7 @@ class QXCORE_API SZipEntry {
  public:
   // Attributes: every entry is read-only; deflated ones are compressed, names that end with "/" are folders.
   enum Attributes : unsigned { kReadOnly = 0x1, kDirectory = 0x10, kCompressed = 0x800 };
-  enum : std::int64_t { kUnknown = -1 };  // a size that the archive has not told yet
+  enum : std::int64_t { kUnknown = -1 };  // a number that the archive has not told yet
 
   // The name as the archive has it, parts separated by "/" by those who keep to the format; it may be absolute,
   // lead upwards, or hold backslashes. Flag bit 11 makes it UTF-8, else it is in the ANSI code page; it ends
@@ -28,10 +28,9 @@ class QXCORE_API SZipEntry {
   // The time of the last modification in the local time of who made the archive, to two seconds; 0 in both
   // halves when the archive has no valid one.
   const FILETIME& GetTime() const { return m_time; }
-  // CRC-32 of the data; 0 while it is unknown.
-  std::uint32_t GetCRC() const { return m_crc; }
-  // Bytes of the data in the archive, and when it is read; kUnknown in an entry whose local header leaves
-  // them to the descriptor behind the data, until that was read.
+  // CRC-32 of the data, bytes of the data in the archive, and when it is read; all are kUnknown in an entry whose
+  // local header leaves them to the descriptor behind the data, until that was read.
+  std::int64_t GetCRC() const { return m_crc; }
   std::int64_t GetCompressedSize() const { return m_compressedSize; }
   std::int64_t GetSize() const { return m_size; }
   // Where the local header stands in the archive; for SZipInputStream counted from where the stream began.
@@ -57,7 +56,7 @@ class QXCORE_API SZipEntry {
   unsigned m_method = 0;
   unsigned m_flags = 0;
   FILETIME m_time = {0, 0};
-  std::uint32_t m_crc = 0;
+  std::int64_t m_crc = kUnknown;
   std::int64_t m_compressedSize = kUnknown;
   std::int64_t m_size = kUnknown;
   std::int64_t m_offset = 0;

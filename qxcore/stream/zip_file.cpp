@@ -86,13 +86,15 @@ void SZipFile::ReadEnd() {
 
 int SZipFile::FindFile(const WCHAR*, unsigned long) {
   m_next = 0;
-  m_hasFailed = false;
+  m_hasFailed = true;  // until the first entry was read
   m_failure.Release();
   m_windowCount = m_windowPosition = 0;
   m_nextByte = m_directoryOffset;
   std::int64_t position = m_directoryOffset;
   if (m_file.Seek(position, FILE_BEGIN) != S_OK) SThrowZip(nullptr);
-  return ReadNext();
+  const int found = ReadNext();
+  m_hasFailed = false;
+  return found;
 }
 
 int SZipFile::FindNextFileW() {

@@ -43,7 +43,8 @@ class QXCORE_API SZipFile {
   // The entry's time; 0 when `time` is null.
   virtual int GetCreationTime(STime* time) const;
 
-  // What FindNextFileW could not throw: 1 when it was a failure that ended the search, and its text.
+  // What FindNextFileW could not throw: 1 when it was a failure that ended the search, and its text. Also 1,
+  // without a text, after FindFile threw.
   int HasFailed() const { return m_hasFailed; }
   const SString& GetFailure() const { return m_failure; }
 

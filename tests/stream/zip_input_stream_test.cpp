@@ -78,6 +78,7 @@ TEST(ZipInputStream, EntriesComeWithTheirFieldsAndData) {
       EXPECT_EQ(entry->GetOffset(), offset);
       EXPECT_EQ(entry->GetMethod(), part.method);
       const bool later = part.flags == 8;
+      EXPECT_EQ(entry->GetCRC(), later ? SZipEntry::kUnknown : static_cast<std::int64_t>(part.crc));
       EXPECT_EQ(entry->GetSize(), later ? SZipEntry::kUnknown : static_cast<std::int64_t>(part.size));
       EXPECT_EQ(entry->GetAttributes(), 1u | (part.method == 8 ? 0x800u : 0u) | (part.name == "folder/" ? 0x10u : 0u));
       SYSTEMTIME time;
