@@ -415,7 +415,7 @@ class ToolTest(unittest.TestCase):
         self.assert_done(self.run_tool("unescape", "escaped.txt", "out.txt"))
         self.assertEqual((self.folder / "out.txt").read_text(encoding="utf-8"), text)
         self.assert_done(self.run_tool("escape", "--to", "UTF-16", "in.txt", "escaped16.txt"))
-        self.assert_done(self.run_tool("unescape", "--to", "UTF16Big", "escaped16.txt", "out.txt"))
+        self.assert_done(self.run_tool("unescape", "--from", "UTF-16", "--to", "UTF16Big", "escaped16.txt", "out.txt"))
         self.assertEqual((self.folder / "out.txt").read_text(encoding="utf-16-be"), text)
 
     def test_unescape_takes_text_that_is_only_partly_escaped(self):
