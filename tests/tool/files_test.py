@@ -9,19 +9,13 @@ import json
 import os
 import pathlib
 import random
-import shutil
 import signal
 import subprocess
-import sys
-import tempfile
 import time
 import unittest
 
-sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "support"))
-import wine  # noqa: E402
+from tool_case import ON_WINE, TOOL, ToolCase, main
 
-TOOL = []
-ON_WINE = "wine" in sys.argv[2:]
 SOURCES = pathlib.Path(__file__).resolve().parents[2] / "qxcore"
 DRIVE = "Z:" if ON_WINE else "C:"
 
@@ -41,11 +35,7 @@ def walk(folder):
     return files, folders
 
 
-class FilesTest(unittest.TestCase):
-    def setUp(self):
-        self.folder = pathlib.Path(tempfile.mkdtemp(prefix="qxtool-test-"))
-        self.addCleanup(shutil.rmtree, self.folder, ignore_errors=True)
-
+class FilesTest(ToolCase):
     def run_tool(self, *arguments, stdin=b"", zone=None):
         environment = {**os.environ, "TZ": zone} if zone else None
         return subprocess.run(TOOL + [str(argument) for argument in arguments], cwd=self.folder, input=stdin,
@@ -250,7 +240,4 @@ class FilesTest(unittest.TestCase):
 
 
 if __name__ == "__main__":
-    tool, *wrapper = sys.argv[1:]
-    wine.keep_running(wrapper)
-    TOOL += wrapper + [os.path.abspath(tool)]
-    unittest.main(argv=sys.argv[:1], verbosity=2)
+    main()

@@ -7,25 +7,17 @@ With the wrapper "wine" the tool is the Windows one; the list of tests is the sa
 
 import json
 import os
-import pathlib
-import shutil
 import subprocess
-import sys
-import tempfile
 import unittest
 
-sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "support"))
-import wine  # noqa: E402
+from tool_case import ON_WINE, TOOL, ToolCase, main
 
-TOOL = []
-ON_WINE = "wine" in sys.argv[2:]
 ROOT = "qxtool test"
 
 
-class SettingsTest(unittest.TestCase):
+class SettingsTest(ToolCase):
     def setUp(self):
-        self.folder = pathlib.Path(tempfile.mkdtemp(prefix="qxtool-test-"))
-        self.addCleanup(shutil.rmtree, self.folder, ignore_errors=True)
+        super().setUp()
         self.environment = dict(os.environ, QXCORE_REGISTRY=str(self.folder / "data" / "registry.db"), QXCORE_HOME="here")
         self.run_tool("settings", "delete", ROOT, "--recursive")
         self.addCleanup(self.run_tool, "settings", "delete", ROOT, "--recursive")
@@ -38,14 +30,6 @@ class SettingsTest(unittest.TestCase):
         result = self.run_tool(*arguments)
         self.assertEqual((result.returncode, result.stderr.decode("utf-8")), (0, ""))
         return result.stdout.decode("utf-8")
-
-    def assert_one_line(self, result, code, *words):
-        text = result.stderr.decode("utf-8")
-        self.assertEqual((result.returncode, text.count("\n")), (code, 1), text)
-        self.assertTrue(text.startswith("qxtool: "), text)
-        for word in words:
-            self.assertIn(word, text)
-        self.assertFalse(result.stdout)
 
     # --- the registry ---
 
@@ -131,7 +115,4 @@ class SettingsTest(unittest.TestCase):
 
 
 if __name__ == "__main__":
-    TOOL = sys.argv[2:] + [os.path.abspath(sys.argv[1])]
-    wine.keep_running(sys.argv[2:])
-    del sys.argv[1:]
-    unittest.main()
+    main()

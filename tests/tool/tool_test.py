@@ -13,16 +13,11 @@ import shlex
 import shutil
 import signal
 import subprocess
-import sys
-import tempfile
 import time
 import unittest
 
-sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "support"))
-import wine  # noqa: E402
+from tool_case import ON_WINE, TOOL, ToolCase, main
 
-TOOL = []
-ON_WINE = "wine" in sys.argv[2:]
 SAMPLES = pathlib.Path(__file__).resolve().parents[2] / "samples/texts/files"
 COMMANDS = ["detect", "convert", "escape", "unescape", "encodings", "find", "sort", "info", "zip", "settings", "ini"]
 GERMAN = "Größe, Übermaß und Äpfel\nfür jeden 5 €\n"
@@ -32,11 +27,7 @@ def command(*arguments):
     return TOOL + [str(argument) for argument in arguments]
 
 
-class ToolTest(unittest.TestCase):
-    def setUp(self):
-        self.folder = pathlib.Path(tempfile.mkdtemp(prefix="qxtool-test-"))
-        self.addCleanup(shutil.rmtree, self.folder, ignore_errors=True)
-
+class ToolTest(ToolCase):
     def run_tool(self, *arguments, stdin=b"", stdout=subprocess.PIPE):
         return subprocess.run(command(*arguments), cwd=self.folder, input=stdin, stdout=stdout, stderr=subprocess.PIPE, timeout=120)
 
@@ -51,19 +42,6 @@ class ToolTest(unittest.TestCase):
 
     def names(self):
         return sorted(path.name for path in self.folder.iterdir())
-
-    def assert_done(self, result):
-        self.assertEqual((result.returncode, result.stderr.decode("utf-8")), (0, ""))
-
-    def assert_one_line(self, result, code, *words):
-        """Failed with this code, one line of explanation that has the words, and no data."""
-        text = result.stderr.decode("utf-8")
-        self.assertEqual(result.returncode, code, text)
-        self.assertEqual(text.count("\n"), 1, text)
-        self.assertTrue(text.startswith("qxtool: "), text)
-        for word in words:
-            self.assertIn(word, text)
-        self.assertFalse(result.stdout)
 
     # --- arguments ---
 
@@ -442,7 +420,4 @@ class ToolTest(unittest.TestCase):
 
 
 if __name__ == "__main__":
-    tool, *wrapper = sys.argv[1:]
-    wine.keep_running(wrapper)
-    TOOL += wrapper + [os.path.abspath(tool)]
-    unittest.main(argv=sys.argv[:1], verbosity=2)
+    main()

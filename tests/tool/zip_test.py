@@ -11,19 +11,14 @@ import shutil
 import signal
 import struct
 import subprocess
-import sys
-import tempfile
 import time
 import unittest
 import warnings
 import zipfile
 import zlib
 
-sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "support"))
-import wine  # noqa: E402
+from tool_case import ON_WINE, TOOL, ToolCase, main
 
-TOOL = []
-ON_WINE = "wine" in sys.argv[2:]
 STAMP = (2026, 11, 21, 13, 34, 52)
 TEXT = b"".join(b"line %d\n" % (i * 7919 % 10007) for i in range(20000))
 
@@ -36,10 +31,10 @@ def entry(name, method=zipfile.ZIP_DEFLATED, comment=b""):
     return info
 
 
-class ZipTest(unittest.TestCase):
+class ZipTest(ToolCase):
     def setUp(self):
-        self.outside = pathlib.Path(tempfile.mkdtemp(prefix="qxtool-zip-"))
-        self.addCleanup(shutil.rmtree, self.outside, ignore_errors=True)
+        super().setUp()
+        self.outside = self.folder
         self.folder = self.outside / "inner"
         self.folder.mkdir()
 
@@ -75,9 +70,6 @@ class ZipTest(unittest.TestCase):
     def tree(self, root=None):
         root = root or self.outside
         return sorted(str(path.relative_to(root)).replace("\\", "/") for path in root.rglob("*"))
-
-    def assert_done(self, result):
-        self.assertEqual((result.returncode, result.stderr.decode("utf-8")), (0, ""))
 
     def assert_fails(self, result, *words):
         text = result.stderr.decode("utf-8")
@@ -326,7 +318,4 @@ class ZipTest(unittest.TestCase):
 
 
 if __name__ == "__main__":
-    TOOL = sys.argv[2:] + [os.path.abspath(sys.argv[1])]
-    wine.keep_running(sys.argv[2:])
-    del sys.argv[1:]
-    unittest.main()
+    main()
