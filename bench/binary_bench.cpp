@@ -12,10 +12,10 @@
 
 #include "bench/bench.h"
 #include "bench/inputs.h"
+#include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_binary_stream.h"
 #include "qxcore/stream/input_buffer.h"
 #include "qxcore/stream/java_unicode_escape_filter_stream.h"
-#include "qxcore/stream/multi_format_reader_unicode.h"
 #include "qxcore/stream/output_binary_stream.h"
 #include "qxcore/stream/output_global.h"
 

@@ -9,8 +9,8 @@
 
 #include "bench/bench.h"
 #include "bench/inputs.h"
+#include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_buffer.h"
-#include "qxcore/stream/multi_format_reader_unicode.h"
 #if BENCH_PEERS
 #include <iconv.h>
 #include <uchardet/uchardet.h>

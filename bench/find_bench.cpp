@@ -9,8 +9,8 @@
 #include <string>
 
 #include "bench/bench.h"
-#include "qxcore/system/recurse_find.h"
-#include "qxcore/system/time.h"
+#include "qxcore/system/file/recurse_find.h"
+#include "qxcore/system/time/time.h"
 
 namespace {
 

@@ -2,7 +2,7 @@
 
 #include <vector>
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 
 namespace bench {
 namespace {

@@ -5,8 +5,8 @@
 #include <vector>
 
 #include "bench/bench.h"
-#include "platform/wide.h"
-#include "qxcore/system/registry.h"
+#include "qxcore/platform/wide.h"
+#include "qxcore/system/settings/registry.h"
 
 #if BENCH_PEERS
 #include <unistd.h>

@@ -1,7 +1,7 @@
 // Formatting a time.
 
 #include "bench/bench.h"
-#include "qxcore/system/time.h"
+#include "qxcore/system/time/time.h"
 
 #if BENCH_PEERS
 #include <QDateTime>

@@ -22,8 +22,8 @@
 
 #include "bench/bench.h"
 #include "qxcore/stream/input_file.h"
-#include "qxcore/stream/zip_file.h"
-#include "qxcore/stream/zip_input_stream.h"
+#include "qxcore/stream/zip/zip_file.h"
+#include "qxcore/stream/zip/zip_input_stream.h"
 
 namespace {
 

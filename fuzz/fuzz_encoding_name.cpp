@@ -1,7 +1,7 @@
 // Names of encodings: any text is matched without harm, and what it means has a name that means the same.
 
 #include "fuzz/fuzz_input.h"
-#include "qxcore/stream/multi_format_support.h"
+#include "qxcore/stream/encoding/multi_format_support.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   using Support = SAbstractIO::SMultiFormatSupport;

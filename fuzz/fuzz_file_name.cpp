@@ -3,7 +3,7 @@
 #include <algorithm>
 
 #include "fuzz/fuzz_input.h"
-#include "qxcore/system/file.h"
+#include "qxcore/system/file/file.h"
 
 namespace {
 

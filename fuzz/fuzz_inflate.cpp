@@ -6,8 +6,8 @@
 
 #include "fuzz/fuzz_input.h"
 #include "qxcore/core/exception.h"
-#include "qxcore/stream/inflater_input_stream.h"
 #include "qxcore/stream/input_buffer.h"
+#include "qxcore/stream/zip/inflater_input_stream.h"
 
 namespace {
 

@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "fuzz/fuzz_input.h"
-#include "qxcore/system/profile.h"
+#include "qxcore/system/settings/profile.h"
 
 namespace {
 

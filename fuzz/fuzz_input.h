@@ -10,7 +10,7 @@
 #include <string_view>
 #include <utility>
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 
 // Ends the run with the place, when something that has to hold does not.
 #define FUZZ_CHECK(condition)                                                             \

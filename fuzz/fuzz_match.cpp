@@ -4,7 +4,7 @@
 #include <vector>
 
 #include "fuzz/fuzz_input.h"
-#include "platform/bmp.h"
+#include "qxcore/platform/bmp.h"
 #include "qxcore/string/natural_compare.h"
 #include "qxcore/string/string.h"
 

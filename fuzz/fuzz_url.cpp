@@ -1,7 +1,7 @@
 // Paths to file URLs and back: nothing is lost but what the form cannot hold.
 
 #include "fuzz/fuzz_input.h"
-#include "qxcore/system/file.h"
+#include "qxcore/system/file/file.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   if (size > 600) return 0;

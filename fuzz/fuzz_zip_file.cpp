@@ -8,9 +8,9 @@
 
 #include "fuzz/fuzz_input.h"
 #include "qxcore/core/io_exceptions.h"
-#include "qxcore/stream/crc32.h"
 #include "qxcore/stream/output_stream.h"
-#include "qxcore/stream/zip_file.h"
+#include "qxcore/stream/zip/crc32.h"
+#include "qxcore/stream/zip/zip_file.h"
 
 namespace {
 

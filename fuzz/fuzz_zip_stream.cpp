@@ -6,7 +6,7 @@
 #include "fuzz/fuzz_input.h"
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/stream/input_buffer.h"
-#include "qxcore/stream/zip_input_stream.h"
+#include "qxcore/stream/zip/zip_input_stream.h"
 
 namespace {
 

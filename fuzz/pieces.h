@@ -6,9 +6,9 @@
 #include <string>
 #include <string_view>
 
-#include "platform/win32.h"
 #include "qxcore/core/exception.h"
-#include "qxcore/stream/multi_format_reader_unicode.h"
+#include "qxcore/platform/win32.h"
+#include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 
 // Gives at most `piece` bytes at a time; 0 gives all that is asked for.
 class PieceInput : public SInputStream {

@@ -1,7 +1,7 @@
 // Orders of map keys. A comparer has one static function Compare(a, b): negative, 0 or positive.
 #pragma once
 
-#include "platform/bmp.h"
+#include "qxcore/platform/bmp.h"
 #include "qxcore/string/string.h"
 
 // By code unit, up to the first NUL.

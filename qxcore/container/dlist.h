@@ -9,8 +9,8 @@
 
 #include <cstdint>
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 
 class SDList;
 

@@ -15,7 +15,7 @@
 #include <utility>
 
 #include "qxcore/container/node_pool.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 
 // The untyped list: nodes whose payload only the virtual operations know.
 class QXCORE_API __SList {

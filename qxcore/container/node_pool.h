@@ -8,9 +8,9 @@
 #include <atomic>
 #include <cstddef>
 
-#include "qxcore/core/export.h"
 #include "qxcore/core/fixed_alloc.h"
 #include "qxcore/core/memory.h"
+#include "qxcore/platform/export.h"
 
 class QXCORE_API SNodePools {
  public:

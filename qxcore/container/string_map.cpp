@@ -2,7 +2,7 @@
 
 #include <new>
 
-#include "qxcore/container/list_escape.h"
+#include "qxcore/container/internal/list_escape.h"
 
 const SStringMap SStringMap::null;
 const SStringMapNoCase SStringMapNoCase::null;

@@ -4,7 +4,7 @@
 #include <cstring>
 #include <new>
 
-#include "qxcore/container/table_storage.h"
+#include "qxcore/container/internal/table_storage.h"
 #include "qxcore/core/memory.h"
 #include "qxcore/string/string_buffer.h"
 

@@ -16,7 +16,7 @@
 #include <utility>
 
 #include "qxcore/container/table.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 #include "qxcore/string/string.h"
 
 class SStringTable;

@@ -2,7 +2,7 @@
 
 #include <cstdint>
 
-#include "qxcore/container/list_escape.h"
+#include "qxcore/container/internal/list_escape.h"
 #include "qxcore/container/string_table.h"
 
 namespace {

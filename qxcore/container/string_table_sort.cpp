@@ -9,9 +9,9 @@
 #include <bit>
 #include <cstdint>
 
-#include "platform/bmp.h"
-#include "platform/wide.h"
 #include "qxcore/container/string_table.h"
+#include "qxcore/platform/bmp.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/natural_compare.h"
 
 namespace {

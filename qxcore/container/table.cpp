@@ -3,7 +3,7 @@
 #include <cstring>
 #include <utility>
 
-#include "qxcore/container/table_storage.h"
+#include "qxcore/container/internal/table_storage.h"
 #include "qxcore/core/exception.h"
 #include "qxcore/core/memory.h"
 

@@ -12,7 +12,7 @@
 #include <cstdint>
 
 #include "qxcore/container/table_shell.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 
 class QXCORE_API __STable {
  public:

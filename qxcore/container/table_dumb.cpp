@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cstring>
 
-#include "qxcore/container/table_storage.h"
+#include "qxcore/container/internal/table_storage.h"
 #include "qxcore/core/memory.h"
 
 using table_storage::BytesFor;

@@ -11,7 +11,7 @@
 #include <type_traits>
 
 #include "qxcore/container/table_shell.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 
 // A 32-bit integer under a type of its own: writing an element that is an int does not touch it, so the
 // compiler may keep the header's values in registers while elements are appended.

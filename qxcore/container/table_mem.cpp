@@ -2,7 +2,7 @@
 
 #include <cstring>
 
-#include "qxcore/container/table_storage.h"
+#include "qxcore/container/internal/table_storage.h"
 #include "qxcore/core/memory.h"
 
 __STableMem::~__STableMem() { __STableMem::Clear(); }

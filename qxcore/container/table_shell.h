@@ -13,7 +13,7 @@
 #include <type_traits>
 #include <utility>
 
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 
 // Throws SECOMException with the code 0x8000000B (E_BOUNDS).
 [[noreturn]] QXCORE_API void SThrowIndexOutOfRange(int index, int count);

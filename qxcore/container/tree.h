@@ -11,7 +11,7 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 
 class QXCORE_API __STree {
  public:

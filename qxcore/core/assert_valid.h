@@ -2,8 +2,8 @@
 // that modules which were built against them keep linking.
 #pragma once
 
-#include "qxcore/core/export.h"
 #include "qxcore/core/object.h"
+#include "qxcore/platform/export.h"
 
 struct IUnknown;
 

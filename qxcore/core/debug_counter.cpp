@@ -4,8 +4,8 @@
 #include <mutex>
 #include <string_view>
 
-#include "platform/interlocked.h"
 #include "qxcore/core/memory.h"
+#include "qxcore/platform/interlocked.h"
 
 namespace {
 

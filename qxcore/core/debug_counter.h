@@ -5,8 +5,8 @@
 
 #include <cstdint>
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 
 // Registers `*value` under a name and a unit ("bytes", "elements"); the name is copied, the unit and
 // the figure have to stay until SDbgRemoveCounter. Several counters may have one name. When memory is

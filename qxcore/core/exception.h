@@ -4,8 +4,8 @@
 // the library have facility 0x99 (0x8099xxxx). Exceptions are thrown by value and caught by reference.
 #pragma once
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 #include "qxcore/string/string.h"
 
 class QXCORE_API SException {
@@ -59,6 +59,9 @@ class QXCORE_API SEConstructor : public SException {
   SEConstructor(const SString& text, HRESULT code) : SException(text, code) {}
   const WCHAR* GetExceptionName() const override;
 };
+
+// The code of every SEZipException that the library throws.
+constexpr HRESULT kSZipFailed = static_cast<HRESULT>(0x80990040);
 
 // A zip archive cannot be read; code and text are the raiser's.
 class QXCORE_API SEZipException : public SException {

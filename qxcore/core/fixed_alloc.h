@@ -13,10 +13,10 @@
 #include <cstring>
 #include <mutex>
 
-#include "platform/interlocked.h"
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
 #include "qxcore/core/idle_consumer.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/interlocked.h"
+#include "qxcore/platform/win32.h"
 
 class QXCORE_API SFixedAlloc : public SIdleConsumer {
  public:

@@ -12,7 +12,7 @@
 
 #include <cstdint>
 
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 
 class SIdleConsumerList;
 

@@ -6,7 +6,7 @@
 
 #include <cstddef>
 
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 
 // Takes size bytes (0 counts as 1), aligned for any fundamental type. Throws SEOutOfMemory; never
 // returns null. Release with SMemFree.

@@ -1,6 +1,6 @@
 #include "qxcore/core/module_state.h"
 
-#include "platform/module.h"
+#include "qxcore/platform/module.h"
 
 void SModuleState::Init(HINSTANCE instance) {
   if (m_initialized != 0) return;

@@ -3,8 +3,8 @@
 // Written when a module is attached, read afterwards; not locked.
 #pragma once
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 #include "qxcore/string/string.h"
 
 class QXCORE_API SModuleState {

@@ -11,8 +11,8 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 
 class SObject;
 

@@ -3,8 +3,8 @@
 #include <new>
 
 #include "qxcore/container/map.h"
+#include "qxcore/string/internal/text_search.h"
 #include "qxcore/string/string_iterators.h"
-#include "qxcore/string/text_search.h"
 
 namespace {
 

@@ -8,8 +8,8 @@
 // everything here belongs to one thread.
 #pragma once
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 #include "qxcore/string/string.h"
 
 class SThrowTarget;

@@ -4,8 +4,8 @@
 #include <cerrno>
 #include <limits>
 
-#include "platform/wide.h"
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/platform/wide.h"
 
 namespace {
 

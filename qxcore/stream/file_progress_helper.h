@@ -8,7 +8,7 @@
 #include <cstdint>
 #include <cstdio>
 
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 #include "qxcore/stream/progress_indicator.h"
 #include "qxcore/string/string.h"
 

@@ -1,7 +1,7 @@
 #include "qxcore/stream/input_binary_stream.h"
 
 #include "qxcore/core/io_exceptions.h"
-#include "qxcore/stream/working_buffer.h"
+#include "qxcore/stream/internal/working_buffer.h"
 #include "qxcore/string/text_conversion.h"
 
 QXCORE_IMPLEMENT_CLASS(SInputBinaryStream, SObject, 0)

@@ -6,8 +6,8 @@
 // cancelling, misuse of marks), never for the end. A stream is used by one thread at a time.
 #pragma once
 
-#include "qxcore/core/export.h"
 #include "qxcore/core/object.h"
+#include "qxcore/platform/export.h"
 
 class QXCORE_API SInputStream : public SObject {
   QXCORE_DECLARE_CLASS(SInputStream)

@@ -12,7 +12,7 @@
 
 #include <exception>
 
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 #include "qxcore/stream/input_stream.h"
 #include "qxcore/string/string.h"
 

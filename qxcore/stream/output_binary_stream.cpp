@@ -4,7 +4,7 @@
 #include <limits>
 
 #include "qxcore/core/io_exceptions.h"
-#include "qxcore/stream/working_buffer.h"
+#include "qxcore/stream/internal/working_buffer.h"
 #include "qxcore/string/text_conversion.h"
 
 QXCORE_IMPLEMENT_CLASS(SOutputBinaryStream, SObject, 0)

@@ -13,8 +13,8 @@
 
 #include "qxcore/container/string_map.h"
 #include "qxcore/container/string_table.h"
-#include "qxcore/core/export.h"
 #include "qxcore/core/object.h"
+#include "qxcore/platform/export.h"
 #include "qxcore/stream/output_stream.h"
 
 class QXCORE_API SOutputBinaryStream : public SObject {

@@ -3,8 +3,8 @@
 #include <cerrno>
 #include <limits>
 
-#include "platform/wide.h"
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/platform/wide.h"
 
 QXCORE_IMPLEMENT_CLASS(SOutputFile, SOutputStream, 0)
 

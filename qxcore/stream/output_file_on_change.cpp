@@ -3,11 +3,11 @@
 #include <algorithm>
 #include <cstring>
 
-#include "platform/win32.h"
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/platform/win32.h"
 #include "qxcore/stream/output_file.h"
 #include "qxcore/stream/output_global.h"
-#include "qxcore/system/file.h"
+#include "qxcore/system/file/file.h"
 
 QXCORE_IMPLEMENT_CLASS(SOutputFileOnChange, SOutputStream, 0)
 

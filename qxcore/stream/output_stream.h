@@ -4,8 +4,8 @@
 // know that everything arrived calls Close, or Flush, before. A stream is used by one thread at a time.
 #pragma once
 
-#include "qxcore/core/export.h"
 #include "qxcore/core/object.h"
+#include "qxcore/platform/export.h"
 
 class QXCORE_API SOutputStream : public SObject {
   QXCORE_DECLARE_CLASS(SOutputStream)

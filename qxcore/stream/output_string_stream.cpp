@@ -2,7 +2,7 @@
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/core/module_state.h"
-#include "qxcore/string/surrogates.h"
+#include "qxcore/string/internal/surrogates.h"
 
 QXCORE_IMPLEMENT_CLASS(SOutputStringStream, SOutputStream, 0)
 

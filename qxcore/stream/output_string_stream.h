@@ -6,10 +6,10 @@
 // come in two calls: its first half waits, until Close at the latest.
 #pragma once
 
-#include "qxcore/core/export.h"
-#include "qxcore/stream/multi_format_support.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/stream/encoding/internal/text_encoder.h"
+#include "qxcore/stream/encoding/multi_format_support.h"
 #include "qxcore/stream/output_stream.h"
-#include "qxcore/stream/text_encoder.h"
 #include "qxcore/string/string_buffer.h"
 
 class QXCORE_API SOutputStringStream : public SOutputStream {

@@ -1,7 +1,7 @@
 // Characters with positions: what SSeekableStringInputStream reads from.
 #pragma once
 
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 #include "qxcore/stream/abstract_io.h"
 #include "qxcore/string/string.h"
 

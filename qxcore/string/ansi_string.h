@@ -6,8 +6,8 @@
 // copy constructor is deleted and an assigned-to object should be given Detach before it ends).
 #pragma once
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 
 class SString;
 

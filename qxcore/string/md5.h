@@ -4,7 +4,7 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
 #include "qxcore/string/string.h"
 
 // Digests bytes that come in pieces.

@@ -4,7 +4,7 @@
 #include <climits>
 #include <cstddef>
 
-#include "platform/wide.h"
+#include "qxcore/platform/wide.h"
 
 namespace {
 

@@ -9,8 +9,8 @@
 // is an empty one. The order is total.
 #pragma once
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 
 // The narrow/wide switches of the runtime's headers would rename these functions.
 #undef _tcscmpi

@@ -4,7 +4,7 @@
 
 #include <algorithm>
 
-#include "platform/wide.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/string_buffer.h"
 #include "qxcore/string/text_conversion.h"
 

@@ -20,8 +20,8 @@
 #include <functional>
 #include <utility>
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 #include "qxcore/string/string_data.h"
 
 class SStringBuffer;

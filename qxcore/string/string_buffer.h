@@ -7,8 +7,8 @@
 
 #include <cstdint>
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 #include "qxcore/string/string.h"
 
 class QXCORE_API SStringBuffer {

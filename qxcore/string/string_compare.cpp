@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "platform/wide.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/natural_compare.h"
 #include "qxcore/string/string.h"
 

@@ -2,7 +2,7 @@
 
 #include <cstdlib>
 
-#include "platform/wide.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/string.h"
 #include "qxcore/string/text_conversion.h"
 

@@ -9,8 +9,8 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "platform/interlocked.h"
-#include "platform/win32.h"
+#include "qxcore/platform/interlocked.h"
+#include "qxcore/platform/win32.h"
 
 struct SStringData {
   static constexpr std::int32_t kStatic = -1;  // constant data, shared without counting

@@ -3,8 +3,8 @@
 
 #include <algorithm>
 
-#include "platform/wide.h"
 #include "qxcore/core/module_state.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/string.h"
 
 namespace {

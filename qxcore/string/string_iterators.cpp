@@ -1,6 +1,6 @@
 #include "qxcore/string/string_iterators.h"
 
-#include "platform/wide.h"
+#include "qxcore/platform/wide.h"
 
 void word_iterator::ScanEnd() {
   m_end = m_start;

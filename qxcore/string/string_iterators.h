@@ -8,8 +8,8 @@
 // A line end at the end of the text does not begin another line; white space at the end no word.
 #pragma once
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 #include "qxcore/string/string.h"
 
 // What the three token iterators share; only they differ in where a token ends and the next begins.

@@ -2,9 +2,9 @@
 
 #include <algorithm>
 
-#include "platform/wide.h"
+#include "qxcore/platform/wide.h"
+#include "qxcore/string/internal/text_search.h"
 #include "qxcore/string/string.h"
-#include "qxcore/string/text_search.h"
 
 namespace {
 

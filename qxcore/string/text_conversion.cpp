@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <cstring>
 
+#include "qxcore/string/internal/widen.h"
 #include "qxcore/string/string.h"
-#include "qxcore/string/widen.h"
 
 // A text that ends at its NUL is at most as long as `max`.
 template <class Character>

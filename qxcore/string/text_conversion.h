@@ -3,8 +3,8 @@
 
 #include <string_view>
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 
 class SString;
 

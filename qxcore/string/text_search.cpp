@@ -1,10 +1,12 @@
 #include "qxcore/string/text_search.h"
 
+#include "qxcore/string/internal/text_search.h"
+
 #include <algorithm>
 #include <bit>
 #include <cstring>
 
-#include "platform/wide.h"
+#include "qxcore/platform/wide.h"
 
 #ifdef __SSE2__
 #include <emmintrin.h>

@@ -1,8 +1,8 @@
 // A handle of the platform's global memory, not owned unless a user says so.
 #pragma once
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 
 class QXCORE_API SHGlobal {
  public:

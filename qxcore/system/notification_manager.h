@@ -12,8 +12,8 @@
 // registrations as they were and call nobody. Unregistering takes none.
 #pragma once
 
-#include "platform/win32.h"
-#include "qxcore/core/export.h"
+#include "qxcore/platform/export.h"
+#include "qxcore/platform/win32.h"
 
 // Who is told. The object counts its references by itself, and its first three functions are those of the
 // platform's IUnknown.

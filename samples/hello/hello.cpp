@@ -5,8 +5,8 @@
 #include <vector>
 
 #include "qxcore/core/exception.h"
+#include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_file.h"
-#include "qxcore/stream/multi_format_reader_unicode.h"
 #include "qxcore/string/text_conversion.h"
 
 using Encodings = SAbstractIO::SMultiFormatSupport;

@@ -10,8 +10,8 @@
 #include <set>
 #include <vector>
 
-#include "platform/wide.h"
 #include "qxcore/core/exception.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/natural_compare.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/text.h"

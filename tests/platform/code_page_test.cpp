@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 
 namespace {
 

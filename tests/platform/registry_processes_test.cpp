@@ -18,8 +18,8 @@
 #include <random>
 #include <string>
 
-#include "platform/wide.h"
-#include "platform/win32.h"
+#include "qxcore/platform/wide.h"
+#include "qxcore/platform/win32.h"
 #include "tests/support/registry_root.h"
 
 namespace {

@@ -9,8 +9,8 @@
 #include <thread>
 #include <vector>
 
-#include "platform/wide.h"
-#include "platform/win32.h"
+#include "qxcore/platform/wide.h"
+#include "qxcore/platform/win32.h"
 #include "tests/support/registry_root.h"
 #include "tests/support/text.h"
 

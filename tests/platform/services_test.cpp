@@ -5,8 +5,8 @@
 #include <string>
 #include <thread>
 
-#include "platform/module.h"
-#include "platform/wide.h"
+#include "qxcore/platform/module.h"
+#include "qxcore/platform/wide.h"
 
 namespace {
 

@@ -7,7 +7,7 @@
 #include <thread>
 #include <vector>
 
-#include "platform/interlocked.h"
+#include "qxcore/platform/interlocked.h"
 #include "tests/support/temp_folder.h"
 
 namespace {

@@ -5,7 +5,7 @@
 #include <cmath>
 #include <ctime>
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 #include "tests/support/text.h"
 #include "tests/support/wine.h"
 

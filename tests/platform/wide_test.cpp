@@ -1,6 +1,6 @@
 // The wide functions, the character tables and the formatting agree between the targets.
 
-#include "platform/wide.h"
+#include "qxcore/platform/wide.h"
 
 #include <gtest/gtest.h>
 

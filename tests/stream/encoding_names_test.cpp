@@ -2,7 +2,7 @@
 
 #include <set>
 
-#include "qxcore/stream/multi_format_support.h"
+#include "qxcore/stream/encoding/multi_format_support.h"
 #include "tests/support/text.h"
 
 namespace {
@@ -16,7 +16,7 @@ struct Row {
 };
 #define E(value, name) {value, WTEXT(name)},
 constexpr Row kRows[] = {
-#include "qxcore/stream/encoding_names.inc"
+#include "qxcore/stream/encoding/encoding_names.inc"
 };
 
 bool IsPattern(const SString& name) { return name.Find(WTEXT('%')) != nullptr; }

@@ -7,9 +7,9 @@
 
 #include "qxcore/core/exception.h"
 #include "qxcore/core/io_exceptions.h"
-#include "qxcore/stream/crc32.h"
-#include "qxcore/stream/inflater_input_stream.h"
 #include "qxcore/stream/input_buffer.h"
+#include "qxcore/stream/zip/crc32.h"
+#include "qxcore/stream/zip/inflater_input_stream.h"
 #include "tests/stream/zip_builder.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/text.h"

@@ -9,8 +9,8 @@
 #include <string>
 
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_buffer.h"
-#include "qxcore/stream/multi_format_reader_unicode.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/text.h"
 

@@ -9,7 +9,7 @@
 #include <thread>
 
 #include "qxcore/core/io_exceptions.h"
-#include "qxcore/system/file.h"
+#include "qxcore/system/file/file.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"

@@ -7,8 +7,8 @@
 #include <string>
 #include <utility>
 
+#include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_stream.h"
-#include "qxcore/stream/multi_format_reader_unicode.h"
 #include "qxcore/stream/output_stream.h"
 #include "tests/support/text.h"
 

@@ -1,6 +1,6 @@
 // What the multi-format reader makes of bytes: selection, cuts, losses, positions.
 
-#include "qxcore/stream/multi_format_reader_unicode.h"
+#include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 
 #include <vector>
 

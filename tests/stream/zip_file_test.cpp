@@ -5,11 +5,11 @@
 #include <string>
 #include <vector>
 
-#include "platform/win32.h"
 #include "qxcore/core/io_exceptions.h"
-#include "qxcore/stream/zip_file.h"
-#include "qxcore/stream/zip_format.h"
-#include "qxcore/system/time.h"
+#include "qxcore/platform/win32.h"
+#include "qxcore/stream/zip/internal/zip_format.h"
+#include "qxcore/stream/zip/zip_file.h"
+#include "qxcore/system/time/time.h"
 #include "tests/stream/zip_builder.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/temp_folder.h"

@@ -7,8 +7,8 @@
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/stream/input_buffer.h"
-#include "qxcore/stream/zip_format.h"
-#include "qxcore/stream/zip_input_stream.h"
+#include "qxcore/stream/zip/internal/zip_format.h"
+#include "qxcore/stream/zip/zip_input_stream.h"
 #include "tests/stream/zip_builder.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/text.h"

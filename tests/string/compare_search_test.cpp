@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <string>
 
-#include "platform/wide.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/natural_compare.h"
 #include "qxcore/string/string.h"
 #include "qxcore/string/text_search.h"

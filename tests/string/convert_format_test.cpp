@@ -3,8 +3,8 @@
 #include <cstdio>
 #include <cstring>
 
-#include "platform/wide.h"
 #include "qxcore/core/module_state.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/ansi_string.h"
 #include "qxcore/string/md5.h"
 #include "qxcore/string/string.h"

@@ -1,7 +1,7 @@
 // How many handles this process has open, to see that none is lost.
 #pragma once
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 
 #ifndef _WIN32
 #include <dirent.h>

@@ -4,7 +4,7 @@
 #include <cstdlib>
 #include <string>
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/wine.h"
 

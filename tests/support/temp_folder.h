@@ -4,8 +4,8 @@
 #include <cstddef>
 #include <string>
 
-#include "platform/wide.h"
-#include "platform/win32.h"
+#include "qxcore/platform/wide.h"
+#include "qxcore/platform/win32.h"
 
 namespace test {
 

@@ -7,7 +7,7 @@
 #include <fstream>
 #include <string>
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 #include "qxcore/string/string.h"
 
 class TemporaryFolder {

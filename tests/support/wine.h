@@ -2,7 +2,7 @@
 // of the published documentation.
 #pragma once
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 
 inline bool IsWine() {
 #ifdef _WIN32

@@ -10,7 +10,7 @@
 #include <ctime>
 #include <vector>
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 
 #ifdef _WIN32
 #include <time.h>

@@ -1,13 +1,13 @@
 // The guard of the current directory: where it goes, and when it comes back.
 
-#include "qxcore/system/current_directory.h"
+#include "qxcore/system/file/current_directory.h"
 
 #include <gtest/gtest.h>
 
 #include <algorithm>
 
-#include "qxcore/system/file.h"
-#include "qxcore/system/file_find.h"
+#include "qxcore/system/file/file.h"
+#include "qxcore/system/file/file_find.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"
 

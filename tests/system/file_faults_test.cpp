@@ -6,10 +6,10 @@
 #include <set>
 #include <string>
 
-#include "qxcore/system/current_directory.h"
-#include "qxcore/system/file.h"
-#include "qxcore/system/ordered_recurse_find_files.h"
-#include "qxcore/system/recurse_find.h"
+#include "qxcore/system/file/current_directory.h"
+#include "qxcore/system/file/file.h"
+#include "qxcore/system/file/ordered_recurse_find_files.h"
+#include "qxcore/system/file/recurse_find.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/open_handles.h"
 #include "tests/support/temp_folder.h"

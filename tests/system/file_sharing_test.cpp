@@ -6,7 +6,7 @@
 #include <cstdlib>
 #include <string>
 
-#include "qxcore/system/file.h"
+#include "qxcore/system/file/file.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"
 

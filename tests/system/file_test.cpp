@@ -1,6 +1,6 @@
 // SFile on real files: names, every status code, sharing, searches, folders.
 
-#include "qxcore/system/file.h"
+#include "qxcore/system/file/file.h"
 
 #include <gtest/gtest.h>
 

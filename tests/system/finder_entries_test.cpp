@@ -17,9 +17,9 @@
 #include <string>
 #include <vector>
 
-#include "qxcore/system/file.h"
-#include "qxcore/system/ordered_recurse_find_files.h"
-#include "qxcore/system/recurse_find.h"
+#include "qxcore/system/file/file.h"
+#include "qxcore/system/file/ordered_recurse_find_files.h"
+#include "qxcore/system/file/recurse_find.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"
 

@@ -7,7 +7,7 @@
 #include <string>
 #include <utility>
 
-#include "qxcore/system/mapped_file.h"
+#include "qxcore/system/file/mapped_file.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/wine.h"
 

@@ -8,7 +8,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include "qxcore/system/mapped_view.h"
+#include "qxcore/system/file/mapped_view.h"
 
 namespace {
 

@@ -1,6 +1,6 @@
 // SOleDateTime: the day count against the system's own conversion, order, the way to seconds, limits.
 
-#include "qxcore/system/ole_date_time.h"
+#include "qxcore/system/time/ole_date_time.h"
 
 #include <gtest/gtest.h>
 

@@ -1,12 +1,12 @@
 // SProfile and the initialisation files below it: texts of all encodings, what a write leaves alone.
 
-#include "qxcore/system/profile.h"
+#include "qxcore/system/settings/profile.h"
 
 #include <gtest/gtest.h>
 
 #include <map>
 
-#include "platform/wide.h"
+#include "qxcore/platform/wide.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/file_size_limit.h"
 #include "tests/support/temp_folder.h"

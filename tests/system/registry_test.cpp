@@ -1,6 +1,6 @@
 // SRegistry on the registry itself: opening, typed values, oddities that are meant, enumeration, deletion.
 
-#include "qxcore/system/registry.h"
+#include "qxcore/system/settings/registry.h"
 
 #include <gtest/gtest.h>
 

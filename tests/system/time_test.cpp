@@ -1,7 +1,7 @@
 // STime and STimeSpan: fields and ways back in the zone of the environment against another reading of it,
 // formats, packed and file times.
 
-#include "qxcore/system/time.h"
+#include "qxcore/system/time/time.h"
 
 #include <gtest/gtest.h>
 

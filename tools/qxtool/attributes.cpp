@@ -2,7 +2,7 @@
 
 #include <charconv>
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 #include "tools/qxtool/failure.h"
 
 namespace {

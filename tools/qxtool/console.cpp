@@ -5,7 +5,7 @@
 #include <cstdlib>
 
 #ifdef _WIN32
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 // Order matters: these need windows.h.
 #include <fcntl.h>
 #include <io.h>

@@ -4,7 +4,7 @@
 #include <string>
 #include <string_view>
 
-#include "qxcore/stream/multi_format_support.h"
+#include "qxcore/stream/encoding/multi_format_support.h"
 
 using Encodings = SAbstractIO::SMultiFormatSupport;
 using Encoding = Encodings::Encoding;

@@ -5,7 +5,7 @@
 #include <string_view>
 #include <system_error>
 
-#include "qxcore/system/file.h"
+#include "qxcore/system/file/file.h"
 #include "tools/qxtool/console.h"
 #include "tools/qxtool/failure.h"
 #include "tools/qxtool/utf8.h"

@@ -1,6 +1,6 @@
 #include "tools/qxtool/file_time.h"
 
-#include "qxcore/system/time.h"
+#include "qxcore/system/time/time.h"
 
 TimeTexts::TimeTexts(const FILETIME& time) {
   SYSTEMTIME fields;

@@ -1,7 +1,7 @@
 // The time of a file as text.
 #pragma once
 
-#include "platform/win32.h"
+#include "qxcore/platform/win32.h"
 #include "qxcore/string/string.h"
 
 // Both are empty when the time lies outside the range of STime. Each time is shown with the rules for

@@ -4,8 +4,8 @@
 #include <vector>
 
 #include "qxcore/core/io_exceptions.h"
-#include "qxcore/system/file.h"
-#include "qxcore/system/recurse_find.h"
+#include "qxcore/system/file/file.h"
+#include "qxcore/system/file/recurse_find.h"
 #include "tools/qxtool/attributes.h"
 #include "tools/qxtool/commands.h"
 #include "tools/qxtool/console.h"

@@ -2,7 +2,7 @@
 
 #include <vector>
 
-#include "qxcore/system/file.h"
+#include "qxcore/system/file/file.h"
 #include "tools/qxtool/attributes.h"
 #include "tools/qxtool/commands.h"
 #include "tools/qxtool/failure.h"

@@ -4,8 +4,8 @@
 #include <string>
 #include <vector>
 
-#include "qxcore/system/file.h"
-#include "qxcore/system/profile.h"
+#include "qxcore/system/file/file.h"
+#include "qxcore/system/settings/profile.h"
 #include "tools/qxtool/commands.h"
 #include "tools/qxtool/failure.h"
 #include "tools/qxtool/json.h"

@@ -4,7 +4,7 @@
 #include <vector>
 
 #include "qxcore/system/hglobal.h"
-#include "qxcore/system/registry.h"
+#include "qxcore/system/settings/registry.h"
 #include "tools/qxtool/commands.h"
 #include "tools/qxtool/failure.h"
 #include "tools/qxtool/json.h"

@@ -4,8 +4,8 @@
 #include <memory>
 #include <string>
 
+#include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_file.h"
-#include "qxcore/stream/multi_format_reader_unicode.h"
 #include "tools/qxtool/encoding_option.h"
 #include "tools/qxtool/progress_bar.h"
 #include "tools/qxtool/standard_streams.h"

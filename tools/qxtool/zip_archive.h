@@ -11,8 +11,8 @@
 #include <vector>
 
 #include "qxcore/stream/input_file.h"
-#include "qxcore/stream/zip_file.h"
-#include "qxcore/stream/zip_input_stream.h"
+#include "qxcore/stream/zip/zip_file.h"
+#include "qxcore/stream/zip/zip_input_stream.h"
 #include "tools/qxtool/progress_bar.h"
 
 // Opens an archive's directory. Throws Failure, with a text for what the library leaves without one.

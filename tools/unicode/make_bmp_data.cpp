@@ -1,8 +1,9 @@
-// Writes platform/bmp_data.inc: the case pairs and character classes of the Basic Multilingual Plane,
+// Writes qxcore/platform/bmp_data.inc: the case pairs and character classes of the Basic Multilingual Plane,
 // from ICU, as ranges. Run it to move to another version of Unicode; the checksums that the tests pin
 // change with it.
 //
-//   g++ -std=c++20 tools/unicode/make_bmp_data.cpp -licuuc -o make_bmp_data && ./make_bmp_data >platform/bmp_data.inc
+//   g++ -std=c++20 tools/unicode/make_bmp_data.cpp -licuuc -o make_bmp_data && ./make_bmp_data
+//   >qxcore/platform/bmp_data.inc
 
 #include <unicode/uchar.h>
 #include <unicode/uversion.h>

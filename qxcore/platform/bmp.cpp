@@ -1,0 +1,61 @@
+#include "qxcore/platform/bmp.h"
+
+#include <array>
+
+namespace platform {
+namespace {
+
+struct Run {
+  int first, last, step, delta;
+};
+
+constexpr Run kLowerRuns[] = {
+#define LOWER(first, last, step, delta) {first, last, step, delta},
+#define UPPER(first, last, step, delta)
+#define CLASS(first, last, bits)
+#include "qxcore/platform/bmp_data.inc"
+#undef LOWER
+#undef UPPER
+};
+
+constexpr Run kUpperRuns[] = {
+#define LOWER(first, last, step, delta)
+#define UPPER(first, last, step, delta) {first, last, step, delta},
+#include "qxcore/platform/bmp_data.inc"
+#undef LOWER
+#undef UPPER
+#undef CLASS
+};
+
+constexpr Run kClassRuns[] = {
+#define LOWER(first, last, step, delta)
+#define UPPER(first, last, step, delta)
+#define CLASS(first, last, bits) {first, last, 1, bits},
+#include "qxcore/platform/bmp_data.inc"
+};
+
+template <std::size_t n>
+constexpr BmpTable<WCHAR> MakeCase(const Run (&runs)[n]) {
+  BmpTable<WCHAR> table{};
+  for (int c = 0; c < 65536; ++c) table.values[c] = static_cast<WCHAR>(c);
+  for (const Run& run : runs)
+    for (int c = run.first; c <= run.last; c += run.step) table.values[c] = static_cast<WCHAR>(c + run.delta);
+  return table;
+}
+
+template <std::size_t n>
+constexpr BmpTable<std::uint8_t> MakeClasses(const Run (&runs)[n]) {
+  BmpTable<std::uint8_t> table{};
+  for (const Run& run : runs)
+    for (int c = run.first; c <= run.last; ++c) table.values[c] = static_cast<std::uint8_t>(run.delta);
+  return table;
+}
+
+}  // namespace
+
+// Made by the compiler: the tables are there before any constructor runs.
+constinit const BmpTable<WCHAR> g_lowerBmp = MakeCase(kLowerRuns);
+constinit const BmpTable<WCHAR> g_upperBmp = MakeCase(kUpperRuns);
+constinit const BmpTable<std::uint8_t> g_classBmp = MakeClasses(kClassRuns);
+
+}  // namespace platform

@@ -1,0 +1,123 @@
+// System message texts, in the words of the published list of system error codes.
+
+#include <algorithm>
+#include <cstdlib>
+#include <string_view>
+
+#include "qxcore/platform/win32.h"
+
+namespace {
+
+struct Message {
+  DWORD code;
+  std::u16string_view text;
+};
+
+// Ascending by code.
+constexpr Message kMessages[] = {
+    {ERROR_SUCCESS, u"The operation completed successfully."},
+    {ERROR_INVALID_FUNCTION, u"Incorrect function."},
+    {ERROR_FILE_NOT_FOUND, u"The system cannot find the file specified."},
+    {ERROR_PATH_NOT_FOUND, u"The system cannot find the path specified."},
+    {ERROR_TOO_MANY_OPEN_FILES, u"The system cannot open the file."},
+    {ERROR_ACCESS_DENIED, u"Access is denied."},
+    {ERROR_INVALID_HANDLE, u"The handle is invalid."},
+    {ERROR_NOT_ENOUGH_MEMORY, u"Not enough memory resources are available to process this command."},
+    {ERROR_INVALID_DATA, u"The data is invalid."},
+    {ERROR_OUTOFMEMORY, u"Not enough memory resources are available to complete this operation."},
+    {ERROR_INVALID_DRIVE, u"The system cannot find the drive specified."},
+    {ERROR_NOT_SAME_DEVICE, u"The system cannot move the file to a different disk drive."},
+    {ERROR_NO_MORE_FILES, u"There are no more files."},
+    {ERROR_WRITE_PROTECT, u"The media is write protected."},
+    {ERROR_WRITE_FAULT, u"The system cannot write to the specified device."},
+    {ERROR_READ_FAULT, u"The system cannot read from the specified device."},
+    {ERROR_GEN_FAILURE, u"A device attached to the system is not functioning."},
+    {ERROR_SHARING_VIOLATION, u"The process cannot access the file because it is being used by another process."},
+    {ERROR_HANDLE_EOF, u"Reached the end of the file."},
+    {ERROR_HANDLE_DISK_FULL, u"The disk is full."},
+    {ERROR_NOT_SUPPORTED, u"The request is not supported."},
+    {ERROR_BAD_NETPATH, u"The network path was not found."},
+    {ERROR_FILE_EXISTS, u"The file exists."},
+    {ERROR_INVALID_PARAMETER, u"The parameter is incorrect."},
+    {ERROR_BROKEN_PIPE, u"The pipe has been ended."},
+    {ERROR_DISK_FULL, u"There is not enough space on the disk."},
+    {ERROR_CALL_NOT_IMPLEMENTED, u"This function is not supported on this system."},
+    {ERROR_INSUFFICIENT_BUFFER, u"The data area passed to a system call is too small."},
+    {ERROR_INVALID_NAME, u"The filename, directory name, or volume label syntax is incorrect."},
+    {ERROR_MOD_NOT_FOUND, u"The specified module could not be found."},
+    {ERROR_NEGATIVE_SEEK, u"An attempt was made to move the file pointer before the beginning of the file."},
+    {ERROR_DIR_NOT_EMPTY, u"The directory is not empty."},
+    {ERROR_BUSY, u"The requested resource is in use."},
+    {ERROR_ALREADY_EXISTS, u"Cannot create a file when that file already exists."},
+    {ERROR_FILENAME_EXCED_RANGE, u"The filename or extension is too long."},
+    {ERROR_FILE_TOO_LARGE, u"The file size exceeds the limit allowed and cannot be saved."},
+    {ERROR_MORE_DATA, u"More data is available."},
+    {ERROR_DIRECTORY, u"The directory name is invalid."},
+    {ERROR_MR_MID_NOT_FOUND,
+     u"The system cannot find message text for message number 0x%1 in the message file for %2."},
+    {ERROR_OPERATION_ABORTED,
+     u"The I/O operation has been aborted because of either a thread exit or an application request."},
+    {ERROR_NOACCESS, u"Invalid access to memory location."},
+    {ERROR_INVALID_FLAGS, u"Invalid flags."},
+    {ERROR_NO_UNICODE_TRANSLATION, u"No mapping for the Unicode character exists in the target multi-byte code page."},
+    {ERROR_IO_DEVICE, u"The request could not be performed because of an I/O device error."},
+    {ERROR_CANCELLED, u"The operation was canceled by the user."},
+    {ERROR_RESOURCE_TYPE_NOT_FOUND, u"The specified resource type cannot be found in the image file."},
+    {ERROR_RESOURCE_NAME_NOT_FOUND, u"The specified resource name cannot be found in the image file."},
+    {ERROR_CANT_RESOLVE_FILENAME, u"The name of the file cannot be resolved by the system."},
+    {0x80004001, u"Not implemented"},
+    {0x80004002, u"No such interface supported"},
+    {0x80004003, u"Invalid pointer"},
+    {0x80004004, u"Operation aborted"},
+    {0x80004005, u"Unspecified error"},
+    {0x8000FFFF, u"Catastrophic failure"},
+};
+static_assert(std::is_sorted(std::begin(kMessages), std::end(kMessages),
+                             [](const Message& a, const Message& b) { return a.code < b.code; }));
+
+// The text of a code; a result code made from a Win32 error has that error's.
+std::u16string_view FindMessage(DWORD code) {
+  if ((code & 0xFFFF0000) == 0x80070000) code &= 0xFFFF;
+  const auto* found = std::lower_bound(std::begin(kMessages), std::end(kMessages), code,
+                                       [](const Message& message, DWORD wanted) { return message.code < wanted; });
+  return found != std::end(kMessages) && found->code == code ? found->text : std::u16string_view();
+}
+
+}  // namespace
+
+DWORD FormatMessageW(DWORD flags, LPCVOID, DWORD messageId, DWORD, LPWSTR buffer, DWORD size, std::va_list*) {
+  const bool allocate = (flags & FORMAT_MESSAGE_ALLOCATE_BUFFER) != 0;
+  if ((flags & FORMAT_MESSAGE_FROM_SYSTEM) == 0 || buffer == nullptr) {
+    SetLastError(ERROR_INVALID_PARAMETER);
+    return 0;
+  }
+  if (allocate) *reinterpret_cast<WCHAR**>(buffer) = nullptr;
+  const std::u16string_view text = FindMessage(messageId);
+  if (text.empty()) {
+    SetLastError(ERROR_MR_MID_NOT_FOUND);
+    return 0;
+  }
+  const std::size_t length = text.size() + 2;
+  WCHAR* target = buffer;
+  if (allocate) {
+    target = static_cast<WCHAR*>(std::malloc(std::max<std::size_t>(length + 1, size) * sizeof(WCHAR)));
+    if (target == nullptr) {
+      SetLastError(ERROR_NOT_ENOUGH_MEMORY);
+      return 0;
+    }
+    *reinterpret_cast<WCHAR**>(buffer) = target;
+  } else if (size < length + 1) {
+    SetLastError(ERROR_INSUFFICIENT_BUFFER);
+    return 0;
+  }
+  text.copy(target, text.size());
+  target[length - 2] = u'\r';
+  target[length - 1] = u'\n';
+  target[length] = 0;
+  return static_cast<DWORD>(length);
+}
+
+HLOCAL LocalFree(HLOCAL block) {
+  std::free(block);
+  return nullptr;
+}

@@ -1,0 +1,176 @@
+// The registry's functions over the store.
+
+#include <algorithm>
+#include <cstring>
+
+#include "qxcore/platform/posix/registry_key.h"
+
+namespace {
+
+using namespace platform;
+
+std::u16string_view ViewOf(LPCWSTR text) { return text == nullptr ? std::u16string_view() : text; }
+
+void CheckPath(std::u16string_view path) {
+  if (!path.empty() && path.front() == '\\') throw SqliteError{ERROR_BAD_PATHNAME};
+}
+
+template <class Number>
+void Store(Number* target, Number value) {
+  if (target != nullptr) *target = value;
+}
+
+// Text with its terminator; `length` is the room on entry, the length without terminator on return.
+DWORD CopyText(const std::u16string& text, LPWSTR buffer, LPDWORD length) {
+  if (*length <= text.size()) return ERROR_MORE_DATA;
+  text.copy(buffer, text.size());
+  buffer[text.size()] = 0;
+  *length = static_cast<DWORD>(text.size());
+  return ERROR_SUCCESS;
+}
+
+void ClearClass(LPWSTR className, LPDWORD length) {
+  if (className != nullptr && length != nullptr && *length > 0) *className = 0;
+  Store<DWORD>(length, 0);
+}
+
+// A value's type and data; without a buffer its size alone.
+DWORD CopyData(const RegistryValue& value, LPDWORD type, BYTE* data, LPDWORD size) {
+  Store(type, value.type);
+  if (size == nullptr) return ERROR_SUCCESS;
+  const DWORD room = *size;
+  *size = static_cast<DWORD>(value.data.size());
+  if (data == nullptr) return ERROR_SUCCESS;
+  if (room < value.data.size()) return ERROR_MORE_DATA;
+  std::memcpy(data, value.data.data(), value.data.size());
+  return ERROR_SUCCESS;
+}
+
+}  // namespace
+
+// --- keys ---
+
+LSTATUS RegOpenKeyExW(HKEY key, LPCWSTR path, DWORD, REGSAM access, HKEY* result) {
+  if (result == nullptr) return ERROR_INVALID_PARAMETER;
+  *result = nullptr;
+  return RegistryResult([&]() -> DWORD {
+    const RegistryKeyUse use(key, 0);
+    CheckPath(ViewOf(path));
+    use.MustExist();
+    const KeyId found = use->FindKey(use.Id(), ViewOf(path));
+    if (found == 0) return ERROR_FILE_NOT_FOUND;
+    *result = use.AddHandle(found, access);
+    return ERROR_SUCCESS;
+  });
+}
+
+LSTATUS RegCreateKeyExW(HKEY key, LPCWSTR path, DWORD, LPWSTR, DWORD, REGSAM access, const SECURITY_ATTRIBUTES*,
+                        HKEY* result, LPDWORD disposition) {
+  if (result == nullptr || path == nullptr) return ERROR_INVALID_PARAMETER;
+  *result = nullptr;
+  return RegistryResult([&]() -> DWORD {
+    const RegistryKeyUse use(key, 0);
+    CheckPath(path);
+    bool isNew = false;
+    const KeyId made = use->CreateKey(use.Id(), path, isNew);
+    if (made == 0) return ERROR_KEY_DELETED;
+    *result = use.AddHandle(made, access);
+    Store<DWORD>(disposition, isNew ? REG_CREATED_NEW_KEY : REG_OPENED_EXISTING_KEY);
+    return ERROR_SUCCESS;
+  });
+}
+
+LSTATUS RegCloseKey(HKEY key) {
+  return RegistryResult([&] { return CloseRegistryHandle(key); });
+}
+
+LSTATUS RegDeleteKeyW(HKEY key, LPCWSTR path) {
+  if (path == nullptr) return ERROR_INVALID_PARAMETER;
+  return RegistryResult([&] {
+    const RegistryKeyUse use(key, 0);
+    CheckPath(path);
+    return use->DeleteKey(use.Id(), path);
+  });
+}
+
+LSTATUS RegQueryInfoKeyW(HKEY key, LPWSTR className, LPDWORD classLength, LPDWORD, LPDWORD subKeys,
+                         LPDWORD longestSubKey, LPDWORD longestClass, LPDWORD values, LPDWORD longestValueName,
+                         LPDWORD longestValue, LPDWORD securityDescriptor, FILETIME* lastWrite) {
+  return RegistryResult([&]() -> DWORD {
+    const RegistryKeyUse use(key, KEY_QUERY_VALUE);
+    use.MustExist();
+    const RegistryKeyInfo info = use->Describe(use.Id());
+    ClearClass(className, classLength);
+    Store(subKeys, info.subKeys);
+    Store(longestSubKey, info.longestSubKey);
+    Store<DWORD>(longestClass, 0);
+    Store(values, info.values);
+    Store(longestValueName, info.longestValueName);
+    Store(longestValue, info.longestValue);
+    Store<DWORD>(securityDescriptor, 0);
+    Store(lastWrite, FILETIME{0, 0});
+    return ERROR_SUCCESS;
+  });
+}
+
+LSTATUS RegEnumKeyExW(HKEY key, DWORD index, LPWSTR name, LPDWORD nameLength, LPDWORD, LPWSTR className,
+                      LPDWORD classLength, FILETIME* lastWrite) {
+  if (name == nullptr || nameLength == nullptr) return ERROR_INVALID_PARAMETER;
+  return RegistryResult([&]() -> DWORD {
+    const RegistryKeyUse use(key, KEY_ENUMERATE_SUB_KEYS);
+    use.MustExist();
+    const std::u16string* subKey = use->SubKey(use.Id(), index);
+    if (subKey == nullptr) return ERROR_NO_MORE_ITEMS;
+    const DWORD error = CopyText(*subKey, name, nameLength);
+    if (error != ERROR_SUCCESS) return error;
+    ClearClass(className, classLength);
+    Store(lastWrite, FILETIME{0, 0});
+    return ERROR_SUCCESS;
+  });
+}
+
+// --- values ---
+
+LSTATUS RegEnumValueW(HKEY key, DWORD index, LPWSTR name, LPDWORD nameLength, LPDWORD, LPDWORD type, BYTE* data,
+                      LPDWORD size) {
+  if (name == nullptr || nameLength == nullptr || (data != nullptr && size == nullptr)) return ERROR_INVALID_PARAMETER;
+  return RegistryResult([&]() -> DWORD {
+    const RegistryKeyUse use(key, KEY_QUERY_VALUE);
+    use.MustExist();
+    const RegistryValue* value = use->ValueAt(use.Id(), index);
+    if (value == nullptr) return ERROR_NO_MORE_ITEMS;
+    const DWORD error = CopyText(value->name, name, nameLength);
+    return error == ERROR_SUCCESS ? CopyData(*value, type, data, size) : error;
+  });
+}
+
+LSTATUS RegSetValueExW(HKEY key, LPCWSTR name, DWORD, DWORD type, const BYTE* data, DWORD size) {
+  constexpr std::size_t kLongestName = 16383;
+  if ((data == nullptr && size != 0) || ViewOf(name).size() > kLongestName) return ERROR_INVALID_PARAMETER;
+  return RegistryResult([&]() -> DWORD {
+    const RegistryKeyUse use(key, KEY_SET_VALUE);
+    const std::string_view bytes(reinterpret_cast<const char*>(data), size);
+    return use->SetValue(use.Id(), ViewOf(name), type, bytes) ? ERROR_SUCCESS : ERROR_KEY_DELETED;
+  });
+}
+
+LSTATUS RegQueryValueExW(HKEY key, LPCWSTR name, LPDWORD, LPDWORD type, BYTE* data, LPDWORD size) {
+  if (data != nullptr && size == nullptr) return ERROR_INVALID_PARAMETER;
+  return RegistryResult([&]() -> DWORD {
+    const RegistryKeyUse use(key, KEY_QUERY_VALUE);
+    const RegistryValue* value = use->FindValue(use.Id(), ViewOf(name));
+    if (value != nullptr) return CopyData(*value, type, data, size);
+    use.MustExist();
+    Store<DWORD>(size, 0);
+    return ERROR_FILE_NOT_FOUND;
+  });
+}
+
+LSTATUS RegDeleteValueW(HKEY key, LPCWSTR name) {
+  return RegistryResult([&]() -> DWORD {
+    const RegistryKeyUse use(key, KEY_SET_VALUE);
+    if (use->DeleteValue(use.Id(), ViewOf(name))) return ERROR_SUCCESS;
+    use.MustExist();
+    return ERROR_FILE_NOT_FOUND;
+  });
+}

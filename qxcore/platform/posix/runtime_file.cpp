@@ -1,0 +1,77 @@
+// The C runtime's files with wide paths.
+
+#include <sys/stat.h>
+
+#include <cerrno>
+#include <new>
+#include <string>
+
+#include "qxcore/platform/posix/path.h"
+#include "qxcore/platform/wide.h"
+
+namespace platform {
+namespace {
+
+int ErrnoFromError(DWORD error) {
+  switch (error) {
+    case ERROR_FILE_NOT_FOUND:
+    case ERROR_PATH_NOT_FOUND:
+    case ERROR_INVALID_NAME:
+    case ERROR_BAD_NETPATH:
+      return ENOENT;
+    case ERROR_ACCESS_DENIED:
+      return EACCES;
+    case ERROR_NOT_ENOUGH_MEMORY:
+      return ENOMEM;
+    default:
+      return EINVAL;
+  }
+}
+
+// The mode as the C library takes it: text and binary are one, inherited handles are asked for with "N" left out.
+std::string ConvertMode(const WCHAR* mode) {
+  std::string result;
+  for (; *mode != 0 && *mode != ','; ++mode)
+    if (*mode == 'r' || *mode == 'w' || *mode == 'a' || *mode == '+') result += static_cast<char>(*mode);
+  return result + "e";
+}
+
+}  // namespace
+
+std::FILE* WideFileOpen(const WCHAR* path, const WCHAR* mode) {
+  try {
+    const Resolved entry = ResolvePath(path);
+    if (entry.error != ERROR_SUCCESS) {
+      errno = ErrnoFromError(entry.error);
+      return nullptr;
+    }
+    const std::string how = ConvertMode(mode);
+    struct stat info;
+    const bool there = stat(entry.path.c_str(), &info) == 0;
+    const bool writes = how.find_first_of("wa+") != std::string::npos;
+    if ((there && S_ISDIR(info.st_mode)) || (there && writes && S_ISREG(info.st_mode) && (info.st_mode & 0222) == 0)) {
+      errno = EACCES;
+      return nullptr;
+    }
+    if (entry.wantsFolder) {
+      errno = ENOENT;
+      return nullptr;
+    }
+    return std::fopen(entry.path.c_str(), how.c_str());
+  } catch (const std::bad_alloc&) {
+    errno = ENOMEM;
+    return nullptr;
+  }
+}
+
+WCHAR* WideFullPath(WCHAR* buffer, const WCHAR* path, std::size_t capacity) {
+  const WCHAR* given = path != nullptr && *path != 0 ? path : u".";
+  const DWORD length = GetFullPathNameW(given, static_cast<DWORD>(capacity), buffer, nullptr);
+  return length > 0 && length < capacity ? buffer : nullptr;
+}
+
+int FileSeek(std::FILE* file, std::int64_t offset, int origin) { return fseeko(file, offset, origin); }
+
+std::int64_t FileTell(std::FILE* file) { return ftello(file); }
+
+}  // namespace platform

@@ -1,0 +1,67 @@
+// Decodes raw bytes of a selected encoding to UTF-16, piece by piece.
+//
+// A sequence that the end of a piece cuts is left for the next piece, so that how the input is handed
+// out never shows in the text. Each byte gives one character at most.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "qxcore/stream/encoding/internal/code_page_table.h"
+#include "qxcore/stream/encoding/multi_format_support.h"
+
+class STextDecoder {
+ public:
+  using Encoding = SAbstractIO::SMultiFormatSupport::Encoding;  // see multi_format_support.h
+
+  // What Decode stopped at.
+  struct Run {
+    const unsigned char* in;  // first byte not used
+    WCHAR* out;               // behind the last character written
+    bool isLoss = false;      // at `in` stands something that cannot be mapped
+  };
+
+  // Selects the encoding and what becomes of characters that cannot be mapped: with the lossless policy
+  // decoding stops at them; else they are replaced, or dropped when the replacement is 0. `quick`: UTF-8 is
+  // taken for well-formed; continuation bytes are not checked.
+  void Select(Encoding encoding, bool quick);
+  void SetReplacement(WCHAR replacement) { m_replacement = replacement; }
+  WCHAR GetReplacement() const { return m_replacement; }
+
+  // True for the few code pages that keep a state or have longer characters: they are decoded only when
+  // the whole rest of the input is there.
+  bool NeedsWholeInput() const { return m_kernel == Kernel::kWhole; }
+
+  // Decodes [in, end) to `out`, which has room for end - in characters. With `isLast` a sequence that
+  // the end cuts cannot be mapped; without, it is left.
+  Run Decode(const unsigned char* in, const unsigned char* end, bool isLast, WCHAR* out);
+
+  // Throws the exception for what the last Decode stopped at.
+  [[noreturn]] void ThrowLoss() const;
+
+  // Characters that could not be mapped since Select or ForgetLosses, by what became of them.
+  std::uint64_t GetReplaced() const { return m_replaced; }
+  std::uint64_t GetDropped() const { return m_dropped; }
+  void ForgetLosses() { m_replaced = m_dropped = 0; }
+
+ private:
+  enum class Kernel { kASCII, kSingleByte, kDoubleByte, kWhole, kUTF8, kQuickUTF8, kLittleEndian, kBigEndian };
+  // What stands where a kernel stopped.
+  struct Obstacle {
+    std::ptrdiff_t length;  // 0: cut by the end of the piece
+    bool isIllegal;         // no sequence of the encoding, rather than one without a character
+  };
+
+  Run RunKernel(const unsigned char* in, const unsigned char* end, WCHAR* out) const;
+  Obstacle Look(const unsigned char* in, const unsigned char* end, bool isLast) const;
+  Run DecodeWhole(const unsigned char* in, const unsigned char* end, WCHAR* out);
+
+  Encoding m_encoding = 0;
+  Kernel m_kernel = Kernel::kASCII;
+  const SCodePageTable* m_table = nullptr;
+  WCHAR m_replacement = 0xFFFD;
+  bool m_isLossless = false;
+  bool m_isLossIllegal = false;
+  std::uint64_t m_replaced = 0;
+  std::uint64_t m_dropped = 0;
+};

@@ -1,0 +1,157 @@
+#include "qxcore/stream/encoding/internal/text_encoder.h"
+
+#include <algorithm>
+#include <cstring>
+
+#include "qxcore/core/io_exceptions.h"
+#include "qxcore/string/internal/surrogates.h"
+
+using Support = SAbstractIO::SMultiFormatSupport;
+
+namespace {
+
+constexpr std::size_t kPiece = 1024;
+constexpr std::size_t kBytesPerUnit = 8;  // the escapes of stateful code pages included
+constexpr std::size_t kUnmappable = static_cast<std::size_t>(-1);
+
+// Characters that the first unit begins: a whole surrogate pair counts as one.
+std::size_t UnitsOfCharacter(const WCHAR* text, std::size_t count) {
+  return count >= 2 && SIsHighSurrogate(text[0]) && SIsLowSurrogate(text[1]) ? 2 : 1;
+}
+
+// Each encoder gives the number of bytes, or kUnmappable when a character of the piece cannot be mapped.
+
+std::size_t EncodeASCII(const WCHAR* text, std::size_t count, char* bytes) {
+  for (std::size_t i = 0; i < count; ++i) {
+    if (text[i] >= 0x80) return kUnmappable;
+    bytes[i] = static_cast<char>(text[i]);
+  }
+  return count;
+}
+
+std::size_t EncodeUtf8(const WCHAR* text, std::size_t count, char* bytes) {
+  char* out = bytes;
+  for (std::size_t i = 0; i < count; ++i) {
+    std::uint32_t c = text[i];
+    if (c < 0x80) {
+      *out++ = static_cast<char>(c);
+    } else if (c < 0x800) {
+      *out++ = static_cast<char>(0xC0 | c >> 6);
+      *out++ = static_cast<char>(0x80 | (c & 0x3F));
+    } else if (!SIsHighSurrogate(text[i]) && !SIsLowSurrogate(text[i])) {
+      *out++ = static_cast<char>(0xE0 | c >> 12);
+      *out++ = static_cast<char>(0x80 | (c >> 6 & 0x3F));
+      *out++ = static_cast<char>(0x80 | (c & 0x3F));
+    } else {
+      if (UnitsOfCharacter(text + i, count - i) != 2) return kUnmappable;
+      c = 0x10000 + ((c & 0x3FF) << 10) + (text[++i] & 0x3FFu);
+      *out++ = static_cast<char>(0xF0 | c >> 18);
+      *out++ = static_cast<char>(0x80 | (c >> 12 & 0x3F));
+      *out++ = static_cast<char>(0x80 | (c >> 6 & 0x3F));
+      *out++ = static_cast<char>(0x80 | (c & 0x3F));
+    }
+  }
+  return static_cast<std::size_t>(out - bytes);
+}
+
+std::size_t EncodeUtf16(const WCHAR* text, std::size_t count, bool isBigEndian, char* bytes) {
+  std::memcpy(bytes, text, count * sizeof(WCHAR));
+  if (isBigEndian) {
+    for (std::size_t i = 0; i < count; ++i) std::swap(bytes[2 * i], bytes[2 * i + 1]);
+  }
+  return count * sizeof(WCHAR);
+}
+
+std::size_t EncodePage(unsigned page, const WCHAR* text, std::size_t count, char* bytes) {
+  const int size = static_cast<int>(count);
+  const int room = static_cast<int>(count * kBytesPerUnit);
+  BOOL usedDefault = FALSE;
+  int written = WideCharToMultiByte(page, WC_NO_BEST_FIT_CHARS, text, size, bytes, room, nullptr, &usedDefault);
+  if (written > 0) return usedDefault ? kUnmappable : static_cast<std::size_t>(written);
+  // Pages that take no flags do not tell of losses either: the text must come back from the bytes.
+  written = WideCharToMultiByte(page, 0, text, size, bytes, room, nullptr, nullptr);
+  WCHAR back[kPiece];
+  int length = written > 0 ? MultiByteToWideChar(page, 0, bytes, written, back, static_cast<int>(kPiece)) : 0;
+  bool isSame = length == size && std::equal(text, text + count, back);
+  return isSame ? static_cast<std::size_t>(written) : kUnmappable;
+}
+
+}  // namespace
+
+void STextEncoder::WriteMark(SOutputStream& out) const {
+  if (!Support::IsUnicode(m_encoding) || (m_encoding & (Support::kOptionalBOM | Support::kRequiredBOM)) == 0) return;
+  constexpr WCHAR kMark = 0xFEFF;
+  char bytes[kBytesPerUnit];
+  out.Write(bytes, static_cast<unsigned long>(EncodePiece(&kMark, 1, bytes)));
+}
+
+std::size_t STextEncoder::EncodePiece(const WCHAR* text, std::size_t count, char* bytes) const {
+  switch (Support::KindOf(m_encoding)) {
+    case Support::kASCII:
+      return EncodeASCII(text, count, bytes);
+    case Support::kUnicode:
+      if ((m_encoding & Support::kUtf8Form) != 0) return EncodeUtf8(text, count, bytes);
+      return EncodeUtf16(text, count, (m_encoding & Support::kBigEndian) != 0, bytes);
+    default:
+      return EncodePage(Support::CodePageOf(m_encoding), text, count, bytes);
+  }
+}
+
+void STextEncoder::Write(const WCHAR* text, std::size_t count, SOutputStream& out) {
+  char bytes[kPiece * kBytesPerUnit];
+  while (count > 0) {
+    std::size_t piece = std::min(count, kPiece);
+    if (piece < count && SIsHighSurrogate(text[piece - 1])) --piece;
+    std::size_t size = EncodePiece(text, piece, bytes);
+    if (size != kUnmappable) {
+      out.Write(bytes, static_cast<unsigned long>(size));
+    } else {
+      WriteCarefully(text, piece, out);
+    }
+    text += piece;
+    count -= piece;
+  }
+}
+
+// Character by character, because one of them cannot be mapped.
+void STextEncoder::WriteCarefully(const WCHAR* text, std::size_t count, SOutputStream& out) {
+  while (count > 0) {
+    std::size_t units = UnitsOfCharacter(text, count);
+    char bytes[2 * kBytesPerUnit];
+    std::size_t size = EncodePiece(text, units, bytes);
+    if (size != kUnmappable) {
+      out.Write(bytes, static_cast<unsigned long>(size));
+    } else if ((m_encoding & Support::kLossless) != 0) {
+      ThrowLoss();
+    } else {
+      WriteReplacement(out);
+    }
+    text += units;
+    count -= units;
+  }
+}
+
+// A replacement that cannot be mapped either gives way to a question mark.
+void STextEncoder::WriteReplacement(SOutputStream& out) {
+  if (m_replacement == 0) {
+    ++m_dropped;
+    return;
+  }
+  char bytes[kBytesPerUnit];
+  constexpr WCHAR kLastResort = WTEXT('?');
+  std::size_t size = EncodePiece(&m_replacement, 1, bytes);
+  if (size == kUnmappable) size = EncodePiece(&kLastResort, 1, bytes);
+  if (size != kUnmappable) out.Write(bytes, static_cast<unsigned long>(size));
+  ++m_replaced;
+}
+
+void STextEncoder::ThrowLoss() const {
+  switch (Support::KindOf(m_encoding)) {
+    case Support::kASCII:
+      throw SEIONonASCII();
+    case Support::kUnicode:
+      throw SEIOCantMap_UTF16_UTF8();
+    default:
+      throw SEIOCantMap_UTF16_MBCS();
+  }
+}

@@ -1,0 +1,79 @@
+// What all multi-format readers know of themselves: the requested and the selected encoding, how the
+// selection came about, and what was lost while reading.
+#pragma once
+
+#include "qxcore/platform/export.h"
+#include "qxcore/stream/encoding/internal/data_affinity.h"
+#include "qxcore/stream/encoding/internal/encoding_guess.h"
+#include "qxcore/stream/encoding/internal/text_decoder.h"
+#include "qxcore/stream/encoding/multi_format_support.h"
+#include "qxcore/string/string.h"
+
+class QXCORE_API SMultiFormatReaderStatusBase {
+ public:
+  using Support = SAbstractIO::SMultiFormatSupport;  // the encodings
+  using Encoding = Support::Encoding;                // see multi_format_support.h
+
+  // A growing buffer: bytes lie from start to end, in a block of `capacity` bytes.
+  struct BufferStatus {
+    unsigned char* block = nullptr;  // owned by the reader, unless the capacity is 0
+    unsigned char* start = nullptr;  // first byte not used yet
+    unsigned char* end = nullptr;    // behind the last byte
+    unsigned long capacity = 0;      // bytes of the block
+
+    unsigned long Size() const { return static_cast<unsigned long>(end - start); }  // bytes not used yet
+  };
+
+  // Status bits.
+  enum Status : unsigned {
+    kRawPresent = 0x1,   // raw data was there before detection
+    kWholeInput = 0x2,   // no more raw data follows
+    kProvisional = 0x4,  // ASCII so far; more data may show other bytes
+    kSelected = 0x20,    // a selection was made
+    kWarning = 0x40      // detection's result deserves a warning
+  };
+
+  // A copy has the encodings, the status and the reports, but empty buffers of its own.
+  SMultiFormatReaderStatusBase(const SMultiFormatReaderStatusBase& other);
+  SMultiFormatReaderStatusBase& operator=(const SMultiFormatReaderStatusBase& other);
+  virtual ~SMultiFormatReaderStatusBase();
+
+  // Makes room for `size` bytes from the buffer's start on, keeping its content; by doubling. Throws
+  // SEOutOfMemory and changes nothing.
+  virtual void AllocRawData(BufferStatus& buffer, unsigned long size);
+  virtual void AllocStrData(BufferStatus& buffer, unsigned long size);
+
+  Encoding GetRequestedFormat() const { return m_requested; }  // the hint and the policy
+  // The selected encoding with the requested policy; 0 before the first read or check, and when it failed.
+  Encoding GetFormat() const { return m_selected; }
+  unsigned int GetStatus() const { return m_status; }
+  const SDataAffinity& GetAffinity() const { return m_affinity; }  // the evidence of the last detection
+
+  // With a flag other than 0, UTF-8 is taken for well-formed and its continuation bytes are not checked.
+  // Gives the former flag. Takes effect with the next check of the format.
+  int SetQuickUTF8ToUTF16(int quick);
+
+  // What a user should know of the selection; empty when there is nothing to say.
+  SString GetDetectionWarning() const;
+  // How the selection came about, also where that deserves no warning; empty when nothing was detected.
+  SString GetDetectionReport() const;
+  // That characters were replaced or dropped; empty while none was.
+  SString GetEncodingWarning() const;
+  unsigned long long GetReplacedCount() const { return m_decoder.GetReplaced(); }
+  unsigned long long GetDroppedCount() const { return m_decoder.GetDropped(); }
+
+ protected:
+  // Nothing is selected yet.
+  explicit SMultiFormatReaderStatusBase(Encoding requested) : m_requested(requested) {}
+  static void FreeBuffer(BufferStatus& buffer) noexcept;  // gives the block back and empties the buffer
+
+  Encoding m_requested;       // hint and policy
+  Encoding m_selected = 0;    // 0 before the selection
+  BufferStatus m_raw;         // bytes not decoded yet
+  unsigned int m_status = 0;  // status bits
+  SDataAffinity m_affinity;   // the evidence of the last detection
+  SEncodingGuess m_guess;     // what was made of it
+  STextDecoder m_decoder;     // of the selected encoding; counts the losses
+  bool m_hasFailed = false;   // detection selected nothing
+  int m_quickUTF8 = 0;        // UTF-8 is taken for well-formed
+};

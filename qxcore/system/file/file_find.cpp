@@ -1,0 +1,109 @@
+#include "qxcore/system/file/file_find.h"
+
+#include <algorithm>
+
+#include "qxcore/platform/wide.h"
+#include "qxcore/system/file/file.h"
+#include "qxcore/system/time/time.h"
+
+namespace {
+
+bool IsDotName(const WCHAR* name) { return name[0] == '.' && (name[1] == 0 || (name[1] == '.' && name[2] == 0)); }
+
+// "folder\name", in one allocation.
+SString JoinPath(const SString& folder, const SString& name) {
+  SString path;
+  WCHAR* at = path.GetBufferSetLength(folder.Length() + 1 + name.Length());
+  at = std::copy(folder.begin(), folder.end(), at);
+  *at++ = '\\';
+  std::copy(name.begin(), name.end(), at);
+  return path;
+}
+
+}  // namespace
+
+SString SBaseFind::GetFilePath() const {
+  const SString name = GetFileName();
+  return name.IsEmpty() ? name : JoinPath(GetRoot(), name);
+}
+
+SString SBaseFind::GetFileTitleW() const {
+  const SString name = GetFileName();
+  const int dot = name.ReverseFindPos('.', name.Length() - 1);
+  return dot <= 0 || IsDotName(name) ? name : name.Left(dot);
+}
+
+SString SBaseFind::GetFileURL() const { return SFile::PathToURL(GetFilePath()); }
+
+int SBaseFind::IsDots() const { return MatchesMask(FILE_ATTRIBUTE_DIRECTORY) && IsDotName(GetFileName()); }
+
+SFileFind::~SFileFind() { SFileFind::Close(); }
+
+int SFileFind::Close() {
+  m_data.cFileName[0] = 0;
+  m_data.dwFileAttributes = 0;
+  m_root.Release();
+  if (m_search == nullptr) return 1;
+  const HANDLE search = m_search;
+  m_search = nullptr;
+  const DWORD error = ::GetLastError();
+  if (!::FindClose(search)) return 0;
+  ::SetLastError(error);
+  return 1;
+}
+
+int SFileFind::FindFile(const WCHAR* mask, unsigned long) {
+  const SString wanted(mask != nullptr ? mask : WTEXT("*.*"));  // it may be this object's own
+  // Only this search: a derived class calls this for one folder after the other.
+  SFileFind::Close();
+  m_mask = wanted;
+  const HANDLE search = ::FindFirstFileW(m_mask, &m_data);
+  if (search == INVALID_HANDLE_VALUE) {
+    m_data.cFileName[0] = 0;
+    m_data.dwFileAttributes = 0;
+    return 0;
+  }
+  m_search = search;
+  WCHAR full[MAX_PATH];
+  if (platform::WideFullPath(full, m_mask, MAX_PATH) == nullptr) {
+    SFileFind::Close();
+    ::SetLastError(ERROR_INVALID_NAME);
+    return 0;
+  }
+  const SStringView path(full);
+  const std::size_t last = path.find_last_of(WTEXT("\\/"));
+  try {
+    m_root = path.substr(0, last == SStringView::npos ? 0 : last);
+  } catch (...) {
+    SFileFind::Close();
+    throw;
+  }
+  return 1;
+}
+
+int SFileFind::FindNextFileW() {
+  if (m_search != nullptr && ::FindNextFileW(m_search, &m_data)) return 1;
+  if (m_search == nullptr) ::SetLastError(ERROR_NO_MORE_FILES);
+  m_data.cFileName[0] = 0;
+  m_data.dwFileAttributes = 0;
+  return 0;
+}
+
+SString SFileFind::GetFileName() const { return SString(m_data.cFileName); }
+
+std::uint64_t SFileFind::GetLength() const {
+  if (m_data.cFileName[0] == 0) return 0;
+  return static_cast<std::uint64_t>(m_data.nFileSizeHigh) << 32 | m_data.nFileSizeLow;
+}
+
+int SFileFind::GiveTime(const FILETIME& from, STime* time) const {
+  if (m_data.cFileName[0] == 0) return 0;
+  *time = STime(from);
+  return 1;
+}
+
+int SFileFind::GetCreationTime(STime* time) const { return GiveTime(m_data.ftCreationTime, time); }
+int SFileFind::GetLastAccessTime(STime* time) const { return GiveTime(m_data.ftLastAccessTime, time); }
+int SFileFind::GetLastWriteTime(STime* time) const { return GiveTime(m_data.ftLastWriteTime, time); }
+
+int SFileFind::MatchesMask(unsigned long mask) const { return (m_data.dwFileAttributes & mask) != 0; }
