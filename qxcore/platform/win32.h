@@ -102,6 +102,7 @@ using REGSAM = DWORD;
 #define WINAPI
 #define CALLBACK
 #include "qxcore/platform/win32/constants.h"
+#include "qxcore/platform/win32/handles.h"
 
 // --- names that the Windows headers change: a client may write either form here, too ---
 
