@@ -17,6 +17,7 @@
 #include "qxcore/core/debug_counter.h"
 #include "qxcore/core/exception.h"
 #include "qxcore/core/fixed_alloc.h"
+#include "qxcore/core/handle_map.h"
 #include "qxcore/core/idle_consumer.h"
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/core/memory.h"
