@@ -23,6 +23,7 @@
 #include "qxcore/core/memory.h"
 #include "qxcore/core/module_state.h"
 #include "qxcore/core/object.h"
+#include "qxcore/core/raise_error.h"
 #include "qxcore/core/throw_target.h"
 #include "qxcore/platform/bmp.h"
 #include "qxcore/platform/export.h"
