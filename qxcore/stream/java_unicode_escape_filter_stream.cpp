@@ -8,7 +8,7 @@
 #include <utility>
 
 #include "qxcore/core/exception.h"
-#include "qxcore/string/internal/widen.h"
+#include "qxcore/platform/internal/widen.h"
 
 QXCORE_IMPLEMENT_CLASS(SJavaUnicodeEscapeFilterStream, SInputStream, 0)
 

@@ -2,7 +2,7 @@
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/core/module_state.h"
-#include "qxcore/string/internal/surrogates.h"
+#include "qxcore/platform/internal/utf.h"
 
 QXCORE_IMPLEMENT_CLASS(SOutputStringStream, SOutputStream, 0)
 
@@ -56,12 +56,12 @@ unsigned long Stream::Write(const WCHAR* text, unsigned int count) {
   const WCHAR* end = text + count;
   if (m_waitingHalf != 0) {
     const WCHAR pair[2] = {m_waitingHalf, *at};
-    bool isPair = SIsLowSurrogate(*at);
+    bool isPair = platform::IsLowSurrogate(*at);
     m_waitingHalf = 0;
     m_encoder.Write(pair, isPair ? 2 : 1, *m_out);
     if (isPair) ++at;
   }
-  if (at != end && SIsHighSurrogate(end[-1])) m_waitingHalf = *--end;
+  if (at != end && platform::IsHighSurrogate(end[-1])) m_waitingHalf = *--end;
   m_encoder.Write(at, static_cast<std::size_t>(end - at), *m_out);
   return count;
 }

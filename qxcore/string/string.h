@@ -18,6 +18,8 @@
 #include <cstdarg>
 #include <cstring>
 #include <functional>
+#include <string>
+#include <string_view>
 #include <utility>
 
 #include "qxcore/platform/export.h"
@@ -264,6 +266,12 @@ class QXCORE_API SString {
   // Length() + 1 characters. Gives dst.
   char* ToAnsi(char* dst) const;
   WCHAR* ToUnicode(WCHAR* dst) const;
+  // UTF-8 by the standard (RFC 3629), for program arguments, std::string and native interfaces: sequences of four
+  // bytes are surrogate pairs and the other way round, so that every Unicode text comes back whole; an inner NUL
+  // stays. Bytes that are no UTF-8 become U+FFFD, one for each longest part that could have begun a character, and
+  // so does half of a surrogate pair. ToUtf8 may throw std::bad_alloc.
+  static SString FromUtf8(std::string_view text);
+  std::string ToUtf8() const;
 
   // --- classification ---
   // Of the character at an index; 0 for an index out of range.

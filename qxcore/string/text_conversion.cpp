@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cstring>
 
-#include "qxcore/string/internal/widen.h"
+#include "qxcore/platform/internal/widen.h"
 #include "qxcore/string/string.h"
 
 // A text that ends at its NUL is at most as long as `max`.

@@ -38,6 +38,35 @@ TEST(Utf8Helpers, DamagedInput_IsDroppedAndNeverReadPastItsEnd) {
   EXPECT_EQ(SString(SUTF82THelper(out, "abc", 0)), WTEXT(""));
 }
 
+TEST(Utf8Pair, EveryCharacter_ComesBackAndEqualsThePlatforms) {
+  for (char32_t c = 0; c < 0x110000; ++c) {
+    if (c >= 0xD800 && c < 0xE000) continue;
+    WCHAR units[3] = {static_cast<WCHAR>(c), WTEXT('x')};
+    int count = 2;
+    if (c >= 0x10000) {
+      units[0] = static_cast<WCHAR>(0xD7C0 + (c >> 10));
+      units[1] = static_cast<WCHAR>(0xDC00 + (c & 0x3FF));
+      units[count++] = WTEXT('x');
+    }
+    const SString text(SStringView(units, static_cast<std::size_t>(count)));
+    char bytes[8];
+    const int size = WideCharToMultiByte(CP_UTF8, 0, units, count, bytes, sizeof bytes, nullptr, nullptr);
+    const std::string expected(bytes, static_cast<std::size_t>(size));
+    ASSERT_EQ(text.ToUtf8(), expected) << static_cast<unsigned>(c);
+    ASSERT_EQ(SString::FromUtf8(expected), text) << static_cast<unsigned>(c);
+  }
+}
+
+TEST(Utf8Pair, WhatIsNoText_BecomesTheReplacementCharacter) {
+  EXPECT_EQ(SString::FromUtf8("a\xF0\x9F\x98z\xC0\x80\xED\xA0\x80"), WTEXT("a\uFFFDz\uFFFD\uFFFD\uFFFD\uFFFD\uFFFD"));
+  EXPECT_EQ(SString::FromUtf8("\xF4\x90\xE2\x82"), WTEXT("\uFFFD\uFFFD\uFFFD"));
+  EXPECT_EQ(SString::FromUtf8(""), WTEXT(""));
+  const WCHAR halves[] = {0xD83D, WTEXT('a'), 0xDE00, 0xD83D};
+  EXPECT_EQ(SString(SStringView(halves, 4)).ToUtf8(),
+            "\xEF\xBF\xBD"
+            "a\xEF\xBF\xBD\xEF\xBF\xBD");
+}
+
 TEST(AnsiConversion, Loss_IsRecordedAndBuffersAreKeptTo) {
   char bytes[16];
   EXPECT_EQ(Swcstombsz(bytes, WTEXT("a\u00E9"), 4), 3);

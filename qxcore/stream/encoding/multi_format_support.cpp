@@ -30,7 +30,8 @@ constexpr FlagRow kFlags[] = {
     {Support::kQuickDetect, WTEXT("+QuickDetect")}, {Support::kDetect, WTEXT("+Detect")},
     {Support::kFullDetect, WTEXT("+FullDetect")},   {Support::kFavorHint, WTEXT("+FavorHint")},
     {Support::kFavorGuess, WTEXT("+FavorGuess")},   {Support::kWholeInOnce, WTEXT("+WholeInOnce")},
-    {Support::kLossless, WTEXT("+Lossless")},       {Support::kXML, WTEXT("(xml)")}};
+    {Support::kLossless, WTEXT("+Lossless")},       {Support::kXML, WTEXT("(xml)")},
+    {Support::kFullUnicode, WTEXT("+FullUnicode")}};
 
 constexpr SStringView kCodePagePattern = WTEXT("Cp%d");
 constexpr SStringView kUnicodePattern = WTEXT("Unicode(0x%0.4X)");

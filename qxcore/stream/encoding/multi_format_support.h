@@ -3,7 +3,7 @@
 // The value names an encoding and carries the policy by which a reader may look for another one:
 //   bits 0-15   code page (kind ANSI; 0 = the active one) or form bits (kind Unicode)
 //   bits 16-19  kind
-//   bits 20-26  policy and the XML flag
+//   bits 20-27  policy and the XML flag
 // docs/text-encodings.md tells the whole story with examples.
 #pragma once
 
@@ -46,6 +46,11 @@ class SAbstractIO::SMultiFormatSupport {
   static constexpr Encoding kFavorHint = 0x1000000;   // an acceptable hint wins without a warning
   static constexpr Encoding kXML = 0x2000000;         // the input starts with an XML declaration
   static constexpr Encoding kFavorGuess = 0x4000000;  // detection's guess wins
+  // Unicode by the published standards. UTF-8 is judged and read by RFC 3629: sequences of four bytes are
+  // surrogate pairs, and overlong forms and surrogates in three bytes are invalid. UTF-16 without a mark is
+  // recognised by statistics of the library also where every byte is below 0x80. Without this bit, sequences of four
+  // bytes count against UTF-8 and are replaced in reading.
+  static constexpr Encoding kFullUnicode = 0x8000000;
 
   // Masks. kLevelMask holds the detection level: without bit kWholeInOnce, both of the others together
   // are no level at all, and nothing is detected.

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "qxcore/string/internal/widen.h"
+#include "qxcore/platform/internal/widen.h"
 
 #if defined(__x86_64__) || defined(__i386__)
 #include <immintrin.h>

@@ -5,9 +5,9 @@
 #include <cstring>
 
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/platform/internal/widen.h"
 #include "qxcore/stream/encoding/internal/single_byte_decoder.h"
 #include "qxcore/stream/encoding/internal/utf8_decoder.h"
-#include "qxcore/string/internal/widen.h"
 
 using Support = SAbstractIO::SMultiFormatSupport;
 using Run = STextDecoder::Run;

@@ -4,7 +4,7 @@
 #include <cstring>
 
 #include "qxcore/core/io_exceptions.h"
-#include "qxcore/string/internal/surrogates.h"
+#include "qxcore/platform/internal/utf.h"
 
 using Support = SAbstractIO::SMultiFormatSupport;
 
@@ -14,9 +14,11 @@ constexpr std::size_t kPiece = 1024;
 constexpr std::size_t kBytesPerUnit = 8;  // the escapes of stateful code pages included
 constexpr std::size_t kUnmappable = static_cast<std::size_t>(-1);
 
-// Characters that the first unit begins: a whole surrogate pair counts as one.
+// Units that the first character takes: a whole surrogate pair is one.
 std::size_t UnitsOfCharacter(const WCHAR* text, std::size_t count) {
-  return count >= 2 && SIsHighSurrogate(text[0]) && SIsLowSurrogate(text[1]) ? 2 : 1;
+  const WCHAR* at = text;
+  platform::TakeUtf16(at, text + count);
+  return static_cast<std::size_t>(at - text);
 }
 
 // Each encoder gives the number of bytes, or kUnmappable when a character of the piece cannot be mapped.
@@ -31,25 +33,10 @@ std::size_t EncodeASCII(const WCHAR* text, std::size_t count, char* bytes) {
 
 std::size_t EncodeUtf8(const WCHAR* text, std::size_t count, char* bytes) {
   char* out = bytes;
-  for (std::size_t i = 0; i < count; ++i) {
-    std::uint32_t c = text[i];
-    if (c < 0x80) {
-      *out++ = static_cast<char>(c);
-    } else if (c < 0x800) {
-      *out++ = static_cast<char>(0xC0 | c >> 6);
-      *out++ = static_cast<char>(0x80 | (c & 0x3F));
-    } else if (!SIsHighSurrogate(text[i]) && !SIsLowSurrogate(text[i])) {
-      *out++ = static_cast<char>(0xE0 | c >> 12);
-      *out++ = static_cast<char>(0x80 | (c >> 6 & 0x3F));
-      *out++ = static_cast<char>(0x80 | (c & 0x3F));
-    } else {
-      if (UnitsOfCharacter(text + i, count - i) != 2) return kUnmappable;
-      c = 0x10000 + ((c & 0x3FF) << 10) + (text[++i] & 0x3FFu);
-      *out++ = static_cast<char>(0xF0 | c >> 18);
-      *out++ = static_cast<char>(0x80 | (c >> 12 & 0x3F));
-      *out++ = static_cast<char>(0x80 | (c >> 6 & 0x3F));
-      *out++ = static_cast<char>(0x80 | (c & 0x3F));
-    }
+  for (const WCHAR *at = text, *end = text + count; at != end;) {
+    const char32_t character = platform::TakeUtf16(at, end);
+    if (platform::IsSurrogate(character)) return kUnmappable;
+    out = platform::PutUtf8(character, out);
   }
   return static_cast<std::size_t>(out - bytes);
 }
@@ -101,7 +88,7 @@ void STextEncoder::Write(const WCHAR* text, std::size_t count, SOutputStream& ou
   char bytes[kPiece * kBytesPerUnit];
   while (count > 0) {
     std::size_t piece = std::min(count, kPiece);
-    if (piece < count && SIsHighSurrogate(text[piece - 1])) --piece;
+    if (piece < count && platform::IsHighSurrogate(text[piece - 1])) --piece;
     std::size_t size = EncodePiece(text, piece, bytes);
     if (size != kUnmappable) {
       out.Write(bytes, static_cast<unsigned long>(size));
