@@ -20,6 +20,7 @@
 #define WIN32_LEAN_AND_MEAN
 #endif
 #include <windows.h>
+#include <commctrl.h>
 
 #define WTEXT_PASTE(text) L##text
 #define WTEXT(text) WTEXT_PASTE(text)
@@ -102,7 +103,9 @@ using REGSAM = DWORD;
 #define WINAPI
 #define CALLBACK
 #include "qxcore/platform/win32/constants.h"
+#include "qxcore/platform/win32/gdi.h"
 #include "qxcore/platform/win32/handles.h"
+#include "qxcore/platform/win32/metrics.h"
 
 // --- names that the Windows headers change: a client may write either form here, too ---
 
@@ -120,6 +123,15 @@ using REGSAM = DWORD;
 #define GetWindowsDirectory GetWindowsDirectoryW
 #define GetTempFileName GetTempFileNameW
 #define GetCurrentTime() GetTickCount()
+#define GetObject GetObjectW
+#define CreateFontIndirect CreateFontIndirectW
+#define GetTextMetrics GetTextMetricsW
+#define GetTextFace GetTextFaceW
+#define TextOut TextOutW
+#define ExtTextOut ExtTextOutW
+#define DrawText DrawTextW
+#define CreateMetaFile CreateMetaFileW
+#define CreateEnhMetaFile CreateEnhMetaFileW
 
 #include "qxcore/platform/win32/functions.h"
 
