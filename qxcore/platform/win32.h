@@ -20,6 +20,7 @@
 #define WIN32_LEAN_AND_MEAN
 #endif
 #include <windows.h>
+
 #include <commctrl.h>
 
 #define WTEXT_PASTE(text) L##text
