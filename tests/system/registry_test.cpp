@@ -8,7 +8,9 @@
 #include <sqlite3.h>
 #endif
 
+#include <atomic>
 #include <cstring>
+#include <thread>
 
 #include "qxcore/system/hglobal.h"
 #include "tests/support/failing_allocations.h"
@@ -305,6 +307,24 @@ TEST_F(Registry, Enumeration) {
   EXPECT_TRUE(value.IsEmpty());
   m_key.WriteProfile(WideString(256, 'z').c_str(), 1);
   EXPECT_EQ(m_key.GetEnumValue(3, &name, &value), static_cast<long>(ERROR_MORE_DATA));
+}
+
+// Others make a value longer between the look at its size and the reading of it.
+TEST_F(Registry, AValueThatGrowsMeanwhileIsRead) {
+  m_key.WriteProfile(WTEXT("v"), SString(WTEXT("x")));
+  const HKEY key = m_key.GetKey();
+  std::atomic<bool> isDone{false};
+  std::thread writer([&] {
+    const WideString text(4000, 'x');
+    for (DWORD length = 300; !isDone; length = length < 4000 ? length + 100 : 300)
+      RegSetValueExW(key, WTEXT("v"), 0, REG_SZ, reinterpret_cast<const BYTE*>(text.data()), length * sizeof(WCHAR));
+  });
+  SString value;
+  int failures = 0;
+  for (int i = 0; i < 4000; ++i) failures += m_key.GetEnumValue(0, nullptr, &value) != 0;
+  isDone = true;
+  writer.join();
+  EXPECT_EQ(failures, 0);
 }
 
 TEST_F(Registry, DeletionOfTrees) {

@@ -57,7 +57,7 @@ LSTATUS RegOpenKeyExW(HKEY key, LPCWSTR path, DWORD, REGSAM access, HKEY* result
     const RegistryKeyUse use(key, 0);
     CheckPath(ViewOf(path));
     use.MustExist();
-    const KeyId found = use->FindKey(use.Id(), ViewOf(path));
+    const KeyId found = use->keys.Find(use.Id(), ViewOf(path));
     if (found == 0) return ERROR_FILE_NOT_FOUND;
     *result = use.AddHandle(found, access);
     return ERROR_SUCCESS;
@@ -72,7 +72,7 @@ LSTATUS RegCreateKeyExW(HKEY key, LPCWSTR path, DWORD, LPWSTR, DWORD, REGSAM acc
     const RegistryKeyUse use(key, 0);
     CheckPath(path);
     bool isNew = false;
-    const KeyId made = use->CreateKey(use.Id(), path, isNew);
+    const KeyId made = use->keys.Create(use.Id(), path, isNew);
     if (made == 0) return ERROR_KEY_DELETED;
     *result = use.AddHandle(made, access);
     Store<DWORD>(disposition, isNew ? REG_CREATED_NEW_KEY : REG_OPENED_EXISTING_KEY);
@@ -89,7 +89,7 @@ LSTATUS RegDeleteKeyW(HKEY key, LPCWSTR path) {
   return RegistryResult([&] {
     const RegistryKeyUse use(key, 0);
     CheckPath(path);
-    return use->DeleteKey(use.Id(), path);
+    return use->keys.Delete(use.Id(), path);
   });
 }
 
@@ -99,14 +99,15 @@ LSTATUS RegQueryInfoKeyW(HKEY key, LPWSTR className, LPDWORD classLength, LPDWOR
   return RegistryResult([&]() -> DWORD {
     const RegistryKeyUse use(key, KEY_QUERY_VALUE);
     use.MustExist();
-    const RegistryKeyInfo info = use->Describe(use.Id());
+    const RegistryKeys::Facts keys = use->keys.Describe(use.Id());
+    const RegistryValues::Facts content = use->values.Describe(use.Id());
     ClearClass(className, classLength);
-    Store(subKeys, info.subKeys);
-    Store(longestSubKey, info.longestSubKey);
+    Store(subKeys, keys.count);
+    Store(longestSubKey, keys.longestName);
     Store<DWORD>(longestClass, 0);
-    Store(values, info.values);
-    Store(longestValueName, info.longestValueName);
-    Store(longestValue, info.longestValue);
+    Store(values, content.count);
+    Store(longestValueName, content.longestName);
+    Store(longestValue, content.longestData);
     Store<DWORD>(securityDescriptor, 0);
     Store(lastWrite, FILETIME{0, 0});
     return ERROR_SUCCESS;
@@ -119,7 +120,7 @@ LSTATUS RegEnumKeyExW(HKEY key, DWORD index, LPWSTR name, LPDWORD nameLength, LP
   return RegistryResult([&]() -> DWORD {
     const RegistryKeyUse use(key, KEY_ENUMERATE_SUB_KEYS);
     use.MustExist();
-    const std::u16string* subKey = use->SubKey(use.Id(), index);
+    const std::u16string* subKey = use->keys.SubKey(use.Id(), index);
     if (subKey == nullptr) return ERROR_NO_MORE_ITEMS;
     const DWORD error = CopyText(*subKey, name, nameLength);
     if (error != ERROR_SUCCESS) return error;
@@ -137,7 +138,7 @@ LSTATUS RegEnumValueW(HKEY key, DWORD index, LPWSTR name, LPDWORD nameLength, LP
   return RegistryResult([&]() -> DWORD {
     const RegistryKeyUse use(key, KEY_QUERY_VALUE);
     use.MustExist();
-    const RegistryValue* value = use->ValueAt(use.Id(), index);
+    const RegistryValue* value = use->values.At(use.Id(), index);
     if (value == nullptr) return ERROR_NO_MORE_ITEMS;
     const DWORD error = CopyText(value->name, name, nameLength);
     return error == ERROR_SUCCESS ? CopyData(*value, type, data, size) : error;
@@ -150,7 +151,7 @@ LSTATUS RegSetValueExW(HKEY key, LPCWSTR name, DWORD, DWORD type, const BYTE* da
   return RegistryResult([&]() -> DWORD {
     const RegistryKeyUse use(key, KEY_SET_VALUE);
     const std::string_view bytes(reinterpret_cast<const char*>(data), size);
-    return use->SetValue(use.Id(), ViewOf(name), type, bytes) ? ERROR_SUCCESS : ERROR_KEY_DELETED;
+    return use->values.Set(use.Id(), ViewOf(name), type, bytes) ? ERROR_SUCCESS : ERROR_KEY_DELETED;
   });
 }
 
@@ -158,7 +159,7 @@ LSTATUS RegQueryValueExW(HKEY key, LPCWSTR name, LPDWORD, LPDWORD type, BYTE* da
   if (data != nullptr && size == nullptr) return ERROR_INVALID_PARAMETER;
   return RegistryResult([&]() -> DWORD {
     const RegistryKeyUse use(key, KEY_QUERY_VALUE);
-    const RegistryValue* value = use->FindValue(use.Id(), ViewOf(name));
+    const RegistryValue* value = use->values.Find(use.Id(), ViewOf(name));
     if (value != nullptr) return CopyData(*value, type, data, size);
     use.MustExist();
     Store<DWORD>(size, 0);
@@ -169,7 +170,7 @@ LSTATUS RegQueryValueExW(HKEY key, LPCWSTR name, LPDWORD, LPDWORD type, BYTE* da
 LSTATUS RegDeleteValueW(HKEY key, LPCWSTR name) {
   return RegistryResult([&]() -> DWORD {
     const RegistryKeyUse use(key, KEY_SET_VALUE);
-    if (use->DeleteValue(use.Id(), ViewOf(name))) return ERROR_SUCCESS;
+    if (use->values.Delete(use.Id(), ViewOf(name))) return ERROR_SUCCESS;
     use.MustExist();
     return ERROR_FILE_NOT_FOUND;
   });

@@ -37,25 +37,26 @@ DWORD SpecificRights(DWORD access) {
 RegistryKeyUse::RegistryKeyUse(HKEY handle, DWORD access) : m_store(RootNumber(handle) >= 0) {
   const int root = RootNumber(handle);
   if (root >= 0) {
-    m_id = RegistryStore::RootId(static_cast<DWORD>(root));
+    m_id = RegistryKeys::RootId(static_cast<DWORD>(root));
     return;
   }
   const auto found = Handles().find(reinterpret_cast<std::uintptr_t>(handle));
-  if (found == Handles().end() || found->second.serial != m_store->Serial()) throw SqliteError{ERROR_INVALID_HANDLE};
+  if (found == Handles().end() || found->second.serial != m_store->database.Serial())
+    throw SqliteError{ERROR_INVALID_HANDLE};
   if ((found->second.access & access) != access) throw SqliteError{ERROR_ACCESS_DENIED};
   m_id = found->second.id;
 }
 
 HKEY RegistryKeyUse::AddHandle(KeyId key, DWORD access) const {
   const DWORD rights = SpecificRights(access);
-  if (m_store->IsReadOnly() && (rights & ~DWORD{KEY_READ}) != 0) throw SqliteError{ERROR_ACCESS_DENIED};
+  if (m_store->database.IsReadOnly() && (rights & ~DWORD{KEY_READ}) != 0) throw SqliteError{ERROR_ACCESS_DENIED};
   g_lastHandle += 4;
-  Handles()[g_lastHandle] = {key, rights, m_store->Serial()};
+  Handles()[g_lastHandle] = {key, rights, m_store->database.Serial()};
   return reinterpret_cast<HKEY>(g_lastHandle);
 }
 
 void RegistryKeyUse::MustExist() const {
-  if (!m_store->HasKey(m_id)) throw SqliteError{ERROR_KEY_DELETED};
+  if (!m_store->keys.Exists(m_id)) throw SqliteError{ERROR_KEY_DELETED};
 }
 
 LSTATUS CloseRegistryHandle(HKEY handle) {

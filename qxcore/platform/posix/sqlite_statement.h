@@ -3,12 +3,13 @@
 
 #include <sqlite3.h>
 
+#include <cerrno>
 #include <cstdint>
 #include <memory>
 #include <new>
 #include <string_view>
 
-#include "qxcore/platform/win32.h"
+#include "qxcore/platform/posix/path.h"
 
 namespace platform {
 
@@ -17,15 +18,20 @@ struct SqliteError {
   DWORD code;
 };
 
-// Throws the error for a result code.
-[[noreturn]] inline void ThrowSqlite(int result) {
+// Throws the error for a result code of this connection, which can be null.
+[[noreturn]] inline void ThrowSqlite(int result, sqlite3* database) {
   switch (result & 0xFF) {
     case SQLITE_NOMEM:
       throw std::bad_alloc();
+    case SQLITE_CANTOPEN: {
+      const int error = database != nullptr ? sqlite3_system_errno(database) : 0;
+      if (error == EMFILE || error == ENFILE || error == ENOMEM || error == EIO)
+        throw SqliteError{ErrorFromErrno(error)};
+      throw SqliteError{ERROR_ACCESS_DENIED};
+    }
     case SQLITE_READONLY:
     case SQLITE_PERM:
     case SQLITE_AUTH:
-    case SQLITE_CANTOPEN:
       throw SqliteError{ERROR_ACCESS_DENIED};
     case SQLITE_FULL:
       throw SqliteError{ERROR_DISK_FULL};
@@ -51,7 +57,7 @@ class SqliteStatement {
  public:
   SqliteStatement(sqlite3* database, const char* sql) {
     const int result = sqlite3_prepare_v3(database, sql, -1, SQLITE_PREPARE_PERSISTENT, &m_statement, nullptr);
-    if (result != SQLITE_OK) ThrowSqlite(result);
+    if (result != SQLITE_OK) ThrowSqlite(result, database);
   }
   SqliteStatement(const SqliteStatement&) = delete;
   SqliteStatement& operator=(const SqliteStatement&) = delete;
@@ -87,7 +93,7 @@ class SqliteQuery {
   // True: a row is there; false: done.
   bool Step() {
     const int result = sqlite3_step(m_statement);
-    if (result != SQLITE_ROW && result != SQLITE_DONE) ThrowSqlite(result);
+    if (result != SQLITE_ROW && result != SQLITE_DONE) ThrowSqlite(result, sqlite3_db_handle(m_statement));
     return result == SQLITE_ROW;
   }
   std::int64_t Number(int column) const { return sqlite3_column_int64(m_statement, column); }
@@ -106,7 +112,7 @@ class SqliteQuery {
 
  private:
   SqliteQuery& Check(int result) {
-    if (result != SQLITE_OK) ThrowSqlite(result);
+    if (result != SQLITE_OK) ThrowSqlite(result, sqlite3_db_handle(m_statement));
     return *this;
   }
 

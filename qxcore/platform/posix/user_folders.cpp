@@ -1,6 +1,7 @@
 #include "qxcore/platform/posix/user_folders.h"
 
 #include <pwd.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <cstdlib>
@@ -27,5 +28,10 @@ std::string Folder(const char* variable, const char* inHome) {
 std::string UserDataFolder() { return Folder("XDG_DATA_HOME", "/.local/share"); }
 
 std::string UserConfigurationFolder() { return Folder("XDG_CONFIG_HOME", "/.config"); }
+
+void MakeFoldersOf(const std::string& path) {
+  for (std::size_t slash = path.find('/', 1); slash != std::string::npos; slash = path.find('/', slash + 1))
+    mkdir(path.substr(0, slash).c_str(), 0700);
+}
 
 }  // namespace platform

@@ -10,4 +10,8 @@ namespace platform {
 std::string UserDataFolder();
 std::string UserConfigurationFolder();
 
+// Makes the folders on the way to a file that are missing, for the user alone. Whether they are there then is for
+// the next step to find out.
+void MakeFoldersOf(const std::string& path);
+
 }  // namespace platform

@@ -1,6 +1,5 @@
 // SRegistry: reading values and enumeration.
 
-#include <algorithm>
 #include <cstring>
 
 #include "qxcore/core/memory.h"
@@ -21,7 +20,7 @@ class ValueData {
   ValueData& operator=(const ValueData&) = delete;
   ~ValueData() { Free(); }
 
-  // However often others change the size meanwhile. Gives the platform's code.
+  // However often others change the size meanwhile. Returns the platform's code.
   LSTATUS Read(HKEY key, const WCHAR* name) {
     DWORD size = kInPlace;
     for (;;) {
@@ -31,11 +30,18 @@ class ValueData {
       if (!Is(result, ERROR_MORE_DATA)) return result;
     }
   }
-  LSTATUS ReadAt(HKEY key, DWORD index, WCHAR* name, DWORD* nameLength, DWORD size) {
-    BYTE* const room = Reserve(size);
-    const LSTATUS result = RegEnumValueW(key, index, name, nameLength, nullptr, &m_type, room, &size);
-    m_size = Is(result, ERROR_SUCCESS) ? size : 0;
-    return result;
+  // The same by index; ERROR_MORE_DATA for a name that does not fit.
+  LSTATUS ReadAt(HKEY key, DWORD index, WCHAR* name, DWORD* nameLength) {
+    const DWORD nameRoom = *nameLength;
+    DWORD size = kInPlace;
+    for (;;) {
+      const DWORD given = size;
+      BYTE* const room = Reserve(given);
+      *nameLength = nameRoom;
+      const LSTATUS result = RegEnumValueW(key, index, name, nameLength, nullptr, &m_type, room, &size);
+      m_size = Is(result, ERROR_SUCCESS) ? size : 0;
+      if (!Is(result, ERROR_MORE_DATA) || size <= given) return result;
+    }
   }
 
   DWORD Type() const { return m_type; }
@@ -181,7 +187,6 @@ namespace {
 
 constexpr DWORD kKeyText = 512;    // characters
 constexpr DWORD kValueName = 256;  // with the terminator
-constexpr DWORD kValueBytes = 256 * sizeof(WCHAR);
 
 void Clear(SString* text) {
   if (text != nullptr) *text = SString::null;
@@ -206,13 +211,11 @@ long SRegistry::GetEnumValue(long index, SString* name, SString* value, unsigned
   WCHAR nameText[kValueName];
   Clear(name);
   Clear(value);
-  DWORD nameLength = kValueName, valueType = REG_NONE, longest = 0;
+  DWORD nameLength = kValueName, valueType = REG_NONE;
   ValueData data;
   LSTATUS result;
   if (value != nullptr) {
-    RegQueryInfoKeyW(m_key, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr, nullptr, &longest, nullptr,
-                     nullptr);
-    result = data.ReadAt(m_key, static_cast<DWORD>(index), nameText, &nameLength, std::max(longest, kValueBytes));
+    result = data.ReadAt(m_key, static_cast<DWORD>(index), nameText, &nameLength);
     valueType = data.Type();
   } else {
     result =
