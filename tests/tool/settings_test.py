@@ -106,6 +106,26 @@ class SettingsTest(ToolCase):
         if not ON_WINE:
             self.assertEqual(text, "; top\r\n[One]\r\nkey = Größe 中\r\n\r\n[Two]\r\nk2=" + "x" * 3000 + "\r\n")
 
+    def test_ini_set_writes_what_the_file_can_hold_or_refuses(self):
+        path = self.folder / "a.ini"
+        for content, value, word in (
+            (b"[s]\r\nk=\xe9\r\n", "\u4e2d", "code page"),  # not in the ANSI page
+            (b"[s]\r\nk=\xc3\xa9\r\n", "\xfc", "UTF-8"),  # UTF-8 without a mark
+            (b"[s]\r\nk=\xc3\xa9\r\n", "\u4e2d", "UTF-8"),
+        ):
+            path.write_bytes(content)
+            self.assert_one_line(self.run_tool("ini", "set", "a.ini", "s", "k2", value), 1, "a.ini", word)
+            self.assert_one_line(self.run_tool("ini", "set", "a.ini", "s", value, "v"), 1, "a.ini", word)
+            self.assertEqual(path.read_bytes(), content)
+        self.output("ini", "set", "a.ini", "s", "k2", "plain")
+        self.assertEqual(path.read_bytes(), b"[s]\r\nk=\xc3\xa9\r\nk2=plain\r\n")
+        path.write_bytes(b"[s]\r\n")
+        self.output("ini", "set", "a.ini", "s", "k", "Gr\xf6\xdfe")
+        self.assertEqual(path.read_bytes(), b"[s]\r\nk=Gr\xf6\xdfe\r\n")
+        # A new file can be made so that it holds everything.
+        self.output("ini", "set", "new.ini", "s", "k", "\u4e2d \U0001f642")
+        self.assertEqual(self.output("ini", "get", "new.ini", "s", "k"), "\u4e2d \U0001f642\n")
+
     def test_ini_messages(self):
         self.output("ini", "set", "new.ini", "s", "k", "")
         self.assertEqual(self.output("ini", "get", "new.ini", "s", "k"), "\n")

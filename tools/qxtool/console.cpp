@@ -10,26 +10,33 @@
 #include <fcntl.h>
 #include <io.h>
 #include <shellapi.h>
+#include <sys/stat.h>
 #else
+#include <fcntl.h>
 #include <unistd.h>
 #endif
 
 namespace console {
 namespace {
 
-volatile std::sig_atomic_t g_interrupted = 0;
+// By the custom of shells, what a program that was ended by a signal exits with.
+constexpr int kSignalBase = 128;
+
+volatile std::sig_atomic_t g_signal = 0;  // that asked for the end; 0: none
 
 #ifdef _WIN32
 
 const WCHAR* volatile g_removeWhenKilled = nullptr;
 UINT g_outputCodePage = 0;
 
-BOOL WINAPI OnConsoleEvent(DWORD) {
-  if (g_interrupted) {
+BOOL WINAPI OnConsoleEvent(DWORD event) {
+  const bool isBreak = event == CTRL_C_EVENT || event == CTRL_BREAK_EVENT;
+  // The system ends the process when it comes back from here with the others: the window was closed.
+  if (g_signal != 0 || !isBreak) {
     if (g_removeWhenKilled) DeleteFileW(g_removeWhenKilled);
-    ExitProcess(130);
+    ExitProcess(static_cast<UINT>(kSignalBase + (isBreak ? SIGINT : SIGTERM)));
   }
-  g_interrupted = 1;
+  g_signal = SIGINT;
   return TRUE;
 }
 
@@ -39,19 +46,21 @@ void RestoreConsole() { SetConsoleOutputCP(g_outputCodePage); }
 
 const char* volatile g_removeWhenKilled = nullptr;
 
-void OnSignal(int) {
-  if (g_interrupted) {
+void OnSignal(int number) {
+  if (g_signal != 0) {
     if (g_removeWhenKilled) unlink(g_removeWhenKilled);
-    _exit(130);
+    _exit(kSignalBase + number);
   }
-  g_interrupted = 1;
+  g_signal = number;
 }
 
 #endif
 
 }  // namespace
 
-bool Interrupted() { return g_interrupted != 0; }
+bool Interrupted() { return g_signal != 0; }
+
+int InterruptedCode() { return kSignalBase + (g_signal != 0 ? g_signal : SIGINT); }
 
 void RemoveWhenKilled(const std::filesystem::path* path) { g_removeWhenKilled = path ? path->c_str() : nullptr; }
 
@@ -89,6 +98,11 @@ bool IsBrokenPipe(int error) { return error == EPIPE || error == EINVAL; }
 
 std::FILE* OpenForWriting(const std::filesystem::path& path) { return _wfopen(path.c_str(), L"wb"); }
 
+std::FILE* OpenNew(const std::filesystem::path& path, bool) {
+  const int file = _wopen(path.c_str(), _O_WRONLY | _O_CREAT | _O_EXCL | _O_BINARY, _S_IREAD | _S_IWRITE);
+  return file < 0 ? nullptr : _fdopen(file, "wb");
+}
+
 bool Synchronise(std::FILE* file) { return std::fflush(file) == 0 && _commit(_fileno(file)) == 0; }
 
 #else
@@ -100,6 +114,9 @@ void SetUp() {
   action.sa_handler = OnSignal;
   sigaction(SIGINT, &action, nullptr);
   sigaction(SIGTERM, &action, nullptr);
+  // Who started the tool with nohup wants it to go on when the terminal is gone.
+  struct sigaction former = {};
+  if (sigaction(SIGHUP, nullptr, &former) == 0 && former.sa_handler != SIG_IGN) sigaction(SIGHUP, &action, nullptr);
 }
 
 std::vector<std::string> Arguments(int argc, char** argv) { return {argv + (argc > 0 ? 1 : 0), argv + argc}; }
@@ -109,6 +126,11 @@ bool IsTerminal(std::FILE* stream) { return isatty(fileno(stream)) != 0; }
 bool IsBrokenPipe(int error) { return error == EPIPE; }
 
 std::FILE* OpenForWriting(const std::filesystem::path& path) { return std::fopen(path.c_str(), "wb"); }
+
+std::FILE* OpenNew(const std::filesystem::path& path, bool isPrivate) {
+  const int file = open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, isPrivate ? 0600 : 0666);
+  return file < 0 ? nullptr : fdopen(file, "wb");
+}
 
 bool Synchronise(std::FILE* file) {
   if (std::fflush(file) != 0) return false;

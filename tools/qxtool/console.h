@@ -12,7 +12,7 @@
 namespace console {
 
 // Binary standard streams, UTF-8 on the screen, no death by a broken pipe, and an interruption
-// (Ctrl-C, termination) that is remembered. Call it once, first.
+// (Ctrl-C, termination, a terminal that is closed) that is remembered. Call it once, first.
 void SetUp();
 
 // The arguments behind the program's name, in UTF-8.
@@ -20,6 +20,8 @@ std::vector<std::string> Arguments(int argc, char** argv);
 
 // True once the user asked for an end. A second request ends the process at once.
 bool Interrupted();
+// What the tool then exits with: 130 after Ctrl-C, 143 after termination, 129 after the terminal was closed.
+int InterruptedCode();
 
 // A file that is removed when a second interruption ends the process at once; null for none.
 void RemoveWhenKilled(const std::filesystem::path* path);
@@ -33,6 +35,8 @@ std::filesystem::path PathOf(std::string_view utf8);
 
 // Opens a file that is written from its start, in binary; null and errno on failure.
 std::FILE* OpenForWriting(const std::filesystem::path& path);
+// Makes a file that must not be there yet, readable for its user alone if it is to be private.
+std::FILE* OpenNew(const std::filesystem::path& path, bool isPrivate);
 
 // Hands everything written so far to the disk; false and errno on failure.
 bool Synchronise(std::FILE* file);

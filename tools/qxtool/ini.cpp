@@ -4,6 +4,8 @@
 #include <string>
 #include <vector>
 
+#include "qxcore/stream/input_file.h"
+#include "qxcore/stream/output_file.h"
 #include "qxcore/system/file/file.h"
 #include "qxcore/system/settings/profile.h"
 #include "tools/qxtool/commands.h"
@@ -60,6 +62,56 @@ bool Find(const SString& path, const SString& section, const SString& key, SStri
   return one == two;
 }
 
+// --- what a file can hold ---
+
+bool IsAscii(const std::string& text) {
+  return std::all_of(text.begin(), text.end(), [](char c) { return static_cast<signed char>(c) >= 0; });
+}
+
+bool StartsWith(const std::string& bytes, std::string_view mark) { return bytes.compare(0, mark.size(), mark) == 0; }
+
+// A mark of Unicode at the start says that a file holds every text.
+bool HasMark(const std::string& bytes) {
+  return StartsWith(bytes, "\xFF\xFE") || StartsWith(bytes, "\xFE\xFF") || StartsWith(bytes, "\xEF\xBB\xBF");
+}
+
+bool IsOfAnsiPage(const SString& text) {
+  BOOL isReplaced = FALSE;
+  const int size = WideCharToMultiByte(CP_ACP, WC_NO_BEST_FIT_CHARS, text, text.Length(), nullptr, 0, nullptr,
+                                       GetACP() == CP_UTF8 ? nullptr : &isReplaced);
+  return text.IsEmpty() || (size > 0 && !isReplaced);
+}
+
+std::string ContentOf(const SString& path) {
+  std::string content;
+  if (!SFile::IsFile(path)) return content;
+  SInputFile file(path);
+  char piece[4096];
+  while (const unsigned long count = file.Read(piece, sizeof piece)) content.append(piece, count);
+  return content;
+}
+
+// Sees to it that the file can hold the texts. What has no mark is read and written in the ANSI code page, where other
+// characters would become question marks; and in UTF-8 without a mark what is added would be wrong bytes.
+void MakeRoomFor(const SString& path, const IniOptions& options) {
+  if (IsAscii(options.section) && IsAscii(options.key) && IsAscii(options.value)) return;
+  const std::string content = ContentOf(path);
+  if (HasMark(content)) return;
+  if (GetACP() != CP_UTF8 && !IsAscii(content) && ToUtf8(FromUtf8(content)) == content)
+    throw Failure{"the file is UTF-8 without a mark at its start, and would be read in another encoding", kFailed,
+                  options.file};
+  bool isOfPage = true;
+  for (const std::string* text : {&options.section, &options.key, &options.value})
+    isOfPage = isOfPage && IsOfAnsiPage(FromUtf8(*text));
+  if (isOfPage) return;
+  if (!content.empty())
+    throw Failure{"some characters are not in the code page of the file; convert it to UTF-16 with a mark", kFailed,
+                  options.file};
+  SOutputFile file(path);
+  file.Write("\xFF\xFE", 2);
+  file.Close();
+}
+
 }  // namespace
 
 int GetIni(const IniOptions& options) {
@@ -73,7 +125,9 @@ int GetIni(const IniOptions& options) {
 int SetIni(const IniOptions& options) {
   for (const std::string* text : {&options.section, &options.key, &options.value})
     if (text->find_first_of("\r\n") != std::string::npos) throw Failure{"a line end cannot be kept", kWrongUsage};
-  SProfile profile(PathOf(options), FromUtf8(options.section), 0);
+  const SString path = PathOf(options);
+  MakeRoomFor(path, options);
+  SProfile profile(path, FromUtf8(options.section), 0);
   if (profile.WriteProfile(FromUtf8(options.key), FromUtf8(options.value)) != S_OK)
     throw Failure{SystemText(GetLastError()), kFailed, options.file};
   return kDone;

@@ -19,7 +19,7 @@ int main(int argc, char** argv) {
     std::_Exit(kDone);
   } catch (const SEIOAbortedException&) {
     Complain("cancelled");
-    return kCancelled;
+    return console::InterruptedCode();
   } catch (const Failure& failure) {
     Complain(failure.place.empty() ? failure.text : failure.place + ": " + failure.text);
     return failure.code;

@@ -62,14 +62,14 @@ ReplacementFile::ReplacementFile(std::string_view target, Durability durability)
   if (fs::is_directory(status)) Refuse("Cannot open for writing", "it is a folder");
   bool isDirect = fs::exists(status) && !fs::is_regular_file(status);
   if (!isDirect) m_temporary = TemporaryBeside(m_target);
-  m_file = console::OpenForWriting(isDirect ? m_target : m_temporary);
+  // Before the content is there, so that nobody reads it who could not read the old one.
+  m_file = isDirect ? console::OpenForWriting(m_target) : console::OpenNew(m_temporary, fs::exists(status));
   if (m_file == nullptr) {
     m_temporary.clear();
     Refuse("Cannot open for writing", std::strerror(errno));
   }
   if (isDirect) return;
   console::RemoveWhenKilled(&m_temporary);
-  // Before the content is there, so that nobody reads it who could not read the old one.
   if (fs::exists(status)) fs::permissions(m_temporary, status.permissions(), error);
 }
 
