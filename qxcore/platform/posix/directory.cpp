@@ -8,9 +8,8 @@
 #include <cerrno>
 #include <cstdlib>
 #include <ctime>
-#include <new>
 
-#include "qxcore/platform/posix/path.h"
+#include "qxcore/platform/posix/open_file.h"
 #include "qxcore/platform/wide.h"
 
 namespace {
@@ -25,44 +24,27 @@ DWORD Deliver(std::u16string_view text, DWORD size, LPWSTR buffer) {
   return static_cast<DWORD>(text.size());
 }
 
-template <class Call>
-DWORD Guarded(Call call) {
-  try {
-    return call();
-  } catch (const std::bad_alloc&) {
-    SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-    return 0;
-  }
-}
-
 }  // namespace
 
 DWORD GetCurrentDirectoryW(DWORD size, LPWSTR buffer) { return GetFullPathNameW(u".", size, buffer, nullptr); }
 
 BOOL SetCurrentDirectoryW(LPCWSTR path) {
-  return static_cast<BOOL>(Guarded([&]() -> DWORD {
+  return Succeeds([&]() -> DWORD {
     const Resolved entry = ResolvePath(path);
-    if (entry.error != ERROR_SUCCESS) return static_cast<DWORD>(FailWith(entry.error));
-    if (entry.exists && chdir(entry.path.c_str()) == 0) return TRUE;
-    const DWORD error = !entry.exists || errno == ENOENT ? ERROR_FILE_NOT_FOUND
-                        : errno == ENOTDIR               ? ERROR_DIRECTORY
-                                                         : ErrorFromErrno(errno);
-    return static_cast<DWORD>(FailWith(error));
-  }));
+    if (entry.error != ERROR_SUCCESS) return entry.error;
+    if (entry.exists && chdir(entry.path.c_str()) == 0) return ERROR_SUCCESS;
+    return !entry.exists || errno == ENOENT ? ERROR_FILE_NOT_FOUND
+           : errno == ENOTDIR               ? ERROR_DIRECTORY
+                                            : ErrorFromErrno(errno);
+  });
 }
 
 DWORD GetFullPathNameW(LPCWSTR path, DWORD size, LPWSTR buffer, LPWSTR* filePart) {
   if (filePart != nullptr) *filePart = nullptr;
-  if (path == nullptr || *path == 0) {
-    SetLastError(ERROR_INVALID_NAME);
-    return 0;
-  }
-  return Guarded([&] {
+  if (path == nullptr || *path == 0) return FailWith(ERROR_INVALID_NAME, DWORD{0});
+  return Guarded(DWORD{0}, [&] {
     const FullPath full(path);
-    if (full.View().empty()) {
-      SetLastError(ERROR_PATH_NOT_FOUND);
-      return DWORD{0};
-    }
+    if (full.View().empty()) return FailWith(ERROR_PATH_NOT_FOUND, DWORD{0});
     const DWORD length = Deliver(full.View(), size, buffer);
     if (filePart == nullptr || length >= size) return length;
     const std::size_t name = full.View().find_last_of(u'\\') + 1;
@@ -72,7 +54,7 @@ DWORD GetFullPathNameW(LPCWSTR path, DWORD size, LPWSTR buffer, LPWSTR* filePart
 }
 
 DWORD GetTempPathW(DWORD size, LPWSTR buffer) {
-  return Guarded([&] {
+  return Guarded(DWORD{0}, [&] {
     const char* folder = std::getenv("TMPDIR");
     std::u16string path = ToWindowsPath(folder != nullptr && folder[0] == '/' ? folder : "/tmp");
     if (path.back() != '\\') path += u'\\';
@@ -81,19 +63,12 @@ DWORD GetTempPathW(DWORD size, LPWSTR buffer) {
 }
 
 UINT GetTempFileNameW(LPCWSTR directory, LPCWSTR prefix, UINT unique, LPWSTR name) {
-  if (directory == nullptr || name == nullptr) {
-    SetLastError(ERROR_INVALID_PARAMETER);
-    return 0;
-  }
-  if (WideLength(directory) > MAX_PATH - 14) {
-    SetLastError(ERROR_BUFFER_OVERFLOW);
-    return 0;
-  }
+  const auto fails = [](DWORD error) { return FailWith(error, UINT{0}); };
+  if (directory == nullptr || name == nullptr) return fails(ERROR_INVALID_PARAMETER);
+  if (WideLength(directory) > MAX_PATH - 14) return fails(ERROR_BUFFER_OVERFLOW);
   const DWORD attributes = GetFileAttributesW(directory);
-  if (attributes == INVALID_FILE_ATTRIBUTES || (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0) {
-    SetLastError(ERROR_DIRECTORY);
-    return 0;
-  }
+  if (attributes == INVALID_FILE_ATTRIBUTES || (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0)
+    return fails(ERROR_DIRECTORY);
   const WCHAR last = directory[0] != 0 ? directory[WideLength(directory) - 1] : u'\\';
   const WCHAR* separator = last == '\\' || last == '/' ? u"" : u"\\";
   timespec now;
@@ -104,19 +79,21 @@ UINT GetTempFileNameW(LPCWSTR directory, LPCWSTR prefix, UINT unique, LPWSTR nam
     if (number == 0) number = 1;
     WideFormat(name, MAX_PATH, u"%s%s%.3s%X.tmp", directory, separator, prefix != nullptr ? prefix : u"", number);
     if (unique != 0) return unique;
-    const HANDLE file = CreateFileW(name, GENERIC_WRITE, 0, nullptr, CREATE_NEW, FILE_ATTRIBUTE_NORMAL, nullptr);
+    // Others are not to read what is kept here for a while.
+    const HANDLE file = Guarded(INVALID_HANDLE_VALUE, [&] {
+      return OpenFileAt(ResolvePath(name), {GENERIC_WRITE, 0, CREATE_NEW, 0, false, 0600});
+    });
     if (file != INVALID_HANDLE_VALUE) {
       CloseHandle(file);
       return number;
     }
     if (GetLastError() != ERROR_FILE_EXISTS) return 0;
   }
-  SetLastError(ERROR_FILE_EXISTS);
-  return 0;
+  return fails(ERROR_FILE_EXISTS);
 }
 
 DWORD GetLongPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size) {
-  return Guarded([&]() -> DWORD {
+  return Guarded(DWORD{0}, [&]() -> DWORD {
     const Resolved entry = ResolvePath(path);
     if (entry.error != ERROR_SUCCESS || !entry.exists) {
       SetLastError(entry.error != ERROR_SUCCESS ? entry.error : ERROR_FILE_NOT_FOUND);
@@ -133,16 +110,16 @@ UINT GetSystemDirectoryW(LPWSTR buffer, UINT size) { return Deliver(u"C:\\usr\\l
 UINT GetWindowsDirectoryW(LPWSTR buffer, UINT size) { return Deliver(u"C:\\usr", size, buffer); }
 
 BOOL GetDiskFreeSpaceExW(LPCWSTR directory, ULARGE_INTEGER* available, ULARGE_INTEGER* total, ULARGE_INTEGER* free) {
-  return static_cast<BOOL>(Guarded([&]() -> DWORD {
+  return Succeeds([&]() -> DWORD {
     const Resolved entry = ResolvePath(directory != nullptr ? directory : u".");
-    if (entry.error != ERROR_SUCCESS) return static_cast<DWORD>(FailWith(entry.error));
+    if (entry.error != ERROR_SUCCESS) return entry.error;
     struct statvfs info;
-    if (!entry.exists || statvfs(entry.path.c_str(), &info) != 0)
-      return static_cast<DWORD>(FailWith(entry.exists ? ErrorFromErrno(errno) : ERROR_PATH_NOT_FOUND));
+    if (!entry.exists) return ERROR_PATH_NOT_FOUND;
+    if (statvfs(entry.path.c_str(), &info) != 0) return ErrorFromErrno(errno);
     const ULONGLONG block = info.f_frsize;
     if (available != nullptr) available->QuadPart = info.f_bavail * block;
     if (total != nullptr) total->QuadPart = info.f_blocks * block;
     if (free != nullptr) free->QuadPart = info.f_bfree * block;
-    return TRUE;
-  }));
+    return ERROR_SUCCESS;
+  });
 }

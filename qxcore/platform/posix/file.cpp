@@ -1,114 +1,15 @@
-// Open files: CreateFileW and what is done with its handle.
+// What is done with the handle of an open file.
 
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
-#include <algorithm>
 #include <cerrno>
-#include <climits>
-#include <new>
 
 #include "qxcore/platform/posix/file_info.h"
 #include "qxcore/platform/posix/handle.h"
-#include "qxcore/platform/posix/share_mode.h"
-
-namespace {
 
 using namespace platform;
-
-HANDLE OpenFails(DWORD error) {
-  SetLastError(error);
-  return INVALID_HANDLE_VALUE;
-}
-
-bool IsFolder(const char* path) {
-  struct stat info;
-  return stat(path, &info) == 0 && S_ISDIR(info.st_mode);
-}
-
-// Nobody may write: the read-only attribute, which holds for the superuser, too.
-bool IsReadOnly(const char* path) {
-  struct stat info;
-  return stat(path, &info) == 0 && S_ISREG(info.st_mode) && (info.st_mode & 0222) == 0;
-}
-
-// What is wrong with opening this entry in this way, before it is tried.
-DWORD CheckOpen(const Resolved& entry, DWORD access, DWORD disposition, DWORD flags) {
-  if (disposition < CREATE_NEW || disposition > TRUNCATE_EXISTING) return ERROR_INVALID_PARAMETER;
-  if (disposition == TRUNCATE_EXISTING && (access & GENERIC_WRITE) == 0) return ERROR_INVALID_PARAMETER;
-  if (entry.error != ERROR_SUCCESS) return entry.error;
-  const bool folder = entry.exists && IsFolder(entry.path.c_str());
-  if (entry.wantsFolder && !folder) return entry.exists ? ERROR_PATH_NOT_FOUND : ERROR_INVALID_NAME;
-  if (!entry.exists) return disposition == OPEN_EXISTING || disposition == TRUNCATE_EXISTING ? ERROR_FILE_NOT_FOUND : 0;
-  if (disposition == CREATE_NEW) return ERROR_FILE_EXISTS;
-  if (folder && ((flags & FILE_FLAG_BACKUP_SEMANTICS) == 0 || (access & GENERIC_WRITE) != 0))
-    return ERROR_ACCESS_DENIED;
-  const bool overwrites = disposition == CREATE_ALWAYS || disposition == TRUNCATE_EXISTING;
-  if (((access & GENERIC_WRITE) != 0 || overwrites) && IsReadOnly(entry.path.c_str())) return ERROR_ACCESS_DENIED;
-  return ERROR_SUCCESS;
-}
-
-// Opens the descriptor; -1 with errno.
-int OpenDescriptor(const Resolved& entry, DWORD access, DWORD disposition, DWORD flags, bool inherit) {
-  const bool creates = disposition != OPEN_EXISTING && disposition != TRUNCATE_EXISTING;
-  const bool writes = (access & GENERIC_WRITE) != 0 || disposition == CREATE_ALWAYS;
-  int mode = inherit ? 0 : O_CLOEXEC;
-  if (creates) mode |= O_CREAT;
-  if (disposition == CREATE_NEW) mode |= O_EXCL;
-  if ((flags & FILE_FLAG_WRITE_THROUGH) != 0) mode |= O_SYNC;
-  if (access == 0 && !writes && entry.exists) return open(entry.path.c_str(), mode | O_PATH);
-  const mode_t permissions = (flags & FILE_ATTRIBUTE_READONLY) != 0 ? 0444 : 0666;
-  // A writer needs the right to read, too, for the locks of the sharing mode; without it he goes unlocked.
-  int descriptor = open(entry.path.c_str(), mode | (writes ? O_RDWR : O_RDONLY), permissions);
-  if (descriptor < 0 && errno == EACCES && writes && (access & GENERIC_READ) == 0)
-    descriptor = open(entry.path.c_str(), mode | O_WRONLY, permissions);
-  return descriptor;
-}
-
-int RetriedOpen(const Resolved& entry, DWORD access, DWORD disposition, DWORD flags, bool inherit) {
-  for (;;) {
-    const int descriptor = OpenDescriptor(entry, access, disposition, flags, inherit);
-    if (descriptor >= 0 || errno != EINTR) return descriptor;
-  }
-}
-
-DWORD PathError(const Resolved& entry) {
-  const int error = errno;
-  // A folder on the way that went away meanwhile, or never was.
-  if (error == ENOENT && access(entry.path.substr(0, entry.path.find_last_of('/') + 1).c_str(), F_OK) != 0)
-    return ERROR_PATH_NOT_FOUND;
-  return ErrorFromErrno(error);
-}
-
-HANDLE OpenFileAt(const Resolved& entry, DWORD access, DWORD share, DWORD disposition, DWORD flags, bool inherit) {
-  const int descriptor = RetriedOpen(entry, access, disposition, flags, inherit);
-  if (descriptor < 0) return OpenFails(PathError(entry));
-  auto file =
-      std::make_shared<OpenFile>(descriptor, (flags & FILE_FLAG_DELETE_ON_CLOSE) != 0 ? entry.path : std::string());
-  if (access != 0 && !TakeShareMode(descriptor, access, share)) return OpenFails(ERROR_SHARING_VIOLATION);
-  const bool truncates = entry.exists && (disposition == CREATE_ALWAYS || disposition == TRUNCATE_EXISTING);
-  // What has no length, a terminal or a pipe, needs no truncation.
-  if (truncates && ftruncate(descriptor, 0) != 0 && errno != EINVAL) return OpenFails(ErrorFromErrno(errno));
-  const HANDLE handle = AddHandle(std::move(file), access);
-  const bool tells = disposition == CREATE_ALWAYS || disposition == OPEN_ALWAYS;
-  if (handle != INVALID_HANDLE_VALUE) SetLastError(tells && entry.exists ? ERROR_ALREADY_EXISTS : ERROR_SUCCESS);
-  return handle;
-}
-
-}  // namespace
-
-HANDLE CreateFileW(LPCWSTR path, DWORD access, DWORD share, SECURITY_ATTRIBUTES* security, DWORD disposition,
-                   DWORD flags, HANDLE) {
-  try {
-    const Resolved entry = ResolvePath(path);
-    const DWORD error = CheckOpen(entry, access, disposition, flags);
-    if (error != ERROR_SUCCESS) return OpenFails(error);
-    return OpenFileAt(entry, access, share, disposition, flags, security != nullptr && security->bInheritHandle);
-  } catch (const std::bad_alloc&) {
-    return OpenFails(ERROR_NOT_ENOUGH_MEMORY);
-  }
-}
 
 BOOL CloseHandle(HANDLE handle) {
   const std::shared_ptr<HandleObject> object = RemoveHandle(handle);

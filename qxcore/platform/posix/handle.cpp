@@ -38,10 +38,11 @@ Slot* Find(Table& table, HANDLE handle) {
 
 DWORD OpenFile::Close() {
   if (m_descriptor < 0) return ERROR_SUCCESS;
+  const bool isStillNamed = !m_deleteAtClose.empty() && IsNameOf(m_deleteAtClose.c_str(), m_descriptor);
   const int result = close(m_descriptor);
   const int error = errno;
   m_descriptor = -1;
-  if (!m_deleteAtClose.empty()) unlink(m_deleteAtClose.c_str());
+  if (isStillNamed) unlink(m_deleteAtClose.c_str());
   // An interrupted close has closed, too.
   return result == 0 || error == EINTR ? ERROR_SUCCESS : ErrorFromErrno(error);
 }

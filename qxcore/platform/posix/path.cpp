@@ -232,6 +232,12 @@ std::string SpelledAsGiven(const Resolved& resolved, LPCWSTR path) {
   return resolved.path.substr(0, slash + 1) + ToFileSystemName(full.substr(full.find_last_of(u'\\') + 1));
 }
 
+bool IsNameOf(const char* path, int descriptor) {
+  struct stat named, opened;
+  return stat(path, &named) == 0 && fstat(descriptor, &opened) == 0 && named.st_dev == opened.st_dev &&
+         named.st_ino == opened.st_ino;
+}
+
 DWORD ErrorFromErrno(int error) {
   switch (error) {
     case 0:

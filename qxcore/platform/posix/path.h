@@ -10,6 +10,7 @@
 #include <string>
 #include <string_view>
 
+#include "qxcore/platform/posix/failure.h"
 #include "qxcore/platform/posix/file_name.h"
 
 namespace platform {
@@ -50,13 +51,10 @@ Resolved ResolvePath(LPCWSTR path);
 // The same folder as `resolved`, but the last name exactly as the caller spelled it.
 std::string SpelledAsGiven(const Resolved& resolved, LPCWSTR path);
 
+// Whether the path, links followed, leads to this open file, and not to nothing or to another one.
+bool IsNameOf(const char* path, int descriptor);
+
 // The Win32 error for an errno value.
 DWORD ErrorFromErrno(int error);
-
-// Sets the last error and gives FALSE.
-inline BOOL FailWith(DWORD error) {
-  SetLastError(error);
-  return FALSE;
-}
 
 }  // namespace platform

@@ -25,11 +25,8 @@ bool Lock(int descriptor, short type, bool waits) {
   }
 }
 
-// Whether the name still leads to what was opened, and not to nothing or a successor.
-bool IsLinked(int descriptor) {
-  struct stat info;
-  return fstat(descriptor, &info) == 0 && info.st_nlink > 0;
-}
+// An object of this user's that nobody else can open. Anybody can make one of the name first.
+bool IsOwn(const struct stat& info) { return info.st_uid == geteuid() && (info.st_mode & 0077) == 0; }
 
 SharedMemory Failed(int descriptor, int error) {
   if (descriptor >= 0) close(descriptor);
@@ -49,7 +46,7 @@ DWORD NameOfSharedMemory(LPCWSTR name, std::string& object) {
     }
   }
   if (rest.find(u'\\') != std::u16string_view::npos) return ERROR_PATH_NOT_FOUND;
-  object = "/qxcore." + std::to_string(getuid()) + ".";
+  object = "/qxcore." + std::to_string(geteuid()) + ".";
   // Letters, digits and some signs stand for themselves, the rest as hexadecimal numbers between percent signs.
   for (const char16_t c : rest) {
     const bool isPlain =
@@ -65,17 +62,17 @@ SharedMemory OpenSharedMemory(const std::string& object, std::uint64_t size) {
   for (;;) {
     const int descriptor = shm_open(object.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600);
     if (descriptor < 0) return Failed(-1, errno);
+    struct stat info;
+    if (fstat(descriptor, &info) != 0) return Failed(descriptor, errno);
+    if (!IsOwn(info)) return Failed(descriptor, EACCES);
     const bool isAlone = Lock(descriptor, F_WRLCK, false);
     if (!isAlone && !Lock(descriptor, F_RDLCK, true)) return Failed(descriptor, errno);
-    if (!IsLinked(descriptor)) {  // the last holder removed it between our two steps
+    if (fstat(descriptor, &info) != 0) return Failed(descriptor, errno);
+    if (info.st_nlink == 0) {  // the last holder removed it between our two steps
       close(descriptor);
       continue;
     }
-    if (!isAlone) {
-      struct stat info;
-      fstat(descriptor, &info);
-      return {descriptor, static_cast<std::uint64_t>(info.st_size), true, ERROR_SUCCESS};
-    }
+    if (!isAlone) return {descriptor, static_cast<std::uint64_t>(info.st_size), true, ERROR_SUCCESS};
     // New, or left behind by a process that was killed.
     if (ftruncate(descriptor, 0) != 0 || ftruncate(descriptor, static_cast<off_t>(size)) != 0) {
       const int error = errno;

@@ -23,7 +23,8 @@ struct SharedMemory {
 // ERROR_PATH_NOT_FOUND; too long gives ERROR_FILENAME_EXCED_RANGE.
 DWORD NameOfSharedMemory(LPCWSTR name, std::string& object);
 
-// Takes hold of the memory of that name, which is made with this size where there is none.
+// Takes hold of the memory of that name, which is made with this size where there is none. ERROR_ACCESS_DENIED when
+// somebody else made it, or could open it.
 SharedMemory OpenSharedMemory(const std::string& object, std::uint64_t size);
 
 // Lets go; closes the descriptor.
