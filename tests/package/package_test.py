@@ -1,18 +1,22 @@
 #!/usr/bin/env python3
-"""Installs the package, moves the folder, builds samples/hello against it and runs that.
+"""Installs the package, moves the folder, builds the samples against it and runs them.
 
-usage: package_test.py (cmake|pkgconfig|imports) SOURCE_DIR BUILD_DIR [TOOLCHAIN_FILE]
+usage: package_test.py (cmake|pkgconfig|imports|headers) SOURCE_DIR BUILD_DIR [TOOLCHAIN_FILE]
+
+headers: every installed header compiles alone, and all of them in either order.
 
 With a toolchain file everything is cross-built for Windows and runs under Wine with nothing but the
 moved folder to find DLLs in.
 """
 
+import concurrent.futures
 import os
 import pathlib
 import re
 import shutil
 import subprocess
 import sys
+import zipfile
 
 sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "support"))
 import wine  # noqa: E402
@@ -46,9 +50,58 @@ def check_output(output, expected):
         sys.exit(f"the program printed:\n{text}\nand not the text of {SAMPLE}")
 
 
+def check_samples(run_sample, work, source, environment):
+    """Every sample over a folder that holds a text twice and an archive of texts."""
+    texts = source / "samples/texts/files"
+    folder = work / "texts"
+    folder.mkdir()
+    for name in ("ascii-english.txt", "utf16le-french.txt", "utf8-french.txt"):
+        shutil.copy(texts / name, folder / name)
+    shutil.copy(texts / "utf8-french.txt", folder / "again.txt")
+    (folder / "old.txt").write_bytes("Höhe = 12 m\r\nno setting\r\nBreite=30 m\r\n".encode("utf-16"))
+    with zipfile.ZipFile(work / "texts.zip", "w", zipfile.ZIP_DEFLATED) as archive:
+        archive.write(texts / "utf16le-french.txt", "letters/french.txt")
+    environment["QXCORE_REGISTRY"] = str(work / "settings.db")
+    expected = {
+        ("find_duplicates", folder): ["again.txt", "utf8-french.txt"],
+        ("inspect_archive", work / "texts.zip"): ["letters/french.txt: ", "Unicode"],
+        ("import_settings", "Samples", folder / "old.txt"): ["2 settings, read as Unicode", "Höhe = 12 m", "Breite = 30 m"],
+    }
+    for (name, *arguments), parts in expected.items():
+        output = run_sample(name, *arguments).decode("utf-8")
+        missing = [part for part in parts if part not in output]
+        if missing or "ascii-english" in output:
+            sys.exit(f"{name} printed:\n{output}\nwithout {missing}")
+
+
 def imports(path):
     listing = run(["i686-w64-mingw32-objdump", "-p", path]).decode()
     return {name.lower() for name in re.findall(r"DLL Name: (\S+)", listing)}
+
+
+def check_headers(package, work, compiler):
+    """Each header as a client's only one, and all of them from the first to the last and back."""
+    include = package / "include"
+    headers = sorted(path.relative_to(include).as_posix() for path in include.rglob("*.h"))
+    if not headers or any(not header.startswith("qxcore/") for header in headers):
+        sys.exit(f"not all headers lie in include/qxcore: {headers}")
+    # Those in win32/ are the pieces of win32.h, and no client includes them.
+    headers = [header for header in headers if "/win32/" not in header]
+    texts = {header.replace("/", "_"): [header] for header in headers}
+    texts["all_forward"], texts["all_backward"] = headers, headers[::-1]
+
+    def compiles(item):
+        name, included = item
+        source = work / f"{name}.cpp"
+        source.write_text("".join(f'#include "{header}"\n' for header in included), encoding="utf-8")
+        command = [*compiler, "-std=c++20", "-Wall", "-Wextra", "-Werror", "-fsyntax-only", f"-I{include}", str(source)]
+        return subprocess.run(command, stderr=subprocess.PIPE, timeout=300).stderr.decode("utf-8", "replace")
+
+    with concurrent.futures.ThreadPoolExecutor(os.cpu_count()) as pool:
+        failures = [failure for failure in pool.map(compiles, texts.items()) if failure]
+    if failures:
+        sys.exit("\n".join(failures))
+    print(f"{len(headers)} headers")
 
 
 def main():
@@ -71,16 +124,23 @@ def main():
                 sys.exit(f"{program.name} needs {sorted(strangers)}, which nobody ships")
         if "qxcore11e.dll" not in shipped:
             sys.exit("the library is not in the package")
+    elif kind == "headers":
+        cross = ["i686-w64-mingw32-g++-posix", "-DUNICODE", "-D_UNICODE", "-msse2"]
+        check_headers(package, work, cross if toolchain else [os.environ.get("CXX", "c++")])
     elif kind == "cmake":
-        configure = ["cmake", "-S", source / "samples/hello", "-B", work / "hello", f"-Dqxcore11e_DIR={package}/lib/cmake/qxcore11e",
+        configure = ["cmake", "-S", source / "samples", "-B", work / "samples", f"-Dqxcore11e_DIR={package}/lib/cmake/qxcore11e",
                      "-DCMAKE_BUILD_TYPE=Release", "-G", "Ninja"]
         run(configure + [f"-DCMAKE_TOOLCHAIN_FILE={path}" for path in toolchain])
-        run(["cmake", "--build", work / "hello"])
+        run(["cmake", "--build", work / "samples"])
         if toolchain:
             environment["WINEPATH"] = run(["winepath", "-w", package / "bin"]).decode().strip()
-            check_output(run(["wine", work / "hello/hello.exe", sample], env=environment), expected)
-        else:
-            check_output(run([work / "hello/hello", sample]), expected)
+
+        def run_sample(name, *arguments):
+            program = ["wine", work / "samples" / f"{name}.exe"] if toolchain else [work / "samples" / name]
+            return run([*program, *arguments], env=environment)
+
+        check_output(run_sample("hello", sample), expected)
+        check_samples(run_sample, work, source, environment)
     elif kind == "pkgconfig":
         environment["PKG_CONFIG_PATH"] = f"{package}/lib/pkgconfig"
         # The quoting in the flags is for a shell: a folder's name may hold a blank.
