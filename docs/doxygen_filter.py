@@ -211,7 +211,12 @@ class Filter:
 
 def main():
     with open(sys.argv[1], encoding="utf-8") as file:
-        sys.stdout.write(Filter(file.read().split("\n")).run())
+        text = file.read()
+    if sys.argv[1].endswith(".md"):
+        # Doxygen takes a backslash at the end of code, as in the names of folders, for an escape.
+        sys.stdout.write(text.replace("\\`", "\\ `"))
+    else:
+        sys.stdout.write(Filter(text.split("\n")).run())
 
 
 if __name__ == "__main__":

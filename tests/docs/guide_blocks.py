@@ -3,8 +3,9 @@
 import dataclasses
 
 # console: commands with their output. cpp: statements of C++; "cpp global" are declarations, which all
-# later blocks see. text: what the cpp block right before it prints.
-KINDS = ("console", "cpp", "cpp global", "text")
+# later blocks see; "cpp program" is a whole program. text: what the cpp block right before it prints.
+KINDS = ("console", "cpp", "cpp global", "cpp program", "text")
+EXAMPLES = ("cpp", "cpp program")  # what is run
 
 
 @dataclasses.dataclass
@@ -26,7 +27,7 @@ def blocks(lines):
             elif fence:
                 previous = None if not fence.startswith("<!--") else previous
         elif fence == "```":
-            if open_kind in KINDS and (open_kind != "text" or previous == "cpp"):
+            if open_kind in KINDS and (open_kind != "text" or previous in EXAMPLES):
                 yield Block(open_kind, start, number)
             previous, open_kind = open_kind, None
     if open_kind is not None:

@@ -1,13 +1,14 @@
 #!/usr/bin/env python3
 """Makes one program of all C++ examples of a guide; called with a number it runs that example.
 
-Every cpp block becomes a function of its own; #include lines and "cpp global" blocks go to the top.
-The examples may call Print, which writes a text or a number and ends the line.
+Every cpp block becomes a function of its own, and so does the main function of a "cpp program" block;
+#include lines and "cpp global" blocks go to the top. The examples may call Print, which writes a text or a number and ends the line.
 
 usage: make_program.py GUIDE OUT.cpp
 """
 
 import pathlib
+import re
 import sys
 
 from guide_blocks import blocks
@@ -43,6 +44,10 @@ def main():
         code.append(f'#line {block.start + 1} "{guide}"')
         if block.kind == "cpp global":
             code += rest
+        elif block.kind == "cpp program":
+            count += 1
+            code += [re.sub(r"^int main\(\)", f"static int Program{count}()", line) for line in rest]
+            code.append(f"static void Example{count}() {{ std::exit(Program{count}()); }}")
         else:
             count += 1
             code += [f"static void Example{count}() {{", f'#line {block.start + 1} "{guide}"', *rest, "}"]

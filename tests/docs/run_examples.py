@@ -2,7 +2,7 @@
 """Runs the examples of a guide and compares what comes out with what the guide shows.
 
 In a block of the kind "console" each line that begins with "$ " is a command, the lines below it are its
-output, standard error included. A block "cpp" is run as the example of that number of the program that
+output, standard error included. A block "cpp" or "cpp program" is run as the example of that number of the program that
 make_program.py made; it must end well, and a block "text" right behind it is its output. "..." alone in a
 line stands for any lines. All examples of a guide run in one temporary folder that holds the sample
 texts, in the guide's order.
@@ -20,7 +20,7 @@ import subprocess
 import sys
 import tempfile
 
-from guide_blocks import blocks
+from guide_blocks import EXAMPLES, blocks
 
 sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "support"))
 import wine  # noqa: E402
@@ -122,7 +122,7 @@ def main():
         for block, following in zip(found, [*found[1:], None]):
             if block.kind == "console":
                 runner.run_console(block)
-            elif block.kind == "cpp":
+            elif block.kind in EXAMPLES:
                 examples += 1
                 runner.run_cpp(examples, block, following if following and following.kind == "text" else None)
         runner.copy_up_to(len(lines))
