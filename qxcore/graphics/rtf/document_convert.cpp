@@ -1,0 +1,3 @@
+#include "qxcore/graphics/rtf/document.h"
+
+void SRtfDocument::DeleteEditCtrl() {}

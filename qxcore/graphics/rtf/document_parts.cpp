@@ -1,0 +1,101 @@
+// The parts of a text, as SRtfDocument hands them out.
+
+#include "qxcore/graphics/rtf/document.h"
+#include "qxcore/graphics/rtf/internal/parts.h"
+#include "qxcore/graphics/rtf/internal/tag.h"
+#include "qxcore/string/string_buffer.h"
+
+namespace {
+
+void Cut(SString& text, SStringView part) {
+  text.Delete(static_cast<int>(part.data() - text.GetSafePointer()), static_cast<int>(part.size()));
+}
+
+// Puts braces around the entries of a font table that have none.
+class EntryGrouper {
+ public:
+  explicit EntryGrouper(SStringView table) : m_text(static_cast<unsigned>(table.size()) + 64), m_tags(table) {}
+
+  SString Run() {
+    m_text += m_tags.Next(false);
+    m_text += m_tags.Next(false);
+    for (SStringView tag = m_tags.Next(true); !tag.empty() && tag[0] != '}'; tag = m_tags.Next(true)) Take(tag);
+    if (m_isInEntry) m_text += WTEXT(";}");
+    m_text += static_cast<WCHAR>('}');
+    return m_text.Detach();
+  }
+
+ private:
+  void Take(SStringView tag) {
+    if (!m_isInEntry && tag[0] != '{') {
+      m_text += static_cast<WCHAR>('{');
+      m_isInEntry = true;
+    }
+    const std::size_t last = tag[0] == '{' ? SStringView::npos : tag.find(static_cast<WCHAR>(';'));
+    m_text += tag.substr(0, last == SStringView::npos ? last : last + 1);
+    if (last == SStringView::npos) return;
+    m_text += static_cast<WCHAR>('}');
+    m_isInEntry = false;
+  }
+
+  SStringBuffer m_text;
+  rtf::TagReader m_tags;
+  bool m_isInEntry = false;
+};
+
+bool HasEntriesWithoutBraces(SStringView table) {
+  rtf::TagReader tags(table);
+  tags.Next(false);
+  tags.Next(false);
+  SStringView tag = tags.Next(true);
+  while (!tag.empty() && tag[0] == '{') tag = tags.Next(true);
+  return !tag.empty() && tag[0] != '}';
+}
+
+int ExtractGroup(SString& text, SString& part, int cut, std::uint64_t key) {
+  part = SString::null;
+  try {
+    const SStringView group = rtf::FindGroup(text, key);
+    if (group.empty()) return 0;
+    const bool isRegrouped = key == platform::RtfKey("fonttbl") && HasEntriesWithoutBraces(group);
+    part = isRegrouped ? EntryGrouper(group).Run() : SString(group);
+    if (cut != 0) Cut(text, group);
+    return 1;
+  } catch (...) {
+    part = SString::null;
+    return 0;
+  }
+}
+
+}  // namespace
+
+int SRtfDocument::ExtractHeader(SString& rtf, SString& header, int cut) {
+  header = SString::null;
+  try {
+    std::int32_t fallback;
+    const SStringView found = rtf::FindHeader(rtf, fallback);
+    if (found.empty()) return 0;
+    header = found;
+    if (cut == 0) return 1;
+    // Unicode characters of the body count their substitutes by the header's last word.
+    SString prefix;
+    if (fallback != 1) prefix.Format(WTEXT("\\uc%d "), static_cast<int>(fallback));
+    rtf = prefix + rtf.Mid(header.Length());
+    return 1;
+  } catch (...) {
+    header = SString::null;
+    return 0;
+  }
+}
+
+int SRtfDocument::ExtractFontTable(SString& rtf, SString& table, int cut) {
+  return ExtractGroup(rtf, table, cut, platform::RtfKey("fonttbl"));
+}
+
+int SRtfDocument::ExtractColorTable(SString& rtf, SString& table, int cut) {
+  return ExtractGroup(rtf, table, cut, platform::RtfKey("colortbl"));
+}
+
+int SRtfDocument::ExtractStyleTable(SString& rtf, SString& table, int cut) {
+  return ExtractGroup(rtf, table, cut, platform::RtfKey("stylesheet"));
+}
