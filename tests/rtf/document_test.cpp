@@ -40,7 +40,8 @@ TEST(Parts, AreFoundInOddTexts) {
   SString part;
   SString loose(WTEXT("{\\fonttbl\\f0\\fswiss\\fcharset0 Helvetica;\\f1\\fnil{\\*\\panose 02;}Monaco;\n\\f2 Open}"));
   EXPECT_EQ(SRtfDocument::ExtractFontTable(loose, part, 0), 1);
-  EXPECT_EQ(part, WTEXT("{\\fonttbl{\\f0\\fswiss\\fcharset0 Helvetica;}{\\f1\\fnil{\\*\\panose 02;}Monaco;}{\\f2 Open;}}"));
+  EXPECT_EQ(part,
+            WTEXT("{\\fonttbl{\\f0\\fswiss\\fcharset0 Helvetica;}{\\f1\\fnil{\\*\\panose 02;}Monaco;}{\\f2 Open;}}"));
   SString hidden(WTEXT("{\\rtf1 \\{\\fonttbl a\\\\{ {\\bin14 {\\fonttbl{\\f0}}{ \\* \\colortbl;;}"));
   EXPECT_EQ(SRtfDocument::ExtractFontTable(hidden, part, 0), 0);
   EXPECT_EQ(SRtfDocument::ExtractColorTable(hidden, part, 0), 1);
@@ -62,11 +63,13 @@ TEST(References, AreRenumberedWhereTheyAreReferences) {
   EXPECT_EQ(change(WTEXT("\\f0\\fs1\\f1 a\\f12b\\f2 c\\cf1\\cb0 d")), WTEXT("\\f3\\fs1\\f10 a\\f1b\\f2 c\\cf2\\cb4 d"));
   EXPECT_EQ(change(WTEXT("{{\\stylesheet{\\s1\\f1\\cf0 x;}}{\\*\\listtable{\\list{\\listlevel\\f12}}}")),
             WTEXT("{{\\stylesheet{\\s1\\f10\\cf4 x;}}{\\*\\listtable{\\list{\\listlevel\\f1}}}"));
-  const WCHAR* const untouched[] = {
-      WTEXT("a \\\\f0 \\{\\}f0 \\'f0 \\fi0\\f\\cf"),  WTEXT("{\\fonttbl{\\f0 A;}{\\f1 B;}}"),
-      WTEXT("{\\colortbl;\\cf0;}"),                   WTEXT("{\\pict\\bin6 \\f0\\f1}"),
-      WTEXT("\\f77777777777 \\f-1 \\u0 \\uc1 \\bin"), WTEXT("\\"),
-      WTEXT("")};
+  const WCHAR* const untouched[] = {WTEXT("a \\\\f0 \\{\\}f0 \\'f0 \\fi0\\f\\cf"),
+                                    WTEXT("{\\fonttbl{\\f0 A;}{\\f1 B;}}"),
+                                    WTEXT("{\\colortbl;\\cf0;}"),
+                                    WTEXT("{\\pict\\bin6 \\f0\\f1}"),
+                                    WTEXT("\\f77777777777 \\f-1 \\u0 \\uc1 \\bin"),
+                                    WTEXT("\\"),
+                                    WTEXT("")};
   for (const WCHAR* text : untouched) EXPECT_EQ(change(text), text);
 
   SString own(WTEXT("\\deff1\\highlight1 "));

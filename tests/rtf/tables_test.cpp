@@ -73,8 +73,8 @@ TEST(FontTable, MergesByNameWithoutCase) {
   SRtfFontTable table;
   table.AddFontTable(WTEXT("{\\fonttbl\r\n{\\f0 Times;}\r\n{\\f1 ARIAL;}\r\n}"));
   const SRtfFontTable before = table;
-  const Numbers numbers =
-      table.AddFontTable(WTEXT("{\\fonttbl {\\f3 arial;} {\\f8 Zapf;}{\\f5\\fnil;}{\\f9 zapf;}{\\f3 Times;}}{\\f6 Late;}"));
+  const Numbers numbers = table.AddFontTable(
+      WTEXT("{\\fonttbl {\\f3 arial;} {\\f8 Zapf;}{\\f5\\fnil;}{\\f9 zapf;}{\\f3 Times;}}{\\f6 Late;}"));
   EXPECT_EQ(ToString(numbers), "3>0 8>2 9>2 ");
   EXPECT_EQ(table.GetCount(), 3);
   EXPECT_EQ(table[2].m_number, 2);
@@ -106,8 +106,8 @@ TEST(ColorTable, MergesByExactText) {
             "0>0 1>1 2>2 ");
   EXPECT_EQ(table.GetColorTable(),
             WTEXT("{\\colortbl\r\n;\r\n\\red0\\green0\\blue0;\r\n\\red255\\green0\\blue0;\r\n}\r\n"));
-  EXPECT_EQ(ToString(table.AddColorTable(
-                WTEXT(" {\\colortbl \\red255\\green0\\blue0;{\\x a;}\\red9;;{\\y}\\red255\\green0\\blue0;\\red7 } \\red8;"))),
+  EXPECT_EQ(ToString(table.AddColorTable(WTEXT(
+                " {\\colortbl \\red255\\green0\\blue0;{\\x a;}\\red9;;{\\y}\\red255\\green0\\blue0;\\red7 } \\red8;"))),
             "0>2 1>3 2>0 3>2 4>4 ");
   EXPECT_EQ(table[4].m_number, 4);
   EXPECT_EQ(table[4].m_text, WTEXT("\\red7"));

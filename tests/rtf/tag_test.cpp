@@ -42,8 +42,7 @@ TEST(Tags, EscapesOfTwoCharactersStandForThemselves) {
 
 TEST(Tags, WholeGroupsReachTheirClosingBrace) {
   EXPECT_EQ(Tags(WTEXT("{a{b}c} {d}"), 1), (Texts{WTEXT("{a{b}c}"), WTEXT("{d}")}));
-  EXPECT_EQ(Tags(WTEXT("{a}{b}"), 0),
-            (Texts{WTEXT("{"), WTEXT("a"), WTEXT("}"), WTEXT("{"), WTEXT("b"), WTEXT("}")}));
+  EXPECT_EQ(Tags(WTEXT("{a}{b}"), 0), (Texts{WTEXT("{"), WTEXT("a"), WTEXT("}"), WTEXT("{"), WTEXT("b"), WTEXT("}")}));
   EXPECT_EQ(Tags(WTEXT("{a{b}"), 1), (Texts{WTEXT("{a{b}")}));
   EXPECT_EQ(Tags(WTEXT("{\\bin3 }}}x}y"), 1), (Texts{WTEXT("{\\bin3 }}}x}"), WTEXT("y")}));
   const WideString deep(1000000, '{');

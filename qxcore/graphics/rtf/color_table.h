@@ -38,8 +38,8 @@ class QXCORE_API SRtfColorTable : public STableMem<SRtfColorEntry> {
   //
   // `text` is a colour table group. Its definitions end at each ";"; blanks around one do not count, and an
   // empty one is a colour, too. Behind the last ";" only a definition that is not empty counts. They are
-  // numbered from 0 in the order of the text. Groups inside are skipped, with what stands before them; a text of another kind has no
-  // colours. Time grows with the sizes of both tables, not with their product. On a failure g_RaiseError is
-  // called with "RTF Color table: Add color table"; what was read so far is kept and returned.
+  // numbered from 0 in the order of the text. Groups inside are skipped, with what stands before them; a text of
+  // another kind has no colours. Time grows with the sizes of both tables, not with their product. On a failure
+  // g_RaiseError is called with "RTF Color table: Add color table"; what was read so far is kept and returned.
   SMap<int, int> AddColorTable(const SString& text);
 };

@@ -1,0 +1,5 @@
+# Real documents, converted in a process each.
+add_executable(rtf_converter rtf/rtf_converter.cpp)
+target_link_libraries(rtf_converter PRIVATE qxcore11e qxcore_options)
+target_include_directories(rtf_converter PRIVATE ${PROJECT_SOURCE_DIR})
+set_target_properties(rtf_converter PROPERTIES RUNTIME_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR})
