@@ -104,5 +104,6 @@
 #include "qxcore/system/time/ole_date_time.h"
 #include "qxcore/system/time/time.h"
 #include "qxcore/system/time/time_span.h"
+#include "qxcore/ui/bar/status_bar_panes.h"
 #include "qxcore/ui/layout/pane_sizing.h"
 #include "qxcore/ui/layout/tab_strip.h"
