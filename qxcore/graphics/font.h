@@ -53,7 +53,8 @@ class QXCORE_API SFont : public SFontOld {
   // The sum of its style bits.
   unsigned int GetStyle() const;
 
-  // Makes this the user interface's font: the user's choice, or else the system's font for messages. 1 on success.
+  // Makes this the user interface's font: the user's choice, or else the system's
+  // DEFAULT_GUI_FONT. 1 on success.
   int LoadDefaultUIFont(unsigned int dpi = 0);
   // Keeps this font as the user's choice, and its face for the headers of grids ("Controls\Grid", "Header Font
   // Name"). Returns 0, or the error of the registry.

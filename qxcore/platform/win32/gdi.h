@@ -545,7 +545,7 @@ QXCORE_API HDC CreateMetaFileW(LPCWSTR file);
 QXCORE_API HMETAFILE CloseMetaFile(HDC dc);
 QXCORE_API BOOL PlayMetaFile(HDC dc, HMETAFILE metafile);
 QXCORE_API BOOL DeleteMetaFile(HMETAFILE metafile);
-// `frame` in 0.01 mm of the reference context; without one the bounds of what is drawn.
+// `frame` in 0.01 mm; without one the picture plays unscaled, from the corner of the rectangle.
 QXCORE_API HDC CreateEnhMetaFileW(HDC reference, LPCWSTR file, const RECT* frame, LPCWSTR description);
 QXCORE_API HENHMETAFILE CloseEnhMetaFile(HDC dc);
 QXCORE_API BOOL PlayEnhMetaFile(HDC dc, HENHMETAFILE metafile, const RECT* rect);

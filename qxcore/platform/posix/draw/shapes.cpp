@@ -1,0 +1,171 @@
+// Rectangles, round rectangles and ellipses: the inside with the brush, the outline with the pen.
+#include <cstdlib>
+
+#include "qxcore/platform/posix/draw/line.h"
+#include "qxcore/platform/posix/draw/recorder.h"
+#include "qxcore/platform/posix/draw/stock.h"
+
+using namespace draw;
+
+namespace {
+
+// Paints the four sides of a frame that lies inside a box.
+void PaintFrame(const Context& dc, const Box& box, int width, int height, const Paint& paint, int rop2) {
+  Area frame(box);
+  frame.Less(Area({box.x1 + width, box.y1 + height, box.x2 - width, box.y2 - height}));
+  PaintArea(dc, frame, paint, rop2);
+}
+
+// A region less what is left when it shrinks by one pixel on every side: its outline.
+Area OutlineOf(const Area& area, int width, int height) {
+  Area inner = area;
+  for (int dx : {-width, 0, width}) {
+    for (int dy : {-height, 0, height}) {
+      Area moved = area;
+      moved.Offset(dx, dy);
+      inner.And(moved);
+    }
+  }
+  Area outline = area;
+  outline.Less(inner);
+  return outline;
+}
+
+// Paints the inside and the outline of a shape that fills an area.
+void PaintShape(const Context& dc, const Area& area) {
+  const Settings& set = dc.m_settings;
+  if (set.pen->m_style == PS_NULL) {
+    PaintArea(dc, area, PaintOf(dc, *set.brush), set.rop2);
+    return;
+  }
+  int width = PenWidth(dc);
+  Area outline = OutlineOf(area, width, width), inside = area;
+  inside.Less(outline);
+  PaintArea(dc, inside, PaintOf(dc, *set.brush), set.rop2);
+  PaintArea(dc, outline, PaintOf(dc, *set.pen), set.rop2);
+}
+
+}  // namespace
+
+BOOL Rectangle(HDC handle, int left, int top, int right, int bottom) {
+  auto* dc = Find<Context>(handle);
+  if (!dc) return FALSE;
+  if (Record(*dc, [=](HDC to) { Rectangle(to, left, top, right, bottom); })) return TRUE;
+  Box box = dc->Map(left, top, right, bottom);
+  if (IsEmpty(box)) return TRUE;
+  const Settings& set = dc->m_settings;
+  Paint fill = PaintOf(*dc, *set.brush);
+  if (set.pen->m_style == PS_NULL) {
+    PaintBox(*dc, {box.x1, box.y1, box.x2 - 1, box.y2 - 1}, fill, set.rop2);
+    return TRUE;
+  }
+  int width = PenWidth(*dc), out = set.pen->m_style == PS_INSIDEFRAME ? 0 : width / 2;
+  if (width == 1) {
+    PaintBox(*dc, {box.x1 + 1, box.y1 + 1, box.x2 - 1, box.y2 - 1}, fill, set.rop2);
+    POINT corners[4] = {{box.x1, box.y1}, {box.x2 - 1, box.y1}, {box.x2 - 1, box.y2 - 1}, {box.x1, box.y2 - 1}};
+    DrawLines(*dc, corners, 4, true);
+    return TRUE;
+  }
+  Box outer{box.x1 - out, box.y1 - out, box.x2 - 1 + width - out, box.y2 - 1 + width - out};
+  if (set.pen->m_style == PS_INSIDEFRAME) outer = box;
+  PaintBox(*dc, {outer.x1 + width, outer.y1 + width, outer.x2 - width, outer.y2 - width}, fill, set.rop2);
+  PaintFrame(*dc, outer, width, width, PaintOf(*dc, *set.pen), set.rop2);
+  return TRUE;
+}
+
+BOOL RoundRect(HDC handle, int left, int top, int right, int bottom, int width, int height) {
+  auto* dc = Find<Context>(handle);
+  if (!dc) return FALSE;
+  if (Record(*dc, [=](HDC to) { RoundRect(to, left, top, right, bottom, width, height); })) return TRUE;
+  Box box = dc->Map(left, top, right, bottom);
+  if (dc->m_settings.pen->m_style == PS_NULL) --box.x2, --box.y2;
+  PaintShape(*dc, RoundRectArea(box, std::abs(dc->Map().Width(width)), std::abs(dc->Map().Height(height))));
+  return TRUE;
+}
+
+BOOL Ellipse(HDC handle, int left, int top, int right, int bottom) {
+  auto* dc = Find<Context>(handle);
+  if (!dc) return FALSE;
+  if (Record(*dc, [=](HDC to) { Ellipse(to, left, top, right, bottom); })) return TRUE;
+  Box box = dc->Map(left, top, right, bottom);
+  if (dc->m_settings.pen->m_style == PS_NULL) --box.x2, --box.y2;
+  PaintShape(*dc, EllipseArea(box));
+  return TRUE;
+}
+
+// --- with a brush of their own ---
+
+static Ref<Brush> FindBrush(HBRUSH handle) {
+  // A number up to 31 is a system colour plus one.
+  auto number = reinterpret_cast<std::uintptr_t>(handle);
+  if (number >= 1 && number <= 31) handle = GetSysColorBrush(static_cast<int>(number) - 1);
+  return Find<Brush>(handle);
+}
+
+namespace {
+
+int FillWith(Context& dc, const RECT& rect, const Ref<Brush>& brush) {
+  if (Record(dc, [=](HDC to) { FillWith(*Find<Context>(to), rect, brush); })) return 1;
+  PaintBox(dc, dc.Map(rect), PaintOf(dc, *brush), R2_COPYPEN);
+  return 1;
+}
+
+int FrameWith(Context& dc, const RECT& rect, const Ref<Brush>& brush) {
+  if (Record(dc, [=](HDC to) { FrameWith(*Find<Context>(to), rect, brush); })) return 1;
+  PaintFrame(dc, dc.Map(rect), 1, 1, PaintOf(dc, *brush), R2_COPYPEN);
+  return 1;
+}
+
+// An area in pixels of the device.
+BOOL FillAreaWith(Context& dc, const Area& area, const Ref<Brush>& brush, int rop2) {
+  if (Record(dc, [=](HDC to) { FillAreaWith(*Find<Context>(to), area, brush, rop2); })) return TRUE;
+  Area moved = area;
+  moved.Offset(dc.X(0), dc.Y(0));
+  PaintArea(dc, moved, PaintOf(dc, *brush), rop2);
+  return TRUE;
+}
+
+BOOL FillRegion(HDC handle, HRGN regionHandle, const Ref<Brush>& brush, int rop2) {
+  auto* dc = Find<Context>(handle);
+  auto* region = Find<RegionObject>(regionHandle);
+  return dc && region && brush && FillAreaWith(*dc, region->m_area, brush, rop2);
+}
+
+}  // namespace
+
+int FillRect(HDC handle, const RECT* rect, HBRUSH brushHandle) {
+  auto* dc = Find<Context>(handle);
+  Ref<Brush> brush = FindBrush(brushHandle);
+  return dc && brush ? FillWith(*dc, *rect, brush) : 0;
+}
+
+int FrameRect(HDC handle, const RECT* rect, HBRUSH brushHandle) {
+  auto* dc = Find<Context>(handle);
+  Ref<Brush> brush = FindBrush(brushHandle);
+  if (!dc || !brush || rect->right <= rect->left || rect->bottom <= rect->top) return 0;
+  return FrameWith(*dc, *rect, brush);
+}
+
+BOOL FillRgn(HDC dc, HRGN region, HBRUSH brush) { return FillRegion(dc, region, FindBrush(brush), R2_COPYPEN); }
+
+BOOL FrameRgn(HDC handle, HRGN regionHandle, HBRUSH brushHandle, int width, int height) {
+  auto* dc = Find<Context>(handle);
+  auto* region = Find<RegionObject>(regionHandle);
+  Ref<Brush> brush = FindBrush(brushHandle);
+  return dc && region && brush && FillAreaWith(*dc, OutlineOf(region->m_area, width, height), brush, R2_COPYPEN);
+}
+
+BOOL PaintRgn(HDC handle, HRGN region) {
+  auto* dc = Find<Context>(handle);
+  return dc && FillRegion(handle, region, dc->m_settings.brush, dc->m_settings.rop2);
+}
+
+BOOL InvertRgn(HDC handle, HRGN region) { return FillRegion(handle, region, StockAs<Brush>(BLACK_BRUSH), R2_NOT); }
+
+BOOL InvertRect(HDC handle, const RECT* rect) {
+  auto* dc = Find<Context>(handle);
+  if (!dc) return FALSE;
+  if (Record(*dc, [rect = *rect](HDC to) { InvertRect(to, &rect); })) return TRUE;
+  PaintBox(*dc, dc->Map(*rect), SolidPaint(*dc, 0), R2_NOT);
+  return TRUE;
+}
