@@ -46,7 +46,7 @@ LOGFONTW Description(const SString& face, int height, unsigned int style) {
   description.lfUnderline = (style & SFont::kUnderline) != 0;
   description.lfStrikeOut = (style & SFont::kStrikeOut) != 0;
   description.lfCharSet = DEFAULT_CHARSET;
-  for (int i = 0; i < face.GetLength() && i < LF_FACESIZE - 1; ++i) description.lfFaceName[i] = face[i];
+  for (int i = 0; i < static_cast<int>(face.Length()) && i < LF_FACESIZE - 1; ++i) description.lfFaceName[i] = face[i];
   return description;
 }
 
@@ -149,7 +149,7 @@ Choice ReadFixed() {
     key.GetProfile(WTEXT("Size"), &choice.points, 0);
     key.GetProfile(WTEXT("Bold"), &bold, 0);
     key.GetProfile(WTEXT("Italic"), &italic, 0);
-    choice.style = (bold ? SFont::kBold : 0) | (italic ? SFont::kItalic : 0);
+    choice.style = static_cast<long>((bold ? SFont::kBold : SFont::kRegular) + (italic ? SFont::kItalic : SFont::kRegular));
     if (choice.IsUsable()) return choice;
   }
   return Choice();

@@ -16,15 +16,13 @@ void PaintFrame(const Context& dc, const Box& box, int width, int height, const 
   PaintArea(dc, frame, paint, rop2);
 }
 
-// A region less what is left when it shrinks by one pixel on every side: its outline.
+// The pixels of an area from which one can leave it by going up or down `height` pixels, or `width` to a side.
 Area OutlineOf(const Area& area, int width, int height) {
   Area inner = area;
-  for (int dx : {-width, 0, width}) {
-    for (int dy : {-height, 0, height}) {
-      Area moved = area;
-      moved.Offset(dx, dy);
-      inner.And(moved);
-    }
+  for (POINT step : {POINT{-width, 0}, POINT{width, 0}, POINT{0, -height}, POINT{0, height}}) {
+    Area moved = area;
+    moved.Offset(step.x, step.y);
+    inner.And(moved);
   }
   Area outline = area;
   outline.Less(inner);
