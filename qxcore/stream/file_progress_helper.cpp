@@ -136,6 +136,19 @@ unsigned long SFileProgressHelper::CountAvailable() {
 // A file that fails has nothing more to give, either; a loop up to the end must not run for ever.
 bool SFileProgressHelper::IsAtEnd() const { return m_file == nullptr || std::feof(m_file) != 0 || m_error != 0; }
 
+// Only what has a size is known to be able to go back; asking a pipe would lose nothing, but a device may lie.
+bool SFileProgressHelper::GetFilePlace(std::uint64_t* place) {
+  if (m_file == nullptr || m_size == 0 || m_error != 0) return false;
+  *place = m_position;
+  return true;
+}
+
+bool SFileProgressHelper::GoToFilePlace(std::uint64_t place) {
+  if (m_file == nullptr || !GoBackTo(place)) return false;
+  m_nextReport = std::min(m_nextReport, place);  // the indicator goes the same way again
+  return true;
+}
+
 void SFileProgressHelper::CloseFile() noexcept {
   if (m_file != nullptr) std::fclose(m_file);
   m_file = nullptr;

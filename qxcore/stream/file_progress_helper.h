@@ -35,6 +35,8 @@ class QXCORE_API SFileProgressHelper {
   unsigned long SkipBytes(unsigned long count);
   unsigned long CountAvailable();
   bool IsAtEnd() const;
+  bool GetFilePlace(std::uint64_t* place);
+  bool GoToFilePlace(std::uint64_t place);
   void CloseFile() noexcept;
 
   std::FILE* m_file;  // null when closed

@@ -1,21 +1,20 @@
 #include "qxcore/stream/input_binary_stream.h"
 
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/internal/read_fully.h"
 #include "qxcore/stream/internal/working_buffer.h"
 #include "qxcore/string/text_conversion.h"
 
 QXCORE_IMPLEMENT_CLASS(SInputBinaryStream, SObject, 0)
 
-SInputBinaryStream::~SInputBinaryStream() {
-  if (m_owns) delete m_in;
-}
+SInputBinaryStream::~SInputBinaryStream() = default;
 
 namespace {
 
 // An unsigned little-endian number; throws SEEOFException where it is cut.
 std::uint32_t ReadNumber(SInputStream& in, unsigned long bytes) {
   unsigned char number[4] = {};
-  if (in.Read(number, bytes) != bytes) throw SEEOFException();
+  if (SReadFully(in, number, bytes) != bytes) throw SEEOFException();
   return number[0] | std::uint32_t{number[1]} << 8 | std::uint32_t{number[2]} << 16 | std::uint32_t{number[3]} << 24;
 }
 
@@ -36,8 +35,7 @@ bool IsPlausible(SInputStream& in, std::int32_t n) {
 // Most texts are plain, and then have as many characters as bytes but for the zero.
 SString ReadText(SInputStream& in, int n) {
   SWorkingBuffer<char> bytes(static_cast<std::size_t>(n));
-  unsigned long got = in.Read(bytes.Get(), static_cast<unsigned long>(n));
-  if (got > static_cast<unsigned long>(n)) got = 0;  // all ones: the source has failed
+  const unsigned long got = SReadFully(in, bytes.Get(), static_cast<unsigned long>(n));
   SString text;
   WCHAR* characters = text.GetBufferSetLength(n);
   const int length = static_cast<int>(SDecodeUTF8(characters, std::string_view(bytes.Get(), got)) - characters);

@@ -17,6 +17,7 @@
 #include "qxcore/container/string_table.h"
 #include "qxcore/core/object.h"
 #include "qxcore/platform/export.h"
+#include "qxcore/stream/inner_stream.h"
 #include "qxcore/stream/input_stream.h"
 
 class QXCORE_API SInputBinaryStream : public SObject {
@@ -26,8 +27,8 @@ class QXCORE_API SInputBinaryStream : public SObject {
   enum : std::int32_t { kConfirmAbove = 0x300000 };
 
   // Reads from `in`, which must stay alive; the second form deletes it at the end when `owns` is set.
-  explicit SInputBinaryStream(SInputStream& in) : m_in(&in), m_owns(false) {}
-  SInputBinaryStream(SInputStream* in, bool owns) : m_in(in), m_owns(owns) {}
+  explicit SInputBinaryStream(SInputStream& in) : m_in(in) {}
+  SInputBinaryStream(SInputStream* in, bool owns) : m_in(in, owns) {}
   SInputBinaryStream(const SInputBinaryStream&) = delete;
   SInputBinaryStream& operator=(const SInputBinaryStream&) = delete;
   ~SInputBinaryStream() override;
@@ -36,8 +37,7 @@ class QXCORE_API SInputBinaryStream : public SObject {
   friend SInputStream& SGetStream(SInputBinaryStream& stream) { return *stream.m_in; }
 
  private:
-  SInputStream* m_in;
-  bool m_owns;
+  SInnerStream<SInputStream> m_in;
 };
 
 static_assert(sizeof(void*) != 4 || sizeof(SInputBinaryStream) == 12, "the layout is public");

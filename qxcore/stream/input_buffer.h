@@ -1,6 +1,8 @@
 // Input from a block of memory that the caller keeps.
 #pragma once
 
+#include <concepts>
+
 #include "qxcore/stream/input_stream.h"
 
 class QXCORE_API SInputBuffer : public SInputStream {
@@ -8,8 +10,10 @@ class QXCORE_API SInputBuffer : public SInputStream {
 
   // `size` bytes from `block` on, which must stay as they are meanwhile; negative sizes count as 0.
   SInputBuffer(const void* block, int size);
-  // The same for blocks of any size.
+  // The same for blocks of any size, and for sizes of any integer type.
   SInputBuffer(const void* block, unsigned long size);
+  template <std::integral Size>
+  SInputBuffer(const void* block, Size size) : SInputBuffer(block, static_cast<unsigned long>(size > 0 ? size : 0)) {}
   ~SInputBuffer() override;
 
   int Read() override { return m_position < m_size ? m_block[m_position++] : -1; }

@@ -2,10 +2,11 @@
 
 #include <algorithm>
 #include <cstring>
-#include <limits>
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/core/memory.h"
+#include "qxcore/stream/internal/add_clipped.h"
+#include "qxcore/stream/internal/read_fully.h"
 
 QXCORE_IMPLEMENT_CLASS(SInputBufferStream, SInputStream, 0)
 
@@ -19,16 +20,14 @@ constexpr unsigned long kDefaultMarkLimit = 8192;
 SInputBufferStream::SInputBufferStream(SInputStream& in, unsigned long size) : SInputBufferStream(&in, size, false) {}
 
 SInputBufferStream::SInputBufferStream(SInputStream* in, unsigned long size, bool owns)
-    : m_in(in), m_owns(owns), m_capacity(size != 0 ? size : kDefaultSize), m_markLimit(m_capacity) {
+    : m_in(in, owns), m_capacity(size != 0 ? size : kDefaultSize), m_markLimit(m_capacity) {
   m_buffer = static_cast<unsigned char*>(SMemAlloc(m_capacity));
 }
 
-SInputBufferStream::~SInputBufferStream() {
-  SMemFree(m_buffer);
-  if (m_owns) delete m_in;
-}
+SInputBufferStream::~SInputBufferStream() { SMemFree(m_buffer); }
 
 void SInputBufferStream::Fill() {
+  m_failure.Throw();
   if (m_mark == kNoMark) {
     m_count = m_position = 0;
   } else if (m_count == m_capacity) {
@@ -47,9 +46,7 @@ void SInputBufferStream::Fill() {
       m_count = m_position = 0;
     }
   }
-  // A source that fails may give all ones: nothing came.
-  const unsigned long room = m_capacity - m_count, got = m_in->Read(m_buffer + m_count, room);
-  if (got <= room) m_count += got;
+  m_count += SReadSome(*m_in, m_buffer + m_count, m_capacity - m_count);
 }
 
 int SInputBufferStream::ReadRefilled() {
@@ -58,13 +55,25 @@ int SInputBufferStream::ReadRefilled() {
 }
 
 unsigned long SInputBufferStream::Read(void* buffer, unsigned long count) {
-  unsigned char* out = static_cast<unsigned char*>(buffer);
   unsigned long done = 0;
+  try {
+    ReadInto(static_cast<unsigned char*>(buffer), count, done);
+  } catch (...) {
+    if (done == 0) throw;
+    m_failure.Keep();
+  }
+  return done;
+}
+
+void SInputBufferStream::ReadInto(unsigned char* out, unsigned long count, unsigned long& done) {
   while (done < count) {
     if (m_position == m_count) {
       if (m_mark == kNoMark && count - done >= m_capacity) {
-        const unsigned long got = m_in->Read(out + done, count - done);
-        return got <= count - done ? done + got : done;
+        m_failure.Throw();
+        const unsigned long got = SReadSome(*m_in, out + done, count - done);
+        if (got == 0) break;
+        done += got;
+        continue;
       }
       Fill();
       if (m_position == m_count) break;
@@ -74,31 +83,51 @@ unsigned long SInputBufferStream::Read(void* buffer, unsigned long count) {
     m_position += taken;
     done += taken;
   }
-  return done;
 }
 
 unsigned long SInputBufferStream::Skip(unsigned long count) {
   unsigned long done = 0;
-  while (done < count) {
-    if (m_position == m_count) {
-      if (m_mark == kNoMark) return done + m_in->Skip(count - done);
-      Fill();
-      if (m_position == m_count) break;
+  try {
+    while (done < count) {
+      if (m_position == m_count) {
+        if (m_mark == kNoMark) {
+          m_failure.Throw();
+          const unsigned long passed = m_in->Skip(count - done);
+          if (passed == 0) break;
+          done += passed;
+          continue;
+        }
+        Fill();
+        if (m_position == m_count) break;
+      }
+      unsigned long taken = std::min(count - done, m_count - m_position);
+      m_position += taken;
+      done += taken;
     }
-    unsigned long taken = std::min(count - done, m_count - m_position);
-    m_position += taken;
-    done += taken;
+  } catch (...) {
+    if (done == 0) throw;
+    m_failure.Keep();
   }
   return done;
 }
 
-unsigned long SInputBufferStream::Available() {
-  const unsigned long buffered = m_count - m_position, behind = m_in->Available();
-  return behind <= std::numeric_limits<unsigned long>::max() - buffered ? buffered + behind
-                                                                        : std::numeric_limits<unsigned long>::max();
+unsigned long SInputBufferStream::Available() { return SAddClipped(m_count - m_position, m_in->Available()); }
+
+int SInputBufferStream::IsEOF() { return m_position == m_count && !m_failure.IsThere() && m_in->IsEOF(); }
+
+bool SInputBufferStream::GetPlace(std::uint64_t* place) {
+  if (!m_in->GetPlace(place)) return false;
+  *place -= m_count - m_position;
+  return true;
 }
 
-int SInputBufferStream::IsEOF() { return m_position == m_count && m_in->IsEOF(); }
+bool SInputBufferStream::GoToPlace(std::uint64_t place) {
+  if (!m_in->GoToPlace(place)) return false;
+  m_count = m_position = 0;
+  m_mark = kNoMark;
+  m_failure.Forget();
+  return true;
+}
 
 void SInputBufferStream::Mark(unsigned long limit) {
   m_mark = static_cast<long>(m_position);
@@ -113,5 +142,6 @@ void SInputBufferStream::Reset() {
 void SInputBufferStream::Close() {
   m_count = m_position = 0;
   m_mark = kNoMark;
+  m_failure.Forget();
   m_in->Close();
 }

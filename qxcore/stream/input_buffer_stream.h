@@ -1,7 +1,9 @@
 // A filter that buffers an input stream and can go back to a mark.
 #pragma once
 
+#include "qxcore/stream/inner_stream.h"
 #include "qxcore/stream/input_stream.h"
+#include "qxcore/stream/pending_failure.h"
 
 class QXCORE_API SInputBufferStream : public SInputStream {
   QXCORE_DECLARE_CLASS(SInputBufferStream)
@@ -19,7 +21,8 @@ class QXCORE_API SInputBufferStream : public SInputStream {
       return m_buffer[m_position++];
     return ReadRefilled();
   }
-  // Blocks as large as the buffer go straight to the caller while no mark is set.
+  // Blocks as large as the buffer go straight to the caller while no mark is set. When the inner stream throws in
+  // the middle of a block, the read returns what it has, and the next one throws.
   unsigned long Read(void* buffer, unsigned long count) override;
   unsigned long Skip(unsigned long count) override;
   unsigned long Available() override;
@@ -32,6 +35,9 @@ class QXCORE_API SInputBufferStream : public SInputStream {
   // Gives the buffer's content up and closes the inner stream.
   void Close() override;
   int GetError() const override { return m_in->GetError(); }
+  // Places are those of the inner stream. Going to one gives the mark up.
+  bool GetPlace(std::uint64_t* place) override;
+  bool GoToPlace(std::uint64_t place) override;
 
  protected:
   // Reads more behind what is buffered, or anew from the buffer's start while no mark is set.
@@ -41,13 +47,14 @@ class QXCORE_API SInputBufferStream : public SInputStream {
   static constexpr long kNoMark = -1;
 
   int ReadRefilled();
+  void ReadInto(unsigned char* out, unsigned long count, unsigned long& done);
 
-  SInputStream* m_in;
-  bool m_owns;
+  SInnerStream<SInputStream> m_in;
   unsigned char* m_buffer;
   unsigned long m_capacity;
   unsigned long m_count = 0;     // valid bytes
   unsigned long m_position = 0;  // the next one
   long m_mark = kNoMark;
   unsigned long m_markLimit;  // the largest capacity while a mark is set
+  SPendingFailure m_failure;
 };

@@ -24,4 +24,6 @@ class QXCORE_API SInputFile : public SInputStream, public SFileProgressHelper {
   int IsEOF() override { return IsAtEnd(); }
   void Close() override { CloseFile(); }
   int GetError() const override { return m_error; }
+  bool GetPlace(std::uint64_t* place) override { return GetFilePlace(place); }
+  bool GoToPlace(std::uint64_t place) override { return GoToFilePlace(place); }
 };

@@ -1,7 +1,9 @@
 // A filter that lets the reader push bytes back.
 #pragma once
 
+#include "qxcore/stream/inner_stream.h"
 #include "qxcore/stream/input_stream.h"
+#include "qxcore/stream/pending_failure.h"
 
 class QXCORE_API SInputPushbackStream : public SInputStream {
   QXCORE_DECLARE_CLASS(SInputPushbackStream)
@@ -14,13 +16,18 @@ class QXCORE_API SInputPushbackStream : public SInputStream {
   SInputPushbackStream& operator=(const SInputPushbackStream&) = delete;
   ~SInputPushbackStream() override;
 
-  int Read() override { return m_position < m_size ? m_area[m_position++] : m_in->Read(); }
-  // What was pushed back, then the inner stream. An inner read that reports failure (all ones) gives the
-  // number of bytes pushed back that were delivered, or the failure when there were none.
+  int Read() override {
+    if (m_position < m_size) return m_area[m_position++];
+    m_failure.Throw();
+    return m_in->Read();
+  }
+  // What was pushed back, then the inner stream. When an inner read reports failure (all ones) the result is the
+  // number of bytes delivered before, or the failure when there were none; when it throws after some were delivered,
+  // the next read throws.
   unsigned long Read(void* buffer, unsigned long count) override;
   unsigned long Skip(unsigned long count) override;
-  unsigned long Available() override { return m_size - m_position + m_in->Available(); }
-  int IsEOF() override { return m_position == m_size && m_in->IsEOF(); }
+  unsigned long Available() override;
+  int IsEOF() override { return m_position == m_size && !m_failure.IsThere() && m_in->IsEOF(); }
   // Marks the inner stream and keeps what is pushed back. Throws SEOutOfMemory.
   void Mark(unsigned long limit) override;
   void Reset() override;
@@ -33,11 +40,11 @@ class QXCORE_API SInputPushbackStream : public SInputStream {
   void Unread(const void* buffer, unsigned long count);
 
  private:
-  SInputStream* m_in;
-  bool m_owns;
+  SInnerStream<SInputStream> m_in;
   unsigned char* m_area;  // filled from its end towards its start
   unsigned long m_size;
   unsigned long m_position;  // first byte that was pushed back; m_size when none is
   unsigned char* m_savedArea = nullptr;
   unsigned long m_savedPosition = 0;
+  SPendingFailure m_failure;
 };

@@ -28,6 +28,9 @@ void SInputStream::Close() {}
 const void* SInputStream::TakeRest(unsigned long*) { return nullptr; }
 int SInputStream::GetError() const { return 0; }
 
+bool SInputStream::GetPlace(std::uint64_t*) { return false; }
+bool SInputStream::GoToPlace(std::uint64_t) { return false; }
+
 unsigned long SInputStream::ReadCharacters(WCHAR* buffer, unsigned long) {
   const int character = Read();
   if (character < 0) return 0;

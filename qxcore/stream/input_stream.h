@@ -6,6 +6,8 @@
 // cancelling, misuse of marks), never for the end. A stream is used by one thread at a time.
 #pragma once
 
+#include <cstdint>
+
 #include "qxcore/core/object.h"
 #include "qxcore/platform/export.h"
 
@@ -42,6 +44,12 @@ class QXCORE_API SInputStream : public SObject {
   // reader of text, else bytes. Gives how many, at least one but at the end. Here: one, through Read(), so that
   // nothing is lost when that throws.
   virtual unsigned long ReadCharacters(WCHAR* buffer, unsigned long count);
+
+  // For streams that can go back, such as files: sets *place to where they stand and returns true, and goes to such a
+  // place again. Neither marks nor limits come into it. GoToPlace returns false where that fails, and the stream then
+  // stands where it did. Here: both return false.
+  virtual bool GetPlace(std::uint64_t* place);
+  virtual bool GoToPlace(std::uint64_t place);
 
  protected:
   SInputStream() = default;

@@ -9,6 +9,7 @@
 
 #include "qxcore/core/exception.h"
 #include "qxcore/platform/internal/widen.h"
+#include "qxcore/stream/internal/add_clipped.h"
 
 QXCORE_IMPLEMENT_CLASS(SJavaUnicodeEscapeFilterStream, SInputStream, 0)
 
@@ -50,24 +51,22 @@ unsigned ValueOf(const char* digits) {
 
 }  // namespace
 
-Filter::~SJavaUnicodeEscapeFilterStream() {
-  if (m_owns) delete m_in;
-}
+Filter::~SJavaUnicodeEscapeFilterStream() = default;
 
 // --- escaping ---
 
 // The next character of the inner stream, or -1.
 int Filter::Take() {
-  if (m_pending != nullptr) std::rethrow_exception(std::exchange(m_pending, nullptr));
+  m_failure.Throw();
   return m_at != m_end ? *m_at++ : m_in->Read();
 }
 
-// The same while an escape is being looked at, which must not get lost: a failure is told with the next read.
+// The same while an escape is being looked at, which must not get lost: a failure is thrown by the next read.
 int Filter::TakeAhead() {
   try {
     return Take();
   } catch (...) {
-    m_pending = std::current_exception();
+    m_failure.Keep();
     return kNone;
   }
 }
@@ -116,7 +115,7 @@ unsigned long Filter::Read(void* buffer, unsigned long count) {
     }
   } catch (...) {
     if (done == 0) throw;
-    m_pending = std::current_exception();
+    m_failure.Keep();
   }
   return done;
 }
@@ -134,7 +133,7 @@ unsigned long Filter::ReadBlock(char* out, unsigned long count) {
 unsigned long Filter::ReadRun(char* out, unsigned long room) {
   WCHAR characters[2048];
   const unsigned long wanted = (std::min)(room / kEscapeLength, static_cast<unsigned long>(std::size(characters)));
-  if (m_pending != nullptr) Take();  // throws
+  m_failure.Throw();
   const WCHAR* at = characters;
   const WCHAR* end = characters + m_in->ReadCharacters(characters, wanted);
   char* to = out;
@@ -172,15 +171,15 @@ unsigned long Filter::Skip(unsigned long count) {
 }
 
 unsigned long Filter::Available() {
-  return static_cast<unsigned long>(m_letters + m_digitCount + (m_next != kNone)) + m_in->Available();
+  return SAddClipped(static_cast<unsigned long>(m_letters + m_digitCount + (m_next != kNone)), m_in->Available());
 }
 
-int Filter::IsEOF() { return !HasPending() && m_pending == nullptr && m_in->IsEOF(); }
+int Filter::IsEOF() { return !HasPending() && !m_failure.IsThere() && m_in->IsEOF(); }
 
 void Filter::Close() {
   m_letters = m_digitCount = 0;
   m_next = kNone;
-  m_pending = nullptr;
+  m_failure.Forget();
   m_in->Close();
 }
 

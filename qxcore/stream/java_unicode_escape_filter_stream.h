@@ -10,18 +10,20 @@
 // the middle of a block, the read gives what it has, and the next one throws.
 #pragma once
 
-#include <exception>
+#include <cstddef>
 
 #include "qxcore/platform/export.h"
+#include "qxcore/stream/inner_stream.h"
 #include "qxcore/stream/input_stream.h"
+#include "qxcore/stream/pending_failure.h"
 #include "qxcore/string/string.h"
 
 class QXCORE_API SJavaUnicodeEscapeFilterStream : public SInputStream {
   QXCORE_DECLARE_CLASS(SJavaUnicodeEscapeFilterStream)
 
   // Reads from `in`, which must stay alive; the second form deletes it at the end when `owns` is set.
-  explicit SJavaUnicodeEscapeFilterStream(SInputStream& in) : m_in(&in), m_owns(false) {}
-  SJavaUnicodeEscapeFilterStream(SInputStream* in, bool owns) : m_in(in), m_owns(owns) {}
+  explicit SJavaUnicodeEscapeFilterStream(SInputStream& in) : m_in(in) {}
+  SJavaUnicodeEscapeFilterStream(SInputStream* in, bool owns) : m_in(in, owns) {}
   SJavaUnicodeEscapeFilterStream(const SJavaUnicodeEscapeFilterStream&) = delete;
   SJavaUnicodeEscapeFilterStream& operator=(const SJavaUnicodeEscapeFilterStream&) = delete;
   ~SJavaUnicodeEscapeFilterStream() override;
@@ -45,6 +47,8 @@ class QXCORE_API SJavaUnicodeEscapeFilterStream : public SInputStream {
   // result is also put into *copy, unless that is null. Throws SEOutOfMemory.
   static SString Unescape(const char* text, SString* copy = nullptr);
   static SString Unescape(const char* begin, const char* end, SString* copy = nullptr);
+  // Without a copy: a null that is spelled out is no end of the text.
+  static SString Unescape(const char* text, std::nullptr_t) { return Unescape(text); }
 
  private:
   static constexpr int kNone = -1;
@@ -56,13 +60,12 @@ class QXCORE_API SJavaUnicodeEscapeFilterStream : public SInputStream {
   unsigned long ReadBlock(char* out, unsigned long count);
   unsigned long ReadRun(char* out, unsigned long room);
 
-  SInputStream* m_in;
-  bool m_owns;
+  SInnerStream<SInputStream> m_in;
   int m_next = kNone;           // the look-ahead character
   int m_letters = 0;            // "u" still to be delivered
   int m_digitCount = 0;         // digits still to be delivered, 0 to 4
   char m_digits[4] = {};        // the first one is next
   const WCHAR* m_at = nullptr;  // characters taken from the inner stream in one go, within a block read
   const WCHAR* m_end = nullptr;
-  std::exception_ptr m_pending;  // what the next read throws
+  SPendingFailure m_failure;
 };

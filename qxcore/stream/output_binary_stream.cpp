@@ -9,9 +9,7 @@
 
 QXCORE_IMPLEMENT_CLASS(SOutputBinaryStream, SObject, 0)
 
-SOutputBinaryStream::~SOutputBinaryStream() {
-  if (m_owns) delete m_out;
-}
+SOutputBinaryStream::~SOutputBinaryStream() = default;
 
 namespace {
 

@@ -15,6 +15,7 @@
 #include "qxcore/container/string_table.h"
 #include "qxcore/core/object.h"
 #include "qxcore/platform/export.h"
+#include "qxcore/stream/inner_stream.h"
 #include "qxcore/stream/output_stream.h"
 
 class QXCORE_API SOutputBinaryStream : public SObject {
@@ -22,8 +23,8 @@ class QXCORE_API SOutputBinaryStream : public SObject {
 
   // Writes to `out`, which must stay alive; the second form deletes it at the end when `owns` is set. Nothing
   // is flushed or closed at the end.
-  explicit SOutputBinaryStream(SOutputStream& out) : m_out(&out), m_owns(false) {}
-  SOutputBinaryStream(SOutputStream* out, bool owns) : m_out(out), m_owns(owns) {}
+  explicit SOutputBinaryStream(SOutputStream& out) : m_out(out) {}
+  SOutputBinaryStream(SOutputStream* out, bool owns) : m_out(out, owns) {}
   SOutputBinaryStream(const SOutputBinaryStream&) = delete;
   SOutputBinaryStream& operator=(const SOutputBinaryStream&) = delete;
   ~SOutputBinaryStream() override;
@@ -32,8 +33,7 @@ class QXCORE_API SOutputBinaryStream : public SObject {
   friend SOutputStream& SGetStream(SOutputBinaryStream& stream) { return *stream.m_out; }
 
  private:
-  SOutputStream* m_out;
-  bool m_owns;
+  SInnerStream<SOutputStream> m_out;
 };
 
 static_assert(sizeof(void*) != 4 || sizeof(SOutputBinaryStream) == 12, "the layout is public");

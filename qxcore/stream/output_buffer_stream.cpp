@@ -10,7 +10,7 @@ SOutputBufferStream::SOutputBufferStream(SOutputStream& out, unsigned long size)
     : SOutputBufferStream(&out, size, false) {}
 
 SOutputBufferStream::SOutputBufferStream(SOutputStream* out, unsigned long size, bool owns)
-    : m_out(out), m_owns(owns), m_capacity(size != 0 ? size : 256) {
+    : m_out(out, owns), m_capacity(size != 0 ? size : 256) {
   m_buffer = static_cast<unsigned char*>(SMemAlloc(m_capacity));
 }
 
@@ -21,7 +21,6 @@ SOutputBufferStream::~SOutputBufferStream() {
     // A destructor has nobody to tell; Flush and Close do.
   }
   SMemFree(m_buffer);
-  if (m_owns) delete m_out;
 }
 
 void SOutputBufferStream::FlushBuffer() {

@@ -1,6 +1,7 @@
 // A filter that gathers small writes into large ones.
 #pragma once
 
+#include "qxcore/stream/inner_stream.h"
 #include "qxcore/stream/output_stream.h"
 
 class QXCORE_API SOutputBufferStream : public SOutputFilterStream {
@@ -29,8 +30,7 @@ class QXCORE_API SOutputBufferStream : public SOutputFilterStream {
   void FlushBuffer();
 
  private:
-  SOutputStream* m_out;
-  bool m_owns;
+  SInnerStream<SOutputStream> m_out;
   unsigned char* m_buffer;
   unsigned long m_capacity;
   unsigned long m_count = 0;  // bytes that wait

@@ -3,10 +3,12 @@
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/core/module_state.h"
 #include "qxcore/platform/internal/utf.h"
+#include "qxcore/stream/encoding/internal/text_encoder.h"
 
 QXCORE_IMPLEMENT_CLASS(SOutputStringStream, SOutputStream, 0)
 
 using Stream = SOutputStringStream;
+using Encoding = Stream::Encoding;
 
 namespace {
 
@@ -17,7 +19,7 @@ constexpr unsigned kFirstRoom = 1024;
 Stream::SOutputStringStream() : SOutputStringStream(nullptr, Support::kUTF16LE, false) {}
 Stream::SOutputStringStream(SOutputStream& out, Encoding format) : SOutputStringStream(&out, format, false) {}
 Stream::SOutputStringStream(SOutputStream* out, Encoding format, bool owns)
-    : m_out(out), m_owns(owns), m_text(kFirstRoom, 2, 1) {
+    : m_out(out, owns), m_encoder(new STextEncoder), m_text(kFirstRoom, 2, 1) {
   SetFormat(format);
 }
 
@@ -27,27 +29,26 @@ Stream::~SOutputStringStream() {
   } catch (...) {
     // A destructor has nobody to tell; Close does.
   }
-  if (m_owns) delete m_out;
 }
 
 void Stream::Begin() {
   if (m_hasBegun) return;
-  m_encoder.WriteMark(*m_out);
+  m_encoder->WriteMark(*m_out);
   m_hasBegun = true;
 }
 
 void Stream::WriteWaiting() {
-  if (m_out == nullptr) return;
+  if (!m_out) return;
   Begin();
   if (m_waitingHalf == 0) return;
   WCHAR half = m_waitingHalf;
   m_waitingHalf = 0;
-  m_encoder.Write(&half, 1, *m_out);
+  m_encoder->Write(&half, 1, *m_out);
 }
 
 unsigned long Stream::Write(const WCHAR* text, unsigned int count) {
   if (text == nullptr || count == 0) return 0;
-  if (m_out == nullptr) {
+  if (!m_out) {
     m_text.Concat(text, text + count);
     return count;
   }
@@ -58,11 +59,11 @@ unsigned long Stream::Write(const WCHAR* text, unsigned int count) {
     const WCHAR pair[2] = {m_waitingHalf, *at};
     bool isPair = platform::IsLowSurrogate(*at);
     m_waitingHalf = 0;
-    m_encoder.Write(pair, isPair ? 2 : 1, *m_out);
+    m_encoder->Write(pair, isPair ? 2 : 1, *m_out);
     if (isPair) ++at;
   }
   if (at != end && platform::IsHighSurrogate(end[-1])) m_waitingHalf = *--end;
-  m_encoder.Write(at, static_cast<std::size_t>(end - at), *m_out);
+  m_encoder->Write(at, static_cast<std::size_t>(end - at), *m_out);
   return count;
 }
 
@@ -85,33 +86,38 @@ unsigned long Stream::WriteLn(const WCHAR* text, unsigned int count) {
 void Stream::WriteLn() { Write(SString::CrLf.GetSafePointer(), 2u); }
 
 void Stream::Flush() {
-  if (m_out == nullptr) return;
+  if (!m_out) return;
   Begin();
   m_out->Flush();
 }
 
 void Stream::Close() {
-  if (m_out == nullptr) return;
+  if (!m_out) return;
   WriteWaiting();
   m_out->Close();
 }
 
 int Stream::GetString(SString* text) const {
   if (text == nullptr) return 0;
-  *text = m_out == nullptr ? SString(m_text) : SString();
-  return m_out == nullptr;
+  *text = !m_out ? SString(m_text) : SString();
+  return !m_out;
 }
 
 void Stream::SetFormat(Encoding format) {
   if (!Support::MachineSupports(format)) throw SEIOInvalidEncoding();
-  m_encoder.Select(format);
+  m_encoder->Select(format);
 }
 
 WCHAR Stream::SetReplacement(WCHAR replacement) {
-  WCHAR former = m_encoder.GetReplacement();
-  m_encoder.SetReplacement(replacement);
+  WCHAR former = m_encoder->GetReplacement();
+  m_encoder->SetReplacement(replacement);
   return former;
 }
+
+Encoding Stream::GetFormat() const { return m_encoder->GetEncoding(); }
+WCHAR Stream::GetReplacement() const { return m_encoder->GetReplacement(); }
+unsigned long long Stream::GetReplacedCount() const { return m_encoder->GetReplaced(); }
+unsigned long long Stream::GetDroppedCount() const { return m_encoder->GetDropped(); }
 
 SString Stream::GetEncodingWarning() const {
   SString warning;

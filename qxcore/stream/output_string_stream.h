@@ -6,11 +6,15 @@
 // come in two calls: its first half waits, until Close at the latest.
 #pragma once
 
+#include <memory>
+
 #include "qxcore/platform/export.h"
-#include "qxcore/stream/encoding/internal/text_encoder.h"
 #include "qxcore/stream/encoding/multi_format_support.h"
+#include "qxcore/stream/inner_stream.h"
 #include "qxcore/stream/output_stream.h"
 #include "qxcore/string/string_buffer.h"
+
+class STextEncoder;
 
 class QXCORE_API SOutputStringStream : public SOutputStream {
   QXCORE_DECLARE_CLASS(SOutputStringStream)
@@ -51,23 +55,22 @@ class QXCORE_API SOutputStringStream : public SOutputStream {
   // The format of what follows. A mark stands only at the very beginning. Throws SEIOInvalidEncoding when
   // the machine does not support it.
   void SetFormat(Encoding format);
-  Encoding GetFormat() const { return m_encoder.GetEncoding(); }
+  Encoding GetFormat() const;
   // What stands for characters that cannot be mapped; 0 drops them. Gives the former one.
   WCHAR SetReplacement(WCHAR replacement);
-  WCHAR GetReplacement() const { return m_encoder.GetReplacement(); }
+  WCHAR GetReplacement() const;
   // That characters were replaced or dropped; empty while none was.
   SString GetEncodingWarning() const;
-  unsigned long long GetReplacedCount() const { return m_encoder.GetReplaced(); }
-  unsigned long long GetDroppedCount() const { return m_encoder.GetDropped(); }
+  unsigned long long GetReplacedCount() const;
+  unsigned long long GetDroppedCount() const;
 
  private:
   void Begin();
   void WriteWaiting();
 
-  SOutputStream* m_out;
-  bool m_owns;
+  SInnerStream<SOutputStream> m_out;
   bool m_hasBegun = false;
   WCHAR m_waitingHalf = 0;  // the first half of a surrogate pair
-  STextEncoder m_encoder;
+  std::unique_ptr<STextEncoder> m_encoder;
   SStringBuffer m_text;
 };

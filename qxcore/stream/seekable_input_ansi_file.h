@@ -21,6 +21,8 @@ class QXCORE_API SSeekableInputANSIFile : public SInputStream,
   int IsEOF() override { return IsAtEnd(); }
   void Close() override { CloseFile(); }
   int GetError() const override { return m_error; }
+  bool GetPlace(std::uint64_t* place) override { return GetFilePlace(place); }
+  bool GoToPlace(std::uint64_t place) override { return GoToFilePlace(place); }
 
   // The next character of the ANSI code page, its default character for what is none; or -1.
   int ReadChar() override;

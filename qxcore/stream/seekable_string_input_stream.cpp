@@ -6,11 +6,9 @@
 
 QXCORE_IMPLEMENT_CLASS(SSeekableStringInputStream, SInputStream, 0)
 
-SSeekableStringInputStream::SSeekableStringInputStream(Reader& reader) : m_reader(&reader), m_owns(false) {}
-SSeekableStringInputStream::SSeekableStringInputStream(Reader* reader, bool owns) : m_reader(reader), m_owns(owns) {}
-SSeekableStringInputStream::~SSeekableStringInputStream() {
-  if (m_owns) delete m_reader;
-}
+SSeekableStringInputStream::SSeekableStringInputStream(Reader& reader) : m_reader(reader) {}
+SSeekableStringInputStream::SSeekableStringInputStream(Reader* reader, bool owns) : m_reader(reader, owns) {}
+SSeekableStringInputStream::~SSeekableStringInputStream() = default;
 
 unsigned long SSeekableStringInputStream::Read(void* buffer, unsigned long count) {
   unsigned char* out = static_cast<unsigned char*>(buffer);

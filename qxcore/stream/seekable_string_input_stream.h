@@ -4,6 +4,7 @@
 // reads bytes of whole characters.
 #pragma once
 
+#include "qxcore/stream/inner_stream.h"
 #include "qxcore/stream/input_stream.h"
 #include "qxcore/stream/seekable_char_reader.h"
 
@@ -34,8 +35,7 @@ class QXCORE_API SSeekableStringInputStream : public SInputStream {
   void Reset() override;
 
  private:
-  Reader* m_reader;
-  bool m_owns;
+  SInnerStream<Reader> m_reader;
   bool m_hasMark = false;
   unsigned long m_mark = 0;
 };

@@ -247,9 +247,13 @@ TEST(RealFiles, AllocationFailures) {
         SInputPushbackStream pushback(buffered, 20);
         buffered.Mark(2000);
         pushback.Mark(0);
-        EXPECT_EQ(buffered.Skip(1500), 1500u);
+        // What fails behind something that was skipped fails the next time.
+        unsigned long skipped = 0;
+        while (skipped < 1500) skipped += buffered.Skip(1500 - skipped);
         pushback.Reset();
-        EXPECT_EQ(pushback.Skip(10000), 3005u);
+        skipped = 0;
+        while (const unsigned long more = pushback.Skip(10000)) skipped += more;
+        EXPECT_EQ(skipped, 3005u);
       },
       [] {});
   EXPECT_GE(failures, 10);

@@ -22,6 +22,17 @@ using namespace std::string_literals;
 
 namespace {
 
+TEST(InputBuffer, TakesSizesOfEveryIntegerType) {
+  const char bytes[] = "0123456789";
+  const auto available = [&](auto size) { return SInputBuffer(bytes, size).Available(); };
+  EXPECT_EQ(available(sizeof bytes), sizeof bytes);
+  EXPECT_EQ(available(5), 5u);
+  EXPECT_EQ(available(5u), 5u);
+  EXPECT_EQ(available(5L), 5u);
+  EXPECT_EQ(available(std::ptrdiff_t{-1}), 0u);
+  EXPECT_EQ(available(short{3}), 3u);
+}
+
 std::string Pattern(std::size_t size) {
   std::string bytes(size, 0);
   for (std::size_t i = 0; i < size; ++i) bytes[i] = static_cast<char>(i * 7 + i / 251);

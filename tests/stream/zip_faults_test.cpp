@@ -61,12 +61,11 @@ TEST(ZipFaults, AFailedReadNeverPassesAsTheEnd) {
     } catch (const SException&) {
       thrown = true;
     }
-    EXPECT_EQ(thrown, zip.GetError() != 0) << n;
-    if (!thrown) {
-      EXPECT_EQ(entries, 3);
-      break;
-    }
-    ++failures;
+    // A failure behind the last entry, in what is read ahead, does no harm.
+    EXPECT_TRUE(thrown || entries == 3) << n;
+    EXPECT_TRUE(!thrown || zip.GetError() != 0) << n;
+    if (zip.GetError() == 0) break;
+    if (thrown) ++failures;
   }
   EXPECT_GT(failures, 50);
 }

@@ -2,83 +2,111 @@
 
 #include <algorithm>
 #include <cstring>
+#include <limits>
 
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/core/memory.h"
+#include "qxcore/stream/encoding/internal/data_affinity.h"
+#include "qxcore/stream/encoding/internal/reader_state.h"
+#include "qxcore/stream/internal/add_clipped.h"
 
 QXCORE_IMPLEMENT_CLASS(SMultiFormatReaderBase, SInputStream, 0)
 
 using Reader = SMultiFormatReaderBase;
 using Encoding = SMultiFormatReaderStatusBase::Encoding;
+using State = SFormatChoice::State;
 
 namespace {
 
 constexpr unsigned long kQuickSample = 4096;
 constexpr unsigned long kFairSample = 16384;
 constexpr unsigned long kLongestInput = 0x7FFFFFFF;
+constexpr unsigned long kKeptInput = 0x1000000;  // of an input that can be read again
 constexpr unsigned long kRawBlock = 65536;
 constexpr unsigned long kTextRun = 8192;      // characters decoded at a time
 constexpr unsigned long kLeastDirect = 1024;  // room from which on the caller's buffer is decoded to
 constexpr unsigned long kLeastDetected = 3;
-constexpr unsigned long kLeastXML = 11;
 constexpr unsigned long kDefaultMarkLimit = 8192;
-constexpr int kXMLLength = 5;
 
-bool StartsWithXML(const unsigned char* at, std::size_t unit, std::size_t significant) {
-  constexpr char kXMLStart[] = "<?xml";
-  for (int i = 0; i < kXMLLength; ++i) {
-    for (std::size_t byte = 0; byte < unit; ++byte) {
-      unsigned char expected = byte == significant ? static_cast<unsigned char>(kXMLStart[i]) : 0;
-      if (*at++ != expected) return false;
-    }
-  }
-  return true;
+bool Detects(Encoding requested) {
+  const Encoding level = requested & SAbstractIO::SMultiFormatSupport::kLevelMask;
+  using Support = SAbstractIO::SMultiFormatSupport;
+  return (level & Support::kWholeInOnce) != 0 || level == Support::kQuickDetect || level == Support::kDetect;
 }
 
 }  // namespace
 
+// Lets derived readers score and choose.
+class SMultiFormatReaderBase::Scorer final : public SFormatScorer {
+ public:
+  Scorer(Reader& reader, const SFormatSample& sample) : m_reader(reader), m_sample(sample) {}
+
+  Encoding ScoreSample(const unsigned char* begin, const unsigned char* end, SDetectionCounters& counters,
+                       unsigned short codePage) override {
+    return m_reader.DataAffinity(begin, end, counters.ascii, counters.utf8, counters.active, counters.utf16,
+                                 counters.littleZeros, counters.bigZeros, counters.specified, codePage);
+  }
+
+  bool ScoreRest(SDetectionCounters& counters, unsigned short codePage) override {
+    return m_reader.ScoreRest(m_sample.end, counters, codePage);
+  }
+
+  SEncodingGuess Choose(const SDetectionCounters& counters, bool isComplete) override {
+    m_reader.m_state->isComplete = isComplete;
+    SEncodingGuess& made = m_reader.m_state->guess;
+    made = SEncodingGuess();
+    const Encoding selected =
+        m_reader.GuessEncoding(m_reader.m_requested, counters.ascii, counters.utf8, counters.active, counters.utf16,
+                               counters.littleZeros, counters.bigZeros, counters.specified);
+    if (made.selected == selected) return made;
+    SEncodingGuess other;  // a derived class chose by itself
+    other.selected = selected;
+    return other;
+  }
+
+ private:
+  Reader& m_reader;
+  const SFormatSample& m_sample;
+};
+
 Reader::SMultiFormatReaderBase(SInputStream& in, Encoding requested)
-    : SMultiFormatReaderStatusBase(requested), m_in(&in), m_owns(false) {}
+    : SMultiFormatReaderStatusBase(requested), m_in(in) {}
 
 Reader::SMultiFormatReaderBase(SInputStream* in, Encoding requested, bool owns)
-    : SMultiFormatReaderStatusBase(requested), m_in(in), m_owns(owns) {}
+    : SMultiFormatReaderStatusBase(requested), m_in(in, owns) {}
 
-Reader::~SMultiFormatReaderBase() {
-  FreeBuffer(m_text);
-  if (m_owns) delete m_in;
-}
+Reader::~SMultiFormatReaderBase() { FreeBuffer(m_text); }
 
 // --- raw data ---
 
 unsigned long Reader::ReadRawData(unsigned char* buffer, unsigned long count) {
+  const unsigned long got = m_in->Read(buffer, count);
+  return got <= count ? got : 0;  // all ones: the source failed
+}
+
+unsigned long Reader::GetMoreRawData(BufferStatus& buffer, unsigned long count) {
+  AllocRawData(buffer, buffer.Size() + count);
   unsigned long done = 0;
   while (done < count) {
-    unsigned long got = m_in->Read(buffer + done, count - done);
-    if (got == 0 || got > count - done) break;  // all ones: the source failed
+    const unsigned long got = ReadRawData(buffer.end, count - done);
+    if (got == 0) {
+      m_state->raw.SetAtEnd();
+      break;
+    }
+    buffer.end += got;
     done += got;
   }
   return done;
 }
 
-unsigned long Reader::GetMoreRawData(BufferStatus& buffer, unsigned long count) {
-  AllocRawData(buffer, buffer.Size() + count);
-  unsigned long got = ReadRawData(buffer.end, count);
-  buffer.end += got;
-  if (got < count) m_status |= kWholeInput;
-  return got;
-}
-
-// Raw data before the current run is gone for good, unless a mark holds it.
+// Raw data before the current run is gone for good, unless a mark holds it, or a byte order mark may still be asked
+// for.
 void Reader::DropConsumedRaw() {
-  unsigned long position = RawOffset();
-  if (m_hasMark && position - m_mark.runOffset > std::min(m_markLimit, kLongestInput) + kRawBlock) m_hasMark = false;
-  unsigned long dropped = m_hasMark ? m_mark.runOffset : position;
-  if (!m_hasDelivered) dropped = 0;  // a byte order mark may still be asked for
-  if (dropped == 0) return;
-  std::memmove(m_raw.block, m_raw.block + dropped, static_cast<std::size_t>(m_raw.end - m_raw.block) - dropped);
-  m_raw.start -= dropped;
-  m_raw.end -= dropped;
-  m_run.runOffset = RawOffset();
-  m_mark.runOffset -= m_hasMark ? dropped : 0;
+  SRawInput& raw = m_state->raw;
+  const std::uint64_t position = raw.Position();
+  if (m_hasMark && position - m_mark.run > std::min(m_markLimit, kLongestInput) + kRawBlock) m_hasMark = false;
+  const bool maySniffAgain = m_delivered == 0 && raw.HasBeginning() && position <= kRawBlock;
+  if (!maySniffAgain) raw.DropBefore(m_hasMark ? std::min(m_mark.run, position) : position);
 }
 
 // What lies in memory as a whole need not be copied.
@@ -86,18 +114,17 @@ bool Reader::TakeRestInPlace() {
   unsigned long size = 0;
   const void* rest = m_in->TakeRest(&size);
   if (rest == nullptr) return false;
-  m_raw.block = m_raw.start = const_cast<unsigned char*>(static_cast<const unsigned char*>(rest));  // never written
-  m_raw.end = m_raw.start + size;
-  m_raw.capacity = 0;
-  m_status |= kWholeInput;
+  m_state->raw.Borrow(rest, size);
   return true;
 }
 
-void Reader::ReadWholeInput() {
-  if (m_raw.block == nullptr && TakeRestInPlace()) return;
-  while ((m_status & kWholeInput) == 0 && m_raw.Size() < kLongestInput) {
-    unsigned long expected = std::max(m_in->Available(), kRawBlock - 1) + 1;
-    GetMoreRawData(m_raw, std::min(expected, kLongestInput - m_raw.Size()));
+void Reader::ReadWholeInput(unsigned long most) {
+  SRawInput& raw = m_state->raw;
+  if (raw.IsAtEnd() || (m_raw.block == nullptr && TakeRestInPlace())) return;
+  while (!raw.IsAtEnd() && m_raw.Size() < most) {
+    // What a source says of itself is no reason to take all that memory at once.
+    const unsigned long expected = std::clamp(m_in->Available(), kRawBlock - 1, kKeptInput) + 1;
+    GetMoreRawData(m_raw, std::min(expected, most - m_raw.Size()));
   }
 }
 
@@ -105,323 +132,284 @@ void Reader::ReadWholeInput() {
 void Reader::CompleteCutSequence() {
   const unsigned char* end = m_raw.end;
   unsigned long back = 1;
-  while (back < std::min(m_raw.Size(), 3ul) && (end[-static_cast<long>(back)] & 0xC0) == 0x80) ++back;
-  if (m_raw.Size() == 0 || (m_status & kWholeInput) != 0) return;
+  while (back < std::min(m_raw.Size(), 4ul) && (end[-static_cast<long>(back)] & 0xC0) == 0x80) ++back;
+  if (m_raw.Size() == 0 || m_state->raw.IsAtEnd()) return;
   unsigned char lead = end[-static_cast<long>(back)];
-  unsigned long needed = lead >= 0xE0 && lead < 0xF0 ? 3 : lead >= 0xC0 && lead < 0xE0 ? 2 : 1;
+  unsigned long needed = lead >= 0xF0   ? ((m_requested & Support::kFullUnicode) != 0 ? 4 : 1)
+                         : lead >= 0xE0 ? 3
+                         : lead >= 0xC0 ? 2
+                                        : 1;
   if (needed > back) GetMoreRawData(m_raw, needed - back);
 }
 
-// The first step of a check; true when encodings are to be detected.
-bool Reader::FillSample() {
+// Reads what the level orders, or what follows a provisional choice; after SetFormat the data that is there is enough.
+void Reader::FillSample() {
+  const bool isAgain = m_state->choice.state == State::kProvisional;
+  if (m_isFilled && m_raw.Size() > 0) return;
   const Encoding level = m_requested & Support::kLevelMask;
-  const bool detects =
-      (level & Support::kWholeInOnce) != 0 || level == Support::kQuickDetect || level == Support::kDetect;
-  if ((m_status & kRawPresent) != 0) {
-    m_status &= ~kRawPresent;
-    // Later data of an input that was long enough for detection is detected, however little is left of it.
-    bool isAgain = (m_status & kProvisional) != 0 && m_hasDelivered;
-    return detects && (isAgain || m_raw.Size() >= kLeastDetected);
-  }
-  if ((level & Support::kWholeInOnce) != 0) {
-    ReadWholeInput();
+  if ((level & Support::kWholeInOnce) != 0 && !isAgain) {
+    std::uint64_t place;
+    ReadWholeInput(m_in->GetPlace(&place) ? kKeptInput : kLongestInput);
   } else {
-    GetMoreRawData(m_raw, level == Support::kDetect ? kFairSample : kQuickSample);
-    if (detects) CompleteCutSequence();
+    const unsigned long wanted = level == Support::kDetect ? kFairSample : kQuickSample;
+    if (m_raw.Size() < wanted && !m_state->raw.IsAtEnd()) GetMoreRawData(m_raw, wanted - m_raw.Size());
+    if (Detects(m_requested)) CompleteCutSequence();
   }
-  return detects && m_raw.Size() >= kLeastDetected;
+  m_isFilled = true;
 }
 
 // --- the check of the format ---
 
+bool Reader::NeedsCheck() const {
+  const State state = m_state->choice.state;
+  return state == State::kNone || state == State::kFailed || (state == State::kProvisional && !m_isFilled);
+}
+
+bool Reader::IsAtBeginning() const { return m_delivered == 0 && m_state->raw.Position() == 0; }
+
 void Reader::CheckFormat() {
-  if (!m_needsCheck) return;
-  const unsigned long skippedBefore = m_skippedMark;
-  try {
-    SelectFormat(FillSample());
-  } catch (...) {
-    // What was read stays, from its very beginning, for the next check.
-    m_raw.start -= m_skippedMark - skippedBefore;
-    m_skippedMark = skippedBefore;
-    if (m_raw.Size() > 0) m_status |= kRawPresent;
-    throw;
-  }
-  m_decoder.Select(m_selected, m_quickUTF8 != 0);
-  m_run = {RawOffset(), 0, m_decoder};
-  m_needsCheck = false;
-}
-
-void Reader::SelectFormat(bool detects) {
-  const bool isBeginning = !m_hasDelivered;
-  m_hasFailed = false;
-  try {
-    if (isBeginning && (m_status & kSelected) == 0) m_selected = m_requested;
-    const bool needsMark = isBeginning && Support::IsUnicode(m_requested) && (m_requested & Support::kRequiredBOM) != 0;
-    if (detects || needsMark) {
-      Encoding sniffed = isBeginning ? SniffMark() : 0;
-      if (detects && isBeginning) sniffed = SniffXML(sniffed);
-      if (needsMark && (sniffed & Support::kOptionalBOM) == 0) throw SEIONoUnicodeBOM();
-      if (detects) {
-        Detect(sniffed);
-      } else if (!Support::IsSameFormat(sniffed, m_selected)) {
-        throw SEIOMismatchedBOM();
-      }
-    } else if (isBeginning) {
-      DropOwnMark();
-    }
-    CheckSelection();
-    if ((m_status & kProvisional) == 0) m_status |= kSelected;
-  } catch (const SEEncodingException&) {
-    m_selected = 0;
-    m_status &= ~(kSelected | kProvisional);
-    m_hasFailed = detects;
-    throw;
-  }
-}
-
-Encoding Reader::SniffMark() {
-  const unsigned char* at = m_raw.start;
-  const unsigned long size = m_raw.Size();
-  Encoding found = 0;
-  unsigned long length = 0;
-  if (size >= 3 && at[0] == 0xEF && at[1] == 0xBB && at[2] == 0xBF) {
-    found = Support::kUTF8;
-    length = 3;
-  } else if (size >= 2 && at[0] == 0xFE && at[1] == 0xFF) {
-    found = Support::kUTF16BE;
-    length = 2;
-  } else if (size >= 2 && at[0] == 0xFF && at[1] == 0xFE) {
-    found = Support::kUTF16LE;
-    length = 2;
-  }
-  m_raw.start += length;
-  m_skippedMark += length;
-  return found != 0 ? found | Support::kOptionalBOM : 0;
-}
-
-// With no detection and an optional mark, a mark of the format itself is dropped; any other is data.
-void Reader::DropOwnMark() {
-  if (!Support::IsUnicode(m_selected) || (m_selected & Support::kOptionalBOM) == 0) return;
-  Encoding found = SniffMark();
-  if (found == 0 || Support::IsSameFormat(found, m_selected)) return;
-  m_raw.start -= m_skippedMark;
-  m_skippedMark = 0;
-}
-
-Encoding Reader::SniffXML(Encoding sniffed) {
-  if (m_raw.Size() + m_skippedMark < kLeastXML) return sniffed;
-  const unsigned char* at = m_raw.start;
-  if (StartsWithXML(at, 1, 0)) {  // eight bytes at least stand behind any mark
-    if (sniffed != 0) return sniffed | Support::kXML;
-    m_status |= kProvisional;
-    return Support::kXML | Support::kASCII;
-  }
-  if (m_raw.Size() < 2 * kXMLLength) return sniffed;
-  const struct {
-    std::size_t significant;
-    Encoding format;
-  } kOrders[] = {{0, Support::kUTF16LE}, {1, Support::kUTF16BE}};
-  for (const auto& order : kOrders) {
-    if (!StartsWithXML(at, 2, order.significant)) continue;
-    if (sniffed == 0) return Support::kXML | order.format;
-    if (Support::IsSameFormat(sniffed, order.format)) return sniffed | Support::kXML;
-  }
-  return sniffed;
-}
-
-void Reader::Detect(Encoding sniffed) {
-  const Encoding policy = m_requested & Support::kFlagsMask;
-  const bool isFirst = (m_status & kSelected) == 0;
-  const bool isXML8 = (sniffed & Support::kXML) != 0 && Support::KindOf(sniffed) == Support::kASCII;
-  if (sniffed != 0 && (m_status & kProvisional) == 0) {
-    m_selected = isFirst ? policy | sniffed : m_selected | (sniffed & Support::kXML);
+  if (!NeedsCheck()) return;
+  SReaderState& state = *m_state;
+  const bool isAgain = state.choice.state == State::kProvisional;
+  FillSample();
+  if (isAgain && m_raw.Size() == 0) {  // the whole input was ASCII
+    state.choice.state = State::kFinal;
     return;
   }
-  const Encoding xml = (sniffed | m_selected) & Support::kXML;
-  const bool isHalf = (m_status & kWholeInput) != 0 && m_raw.Size() % 2 != 0;
-  m_affinity = SDataAffinity();
-  if (isHalf || isXML8) m_affinity.utf16 = m_affinity.littleZeros = m_affinity.bigZeros = SDataAffinity::kRejected;
-  const unsigned page = Support::IsANSI(m_requested) ? m_requested & Support::kCodePageMask : 0;
-  if (page != 0) m_affinity.specified = 0;
+  SFormatSample sample;
+  sample.begin = m_raw.start;
+  sample.end = m_raw.end;
+  sample.isBeginning = IsAtBeginning();
+  sample.isWhole = state.raw.IsAtEnd();
+  // Later data of an input that was long enough for detection is detected, however little is left of it.
+  sample.detects = Detects(m_requested) && (isAgain || m_raw.Size() >= kLeastDetected);
+  const bool scansOn = sample.detects && !sample.isWhole && (m_requested & Support::kWholeInOnce) != 0;
+  if (scansOn) sample.end = SEndOfPiece(sample.begin, sample.end);
 
-  const unsigned char* sampleEnd = m_raw.start + std::min(m_raw.Size(), kQuickSample);
-  Encoding result = DataAffinity(m_raw.start, sampleEnd, m_affinity, page);
-  const unsigned char* wholeEnd = m_raw.start + std::min(m_raw.Size(), kLongestInput);  // the platform counts in an int
-  if (result == 0 && sampleEnd != wholeEnd) result = DataAffinity(m_raw.start, wholeEnd, m_affinity, page);
-  if (result != 0) {
-    if (Support::KindOf(result) != Support::kASCII) m_status &= ~kProvisional;
-    m_guess = SEncodingGuess();
-    result |= policy;
-  } else {
-    m_guess = GuessEncoding(m_requested, m_affinity);
-    result = m_guess.selected;
-    m_status = m_guess.isProvisional ? m_status | kProvisional : m_status & ~kProvisional;
-    if (m_guess.needsWarning) m_status |= kWarning;
+  Scorer scorer(*this, sample);
+  const SFormatChoice choice = SCheckFormat(m_requested, sample, state.choice, scorer);
+  if (choice.state == State::kFailed) {
+    state.choice = choice;
+    ThrowFailure();
   }
-  m_selected = isFirst ? result | xml : m_selected | xml;
+  STextDecoder decoder = state.decoder;
+  decoder.Select(choice.selected, m_quickUTF8 != 0);
+  state.decoder = decoder;
+  state.choice = choice;
+  m_raw.start += choice.markLength;
 }
 
-Encoding Reader::DataAffinity(const unsigned char* begin, const unsigned char* end, SDataAffinity& affinity,
-                              unsigned int codePage) {
-  return affinity.Scan(begin, end, codePage);
-}
-
-SEncodingGuess Reader::GuessEncoding(Encoding requested, const SDataAffinity& affinity) {
-  bool isComplete = (m_status & kWholeInput) != 0 && (requested & Support::kLevelMask) != 0;
-  return SEncodingGuess::Make(requested, affinity, isComplete);
-}
-
-void Reader::CheckSelection() const {
-  switch (Support::KindOf(m_selected)) {
-    case 0:
-      throw SEIODetectFailed();
-    case Support::kASCII:
-    case Support::kOEM:
-      return;
-    case Support::kUnicode:
-      if (!Support::MachineSupports(m_selected)) throw SEEncodingException();
-      return;
+void Reader::ThrowFailure() const {
+  using Failure = SFormatChoice::Failure;
+  switch (m_state->choice.failure) {
+    case Failure::kNoMark:
+      throw SEIONoUnicodeBOM();
+    case Failure::kMismatchedMark:
+      throw SEIOMismatchedBOM();
+    case Failure::kUnsupportedPage:
+      throw SEIOInvalidEncoding();
+    case Failure::kNoForm:
+      throw SEEncodingException();
     default:
-      if (!Support::MachineSupports(m_selected)) throw SEIOInvalidEncoding();
+      throw SEIODetectFailed();
   }
+}
+
+Encoding Reader::DataAffinity(const unsigned char* begin, const unsigned char* end, std::int32_t& ascii,
+                              std::int32_t& utf8, std::int32_t& active, std::int32_t& utf16, std::int32_t& littleZeros,
+                              std::int32_t& bigZeros, std::int32_t& specified, unsigned short codePage) {
+  SDetectionCounters counters{ascii, utf8, active, utf16, littleZeros, bigZeros, specified};
+  const auto rules = (m_requested & Support::kFullUnicode) != 0 ? SUnicodeRules::kFull : SUnicodeRules::kBasic;
+  const Encoding settled = SScanAffinity(begin, end, counters, codePage, rules);
+  ascii = counters.ascii;
+  utf8 = counters.utf8;
+  active = counters.active;
+  utf16 = counters.utf16;
+  littleZeros = counters.littleZeros;
+  bigZeros = counters.bigZeros;
+  specified = counters.specified;
+  return settled;
+}
+
+Encoding Reader::GuessEncoding(Encoding requested, std::int32_t ascii, std::int32_t utf8, std::int32_t active,
+                               std::int32_t utf16, std::int32_t littleZeros, std::int32_t bigZeros,
+                               std::int32_t specified) {
+  const SDetectionCounters counters{ascii, utf8, active, utf16, littleZeros, bigZeros, specified};
+  m_state->guess = SEncodingGuess::Make(requested, counters, m_state->isComplete);
+  return m_state->guess.selected;
+}
+
+// Looks at an input that is too long to keep, from `begin` in the raw data to its end, and goes back. True when that
+// was possible, so that the evidence is that of the whole input.
+bool Reader::ScoreRest(const unsigned char* begin, SDetectionCounters& counters, unsigned short codePage) {
+  std::uint64_t place;
+  if ((m_requested & Support::kWholeInOnce) == 0 || !m_in->GetPlace(&place)) return false;
+  try {
+    ScorePieces(begin, counters, codePage);
+  } catch (...) {
+    m_in->GoToPlace(place);
+    throw;
+  }
+  if (!m_in->GoToPlace(place)) throw SEIOException();
+  return true;
+}
+
+void Reader::ScorePieces(const unsigned char* begin, SDetectionCounters& counters, unsigned short codePage) {
+  constexpr unsigned long kPiece = 0x400000;
+  struct Block {
+    BufferStatus bytes;
+    ~Block() { FreeBuffer(bytes); }
+  } piece;
+  AllocRawData(piece.bytes, kPiece);
+  unsigned char* const start = piece.bytes.block;
+  unsigned long held = static_cast<unsigned long>(m_raw.end - begin);
+  std::memcpy(start, begin, held);
+  std::uint64_t total = static_cast<std::uint64_t>(begin - m_raw.start);
+  SAffinitySum sum(counters);
+  for (bool isLast = false; !isLast;) {
+    while (held < kPiece && !isLast) {
+      const unsigned long got = ReadRawData(start + held, kPiece - held);
+      held += got;
+      isLast = got == 0;
+    }
+    const unsigned char* end = isLast ? start + held : SEndOfPiece(start, start + held);
+    SDetectionCounters fresh = sum.Fresh();
+    DataAffinity(start, end, fresh.ascii, fresh.utf8, fresh.active, fresh.utf16, fresh.littleZeros, fresh.bigZeros,
+                 fresh.specified, codePage);
+    sum.Add(fresh);
+    total += static_cast<std::uint64_t>(end - start);
+    held -= static_cast<unsigned long>(end - start);
+    std::memmove(start, end, held);
+  }
+  if (total % 2 != 0) {  // odd lengths are no 16-bit text
+    SDetectionCounters rejected = sum.Fresh();
+    rejected.utf16 = rejected.littleZeros = rejected.bigZeros = SDetectionCounters::kRejected;
+    sum.Add(rejected);
+  }
+  counters = sum.Total();
 }
 
 void Reader::SetFormat(Encoding requested) {
-  GoTo(CurrentPosition());
+  // With the decoder that the text was read with, as long as there is one.
+  Position current = CurrentPosition();
+  Settle(current);
+  if (m_hasMark) Settle(m_mark);
+  ClearText();
+  if (m_delivered == 0 && m_state->raw.HasBeginning()) current = Position();
+  GoTo(current);
   m_requested = requested;
-  m_needsCheck = true;
-  m_status &= kWholeInput;
-  if (!m_hasDelivered) {
-    m_raw.start -= m_skippedMark;
-    m_skippedMark = 0;
-    m_decoder.ForgetLosses();
-  }
-  if (m_raw.Size() > 0) m_status |= kRawPresent;
-  m_guess = SEncodingGuess();
-  if (m_hasDelivered) m_selected = requested;
+  m_state->choice = SFormatChoice();
 }
 
 // --- decoding ---
 
 void Reader::ReadMoreRaw() {
-  const bool isProvisional = (m_status & kProvisional) != 0;
-  const bool isFair = (m_requested & Support::kLevelMask) == Support::kDetect;
   DropConsumedRaw();
-  unsigned long got = GetMoreRawData(m_raw, !isProvisional ? kRawBlock : isFair ? kFairSample : kQuickSample);
-  m_isCut = false;
-  if (!isProvisional) return;
-  if (got == 0) {  // the whole input was ASCII
-    m_status = (m_status & ~kProvisional) | kSelected;
-    return;
+  if (m_state->choice.state == State::kProvisional) {
+    m_isFilled = false;
+    CheckFormat();
+  } else {
+    GetMoreRawData(m_raw, kRawBlock);
   }
-  m_status |= kRawPresent;
-  m_needsCheck = true;
-  CompleteCutSequence();
 }
 
-// Decodes up to `room` characters, at least one unless the data is at its end.
+// Decodes up to `room` characters, at least one; 0 at the end of the data, and when the format turns out to be one
+// that must be decoded as a whole.
 unsigned long Reader::DecodePiece(WCHAR* out, unsigned long room) {
+  SReaderState& state = *m_state;
   for (;;) {
     CheckFormat();
-    if (m_raw.Size() == 0 || m_isCut) {
-      if ((m_status & kWholeInput) != 0 && m_raw.Size() == 0) return 0;
-      if ((m_status & kWholeInput) == 0) {
-        ReadMoreRaw();
-        continue;
-      }
+    if (state.decoder.NeedsWholeInput()) return 0;
+    if (m_raw.Size() > 0) {
+      m_run = PositionOfRaw();
+      const STextDecoder::Run run = state.decoder.Decode(m_raw.start, m_raw.end, state.raw.IsAtEnd(), out, room);
+      const bool moved = run.in != m_raw.start;
+      m_raw.start += run.in - m_raw.start;
+      if (run.out != out) return static_cast<unsigned long>(run.out - out);
+      if (run.isLoss) state.decoder.ThrowLoss();
+      if (moved) continue;  // everything was dropped
     }
-    const unsigned long piece = std::min(m_raw.Size(), room);
-    const bool isLast = (m_status & kWholeInput) != 0 && piece == m_raw.Size();
-    m_run = {RawOffset(), 0, m_decoder};
-    STextDecoder::Run run = m_decoder.Decode(m_raw.start, m_raw.start + piece, isLast, out);
-    const bool moved = run.in != m_raw.start;
-    m_raw.start += run.in - m_raw.start;
-    if (run.out != out) return static_cast<unsigned long>(run.out - out);
-    if (run.isLoss) m_decoder.ThrowLoss();
-    m_isCut = !moved;
+    if (state.raw.IsAtEnd()) return 0;
+    ReadMoreRaw();
   }
+}
+
+// The same for all that is left, into the text buffer.
+unsigned long Reader::DecodeWhole() {
+  SReaderState& state = *m_state;
+  ReadWholeInput(kLongestInput);
+  if (!state.raw.IsAtEnd() || m_raw.Size() > kLongestInput) throw SEOutOfMemory();  // more than the platform converts
+  if (m_raw.Size() == 0) return 0;
+  AllocStrData(m_text, m_raw.Size() * static_cast<unsigned long>(sizeof(WCHAR)));
+  m_run = PositionOfRaw();
+  WCHAR* out = reinterpret_cast<WCHAR*>(m_text.block);
+  const STextDecoder::Run run = state.decoder.Decode(m_raw.start, m_raw.end, true, out, m_raw.Size());
+  if (run.isLoss) state.decoder.ThrowLoss();
+  m_raw.start = m_raw.end;
+  return static_cast<unsigned long>(run.out - out);
 }
 
 bool Reader::DecodeNextRun() {
-  CheckFormat();
-  if (m_decoder.NeedsWholeInput()) {
-    ReadWholeInput();
-    const bool isWhole = (m_status & kWholeInput) != 0 && m_raw.Size() <= kLongestInput;
-    if (!isWhole) throw SEOutOfMemory();  // more than the platform converts at once
-  }
-  const unsigned long room = m_decoder.NeedsWholeInput() ? std::max(m_raw.Size(), 1ul) : kTextRun;
-  m_text.start = m_text.end = m_text.block;
-  AllocStrData(m_text, room * sizeof(WCHAR));
-  unsigned long characters = DecodePiece(reinterpret_cast<WCHAR*>(m_text.block), room);
+  ClearText();
+  AllocStrData(m_text, kTextRun * static_cast<unsigned long>(sizeof(WCHAR)));
+  unsigned long characters = DecodePiece(reinterpret_cast<WCHAR*>(m_text.block), kTextRun);
+  if (characters == 0 && m_state->decoder.NeedsWholeInput()) characters = DecodeWhole();
   m_text.end = m_text.start + characters * sizeof(WCHAR);
   return characters > 0;
 }
 
 unsigned long Reader::DecodeInto(WCHAR* out, unsigned long room) {
-  CheckFormat();
-  if (room < kLeastDirect || m_decoder.NeedsWholeInput()) {
-    if (!DecodeNextRun()) return 0;
-    unsigned long count = std::min(room, TextLength());
-    std::memcpy(out, m_text.start, count * sizeof(WCHAR));
-    Deliver(count);
-    return count;
+  if (room >= kLeastDirect) {
+    ClearText();
+    if (const unsigned long count = DecodePiece(out, room)) {
+      m_delivered += count;
+      return count;
+    }
+    if (!m_state->decoder.NeedsWholeInput()) return 0;
   }
-  unsigned long count = DecodePiece(out, room);
-  m_run = {RawOffset(), 0, m_decoder};
-  m_hasDelivered = m_hasDelivered || count > 0;
-  m_delivered += count;
+  if (!DecodeNextRun()) return 0;
+  const unsigned long count = std::min(room, TextLength());
+  std::memcpy(out, m_text.start, count * sizeof(WCHAR));
+  Deliver(count);
   return count;
 }
 
 // --- positions ---
 
+Reader::Position Reader::PositionOfRaw() const {
+  const STextDecoder::Losses& losses = m_state->decoder.GetLosses();
+  return {m_state->raw.Position(), 0, losses.replaced, losses.dropped};
+}
+
 Reader::Position Reader::CurrentPosition() const {
+  if (TextLength() == 0) return PositionOfRaw();
   Position position = m_run;
-  if (TextLength() > 0) {
-    position.delivered = static_cast<unsigned long>(m_text.start - m_text.block) / sizeof(WCHAR);
-  } else {
-    position = {RawOffset(), 0, m_decoder};
-  }
+  position.delivered = static_cast<unsigned long>(m_text.start - m_text.block) / sizeof(WCHAR);
   return position;
 }
 
-// Decodes the run of the position anew and passes over what was delivered of it, byte by byte, because
-// only that tells where in the raw data a character begins.
+// Decodes the run of the position anew and passes over what was delivered of it.
 void Reader::GoTo(const Position& position) {
-  m_text.start = m_text.end = m_text.block;
-  m_raw.start = m_raw.block + position.runOffset;
-  m_decoder = position.decoder;
-  m_isCut = false;
-  if (m_decoder.NeedsWholeInput()) {
-    // One run holds all of the text; no part of it can be decoded alone.
-    if (position.delivered > 0 && DecodeNextRun()) {
-      m_text.start += std::min(position.delivered, TextLength()) * sizeof(WCHAR);
-    }
-    return;
+  ClearText();
+  m_state->raw.GoTo(position.run);
+  m_state->decoder.SetLosses({position.replaced, position.dropped});
+  for (unsigned long left = position.delivered; left > 0 && DecodeNextRun();) {
+    const unsigned long passed = std::min(left, TextLength());
+    m_text.start += passed * sizeof(WCHAR);
+    left -= passed;
   }
-  for (unsigned long passed = 0; passed < position.delivered && m_raw.start != m_raw.end;) {
-    STextDecoder::Run run{};
-    WCHAR character[8];
-    const STextDecoder before = m_decoder;
-    for (const unsigned char* end = m_raw.start + 1;; ++end) {
-      bool isLast = end == m_raw.end && (m_status & kWholeInput) != 0;
-      run = m_decoder.Decode(m_raw.start, end, isLast, character);
-      if (run.in != m_raw.start || end == m_raw.end) break;
-    }
-    // A byte that ended an invalid sequence may have become a character of its own at once; when only what
-    // stands for the sequence was delivered, the position is in front of that byte.
-    const unsigned long wanted = position.delivered - passed;
-    for (const unsigned char* end = run.in; static_cast<unsigned long>(run.out - character) > wanted;) {
-      if (--end == m_raw.start) break;
-      m_decoder = before;
-      STextDecoder::Run shorter = m_decoder.Decode(m_raw.start, end, true, character);
-      if (shorter.in == end && static_cast<unsigned long>(shorter.out - character) == wanted) run = shorter;
-    }
-    if (run.in == m_raw.start) break;
-    m_raw.start += run.in - m_raw.start;
-    passed += static_cast<unsigned long>(run.out - character);
-  }
-  m_run = {RawOffset(), 0, m_decoder};
+}
+
+// Finds the byte at which the character of the position begins, because another decoder comes.
+void Reader::Settle(Position& position) {
+  if (position.delivered == 0) return;
+  SReaderState& state = *m_state;
+  STextDecoder decoder = state.decoder;
+  decoder.SetLosses({position.replaced, position.dropped});
+  const unsigned char* found =
+      decoder.Locate(state.raw.ByteAt(position.run), m_raw.end, state.raw.IsAtEnd(), position.delivered);
+  const STextDecoder::Losses& losses = decoder.GetLosses();
+  position = {state.raw.PositionOf(found), 0, losses.replaced, losses.dropped};
 }
 
 void Reader::Mark(unsigned long limit) {
@@ -436,12 +424,11 @@ void Reader::Reset() {
   if (!m_hasMark) throw SEIOResetInvalid();
   GoTo(m_mark);
   m_delivered = m_markDelivered;
-  m_mark = CurrentPosition();
 }
 
 unsigned long Reader::Available() {
-  unsigned long waiting = TextLength() + m_raw.Size();
-  return (m_status & kWholeInput) != 0 ? waiting : waiting + m_in->Available();
+  const unsigned long waiting = SAddClipped(TextLength(), m_raw.Size());
+  return m_state->raw.IsAtEnd() ? waiting : SAddClipped(waiting, m_in->Available());
 }
 
 int Reader::IsEOF() { return TextLength() == 0 && !DecodeNextRun(); }
@@ -449,7 +436,9 @@ int Reader::IsEOF() { return TextLength() == 0 && !DecodeNextRun(); }
 void Reader::Close() {
   FreeBuffer(m_text);
   FreeBuffer(m_raw);
-  m_hasMark = m_isCut = m_needsCheck = false;
-  m_status |= kWholeInput;
+  m_hasMark = false;
+  m_isFilled = true;
+  m_state->raw.SetAtEnd();
+  m_state->choice.state = State::kFinal;
   m_in->Close();
 }

@@ -2,12 +2,14 @@
 // selection came about, and what was lost while reading.
 #pragma once
 
+#include <memory>
+
 #include "qxcore/platform/export.h"
-#include "qxcore/stream/encoding/internal/data_affinity.h"
-#include "qxcore/stream/encoding/internal/encoding_guess.h"
-#include "qxcore/stream/encoding/internal/text_decoder.h"
+#include "qxcore/stream/encoding/detection_counters.h"
 #include "qxcore/stream/encoding/multi_format_support.h"
 #include "qxcore/string/string.h"
+
+struct SReaderState;
 
 class QXCORE_API SMultiFormatReaderStatusBase {
  public:
@@ -16,24 +18,25 @@ class QXCORE_API SMultiFormatReaderStatusBase {
 
   // A growing buffer: bytes lie from start to end, in a block of `capacity` bytes.
   struct BufferStatus {
-    unsigned char* block = nullptr;  // owned by the reader, unless the capacity is 0
+    unsigned char* block = nullptr;
     unsigned char* start = nullptr;  // first byte not used yet
     unsigned char* end = nullptr;    // behind the last byte
     unsigned long capacity = 0;      // bytes of the block
+    bool isBorrowed = false;         // the block is another's: it is never written, and copied before it grows
 
     unsigned long Size() const { return static_cast<unsigned long>(end - start); }  // bytes not used yet
   };
 
   // Status bits.
   enum Status : unsigned {
-    kRawPresent = 0x1,   // raw data was there before detection
+    kRawPresent = 0x1,   // raw data is there, and the format is still to be checked
     kWholeInput = 0x2,   // no more raw data follows
     kProvisional = 0x4,  // ASCII so far; more data may show other bytes
     kSelected = 0x20,    // a selection was made
     kWarning = 0x40      // detection's result deserves a warning
   };
 
-  // A copy has the encodings, the status and the reports, but empty buffers of its own.
+  // A copy has the encodings, the status and the reports, but empty buffers of its own. Throw SEOutOfMemory.
   SMultiFormatReaderStatusBase(const SMultiFormatReaderStatusBase& other);
   SMultiFormatReaderStatusBase& operator=(const SMultiFormatReaderStatusBase& other);
   virtual ~SMultiFormatReaderStatusBase();
@@ -44,13 +47,14 @@ class QXCORE_API SMultiFormatReaderStatusBase {
   virtual void AllocStrData(BufferStatus& buffer, unsigned long size);
 
   Encoding GetRequestedFormat() const { return m_requested; }  // the hint and the policy
-  // The selected encoding with the requested policy; 0 before the first read or check, and when it failed.
-  Encoding GetFormat() const { return m_selected; }
-  unsigned int GetStatus() const { return m_status; }
-  const SDataAffinity& GetAffinity() const { return m_affinity; }  // the evidence of the last detection
+  // The selected encoding with the requested policy; 0 before the check (the first one, or that which SetFormat
+  // orders), and when it failed.
+  Encoding GetFormat() const;
+  unsigned int GetStatus() const;                 // status bits, as they are now
+  const SDetectionCounters& GetCounters() const;  // the evidence of the last detection
 
   // With a flag other than 0, UTF-8 is taken for well-formed and its continuation bytes are not checked.
-  // Gives the former flag. Takes effect with the next check of the format.
+  // Returns the former flag. Takes effect with the next check of the format.
   int SetQuickUTF8ToUTF16(int quick);
 
   // What a user should know of the selection; empty when there is nothing to say.
@@ -59,21 +63,16 @@ class QXCORE_API SMultiFormatReaderStatusBase {
   SString GetDetectionReport() const;
   // That characters were replaced or dropped; empty while none was.
   SString GetEncodingWarning() const;
-  unsigned long long GetReplacedCount() const { return m_decoder.GetReplaced(); }
-  unsigned long long GetDroppedCount() const { return m_decoder.GetDropped(); }
+  unsigned long long GetReplacedCount() const;
+  unsigned long long GetDroppedCount() const;
 
  protected:
-  // Nothing is selected yet.
-  explicit SMultiFormatReaderStatusBase(Encoding requested) : m_requested(requested) {}
+  // Nothing is selected yet. Throws SEOutOfMemory.
+  explicit SMultiFormatReaderStatusBase(Encoding requested);
   static void FreeBuffer(BufferStatus& buffer) noexcept;  // gives the block back and empties the buffer
 
-  Encoding m_requested;       // hint and policy
-  Encoding m_selected = 0;    // 0 before the selection
-  BufferStatus m_raw;         // bytes not decoded yet
-  unsigned int m_status = 0;  // status bits
-  SDataAffinity m_affinity;   // the evidence of the last detection
-  SEncodingGuess m_guess;     // what was made of it
-  STextDecoder m_decoder;     // of the selected encoding; counts the losses
-  bool m_hasFailed = false;   // detection selected nothing
-  int m_quickUTF8 = 0;        // UTF-8 is taken for well-formed
+  Encoding m_requested;                   // hint and policy
+  BufferStatus m_raw;                     // bytes not decoded yet
+  int m_quickUTF8 = 0;                    // UTF-8 is taken for well-formed
+  std::unique_ptr<SReaderState> m_state;  // the rest
 };

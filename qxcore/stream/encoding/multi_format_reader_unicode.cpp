@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstring>
 
+#include "qxcore/stream/encoding/internal/reader_state.h"
 #include "qxcore/string/internal/text_search.h"
 #include "qxcore/string/string_buffer.h"
 
@@ -23,11 +24,8 @@ unsigned long Reader::Read(void* buffer, unsigned long count) {
     std::memcpy(out, TextStart(), done * sizeof(WCHAR));
     Deliver(done);
   }
-  if (done < wanted && m_pending != nullptr) {
-    if (done == 0) ThrowPending();
-    return done * static_cast<unsigned long>(sizeof(WCHAR));
-  }
   try {
+    if (done < wanted) m_failure.Throw();
     while (done < wanted) {
       unsigned long got = DecodeInto(out + done, wanted - done);
       if (got == 0) break;
@@ -35,7 +33,7 @@ unsigned long Reader::Read(void* buffer, unsigned long count) {
     }
   } catch (...) {
     if (done == 0) throw;
-    m_pending = std::current_exception();
+    m_failure.Keep();
   }
   return done * static_cast<unsigned long>(sizeof(WCHAR));
 }
@@ -47,25 +45,19 @@ bool Reader::FetchMore(bool hasSome) {
     return fetch();
   } catch (...) {
     if (!hasSome) throw;
-    m_pending = std::current_exception();
+    m_failure.Keep();
     return false;
   }
 }
 
-void Reader::ThrowPending() {
-  std::exception_ptr pending = m_pending;
-  m_pending = nullptr;
-  std::rethrow_exception(pending);
-}
-
 void Reader::SetFormat(Encoding requested) {
-  m_pending = nullptr;
+  m_failure.Forget();
   SMultiFormatReaderBase::SetFormat(requested);
 }
 
 void Reader::Reset() {
   SMultiFormatReaderBase::Reset();
-  m_pending = nullptr;
+  m_failure.Forget();
 }
 
 unsigned long Reader::Skip(unsigned long count) {
@@ -112,7 +104,9 @@ SString Reader::ReadAll() {
 }
 
 WCHAR Reader::SetReplacement(WCHAR replacement) {
-  WCHAR former = m_decoder.GetReplacement();
-  m_decoder.SetReplacement(replacement);
+  WCHAR former = GetReplacement();
+  m_state->decoder.SetReplacement(replacement);
   return former;
 }
+
+WCHAR Reader::GetReplacement() const { return m_state->decoder.GetReplacement(); }

@@ -4,18 +4,17 @@
 //   SMultiFormatReaderUnicode reader(file, SMultiFormatReaderUnicode::Support::kANSI |
 //                                              SMultiFormatReaderUnicode::Support::kFullDetect);
 //   while (!reader.IsEOF()) Use(reader.ReadLn());
-//   Tell(reader.GetDetectionWarning(), reader.GetEncodingWarning());
+//   Show(reader.GetDetectionWarning(), reader.GetEncodingWarning());
 //
 // A character that cannot be mapped is replaced (U+FFFD unless changed) or dropped, and the encoding
-// warning tells of it; with the lossless policy it throws an exception of the SEIOCantMap family, after
+// warning says so; with the lossless policy it throws an exception of the SEIOCantMap family, after
 // everything before it was delivered, and again at each further read. Whatever throws in the middle of a
-// block, a line or the rest: the read gives what it has, and the next one throws.
+// block, a line or the rest: the read returns what it has, and the next one throws.
 // Read errors of the source look like the end of the data; ask GetError.
 #pragma once
 
-#include <exception>
-
 #include "qxcore/stream/encoding/multi_format_reader_base.h"
+#include "qxcore/stream/pending_failure.h"
 #include "qxcore/stream/seekable_char_reader.h"
 
 class QXCORE_API SMultiFormatReaderUnicode : public SMultiFormatReaderBase, public SAbstractIO::SIOSeekableCharReader {
@@ -33,12 +32,12 @@ class QXCORE_API SMultiFormatReaderUnicode : public SMultiFormatReaderBase, publ
     Deliver(1);
     return character;
   }
-  // Up to `count` bytes of 16-bit characters, whole ones only; gives the number of bytes.
+  // Up to `count` bytes of 16-bit characters, whole ones only; returns the number of bytes.
   unsigned long Read(void* buffer, unsigned long count) override;
   unsigned long ReadCharacters(WCHAR* buffer, unsigned long count) override {
     return SMultiFormatReaderUnicode::Read(buffer, count * sizeof(WCHAR)) / sizeof(WCHAR);
   }
-  // Passes over characters; gives how many.
+  // Passes over characters; returns how many.
   unsigned long Skip(unsigned long count) override;
   // The next line, without its end: a line feed, or a carriage return and one. Empty at the end, too: ask
   // IsEOF before.
@@ -52,18 +51,18 @@ class QXCORE_API SMultiFormatReaderUnicode : public SMultiFormatReaderBase, publ
   unsigned long GetPos() const override { return m_delivered; }
   bool SeekSupported() const override { return false; }
   unsigned long Available() override { return SMultiFormatReaderBase::Available(); }
-  int IsEOF() override { return m_pending == nullptr && SMultiFormatReaderBase::IsEOF(); }
+  int IsEOF() override { return !m_failure.IsThere() && SMultiFormatReaderBase::IsEOF(); }
   void SetFormat(Encoding requested) override;
   void Reset() override;
 
-  // What stands for characters that cannot be mapped; 0 drops them. Gives the former one.
+  // What stands for characters that cannot be mapped; 0 drops them. Returns the former one.
   WCHAR SetReplacement(WCHAR replacement);
-  WCHAR GetReplacement() const { return m_decoder.GetReplacement(); }
+  WCHAR GetReplacement() const;
 
  protected:
   // Decodes the next run of raw bytes; false at the end.
   bool fetch() {
-    if (m_pending != nullptr) ThrowPending();
+    m_failure.Throw();
     return DecodeNextRun();
   }
   // The next character, or -1.
@@ -71,7 +70,6 @@ class QXCORE_API SMultiFormatReaderUnicode : public SMultiFormatReaderBase, publ
 
  private:
   bool FetchMore(bool hasSome);
-  [[noreturn]] void ThrowPending();
 
-  std::exception_ptr m_pending;  // what the next read throws
+  SPendingFailure m_failure;
 };

@@ -5,6 +5,7 @@
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/core/memory.h"
+#include "qxcore/stream/internal/read_fully.h"
 #include "qxcore/stream/zip/internal/zip_format.h"
 
 QXCORE_IMPLEMENT_CLASS(SInflaterInputStream, SInputStream, 0)
@@ -15,28 +16,21 @@ constexpr unsigned long kLargestPiece = std::numeric_limits<int>::max();  // the
 
 }  // namespace
 
-SInflaterInputStream::SInflaterInputStream(unsigned long size) : m_size(std::clamp(size, 1ul, kLargestPiece)) {
-  m_buffer = static_cast<unsigned char*>(SMemAlloc(m_size));
-}
+SInflaterInputStream::SInflaterInputStream(unsigned long size) : SInflaterInputStream(nullptr, size, false) {}
 
 SInflaterInputStream::SInflaterInputStream(SInputStream& in, unsigned long size)
     : SInflaterInputStream(&in, size, false) {}
 
 SInflaterInputStream::SInflaterInputStream(SInputStream* in, unsigned long size, bool owns)
-    : SInflaterInputStream(size) {
-  m_in = in;
-  m_owns = owns;
+    : m_in(in, owns), m_size(std::clamp(size, 1ul, kLargestPiece)) {
+  m_buffer = static_cast<unsigned char*>(SMemAlloc(m_size));
 }
 
-SInflaterInputStream::~SInflaterInputStream() {
-  SMemFree(m_buffer);
-  if (m_owns) delete m_in;
-}
+SInflaterInputStream::~SInflaterInputStream() { SMemFree(m_buffer); }
 
 void SInflaterInputStream::Fill() {
-  const unsigned long got = m_in->Read(m_buffer, m_size);
-  // A stream may report failure as all ones.
-  if (got == 0 || got > m_size) throw SEEOFException();
+  const unsigned long got = SReadSome(*m_in, m_buffer, m_size);
+  if (got == 0) throw SEEOFException();
   m_inflater.SetInput(m_buffer, static_cast<int>(got));
 }
 

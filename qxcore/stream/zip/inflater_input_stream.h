@@ -1,6 +1,7 @@
 // SInflaterInputStream: a filter that decompresses raw deflate data.
 #pragma once
 
+#include "qxcore/stream/inner_stream.h"
 #include "qxcore/stream/input_stream.h"
 #include "qxcore/stream/zip/inflater.h"
 
@@ -34,12 +35,11 @@ class QXCORE_API SInflaterInputStream : public SInputStream {
   void Fill();
 
   // Where the compressed data comes from.
-  SInputStream* m_in = nullptr;
+  SInnerStream<SInputStream> m_in;
   // In raw mode.
   SInflater m_inflater{1};
 
  private:
-  bool m_owns = false;
   unsigned char* m_buffer;
   unsigned long m_size;
 };

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/internal/read_fully.h"
 #include "qxcore/stream/zip/internal/zip_format.h"
 
 QXCORE_IMPLEMENT_CLASS(SZipInputStream, SInflaterInputStream, 0)
@@ -18,7 +19,7 @@ SZipInputStream::SZipInputStream(SInputStream& in) : SZipInputStream(&in, false)
 
 SZipInputStream::SZipInputStream(SInputStream* in, bool owns)
     : SInflaterInputStream(kInputSize), m_source(in, kPushbackSize, owns) {
-  m_in = &m_source;
+  m_in.Set(m_source);
 }
 
 SZipEntry* SZipInputStream::GetNextEntry() {
@@ -38,13 +39,7 @@ void SZipInputStream::CloseEntry() {
 }
 
 void SZipInputStream::ReadFully(void* buffer, unsigned long count) {
-  auto* out = static_cast<unsigned char*>(buffer);
-  while (count > 0) {
-    const unsigned long got = m_source.Read(out, count);
-    if (got == 0 || got > count) throw SEEOFException();
-    out += got;
-    count -= got;
-  }
+  if (SReadFully(m_source, buffer, count) != count) throw SEEOFException();
 }
 
 bool SZipInputStream::ReadLOC() {

@@ -18,12 +18,25 @@ WCHAR Image(unsigned codePage, const char* bytes, int count) {
   return length == 1 ? text[0] : SCodePageTable::kNone;
 }
 
+// Not every page says which bytes are lead bytes (the EUC pages do not), so the conversion itself is asked: a lead byte
+// is no character alone, and makes one together with another byte.
+bool IsLeadByte(unsigned codePage, unsigned char byte) {
+  const char narrow = static_cast<char>(byte);
+  if (IsDBCSLeadByteEx(codePage, byte)) return true;
+  if (byte < 0x80 || Image(codePage, &narrow, 1) != SCodePageTable::kNone) return false;
+  for (int trail = 0x21; trail < 256; ++trail) {
+    const char bytes[2] = {narrow, static_cast<char>(trail)};
+    if (Image(codePage, bytes, 2) != SCodePageTable::kNone) return true;
+  }
+  return false;
+}
+
 }  // namespace
 
-SCodePageTable::SCodePageTable(unsigned int codePage) : m_codePage(codePage) {
+SCodePageTable::SCodePageTable(unsigned int codePage, bool mayHaveLeads) : m_codePage(codePage) {
   for (int byte = 0; byte < 256; ++byte) {
     char narrow = static_cast<char>(byte);
-    m_isLead[byte] = IsDBCSLeadByteEx(codePage, static_cast<BYTE>(byte)) != 0;
+    m_isLead[byte] = mayHaveLeads && IsLeadByte(codePage, static_cast<unsigned char>(byte));
     m_hasLeads = m_hasLeads || m_isLead[byte];
     m_single[byte] = m_isLead[byte] ? kNone : Image(codePage, &narrow, 1);
     if (byte < 0x80 && m_single[byte] != byte) m_isASCIICompatible = false;
@@ -51,7 +64,7 @@ const SCodePageTable* SCodePageTable::Get(unsigned int codePage) {
   bool takesFlags = MultiByteToWideChar(codePage, MB_PRECOMPOSED | MB_ERR_INVALID_CHARS, "A", 1, nullptr, 0) > 0;
   if (!takesFlags || !GetCPInfo(codePage, &info) || info.MaxCharSize > 2) return nullptr;
 
-  SCodePageTable* made = new (SMemAlloc(sizeof(SCodePageTable))) SCodePageTable(codePage);
+  SCodePageTable* made = new (SMemAlloc(sizeof(SCodePageTable))) SCodePageTable(codePage, info.MaxCharSize > 1);
   std::lock_guard<platform::ShortLock> lock(g_tablesLock);
   made->m_next = g_tables.load(std::memory_order_relaxed);
   g_tables.store(made, std::memory_order_release);  // two threads may both make one; that does no harm

@@ -29,7 +29,7 @@ class SCodePageTable {
   }
 
  private:
-  explicit SCodePageTable(unsigned int codePage);
+  SCodePageTable(unsigned int codePage, bool mayHaveLeads);
   const WCHAR* MakeTrails(unsigned char lead) const;
 
   unsigned int m_codePage;

@@ -3,13 +3,16 @@
 #include <algorithm>
 #include <climits>
 
+#include "qxcore/platform/internal/utf.h"
 #include "qxcore/platform/win32.h"
+#include "qxcore/stream/encoding/internal/utf8_blocks.h"
 
 #ifdef __SSE2__
 #include <emmintrin.h>
 #endif
 
 using Support = SAbstractIO::SMultiFormatSupport;
+using Counters = SDetectionCounters;
 
 namespace {
 
@@ -18,8 +21,6 @@ constexpr std::ptrdiff_t kPatience = 4096;  // bytes after which a rejection end
 void Add(std::int32_t& counter, std::int64_t amount) {
   counter = static_cast<std::int32_t>(std::clamp<std::int64_t>(counter + amount, INT_MIN, INT_MAX));
 }
-
-bool IsContinuation(unsigned char byte) { return (byte & 0xC0) == 0x80; }
 
 // Moves over bytes that say nothing: 0x01 to 0x7F.
 const unsigned char* SkipPlain(const unsigned char* at, const unsigned char* end) {
@@ -42,70 +43,37 @@ const unsigned char* SkipPlain(const unsigned char* at, const unsigned char* end
   return at;
 }
 
-#ifdef __SSE2__
-
-// 64 bytes, one bit each.
-struct Block {
-  static constexpr std::ptrdiff_t kSize = 64;
-
-  std::uint64_t zeros = 0;
-  std::uint64_t above = 0;         // 0x80 and more
-  std::uint64_t continuation = 0;  // 0x80 to 0xBF
-  std::uint64_t fromE0 = 0;
-  std::uint64_t fromF0 = 0;
-
-  explicit Block(const unsigned char* at) {
-    const __m128i zero = _mm_setzero_si128();
-    const __m128i c0 = _mm_set1_epi8(static_cast<char>(0xC0));
-    const __m128i e0 = _mm_set1_epi8(static_cast<char>(0xE0));
-    const __m128i f0 = _mm_set1_epi8(static_cast<char>(0xF0));
-    for (int part = 0; part < 4; ++part) {
-      const __m128i bytes = _mm_loadu_si128(reinterpret_cast<const __m128i*>(at) + part);
-      const auto put = [part](std::uint64_t& mask, __m128i found) {
-        mask |= static_cast<std::uint64_t>(static_cast<unsigned>(_mm_movemask_epi8(found))) << (part * 16);
-      };
-      put(above, bytes);
-      put(zeros, _mm_cmpeq_epi8(bytes, zero));
-      put(continuation, _mm_cmplt_epi8(bytes, c0));  // as signed numbers those below 0xC0
-      put(fromE0, _mm_cmpeq_epi8(_mm_max_epu8(bytes, e0), bytes));
-      put(fromF0, _mm_cmpeq_epi8(_mm_max_epu8(bytes, f0), bytes));
-    }
-  }
-};
-
-// Without the processor's own instruction, which not every one has.
-int CountBits(std::uint64_t bits) {
-  bits -= bits >> 1 & 0x5555555555555555u;
-  bits = (bits & 0x3333333333333333u) + (bits >> 2 & 0x3333333333333333u);
-  bits = (bits + (bits >> 4)) & 0x0F0F0F0F0F0F0F0Fu;
-  return static_cast<int>(bits * 0x0101010101010101u >> 56);
-}
-
-#endif
-
 // The walk over the bytes; counts into plain locals, which the loop keeps in registers.
 class Walk {
  public:
-  Walk(const unsigned char* begin, const unsigned char* end, const SDataAffinity& before)
-      : m_begin(begin), m_end(end), m_countsZeros(before.utf16 >= 0), m_utf8Rejected(before.utf8 < 0) {}
+  Walk(const unsigned char* begin, const unsigned char* end, const Counters& before, SUnicodeRules rules)
+      : m_begin(begin),
+        m_end(end),
+        m_isFull(rules == SUnicodeRules::kFull),
+        m_countsZeros(before.utf16 >= 0),
+        m_utf8Rejected(before.utf8 < 0) {}
 
   void Run() {
     const unsigned char* at = m_begin;
     while ((at = SkipPlain(at, m_end)) != m_end) {
       const unsigned char* next = WalkBlocks(at);
-      at = next != at ? next : WalkByte(at);
+      if (next == m_end) {
+        at = next;
+        break;
+      }
+      at = next != at ? next : m_isFull ? WalkByteFully(at) : WalkByte(at);
       if (m_mayStop && at - m_begin > kPatience) break;
       m_mayStop = false;
     }
     m_walked = at - m_begin;
   }
 
-  void AddTo(SDataAffinity& affinity) const {
-    Add(affinity.ascii, -m_nonAscii);
+  void AddTo(Counters& counters) const {
+    Add(counters.ascii, -m_nonAscii);
     if (m_utf8Rejected) {
-      affinity.utf8 = SDataAffinity::kRejected;
+      counters.utf8 = Counters::kRejected;
     } else {
-      Add(affinity.utf8, m_continuations);
+      Add(counters.utf8, m_continuations);
     }
     std::int64_t little = m_zeros[1];
     std::int64_t big = m_zeros[0];
@@ -113,20 +81,24 @@ class Walk {
       bool isClear = std::max(little, big) >= m_walked >> 2 && std::min(little, big) <= m_walked >> 5;
       if (!isClear) little = big = 0;
     }
-    Add(affinity.littleZeros, little);
-    Add(affinity.bigZeros, big);
+    Add(counters.littleZeros, little);
+    Add(counters.bigZeros, big);
   }
 
   bool SawZeros() const { return m_zeros[0] + m_zeros[1] > 0; }
   bool WalkedAny() const { return m_walked > 0; }
 
  private:
+  const unsigned char* WalkZero(const unsigned char* at) {
+    if (m_countsZeros && at != m_end) ++m_zeros[(at - 1 - m_begin) & 1];
+    return at;
+  }
+
   const unsigned char* WalkByte(const unsigned char* at) {
     const unsigned char byte = *at++;
     switch (byte >> 4) {
       case 0x0:
-        if (m_countsZeros && at != m_end) ++m_zeros[(at - 1 - m_begin) & 1];
-        return at;
+        return WalkZero(at);
       case 0xC:
       case 0xD:
         ++m_nonAscii;
@@ -135,8 +107,8 @@ class Walk {
         ++m_nonAscii;
         return TakeContinuations(at, 2);
       case 0xF:
-        // Neither evidence nor a rejection by itself; its continuation bytes count as stray ones. That is
-        // meant: readers do not support sequences of four bytes.
+        // Neither evidence nor a rejection by itself; its continuation bytes count as stray ones. That is on
+        // purpose: by the basic rules readers do not support sequences of four bytes.
         ++m_nonAscii;
         m_mayStop = true;
         return at;
@@ -147,40 +119,59 @@ class Walk {
     }
   }
 
-  // Walks whole blocks of well-formed sequences up to three bytes, and zeros; gives where that ends, which is
-  // between two sequences.
-  const unsigned char* WalkBlocks(const unsigned char* at) {
-#ifdef __SSE2__
-    std::uint64_t expected = 0;  // continuation bytes that belong to the block before
-    for (; m_end - at > Block::kSize; at += Block::kSize) {
-      const Block block(at);
-      const std::uint64_t leads = block.above & ~block.continuation;
-      const std::uint64_t due = expected | leads << 1 | block.fromE0 << 2;
-      if (block.fromF0 != 0 || due != block.continuation) break;
-      m_nonAscii += CountBits(leads);
-      m_continuations += CountBits(block.continuation);
-      if (m_countsZeros && block.zeros != 0) {
-        const int first = static_cast<int>((at - m_begin) & 1);
-        m_zeros[first] += CountBits(block.zeros & 0x5555555555555555u);
-        m_zeros[first ^ 1] += CountBits(block.zeros & 0xAAAAAAAAAAAAAAAAu);
-      }
-      expected = leads >> 63 | block.fromE0 >> 62;
+  // By the full rules; a sequence that the end of the sample cuts is no rejection.
+  const unsigned char* WalkByteFully(const unsigned char* at) {
+    if (*at == 0) return WalkZero(at + 1);
+    const platform::Utf8Step step = platform::StepUtf8(at, m_end);
+    ++m_nonAscii;
+    if (!step.isValid && !step.isCut) {
+      Reject();
+      return at + 1;
     }
-    if (expected != 0) at = TakeContinuations(at, expected == 1 ? 1 : 2);
-#endif
-    return at;
+    m_continuations += step.length - 1;
+    return at + step.length;
+  }
+
+  // Walks whole blocks of well-formed sequences, and zeros; returns where that ends, which is between two sequences.
+  const unsigned char* WalkBlocks(const unsigned char* at) {
+    SUtf8BlockWalk walk;
+    SUtf8BlockCounts counts;
+    const unsigned char* stop = SWalkUtf8Blocks(at, m_end, m_isFull, walk, counts);
+    m_nonAscii += counts.leads;
+    m_continuations += counts.continuations;
+    if (m_countsZeros) {
+      const int first = static_cast<int>((at - m_begin) & 1);
+      m_zeros[first] += counts.zeros[0];
+      m_zeros[first ^ 1] += counts.zeros[1];
+    }
+    if (walk.Expected() == 0) return stop;
+    if (!m_isFull) return TakeContinuations(stop, walk.Expected());
+    return FinishSequence(stop);
   }
 
   // A sequence that the end of the sample cuts is no rejection.
   const unsigned char* TakeContinuations(const unsigned char* at, int count) {
     for (; count > 0 && at != m_end; --count, ++at) {
-      if (!IsContinuation(*at)) {
+      if (!platform::IsUtf8Continuation(*at)) {
         Reject();
         return at;
       }
       ++m_continuations;
     }
     return at;
+  }
+
+  // The same by the full rules: the sequence began before `at` and was counted up to there.
+  const unsigned char* FinishSequence(const unsigned char* at) {
+    const unsigned char* lead = at - 1;
+    while (platform::IsUtf8Continuation(*lead)) --lead;
+    const platform::Utf8Step step = platform::StepUtf8(lead, m_end);
+    if (!step.isValid && !step.isCut) {
+      Reject();
+      return at;
+    }
+    m_continuations += lead + step.length - at;
+    return lead + step.length;
   }
 
   void Reject() {
@@ -190,6 +181,7 @@ class Walk {
 
   const unsigned char* m_begin;
   const unsigned char* m_end;
+  bool m_isFull;
   bool m_countsZeros;
   bool m_utf8Rejected;
   bool m_mayStop = false;
@@ -233,62 +225,149 @@ bool ConvertsSample(unsigned page, const unsigned char* begin, const unsigned ch
   return Converts(page, begin, size) || (IsDBCSLeadByteEx(page, end[-1]) && Converts(page, begin, size - 1));
 }
 
-void TestPage(std::int32_t& counter, unsigned page, const SDataAffinity& affinity, const unsigned char* begin,
+void TestPage(std::int32_t& counter, unsigned page, std::int32_t ascii, const unsigned char* begin,
               const unsigned char* end) {
   if (counter < 0) return;
   if (ConvertsSample(page, begin, end)) {
-    Add(counter, -static_cast<std::int64_t>(affinity.ascii));
+    Add(counter, -static_cast<std::int64_t>(ascii));
   } else {
-    counter = SDataAffinity::kRejected;
+    counter = Counters::kRejected;
   }
 }
 
 // The platform's own opinion on 16-bit text.
-Support::Encoding TestUtf16(SDataAffinity& affinity, const unsigned char* begin, const unsigned char* end) {
+Support::Encoding TestUtf16(Counters& counters, const unsigned char* begin, const unsigned char* end) {
   int verdict = IS_TEXT_UNICODE_ASCII16 | IS_TEXT_UNICODE_STATISTICS | IS_TEXT_UNICODE_CONTROLS |
                 IS_TEXT_UNICODE_REVERSE_ASCII16 | IS_TEXT_UNICODE_REVERSE_STATISTICS |
                 IS_TEXT_UNICODE_REVERSE_CONTROLS | IS_TEXT_UNICODE_ILLEGAL_CHARS | IS_TEXT_UNICODE_NULL_BYTES;
   IsTextUnicode(begin, static_cast<int>(end - begin), &verdict);
 
-  affinity.utf16 = std::max(affinity.littleZeros, affinity.bigZeros);
+  counters.utf16 = std::max(counters.littleZeros, counters.bigZeros);
   struct Order {
     int ascii16, statistics, controls;
-    std::int32_t SDataAffinity::*zeros;
+    std::int32_t Counters::*zeros;
     Support::Encoding encoding;
   };
   static constexpr Order kOrders[] = {
-      {IS_TEXT_UNICODE_ASCII16, IS_TEXT_UNICODE_STATISTICS, IS_TEXT_UNICODE_CONTROLS, &SDataAffinity::littleZeros,
+      {IS_TEXT_UNICODE_ASCII16, IS_TEXT_UNICODE_STATISTICS, IS_TEXT_UNICODE_CONTROLS, &Counters::littleZeros,
        Support::kUTF16LE | Support::kOptionalBOM},
       {IS_TEXT_UNICODE_REVERSE_ASCII16, IS_TEXT_UNICODE_REVERSE_STATISTICS, IS_TEXT_UNICODE_REVERSE_CONTROLS,
-       &SDataAffinity::bigZeros, Support::kUTF16BE | Support::kOptionalBOM}};
+       &Counters::bigZeros, Support::kUTF16BE | Support::kOptionalBOM}};
   for (const Order& order : kOrders) {
     if (verdict & order.ascii16) {
-      affinity.utf16 = affinity.*order.zeros = SDataAffinity::kCertain;
+      counters.utf16 = counters.*order.zeros = Counters::kCertain;
       return order.encoding;
     }
-    if (verdict & order.statistics) affinity.utf16 = affinity.*order.zeros = SDataAffinity::kLikely;
+    if (verdict & order.statistics) counters.utf16 = counters.*order.zeros = Counters::kLikely;
     if (verdict & order.controls) {
-      Add(affinity.utf16, SDataAffinity::kControls);
-      Add(affinity.*order.zeros, SDataAffinity::kControls);
+      Add(counters.utf16, Counters::kControls);
+      Add(counters.*order.zeros, Counters::kControls);
     }
+  }
+  return 0;
+}
+
+// UTF-16 whose bytes are all below 0x80. The upper halves of its units are small numbers, zero for blanks, line ends
+// and Latin letters, up to 0x1F for the alphabets below U+2000; 8-bit text has neither NULs nor other controls at
+// every second place. One unit in eight may lie elsewhere (quotation marks, arrows), and hardly any lower half is zero.
+Support::Encoding TestPlainUtf16(Counters& counters, const unsigned char* begin, const unsigned char* end) {
+  const std::int64_t units = (end - begin) / 2;
+  std::int64_t zeros[2] = {0, 0}, small[2] = {0, 0};
+  for (const unsigned char* at = begin; at != begin + 2 * units; at += 2) {
+    for (int half = 0; half < 2; ++half) {
+      zeros[half] += at[half] == 0;
+      small[half] += at[half] < 0x20;
+    }
+  }
+  struct Order {
+    int upper;
+    std::int32_t Counters::*zeros;
+    Support::Encoding encoding;
+  };
+  static constexpr Order kOrders[] = {{1, &Counters::littleZeros, Support::kUTF16LE | Support::kOptionalBOM},
+                                      {0, &Counters::bigZeros, Support::kUTF16BE | Support::kOptionalBOM}};
+  for (const Order& order : kOrders) {
+    const int lower = 1 - order.upper;
+    if (zeros[order.upper] == 0 || small[order.upper] < units - units / 8) continue;
+    if (zeros[lower] > units / 32 || small[lower] > units / 2) continue;
+    counters.utf16 = counters.*order.zeros = Counters::kCertain;
+    return order.encoding;
   }
   return 0;
 }
 
 }  // namespace
 
-Support::Encoding SDataAffinity::Scan(const unsigned char* begin, const unsigned char* end, unsigned int codePage) {
+Support::Encoding SScanAffinity(const unsigned char* begin, const unsigned char* end, Counters& counters,
+                                unsigned int codePage, SUnicodeRules rules) {
   if (begin == end) return 0;
-  Walk walk(begin, end, *this);
+  Walk walk(begin, end, counters, rules);
   walk.Run();
-  walk.AddTo(*this);
+  walk.AddTo(counters);
 
-  if (ascii < 0 && !walk.SawZeros()) {
-    if (codePage != 0) TestPage(specified, ResolvePage(codePage), *this, begin, end);
-    TestPage(active, GetACP(), *this, begin, end);
+  if (counters.ascii < 0 && !walk.SawZeros()) {
+    if (codePage != 0) TestPage(counters.specified, ResolvePage(codePage), counters.ascii, begin, end);
+    TestPage(counters.active, GetACP(), counters.ascii, begin, end);
     // Without flags the platform converts any bytes as UTF-8, so its test only adds.
-    if (utf8 >= 0) Add(utf8, -static_cast<std::int64_t>(ascii));
+    if (counters.utf8 >= 0) Add(counters.utf8, -static_cast<std::int64_t>(counters.ascii));
   }
-  bool mayBeUtf16 = ascii < 0 || (ascii == 0 && walk.WalkedAny());
-  return mayBeUtf16 && utf16 >= 0 ? TestUtf16(*this, begin, end) : 0;
+  if (counters.utf16 < 0) return 0;
+  if (rules == SUnicodeRules::kFull && counters.ascii == 0 && walk.SawZeros()) {
+    if (Support::Encoding settled = TestPlainUtf16(counters, begin, end)) return settled;
+  }
+  bool mayBeUtf16 = counters.ascii < 0 || (counters.ascii == 0 && walk.WalkedAny());
+  return mayBeUtf16 ? TestUtf16(counters, begin, end) : 0;
+}
+
+// --- samples one behind the other ---
+
+const unsigned char* SEndOfPiece(const unsigned char* begin, const unsigned char* end) {
+  // No multi-byte page has bytes below 0x30 within a character, and only 16-bit text has zeros.
+  constexpr std::ptrdiff_t kReach = 65536;
+  const unsigned char* last = end - ((end - begin) & 1);
+  for (const unsigned char* at = last; last - at < kReach && at - begin > 2; at -= 2) {
+    if (at[-1] < 0x30) return at;
+  }
+  return last;
+}
+
+static constexpr std::int32_t Counters::*kMembers[] = {&Counters::ascii,    &Counters::utf8,        &Counters::active,
+                                                       &Counters::utf16,    &Counters::littleZeros, &Counters::bigZeros,
+                                                       &Counters::specified};
+static constexpr int kAscii = 0;  // its negative values are evidence, not a rejection
+
+SAffinitySum::SAffinitySum(const Counters& first) {
+  for (int i = 0; i < kCounters; ++i) m_sums[i] = first.*kMembers[i];
+}
+
+Counters SAffinitySum::Fresh() const {
+  Counters fresh;
+  for (int i = 0; i < kCounters; ++i) fresh.*kMembers[i] = i != kAscii && m_sums[i] < 0 ? Counters::kRejected : 0;
+  return fresh;
+}
+
+void SAffinitySum::Add(const Counters& sample) {
+  for (int i = 0; i < kCounters; ++i) {
+    const std::int32_t value = sample.*kMembers[i];
+    if (i == kAscii || (m_sums[i] >= 0 && value >= 0)) {
+      m_sums[i] += value;
+    } else {
+      m_sums[i] = Counters::kRejected;
+    }
+  }
+}
+
+Counters SAffinitySum::Total() const {
+  std::int64_t largest = -m_sums[kAscii];
+  for (std::int64_t sum : m_sums) largest = std::max(largest, sum);
+  int shift = 0;
+  while (largest >> shift > INT_MAX) ++shift;
+  Counters total;
+  for (int i = 0; i < kCounters; ++i) {
+    // What was found at all stays found, and rejected stays rejected.
+    const std::int64_t sum = m_sums[i], scaled = (sum < 0 ? -sum : sum) >> shift;
+    const std::int64_t kept = sum != 0 && scaled == 0 ? 1 : scaled;
+    total.*kMembers[i] = static_cast<std::int32_t>(sum < 0 ? -kept : kept);
+  }
+  return total;
 }

@@ -22,14 +22,14 @@ const Candidate* Strongest(const Candidate (&candidates)[4]) {
   return nullptr;
 }
 
-bool IsHintAcceptable(Encoding hint, const SDataAffinity& affinity, Encoding guessedOrder) {
+bool IsHintAcceptable(Encoding hint, const SDetectionCounters& affinity, Encoding guessedOrder) {
   if ((hint & Support::kFormatMask) == Support::kUTF8) return affinity.utf8 > 0;
-  // A hint that names a code page, even the active one, is never accepted here; that is meant.
+  // A hint that names a code page, even the active one, is never accepted here; that is on purpose.
   if ((hint & Support::kValueMask) == Support::kANSI) return affinity.active > 0;
   return (hint & Support::kFormatMask) == guessedOrder && affinity.utf16 > 0;
 }
 
-Encoding BreakTie(Encoding requested, const SDataAffinity& a) {
+Encoding BreakTie(Encoding requested, const SDetectionCounters& a) {
   if (a.active == a.utf8 && a.active > a.specified) return Support::kANSI;
   if (a.utf8 > a.active && a.utf8 > a.specified && a.utf8 == a.utf16) return Support::kUTF8;
   if (a.active > a.utf8 && a.active > a.specified && a.active == a.utf16) return Support::kANSI;
@@ -38,7 +38,7 @@ Encoding BreakTie(Encoding requested, const SDataAffinity& a) {
 
 }  // namespace
 
-SEncodingGuess SEncodingGuess::Make(Encoding requested, const SDataAffinity& affinity, bool isComplete) {
+SEncodingGuess SEncodingGuess::Make(Encoding requested, const SDetectionCounters& affinity, bool isComplete) {
   const Encoding policy = requested & Support::kFlagsMask;
   const Encoding order = affinity.littleZeros > affinity.bigZeros ? Support::kUTF16LE : Support::kUTF16BE;
   SEncodingGuess guess;

@@ -1,7 +1,7 @@
 // The choice among the candidate encodings by their evidence and the caller's hint.
 #pragma once
 
-#include "qxcore/stream/encoding/internal/data_affinity.h"
+#include "qxcore/stream/encoding/detection_counters.h"
 #include "qxcore/stream/encoding/multi_format_support.h"
 
 struct SEncodingGuess {
@@ -27,5 +27,5 @@ struct SEncodingGuess {
   bool needsWarning = false;      // the user should know
 
   // `isComplete`: the whole input was read, and a detection level is set.
-  static SEncodingGuess Make(Encoding requested, const SDataAffinity& affinity, bool isComplete);
+  static SEncodingGuess Make(Encoding requested, const SDetectionCounters& affinity, bool isComplete);
 };

@@ -5,6 +5,7 @@
 #include <cstring>
 
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/platform/internal/utf.h"
 #include "qxcore/platform/internal/widen.h"
 #include "qxcore/stream/encoding/internal/single_byte_decoder.h"
 #include "qxcore/stream/encoding/internal/utf8_decoder.h"
@@ -13,6 +14,8 @@ using Support = SAbstractIO::SMultiFormatSupport;
 using Run = STextDecoder::Run;
 
 namespace {
+
+constexpr HRESULT kUnexpected = static_cast<HRESULT>(0x80990061);  // the code of text 217
 
 // --- kernels: each decodes as far as all is well and stops where it is not ---
 
@@ -76,9 +79,11 @@ void STextDecoder::Select(Encoding encoding, bool quick) {
       m_kernel = Kernel::kASCII;
       break;
     case Support::kUnicode:
-      m_kernel = (encoding & Support::kUtf8Form) != 0    ? (quick ? Kernel::kQuickUTF8 : Kernel::kUTF8)
-                 : (encoding & Support::kBigEndian) != 0 ? Kernel::kBigEndian
-                                                         : Kernel::kLittleEndian;
+      m_kernel = (encoding & Support::kUtf8Form) == 0
+                     ? ((encoding & Support::kBigEndian) != 0 ? Kernel::kBigEndian : Kernel::kLittleEndian)
+                 : quick                                   ? Kernel::kQuickUTF8
+                 : (encoding & Support::kFullUnicode) != 0 ? Kernel::kFullUTF8
+                                                           : Kernel::kUTF8;
       break;
     default:
       m_table = SCodePageTable::Get(Support::CodePageOf(encoding));
@@ -98,6 +103,10 @@ Run STextDecoder::RunKernel(const unsigned char* in, const unsigned char* end, W
       SUtf8Run run = SDecodeUtf8(in, end, out);
       return {run.in, run.out};
     }
+    case Kernel::kFullUTF8: {
+      SUtf8Run run = SDecodeFullUtf8(in, end, out);
+      return {run.in, run.out};
+    }
     case Kernel::kQuickUTF8: {
       SUtf8Run run = SDecodeUtf8Quick(in, end, out);
       return {run.in, run.out};
@@ -112,76 +121,133 @@ Run STextDecoder::RunKernel(const unsigned char* in, const unsigned char* end, W
 }
 
 STextDecoder::Obstacle STextDecoder::Look(const unsigned char* in, const unsigned char* end, bool isLast) const {
+  const auto surrogates =
+      m_kernel == Kernel::kFullUTF8 ? platform::Utf8Surrogates::kRefused : platform::Utf8Surrogates::kTaken;
   switch (m_kernel) {
-    case Kernel::kQuickUTF8:
-      // As its continuation bytes are not looked at, a sequence stops the kernel only when some are missing.
-      if (*in >= 0xC0 && *in < 0xF0 && !isLast) return {0, false};
+    case Kernel::kQuickUTF8: {
+      // Its continuation bytes are not looked at, only whether they are there.
+      const std::ptrdiff_t wanted = *in < 0xC0 || *in >= 0xF0 ? 0 : *in < 0xE0 ? 2 : 3;
+      if (wanted > 0 && end - in >= wanted) return {wanted, false, true};
+      if (wanted > 0 && !isLast) return {0};
       [[fallthrough]];
-    case Kernel::kUTF8: {
-      SUtf8Obstacle obstacle = SLookAtUtf8(in, end);
-      if (obstacle.isCut && !isLast) return {0, false};
-      return {obstacle.length, obstacle.isIllegal};
+    }
+    case Kernel::kUTF8:
+    case Kernel::kFullUTF8: {
+      const platform::Utf8Step step = platform::StepUtf8(in, end, surrogates);
+      if (step.isCut && !isLast) return {0};
+      const bool isTaken = step.isValid && (step.length < 4 || m_kernel == Kernel::kFullUTF8);
+      return {step.length, !step.isValid, isTaken};
     }
     case Kernel::kDoubleByte:
       if (!m_table->IsLead(*in)) return {1, true};
       if (end - in < 2) return {isLast ? 1 : 0, true};
+      if (m_table->Trails(*in)[in[1]] != SCodePageTable::kNone) return {2, false, true};
       // An ASCII byte behind a lead byte with which it makes no character stands for itself.
-      return in[1] < 0x80 ? Obstacle{1, true} : Obstacle{2, false};
+      return in[1] < 0x80 ? Obstacle{1, true} : Obstacle{2};
     case Kernel::kLittleEndian:
     case Kernel::kBigEndian:
+      if (end - in >= 2) return {2, false, true};
       return {isLast ? end - in : 0, true};  // half a character
     default:
       return {1, m_kernel != Kernel::kSingleByte};
   }
 }
 
-Run STextDecoder::Decode(const unsigned char* in, const unsigned char* end, bool isLast, WCHAR* out) {
+Run STextDecoder::Decode(const unsigned char* in, const unsigned char* end, bool isLast, WCHAR* out, std::size_t room) {
   if (m_kernel == Kernel::kWhole) return isLast ? DecodeWhole(in, end, out) : Run{in, out};
+  WCHAR* const outEnd = out + room;
   for (;;) {
-    Run run = RunKernel(in, end, out);
-    if (run.in == end) return run;
-    Obstacle obstacle = Look(run.in, end, isLast);
+    // As no sequence gives more characters than it has bytes, as many bytes as there is room cannot be too many.
+    const unsigned char* stop =
+        in + std::min<std::size_t>(static_cast<std::size_t>(end - in), static_cast<std::size_t>(outEnd - out));
+    Run run = RunKernel(in, stop, out);
+    in = run.in;
+    out = run.out;
+    if (in == end || out == outEnd) return run;
+    if (in == stop) continue;
+    const Obstacle obstacle = Look(in, end, isLast);
     if (obstacle.length == 0) return run;
+    if (obstacle.isNone) {
+      const bool isPair = m_kernel == Kernel::kFullUTF8 && obstacle.length == 4;
+      if (isPair && outEnd - out < 2) return run;
+      run = RunKernel(in, in + obstacle.length, out);
+      in = run.in;
+      out = run.out;
+      continue;
+    }
     if (m_isLossless) {
       m_isLossIllegal = obstacle.isIllegal;
       run.isLoss = true;
       return run;
     }
     if (m_replacement != 0) {
-      *run.out++ = m_replacement;
-      ++m_replaced;
+      *out++ = m_replacement;
+      ++m_losses.replaced;
     } else {
-      ++m_dropped;
+      ++m_losses.dropped;
     }
-    in = run.in + obstacle.length;
-    out = run.out;
+    in += obstacle.length;
+    if (in == end || out == outEnd) return {in, out};
   }
+}
+
+const unsigned char* STextDecoder::Locate(const unsigned char* in, const unsigned char* end, bool isLast,
+                                          std::size_t count) {
+  if (m_kernel == Kernel::kWhole) return LocateInWhole(in, end, count);
+  constexpr std::size_t kPiece = 512;
+  WCHAR passed[kPiece];
+  while (count > 0) {
+    // With room for one only, a surrogate pair would not be decoded at all.
+    Run run = Decode(in, end, isLast, passed, count == 1 ? 1 : std::min(count, kPiece));
+    if (run.in == in) run = Decode(in, end, isLast, passed, 2);
+    if (run.in == in) break;
+    in = run.in;
+    count -= std::min(count, static_cast<std::size_t>(run.out - passed));
+  }
+  return in;
 }
 
 // The platform's conversion puts U+FFFD where it has no character.
 Run STextDecoder::DecodeWhole(const unsigned char* in, const unsigned char* end, WCHAR* out) {
-  constexpr WCHAR kPlatformReplacement = 0xFFFD;
   int room = static_cast<int>(end - in);
   unsigned page = Support::CodePageOf(m_encoding);
   SetLastError(0);
   int length = MultiByteToWideChar(page, 0, reinterpret_cast<const char*>(in), room, out, room);
   // Escapes alone are no text; an error is one that must not pass for the end of the data.
-  if (length == 0 && GetLastError() != 0) throw SEEncodingException(static_cast<HRESULT>(0x80990067), 217);
+  if (length == 0 && GetLastError() != 0) throw SEEncodingException(kUnexpected, 217);
   WCHAR* written = out;
   for (int i = 0; i < length; ++i) {
-    if (out[i] != kPlatformReplacement) {
+    if (out[i] != platform::kReplacementCharacter) {
       *written++ = out[i];
     } else if (m_isLossless) {
       m_isLossIllegal = true;
       return {in, out, true};
     } else if (m_replacement != 0) {
       *written++ = m_replacement;
-      ++m_replaced;
+      ++m_losses.replaced;
     } else {
-      ++m_dropped;
+      ++m_losses.dropped;
     }
   }
   return {end, written};
+}
+
+// The shortest beginning of the bytes that has so many characters: its length is found by halving.
+const unsigned char* STextDecoder::LocateInWhole(const unsigned char* in, const unsigned char* end,
+                                                 std::size_t count) const {
+  const auto characters = [&](std::ptrdiff_t bytes) {
+    return static_cast<std::size_t>(MultiByteToWideChar(
+        Support::CodePageOf(m_encoding), 0, reinterpret_cast<const char*>(in), static_cast<int>(bytes), nullptr, 0));
+  };
+  std::ptrdiff_t less = 0, enough = end - in;
+  if (count == 0) return in;
+  while (enough - less > 1) {
+    const std::ptrdiff_t middle = less + (enough - less) / 2;
+    (characters(middle) < count ? less : enough) = middle;
+  }
+  // A character that is cut may count as one already: its other bytes add none.
+  while (enough < end - in && characters(enough + 1) == characters(enough)) ++enough;
+  return in + enough;
 }
 
 void STextDecoder::ThrowLoss() const {
@@ -195,7 +261,7 @@ void STextDecoder::ThrowLoss() const {
       if (m_isLossIllegal) throw SEIOCantMap_MBCS_UTF16(code(0x8099005C), 212);
       throw SEIOCantMap_MBCS_UTF16();
     default:
-      if ((m_encoding & Support::kUtf8Form) == 0) throw SEEncodingException(code(0x80990067), 217);
+      if ((m_encoding & Support::kUtf8Form) == 0) throw SEEncodingException(kUnexpected, 217);
       if (m_isLossIllegal) throw SEIOCantMap_UTF8_UTF16(code(0x8099005D), 213);
       throw SEIOCantMap_UTF8_UTF16();
   }

@@ -3,12 +3,17 @@
 
 #include <cstdint>
 
+#include "qxcore/core/memory.h"
 #include "qxcore/stream/encoding/multi_format_support.h"
 #include "qxcore/stream/output_stream.h"
 
 class STextEncoder {
  public:
   using Encoding = SAbstractIO::SMultiFormatSupport::Encoding;  // see multi_format_support.h
+
+  // Through the library's memory, like everything.
+  static void* operator new(std::size_t size) { return SMemAlloc(size); }
+  static void operator delete(void* block) { SMemFree(block); }
 
   // The target, with the lossless policy or without.
   void Select(Encoding encoding) { m_encoding = encoding; }

@@ -1,7 +1,4 @@
-// UTF-8 to UTF-16: sequences of one to three bytes, as the library reads them.
-//
-// Surrogates in three bytes each are taken as they stand, because the library's own files hold them
-// so; sequences of four bytes are not supported. Overlong forms are illegal (Unicode 15, table 3-7).
+// UTF-8 to UTF-16, as far as all is well; what stands in the way is looked at with platform::StepUtf8.
 #pragma once
 
 #include <cstddef>
@@ -13,19 +10,14 @@ struct SUtf8Run {
   WCHAR* out;               // behind the last character
 };
 
-// Decodes until the end or the first sequence that is cut, illegal or not supported. `out` has room for
-// end - in characters.
+// Decodes sequences of one to three bytes until the end or the first sequence that is cut, illegal or longer.
+// Surrogates in three bytes each are taken as they stand, because files of the library hold them so; overlong forms are
+// illegal (Unicode 15, table 3-7). `out` has room for end - in characters.
 SUtf8Run SDecodeUtf8(const unsigned char* in, const unsigned char* end, WCHAR* out);
 
-// The same without checking continuation bytes: stops at a cut sequence, a stray continuation byte
+// The same by the standard alone: sequences of four bytes become surrogate pairs, surrogates are illegal.
+SUtf8Run SDecodeFullUtf8(const unsigned char* in, const unsigned char* end, WCHAR* out);
+
+// Like SDecodeUtf8 without checking continuation bytes: stops at a cut sequence, a stray continuation byte
 // or a lead byte of four and more.
 SUtf8Run SDecodeUtf8Quick(const unsigned char* in, const unsigned char* end, WCHAR* out);
-
-// What stands where decoding stopped.
-struct SUtf8Obstacle {
-  std::ptrdiff_t length;  // bytes to pass over: a whole sequence of four, or the longest beginning of one
-  bool isIllegal;         // no UTF-8 at all
-  bool isCut;             // the end came before the sequence could be judged
-};
-// Looks at the place where a decoder stopped, which is not the end.
-SUtf8Obstacle SLookAtUtf8(const unsigned char* in, const unsigned char* end);

@@ -11,6 +11,8 @@
 
 #include <cstdint>
 
+#include "qxcore/platform/internal/utf.h"
+
 bool SCanDecodeUtf8Avx512() {
   return __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512bw") &&
          __builtin_cpu_supports("avx512vl") && __builtin_cpu_supports("avx512vbmi2");
@@ -32,9 +34,10 @@ struct Layout {
   bool isGood;
 };
 
-bool IsContinuation(unsigned char byte) { return (byte & 0xC0) == 0x80; }
+using platform::IsUtf8Continuation;
 
-QXCORE_TARGET inline Layout Check(const unsigned char* in, __m512i bytes, std::uint64_t above, std::uint64_t expected) {
+QXCORE_TARGET inline Layout Check(const unsigned char* in, __m512i bytes, std::uint64_t above, std::uint64_t expected,
+                                  bool full) {
   Layout layout;
   // As signed numbers the continuation bytes are those below 0xC0.
   layout.continuation = _mm512_cmplt_epi8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xC0)));
@@ -48,11 +51,14 @@ QXCORE_TARGET inline Layout Check(const unsigned char* in, __m512i bytes, std::u
   expected |= leads << 1 | fromE0 << 2;
   const std::uint64_t overlong = (leads & belowC2) | (isE0 << 1 & belowA0);
   layout.expects = leads >> 63 | fromE0 >> 62;
-  layout.isGood = ((expected ^ layout.continuation) | fromF0 | overlong) == 0;
+  const std::uint64_t surrogates =
+      full ? _mm512_cmpeq_epi8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xED))) << 1 & ~belowA0 : 0;
+  layout.isGood = ((expected ^ layout.continuation) | fromF0 | overlong | surrogates) == 0;
   if (layout.expects != 0) {  // the characters that reach beyond the block are decoded with it
-    layout.isGood = layout.isGood && IsContinuation(in[kBlock]) &&
-                    ((layout.expects & 2) == 0 || IsContinuation(in[kBlock + 1])) &&
-                    !(in[kBlock - 1] == 0xE0 && in[kBlock] < 0xA0);
+    layout.isGood = layout.isGood && IsUtf8Continuation(in[kBlock]) &&
+                    ((layout.expects & 2) == 0 || IsUtf8Continuation(in[kBlock + 1])) &&
+                    !(in[kBlock - 1] == 0xE0 && in[kBlock] < 0xA0) &&
+                    !(full && in[kBlock - 1] == 0xED && in[kBlock] >= 0xA0);
   }
   return layout;
 }
@@ -85,7 +91,7 @@ QXCORE_TARGET inline WCHAR* DecodeHalf(const unsigned char* in, std::uint32_t ab
 
 }  // namespace
 
-QXCORE_TARGET SUtf8Run SDecodeUtf8Avx512(const unsigned char* in, const unsigned char* end, WCHAR* out) {
+QXCORE_TARGET SUtf8Run SDecodeUtf8Avx512(const unsigned char* in, const unsigned char* end, WCHAR* out, bool full) {
   std::uint64_t expected = 0;  // continuation bytes that belong to the block before
   for (; end - in >= kReach; in += kBlock) {
     const __m512i bytes = _mm512_loadu_si512(in);
@@ -96,7 +102,7 @@ QXCORE_TARGET SUtf8Run SDecodeUtf8Avx512(const unsigned char* in, const unsigned
       out += kBlock;
       continue;
     }
-    const Layout layout = Check(in, bytes, above, expected);
+    const Layout layout = Check(in, bytes, above, expected, full);
     if (!layout.isGood) break;
     const auto lower = [](std::uint64_t mask) { return static_cast<std::uint32_t>(mask); };
     const auto upper = [](std::uint64_t mask) { return static_cast<std::uint32_t>(mask >> kHalf); };

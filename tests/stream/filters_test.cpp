@@ -1,0 +1,187 @@
+// Every pair of filters over sources that give one byte at a time or throw under way.
+
+#include <zlib.h>
+
+#include <functional>
+#include <memory>
+#include <vector>
+
+#include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/input_binary_stream.h"
+#include "qxcore/stream/input_buffer_stream.h"
+#include "qxcore/stream/input_pushback_stream.h"
+#include "qxcore/stream/java_unicode_escape_filter_stream.h"
+#include "qxcore/stream/output_binary_stream.h"
+#include "qxcore/stream/zip/inflater_input_stream.h"
+#include "qxcore/stream/zip/zip_input_stream.h"
+#include "tests/stream/reader_fixture.h"
+#include "tests/stream/zip_builder.h"
+
+namespace {
+
+std::string Deflate(const std::string& bytes) {
+  z_stream stream = {};
+  deflateInit2(&stream, 6, Z_DEFLATED, -15, 8, Z_DEFAULT_STRATEGY);
+  std::string result(deflateBound(&stream, static_cast<uLong>(bytes.size())), 0);
+  stream.next_in = reinterpret_cast<Bytef*>(const_cast<char*>(bytes.data()));
+  stream.avail_in = static_cast<uInt>(bytes.size());
+  stream.next_out = reinterpret_cast<Bytef*>(result.data());
+  stream.avail_out = static_cast<uInt>(result.size());
+  deflate(&stream, Z_FINISH);
+  result.resize(stream.total_out);
+  deflateEnd(&stream);
+  return result;
+}
+
+// A filter over an owned stream, and what its source must hold so that it gives `bytes`.
+struct Filter {
+  const char* name;
+  std::function<SInputStream*(SInputStream*)> make;
+  std::function<std::string(const std::string&)> source;
+  bool mayBeShort = false;  // reads may give less than is there
+};
+
+std::string Same(const std::string& bytes) { return bytes; }
+
+std::string Archive(const std::string& bytes, bool deflated) {
+  test::ZipBuilder zip;
+  zip.parts.emplace_back("entry", bytes, deflated);
+  return zip.Make();
+}
+
+SInputStream* OpenFirst(SInputStream* in) {
+  auto* zip = new SZipInputStream(in, true);
+  zip->GetNextEntry();
+  return zip;
+}
+
+const std::vector<Filter>& Filters() {
+  static const std::vector<Filter> filters = {
+      {"buffer", [](SInputStream* in) { return new SInputBufferStream(in, 0, true); }, Same},
+      {"small buffer", [](SInputStream* in) { return new SInputBufferStream(in, 7, true); }, Same},
+      {"marked buffer",
+       [](SInputStream* in) {
+         auto* buffer = new SInputBufferStream(in, 16, true);
+         buffer->Mark(64);
+         return buffer;
+       },
+       Same},
+      {"push-back",
+       [](SInputStream* in) {
+         auto* pushback = new SInputPushbackStream(in, 3, true);
+         pushback->Unread(static_cast<unsigned char>(pushback->Read()));
+         return pushback;
+       },
+       Same},
+      {"inflater", [](SInputStream* in) { return new SInflaterInputStream(in, 33, true); }, Deflate, true},
+      {"stored entry", OpenFirst, [](const std::string& bytes) { return Archive(bytes, false); }},
+      {"deflated entry", OpenFirst, [](const std::string& bytes) { return Archive(bytes, true); }}};
+  return filters;
+}
+
+std::string Payload() {
+  std::string bytes;
+  RandomText random(3);
+  while (bytes.size() < 6000) bytes += "word " + std::to_string(random.Number(1000)) + "\n";
+  return bytes;
+}
+
+TEST(PairsOfFilters, OverASourceOfSingleBytes_GiveWhatIsAskedFor) {
+  const std::string bytes = Payload();
+  for (const Filter& outer : Filters()) {
+    for (const Filter& inner : Filters()) {
+      SCOPED_TRACE(std::string(outer.name) + " over " + inner.name);
+      const auto open = [&] {
+        return std::unique_ptr<SInputStream>(
+            outer.make(inner.make(new PiecewiseInput(inner.source(outer.source(bytes)), 1))));
+      };
+      for (unsigned long count : {1ul, 7ul, 300ul, 5000ul}) {
+        const auto in = open();
+        std::string got;
+        std::vector<char> block(count);
+        while (const unsigned long size = in->Read(block.data(), count)) {
+          got.append(block.data(), size);
+          if (!outer.mayBeShort && got.size() < bytes.size()) {
+            ASSERT_EQ(size, count) << "short before the end";
+          }
+        }
+        ASSERT_EQ(got, bytes);
+      }
+      const auto in = open();
+      unsigned long skipped = 0;
+      while (const unsigned long more = in->Skip(4000 - skipped)) skipped += more;
+      ASSERT_EQ(skipped, 4000u);
+      ASSERT_EQ(in->Read(), static_cast<unsigned char>(bytes[4000]));
+    }
+  }
+}
+
+// What needs so many bytes gets them, or says that they are not there.
+TEST(PairsOfFilters, BinaryTextsAndReadersOverShortReads) {
+  CollectingOutput out;
+  SOutputBinaryStream writer(out);
+  const SString text = SString::FromUtf8(Payload());
+  const SString accents = WTEXT("\u00E9\u20AC");
+  for (int i = 0; i < 50; ++i) writer << accents << text;
+  for (const Filter& filter : Filters()) {
+    SCOPED_TRACE(filter.name);
+    SInputBinaryStream in(filter.make(new PiecewiseInput(filter.source(out.bytes), 1)), true);
+    for (int i = 0; i < 50; ++i) {
+      SString first, second;
+      in >> first >> second;
+      ASSERT_EQ(first, accents);
+      ASSERT_EQ(second, text);
+    }
+    const std::string utf8 = accents.ToUtf8() + Payload();
+    const std::unique_ptr<SInputStream> source(filter.make(new PiecewiseInput(filter.source(utf8), 1)));
+    EXPECT_EQ(ReadFrom(*source, Support::kUTF8 | Support::kFullDetect).text, accents + text);
+    auto* again = new SMultiFormatReaderUnicode(filter.make(new PiecewiseInput(filter.source(utf8), 1)), Support::kUTF8, true);
+    SJavaUnicodeEscapeFilterStream escaped(again, true);
+    std::string all(utf8.size() + 100, 0);
+    all.resize(escaped.Read(all.data(), static_cast<unsigned long>(all.size())));
+    EXPECT_EQ(SJavaUnicodeEscapeFilterStream::Unescape(all.c_str(), nullptr), accents + text);
+  }
+}
+
+// Throws at every n-th read.
+class CancellingInput : public PiecewiseInput {
+ public:
+  CancellingInput(std::string bytes, unsigned long piece, int every)
+      : PiecewiseInput(std::move(bytes), piece), m_every(every) {}
+  unsigned long Read(void* buffer, unsigned long count) override {
+    if (++m_asked % m_every == 0) throw SEIOAbortedException();
+    return PiecewiseInput::Read(buffer, count);
+  }
+  int Read() override {
+    unsigned char byte;
+    return Read(&byte, 1) == 1 ? byte : -1;
+  }
+
+ private:
+  int m_every;
+  int m_asked = 0;
+};
+
+TEST(PairsOfFilters, CancelledReadsLoseNothing) {
+  const std::string bytes = Payload();
+  for (std::size_t outer = 0; outer < 4; ++outer) {  // an archive that throws is of no more use
+    for (std::size_t inner = 0; inner < 4; ++inner) {
+      SCOPED_TRACE(std::string(Filters()[outer].name) + " over " + Filters()[inner].name);
+      for (unsigned long count : {1ul, 50ul, 3000ul}) {
+        std::unique_ptr<SInputStream> in(
+            Filters()[outer].make(Filters()[inner].make(new CancellingInput(bytes, 11, 4))));
+        std::string got;
+        std::vector<char> block(count);
+        for (int steps = 0; got.size() < bytes.size() && steps < 100000; ++steps) {
+          try {
+            got.append(block.data(), in->Read(block.data(), count));
+          } catch (const SEIOAbortedException&) {
+          }
+        }
+        ASSERT_EQ(got, bytes) << count;
+      }
+    }
+  }
+}
+
+}  // namespace
