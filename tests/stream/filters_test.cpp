@@ -135,7 +135,8 @@ TEST(PairsOfFilters, BinaryTextsAndReadersOverShortReads) {
     const std::string utf8 = accents.ToUtf8() + Payload();
     const std::unique_ptr<SInputStream> source(filter.make(new PiecewiseInput(filter.source(utf8), 1)));
     EXPECT_EQ(ReadFrom(*source, Support::kUTF8 | Support::kFullDetect).text, accents + text);
-    auto* again = new SMultiFormatReaderUnicode(filter.make(new PiecewiseInput(filter.source(utf8), 1)), Support::kUTF8, true);
+    auto* again =
+        new SMultiFormatReaderUnicode(filter.make(new PiecewiseInput(filter.source(utf8), 1)), Support::kUTF8, true);
     SJavaUnicodeEscapeFilterStream escaped(again, true);
     std::string all(utf8.size() + 100, 0);
     all.resize(escaped.Read(all.data(), static_cast<unsigned long>(all.size())));

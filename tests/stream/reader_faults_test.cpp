@@ -38,8 +38,12 @@ TEST(ProvisionalChoice, BecomesAPageThatIsDecodedAsAWhole) {
   const struct {
     unsigned page;
     const char* unit;
-  } kPages[] = {{54936, "\xD6\xD0\x81\x30\x81\x30 "}, {51932, "\xC6\xFC "}, {50220, "\x1B$B\x46\x7C\x1B(B "},
-                {52936, "~{VPND~} "},                 {57002, "\xB3\xD1 "}, {51949, "\xC7\xD1 "}};
+  } kPages[] = {{54936, "\xD6\xD0\x81\x30\x81\x30 "},
+                {51932, "\xC6\xFC "},
+                {50220, "\x1B$B\x46\x7C\x1B(B "},
+                {52936, "~{VPND~} "},
+                {57002, "\xB3\xD1 "},
+                {51949, "\xC7\xD1 "}};
   int chosen = 0;
   for (const auto& one : kPages) {
     if (!IsValidCodePage(one.page)) continue;
@@ -347,16 +351,17 @@ TEST(FullUnicode, EveryCharacterComesBack) {
 
 TEST(FullUnicode, JudgesByTheStandard) {
   const auto select = [](const std::string& bytes) {
-    return ReadBytes("plain text before \xC3\xA9 " + bytes + " and behind, long enough for a block: " +
-                         std::string(70, '.'),
-                     kAnsi | kFull | kGuess | kStandard)
-               .selected & Support::kValueMask;
+    return ReadBytes(
+               "plain text before \xC3\xA9 " + bytes + " and behind, long enough for a block: " + std::string(70, '.'),
+               kAnsi | kFull | kGuess | kStandard)
+               .selected &
+           Support::kValueMask;
   };
   for (const char* good : {"\xF0\x9F\x98\x80", "\xF4\x8F\xBF\xBF", "\xED\x9F\xBF", "\xEE\x80\x80", "\xE0\xA0\x80"}) {
     EXPECT_EQ(select(good), Support::kUTF8);
   }
-  for (const char* bad : {"\xC0\x80", "\xC1\xBF", "\xE0\x9F\xBF", "\xED\xA0\x80", "\xF0\x8F\xBF\xBF", "\xF4\x90\x80\x80",
-                          "\xF5\x80\x80\x80", "\xF0\x9F\x98", "\x80"}) {
+  for (const char* bad : {"\xC0\x80", "\xC1\xBF", "\xE0\x9F\xBF", "\xED\xA0\x80", "\xF0\x8F\xBF\xBF",
+                          "\xF4\x90\x80\x80", "\xF5\x80\x80\x80", "\xF0\x9F\x98", "\x80"}) {
     EXPECT_EQ(select(bad), kAnsi);
   }
   EXPECT_EQ(ReadBytes("a\xED\xA0\x80z", Support::kUTF8 | kStandard).text, WTEXT("a\uFFFD\uFFFD\uFFFDz"));
@@ -364,15 +369,16 @@ TEST(FullUnicode, JudgesByTheStandard) {
   // Every short sequence of bytes: the reader and the string's own conversion are of one opinion.
   RandomText random(5);
   for (int round = 0; round < 20000; ++round) {
-    constexpr unsigned char kBytes[] = {'a', 0x80, 0x8F, 0x90, 0x9F, 0xA0, 0xBF, 0xC1, 0xC2, 0xDF, 0xE0,
-                                        0xE1, 0xED, 0xEF, 0xF0, 0xF1, 0xF4, 0xF5, 0xFF};
+    constexpr unsigned char kBytes[] = {'a',  0x80, 0x8F, 0x90, 0x9F, 0xA0, 0xBF, 0xC1, 0xC2, 0xDF,
+                                        0xE0, 0xE1, 0xED, 0xEF, 0xF0, 0xF1, 0xF4, 0xF5, 0xFF};
     std::string bytes(static_cast<std::size_t>(random.Number(90)), 'p');
     for (int i = 0; i < 7; ++i) bytes += static_cast<char>(kBytes[random.Number(static_cast<int>(std::size(kBytes)))]);
     bytes += std::string(static_cast<std::size_t>(random.Number(90)), 'q');
     const ReadResult result = ReadBytes(bytes, Support::kUTF8 | kStandard, 1 + static_cast<unsigned>(round % 97));
     ASSERT_EQ(result.text, SString::FromUtf8(bytes)) << round;
     const bool isValid = result.loss.IsEmpty() && !result.text.IsEmpty();
-    const bool hasHigh = std::any_of(bytes.begin(), bytes.end(), [](char c) { return static_cast<unsigned char>(c) >= 0x80; });
+    const bool hasHigh =
+        std::any_of(bytes.begin(), bytes.end(), [](char c) { return static_cast<unsigned char>(c) >= 0x80; });
     if (bytes.size() < 3 || !hasHigh) continue;
     const Encoding selected = ReadBytes(bytes, kAnsi | kFull | kGuess | kStandard).selected & Support::kFormatMask;
     if (isValid) {
@@ -382,7 +388,8 @@ TEST(FullUnicode, JudgesByTheStandard) {
 }
 
 TEST(FullUnicode, Utf16OfPlainBytesIsRecognised) {
-  const SString russian = WTEXT("\u041F\u0440\u0438\u0432\u0435\u0442, \u043C\u0438\u0440! \u0413\u043E\u0434 2024\r\n");
+  const SString russian =
+      WTEXT("\u041F\u0440\u0438\u0432\u0435\u0442, \u043C\u0438\u0440! \u0413\u043E\u0434 2024\r\n");
   const SString thai = WTEXT("\u0E2A\u0E27\u0E31\u0E2A\u0E14\u0E35 \u0E0A\u0E32\u0E27\u0E42\u0E25\u0E01\r\n");
   const SString latin = WTEXT("Only letters of ASCII, in sixteen bits each.\r\n");
   const Encoding request = kAnsi | kFull | kGuess | kStandard;
@@ -391,7 +398,8 @@ TEST(FullUnicode, Utf16OfPlainBytesIsRecognised) {
     EXPECT_EQ(ReadBytes(Utf16Bytes(text, true), request).selected & Support::kFormatMask, Support::kUTF16BE);
     EXPECT_EQ(ReadBytes(Utf16Bytes(text, true), request).text, text);
   }
-  for (const char* plain : {"just text\twith tabs\r\nand lines\n", "\x01\x02\x03\x04 controls \x1B[0m of a terminal\x07"}) {
+  for (const char* plain :
+       {"just text\twith tabs\r\nand lines\n", "\x01\x02\x03\x04 controls \x1B[0m of a terminal\x07"}) {
     EXPECT_EQ(ReadBytes(plain, request).selected & Support::kValueMask, Support::kASCII);
   }
   EXPECT_EQ(ReadBytes(std::string("a record\0of fields\0\0", 20), request).selected & Support::kValueMask,

@@ -18,7 +18,7 @@ class QXCORE_API SMultiFormatReaderStatusBase {
 
   // A growing buffer: bytes lie from start to end, in a block of `capacity` bytes.
   struct BufferStatus {
-    unsigned char* block = nullptr;
+    unsigned char* block = nullptr;  // the bytes in use and the room around them
     unsigned char* start = nullptr;  // first byte not used yet
     unsigned char* end = nullptr;    // behind the last byte
     unsigned long capacity = 0;      // bytes of the block

@@ -28,11 +28,11 @@ struct SFormatChoice {
 
   State state = State::kNone;
   Failure failure = Failure::kNothing;
-  Encoding selected = 0;         // with the requested policy
-  unsigned markLength = 0;       // bytes of a byte order mark at the start of the sample, which are no text
-  bool wasDetected = false;      // encodings were looked for
-  SDetectionCounters counters;   // the evidence of the last detection
-  SEncodingGuess guess;          // what was made of it
+  Encoding selected = 0;        // with the requested policy
+  unsigned markLength = 0;      // bytes of a byte order mark at the start of the sample, which are no text
+  bool wasDetected = false;     // encodings were looked for
+  SDetectionCounters counters;  // the evidence of the last detection
+  SEncodingGuess guess;         // what was made of it
   bool NeedsWarning() const { return guess.needsWarning; }
 };
 

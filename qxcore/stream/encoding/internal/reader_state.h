@@ -15,7 +15,7 @@ struct SReaderState {
 
   SRawInput raw;
   SFormatChoice choice;
-  STextDecoder decoder;  // of the selected encoding; counts the losses
-  SEncodingGuess guess;  // what the library's own GuessEncoding made of the evidence last
+  STextDecoder decoder;     // of the selected encoding; counts the losses
+  SEncodingGuess guess;     // what the library's own GuessEncoding made of the evidence last
   bool isComplete = false;  // the evidence is that of the whole input
 };

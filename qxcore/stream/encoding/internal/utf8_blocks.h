@@ -31,10 +31,9 @@ class SUtf8BlockWalk {
     if constexpr (kFull) {
       due |= block.fromF0 << 3;
       // The range of the second byte rules out overlong forms, surrogates and values above U+10FFFF.
-      const std::uint64_t wrong = ((block.isE0 << 1 | m_afterE0) & block.belowA0) |
-                                  ((block.isED << 1 | m_afterED) & ~block.belowA0) |
-                                  ((block.isF0 << 1 | m_afterF0) & block.below90) |
-                                  ((block.isF4 << 1 | m_afterF4) & ~block.below90);
+      const std::uint64_t wrong =
+          ((block.isE0 << 1 | m_afterE0) & block.belowA0) | ((block.isED << 1 | m_afterED) & ~block.belowA0) |
+          ((block.isF0 << 1 | m_afterF0) & block.below90) | ((block.isF4 << 1 | m_afterF4) & ~block.below90);
       if ((block.never | wrong) != 0) return false;
     } else if (block.fromF0 != 0) {
       return false;
