@@ -23,6 +23,12 @@
 
 #include <commctrl.h>
 
+// From a header whose other macros are named like members of the library.
+#ifndef GET_X_LPARAM
+#define GET_X_LPARAM(lParam) ((int)(short)LOWORD(lParam))
+#define GET_Y_LPARAM(lParam) ((int)(short)HIWORD(lParam))
+#endif
+
 #define WTEXT_PASTE(text) L##text
 #define WTEXT(text) WTEXT_PASTE(text)
 
@@ -134,7 +140,14 @@ using REGSAM = DWORD;
 #define CreateMetaFile CreateMetaFileW
 #define CreateEnhMetaFile CreateEnhMetaFileW
 
+#include "qxcore/platform/win32/control.h"
+#include "qxcore/platform/win32/dialog.h"
 #include "qxcore/platform/win32/functions.h"
+#include "qxcore/platform/win32/input.h"
+#include "qxcore/platform/win32/menu.h"
+#include "qxcore/platform/win32/message.h"
+#include "qxcore/platform/win32/scroll.h"
+#include "qxcore/platform/win32/window.h"
 
 #endif
 

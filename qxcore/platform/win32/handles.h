@@ -53,6 +53,7 @@ using INT_PTR = std::intptr_t;
 using LPARAM = LONG_PTR;
 using LRESULT = LONG_PTR;
 using ATOM = WORD;
+using WNDPROC = LRESULT(CALLBACK*)(HWND, UINT, WPARAM, LPARAM);
 
 // --- geometry, in pixels unless a call says otherwise; right and bottom lie outside a rectangle ---
 

@@ -1,0 +1,325 @@
+// Which parts of windows are invalid: kept with the window as a region, turned into WM_PAINT when the queue is
+// otherwise empty.
+
+#include "qxcore/platform/posix/window/controls.h"
+#include "qxcore/platform/posix/window/frame.h"
+#include "qxcore/platform/posix/window/paint.h"
+#include "qxcore/platform/posix/window/place.h"
+#include "qxcore/platform/posix/window/queue.h"
+#include "qxcore/platform/posix/window/send.h"
+#include "qxcore/platform/posix/window/tree.h"
+
+namespace platform::model {
+namespace {
+
+// What the parents' client areas leave of the window.
+RECT ClipByParents(const Window* window) {
+  RECT clip = AtOrigin(window->window);
+  int dx = window->window.left, dy = window->window.top;
+  for (const Window* above = window->parent; above != nullptr && !IsRoot(above); above = above->parent) {
+    clip = Common(clip, Moved(AtOrigin(above->client), -dx, -dy));
+    dx += above->client.left;
+    dy += above->client.top;
+  }
+  return clip;
+}
+
+// A child's rectangle relative to the parent's window.
+RECT ChildInWindow(const Window* parent, const Window* child) {
+  const RECT client = ClientInWindow(parent);
+  return Moved(child->window, client.left, client.top);
+}
+
+void InvalidateChildren(Window* window, const Region& region, Erase erase, Children children) {
+  for (Window* child = window->firstChild; child != nullptr; child = child->next) {
+    if (!child->IsVisible()) continue;
+    const RECT place = ChildInWindow(window, child);
+    Region part = region;
+    part.Intersect(place);
+    if (part.IsEmpty()) continue;
+    part.Move(-place.left, -place.top);
+    Invalidate(child, part, erase, children);
+  }
+}
+
+void MarkInvalid(Window* window, const Region& region, Erase erase) {
+  const RECT client = ClientInWindow(window);
+  Region outside = region;
+  outside.Subtract(client);
+  Region inside = region;
+  inside.Intersect(client);
+  if (!outside.IsEmpty()) window->frameUpdate = true;
+  if (!inside.IsEmpty() && erase == Erase::Yes) window->eraseUpdate = true;
+  window->update.Add(region);
+  SetWantsPaint(window, true);
+}
+
+Region SiblingsBelow(const Window* window) {
+  Region region;
+  for (const Window* other = window->previous; other != nullptr; other = other->previous)
+    if (other->IsVisible()) region.Add(Moved(other->window, -window->window.left, -window->window.top));
+  return region;
+}
+
+}  // namespace
+
+void SetWantsPaint(Window* window, bool wants) {
+  if (window->wantsPaint == wants) return;
+  window->wantsPaint = wants;
+  const int step = wants ? 1 : -1;
+  for (Window* each = window; each != nullptr; each = each->parent) each->childPaints += step;
+  window->thread->paints += step;
+  if (!wants) return;
+  window->thread->changed |= QS_PAINT;
+  if (!window->thread->isWoken) Wake(window->thread);
+}
+
+void VisibleRegion(const Window* window, bool withoutChildren, Region* region) {
+  region->Clear();
+  if (!IsShown(window)) return;
+  region->Add(ClipByParents(window));
+  int dx = 0, dy = 0;
+  for (const Window* each = window; !IsRoot(each) && !IsRoot(each->parent); each = each->parent) {
+    if (each->style & WS_CLIPSIBLINGS) {
+      Region covered = SiblingsBelow(each);
+      covered.Move(dx, dy);
+      region->Subtract(covered);
+    }
+    const RECT place = ChildInWindow(each->parent, each);
+    dx -= place.left;
+    dy -= place.top;
+  }
+  if (!withoutChildren) return;
+  for (const Window* child = window->firstChild; child != nullptr; child = child->next)
+    if (child->IsVisible()) region->Subtract(ChildInWindow(window, child));
+}
+
+void Invalidate(Window* window, const Region& region, Erase erase, Children children) {
+  if (IsRoot(window) || !IsShown(window)) return;
+  Region part = region;
+  part.Intersect(ClipByParents(window));
+  if (part.IsEmpty()) return;
+  const bool clips = window->style & WS_CLIPCHILDREN;
+  if (children == Children::All || (children == Children::Unclipped && !clips))
+    InvalidateChildren(window, part, erase, children);
+  if (clips)
+    for (const Window* child = window->firstChild; child != nullptr; child = child->next)
+      if (child->IsVisible()) part.Subtract(ChildInWindow(window, child));
+  if (!part.IsEmpty()) MarkInvalid(window, part, erase);
+}
+
+void Validate(Window* window, const Region* region, Children children) {
+  if (region != nullptr) {
+    window->update.Subtract(*region);
+  } else {
+    window->update.Clear();
+  }
+  if (window->update.IsEmpty()) {
+    window->eraseUpdate = window->frameUpdate = false;
+    if (!window->internalPaint) SetWantsPaint(window, false);
+  }
+  if (children == Children::No || window->childPaints == 0) return;
+  for (Window* child = window->firstChild; child != nullptr; child = child->next) {
+    if (region == nullptr) {
+      Validate(child, nullptr, children);
+      continue;
+    }
+    const RECT place = ChildInWindow(window, child);
+    Region part = *region;
+    part.Move(-place.left, -place.top);
+    Validate(child, &part, children);
+  }
+}
+
+void DropPaint(Window* window) {
+  if (window->childPaints == 0) return;
+  window->internalPaint = false;
+  Validate(window, nullptr, Children::No);
+  for (Window* child = window->firstChild; child != nullptr; child = child->next) DropPaint(child);
+}
+
+void InvalidateCovered(Window* parent, const RECT& covered) {
+  if (IsRoot(parent)) return;
+  const RECT client = ClientInWindow(parent);
+  Region region(Moved(covered, client.left, client.top));
+  region.Intersect(client);
+  Invalidate(parent, region, Erase::Yes, Children::All);
+}
+
+void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
+  const bool isShown = IsShown(window);
+  if (wasShown && !IsRoot(window->parent)) {
+    Region exposed(oldWindow);
+    if (isShown) exposed.Subtract(window->window);
+    const RECT client = ClientInWindow(window->parent);
+    exposed.Move(client.left, client.top);
+    exposed.Intersect(client);
+    if (!exposed.IsEmpty()) Invalidate(window->parent, exposed, Erase::Yes, Children::All);
+  }
+  if (!isShown) return;
+  const RECT whole = AtOrigin(window->window);
+  if (!wasShown) {
+    Invalidate(window, Region(whole), Erase::Yes, Children::All);
+    return;
+  }
+  const bool sameSize = Width(oldWindow) == Width(whole) && Height(oldWindow) == Height(whole);
+  if (sameSize && !(flags & SWP_FRAMECHANGED) && !(flags & SWP_NOCOPYBITS)) return;
+  Region spoiled(whole);
+  const UINT classStyle = window->windowClass->style;
+  const bool redraws = (flags & SWP_NOCOPYBITS) ||
+                       ((classStyle & CS_HREDRAW) && Width(oldClient) != Width(window->client)) ||
+                       ((classStyle & CS_VREDRAW) && Height(oldClient) != Height(window->client));
+  if (!redraws) {
+    RECT kept = ClientInWindow(window);
+    kept.right = std::min(kept.right, kept.left + Width(oldClient));
+    kept.bottom = std::min(kept.bottom, kept.top + Height(oldClient));
+    spoiled.Subtract(kept);
+  }
+  const RECT oldPlace = Moved(oldClient, -oldWindow.left, -oldWindow.top);
+  if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return;
+  Invalidate(window, spoiled, Erase::Yes, Children::Unclipped);
+}
+
+bool TakePaint(Thread* thread, MSG* message, const Filter& filter, bool remove) {
+  if (thread->paints == 0 || !filter.FitsMessage(WM_PAINT)) return false;
+  const Window* top = Desktop();
+  for (Window* window = top->firstChild; window != nullptr;) {
+    if (window->wantsPaint && window->thread == thread && filter.FitsWindow(window->handle)) {
+      *message = {window->handle, WM_PAINT, 0, 0, static_cast<DWORD>(Now()), g_cursorPoint};
+      if (remove && window->internalPaint) {
+        window->internalPaint = false;
+        if (window->update.IsEmpty()) SetWantsPaint(window, false);
+      }
+      return true;
+    }
+    // Into the children only where one of them wants it.
+    if (window->childPaints > (window->wantsPaint ? 1 : 0) && window->firstChild != nullptr) {
+      window = window->firstChild;
+      continue;
+    }
+    while (window != top && window->next == nullptr) window = window->parent;
+    window = window != top ? window->next : nullptr;
+  }
+  return false;
+}
+
+}  // namespace platform::model
+
+using namespace platform::model;
+
+namespace {
+
+// A rectangle or region of the client area as a region of the window; the whole client area for neither.
+bool Wanted(const Window* window, const RECT* rect, HRGN handle, Region* region) {
+  const RECT client = ClientInWindow(window);
+  if (rect != nullptr) {
+    region->Add(*rect);
+  } else if (handle != nullptr) {
+    pixman_region32_t* given = platform::g_painter.region != nullptr ? platform::g_painter.region(handle) : nullptr;
+    if (given == nullptr) return Fail<bool>(ERROR_INVALID_HANDLE);
+    pixman_region32_copy(region->Pixman(), given);
+  } else {
+    region->Add(AtOrigin(client));
+  }
+  region->Move(client.left, client.top);
+  return true;
+}
+
+Children ChildrenOf(UINT flags) {
+  return flags & RDW_NOCHILDREN ? Children::No : flags & RDW_ALLCHILDREN ? Children::All : Children::Unclipped;
+}
+
+void Change(Window* window, const RECT* rect, HRGN handle, const Region& wanted, UINT flags) {
+  const Children children = ChildrenOf(flags);
+  if (flags & RDW_INVALIDATE) {
+    Region region = wanted;
+    if ((flags & RDW_FRAME) && rect == nullptr && handle == nullptr) {
+      region.Add(AtOrigin(window->window));
+    } else if (!(flags & RDW_FRAME)) {
+      region.Intersect(ClientInWindow(window));
+    }
+    Invalidate(window, region, flags & RDW_ERASE ? Erase::Yes : Erase::No, children);
+  } else if (flags & RDW_VALIDATE) {
+    if (flags & RDW_NOERASE) window->eraseUpdate = false;
+    if (flags & RDW_NOFRAME) window->frameUpdate = false;
+    const bool isAll = rect == nullptr && handle == nullptr;
+    Validate(window, isAll ? nullptr : &wanted, children == Children::Unclipped ? Children::All : children);
+  }
+  if (flags & RDW_INTERNALPAINT) {
+    window->internalPaint = true;
+    SetWantsPaint(window, true);
+  } else if (flags & RDW_NOINTERNALPAINT) {
+    window->internalPaint = false;
+    if (window->update.IsEmpty()) SetWantsPaint(window, false);
+  }
+}
+
+// The windows of a subtree that want WM_PAINT, parents first.
+platform::model::List<HWND> Waiting(HWND top, bool deep) {
+  platform::model::List<HWND> handles;
+  const Guard guard;
+  const Window* first = FindWindowObject(top);
+  if (first == nullptr) return handles;
+  for (const Window* window = first; window != nullptr; window = NextInTree(window, first)) {
+    if (window->wantsPaint) handles.push_back(window->handle);
+    if (!deep) break;
+  }
+  return handles;
+}
+
+bool StillWaits(HWND handle) {
+  const Guard guard;
+  const Window* window = FindWindowObject(handle);
+  return window != nullptr && window->wantsPaint;
+}
+
+void PaintNow(HWND top, bool deep) {
+  for (const HWND handle : Waiting(top, deep))
+    if (StillWaits(handle)) Send(handle, WM_PAINT);
+}
+
+}  // namespace
+
+BOOL RedrawWindow(HWND handle, const RECT* rect, HRGN region, UINT flags) {
+  return OrNoMemory<BOOL>(FALSE, [&]() -> BOOL {
+    if (handle == nullptr) handle = GetDesktopWindow();
+    {
+      const Guard guard;
+      Window* window = Expect(handle);
+      if (window == nullptr) return FALSE;
+      Region wanted;
+      if (!Wanted(window, rect, region, &wanted)) return FALSE;
+      Change(window, rect, region, wanted, flags);
+    }
+    const bool deep = !(flags & RDW_NOCHILDREN);
+    if (flags & RDW_UPDATENOW) {
+      PaintNow(handle, deep);
+    } else if (flags & RDW_ERASENOW) {
+      for (const HWND each : Waiting(handle, deep)) EraseNow(each);
+    }
+    return TRUE;
+  });
+}
+
+BOOL UpdateWindow(HWND window) { return RedrawWindow(window, nullptr, nullptr, RDW_UPDATENOW | RDW_ALLCHILDREN); }
+
+// A null window means all windows, as published.
+BOOL InvalidateRect(HWND window, const RECT* rect, BOOL erase) {
+  if (window == nullptr) {
+    const UINT flags = RDW_INVALIDATE | RDW_ALLCHILDREN | RDW_ERASE | RDW_FRAME | RDW_ERASENOW;
+    return RedrawWindow(nullptr, nullptr, nullptr, flags);
+  }
+  return RedrawWindow(window, rect, nullptr, RDW_INVALIDATE | (erase ? RDW_ERASE : 0));
+}
+
+BOOL InvalidateRgn(HWND window, HRGN region, BOOL erase) {
+  return RedrawWindow(window, nullptr, region, RDW_INVALIDATE | (erase ? RDW_ERASE : 0));
+}
+
+BOOL ValidateRect(HWND window, const RECT* rect) {
+  return RedrawWindow(window, rect, nullptr, RDW_VALIDATE | RDW_NOCHILDREN);
+}
+
+BOOL ValidateRgn(HWND window, HRGN region) {
+  return RedrawWindow(window, nullptr, region, RDW_VALIDATE | RDW_NOCHILDREN);
+}

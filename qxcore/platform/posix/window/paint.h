@@ -1,0 +1,32 @@
+// What of the windows must be painted. Regions are relative to a window's top left corner.
+#pragma once
+
+#include "qxcore/platform/posix/window/window.h"
+
+namespace platform::model {
+
+// All under the lock, up to EraseNow.
+
+enum class Erase { No, Yes };
+enum class Children { No, Unclipped, All };
+// Adds to what must be painted of a window, and of the children that lie there: none, those that the style
+// WS_CLIPCHILDREN does not keep out, or all.
+void Invalidate(Window* window, const Region& region, Erase erase, Children children);
+// Takes away, the children's as well if asked.
+void Validate(Window* window, const Region* region, Children children);
+// Forgets all that is to be painted of the window and what is below it.
+void DropPaint(Window* window);
+// Counts the window among those that want WM_PAINT, or no longer.
+void SetWantsPaint(Window* window, bool wants);
+// After a change of place: what comes to light of the parent, and what of the window itself.
+void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags);
+// After a change in the Z order of the children at a place of the parent's client area.
+void InvalidateCovered(Window* parent, const RECT& covered);
+// The part of the window that shows: without what parents cut off and what siblings above and children cover
+// where the styles say so. Relative to the window.
+void VisibleRegion(const Window* window, bool withoutChildren, Region* region);
+
+// Sends WM_NCPAINT and WM_ERASEBKGND if they are due. Without the lock.
+void EraseNow(HWND window);
+
+}  // namespace platform::model

@@ -1,0 +1,299 @@
+// SetWindowPos and its relatives. SetWindowPos reads as the list of what the program hears of it.
+
+#include "qxcore/platform/posix/window/place.h"
+
+#include "qxcore/platform/posix/display/display.h"
+#include "qxcore/platform/posix/window/activate.h"
+#include "qxcore/platform/posix/window/default_proc.h"
+#include "qxcore/platform/posix/window/paint.h"
+#include "qxcore/platform/posix/window/send.h"
+#include "qxcore/platform/posix/window/tree.h"
+
+namespace platform::model {
+namespace {
+
+constexpr UINT kAnyChange = SWP_NOSIZE | SWP_NOMOVE | SWP_NOZORDER | SWP_FRAMECHANGED | SWP_SHOWWINDOW | SWP_HIDEWINDOW;
+constexpr UINT kNoChange = SWP_NOSIZE | SWP_NOMOVE | SWP_NOZORDER;
+
+bool IsTopmost(const Window* window) { return window->exStyle & WS_EX_TOPMOST; }
+
+// The sibling below which the window belongs; null for the top. Windows that are topmost stay above the others.
+Window* PlaceInOrder(const Window* window, HWND after) {
+  Window* parent = window->parent;
+  if (after == HWND_BOTTOM) return parent->lastChild != window ? parent->lastChild : window->previous;
+  if (Window* above = FindWindowObject(after); above != nullptr && above != window && above->parent == parent)
+    return above;
+  if (IsTopmost(window)) return nullptr;
+  Window* last = nullptr;
+  if (parent == Desktop())
+    for (Window* each = parent->firstChild; each != nullptr && (IsTopmost(each) || each == window); each = each->next)
+      if (each != window) last = each;
+  return last;
+}
+
+// Whether the place in the Z order is the one that is asked for already.
+bool IsInPlace(const Window* window, HWND after) {
+  if (after == HWND_TOP) return window->previous == nullptr;
+  if (after == HWND_TOPMOST) return IsTopmost(window) && window->previous == nullptr;
+  if (after == HWND_NOTOPMOST) return !IsTopmost(window);
+  if (after == HWND_BOTTOM) return window->next == nullptr;
+  return after == window->handle || (window->previous != nullptr && window->previous->handle == after);
+}
+
+// Completes a request: what changes nothing is marked so. Under the lock.
+void Settle(const Window* window, WINDOWPOS& place) {
+  place.cx = std::clamp(place.cx, 0, 32767);
+  place.cy = std::clamp(place.cy, 0, 32767);
+  const RECT& now = window->window;
+  if (place.flags & SWP_NOSIZE) {
+    place.cx = Width(now);
+    place.cy = Height(now);
+  }
+  if (place.flags & SWP_NOMOVE) {
+    place.x = now.left;
+    place.y = now.top;
+  }
+  if (place.cx == Width(now) && place.cy == Height(now)) place.flags |= SWP_NOSIZE;
+  if (place.x == now.left && place.y == now.top) place.flags |= SWP_NOMOVE;
+  if (window->IsVisible()) {
+    place.flags &= ~SWP_SHOWWINDOW;
+  } else {
+    place.flags &= ~SWP_HIDEWINDOW;
+    if (!(place.flags & SWP_SHOWWINDOW)) place.flags |= SWP_NOREDRAW;
+  }
+  if (!(place.flags & SWP_NOZORDER) && IsInPlace(window, place.hwndInsertAfter)) place.flags |= SWP_NOZORDER;
+}
+
+struct NewPlace {
+  RECT window, client;
+};
+
+// The new rectangles; asks the window for its client area when the size or the frame changes.
+NewPlace Measure(HWND handle, const WINDOWPOS& place) {
+  RECT oldWindow{}, oldClient{};
+  {
+    const Guard guard;
+    const Window* window = FindWindowObject(handle);
+    if (window == nullptr) return {};
+    oldWindow = window->window;
+    oldClient = window->client;
+  }
+  const RECT moved{place.x, place.y, place.x + place.cx, place.y + place.cy};
+  const bool asks = (place.flags & SWP_FRAMECHANGED) || !(place.flags & SWP_NOSIZE);
+  if (!asks) return {moved, Moved(oldClient, moved.left - oldWindow.left, moved.top - oldWindow.top)};
+  WINDOWPOS copy = place;
+  NCCALCSIZE_PARAMS parameters{{moved, oldWindow, oldClient}, &copy};
+  Send(handle, WM_NCCALCSIZE, TRUE, reinterpret_cast<LPARAM>(&parameters));
+  return {moved, parameters.rgrc[0]};
+}
+
+// Puts the window into the order, and the windows it owns above it. Under the lock.
+void Reorder(Window* window, HWND after) {
+  if (after == HWND_TOPMOST) window->exStyle |= WS_EX_TOPMOST;
+  if (after == HWND_NOTOPMOST || after == HWND_BOTTOM) window->exStyle &= ~WS_EX_TOPMOST;
+  Window* parent = window->parent;
+  Window* above = PlaceInOrder(window, after);
+  if (above != window->previous) {
+    if (above == window) return;
+    const RECT covered = window->window;
+    Unlink(window);
+    Link(window, parent, above);
+    if (window->IsChild() && window->IsVisible()) {
+      InvalidateCovered(parent, covered);
+    }
+  }
+  if (parent == Desktop() && after == HWND_TOP) RaiseTopLevel(window);
+}
+
+// Under the lock: the change itself, and what of the screen it spoils.
+void Apply(Window* window, WINDOWPOS& place, const NewPlace& to) {
+  const RECT oldWindow = window->window, oldClient = window->client;
+  const bool wasShown = IsShown(window);
+  if (!(place.flags & SWP_NOZORDER)) Reorder(window, place.hwndInsertAfter);
+  window->window = to.window;
+  window->client = to.client;
+  if (place.flags & SWP_SHOWWINDOW) window->style |= WS_VISIBLE;
+  if (place.flags & SWP_HIDEWINDOW) {
+    DropPaint(window);
+    window->style &= ~WS_VISIBLE;
+  }
+  if (oldClient.left == to.client.left && oldClient.top == to.client.top) place.flags |= kNoClientMove;
+  if (Width(oldClient) == Width(to.client) && Height(oldClient) == Height(to.client)) place.flags |= kNoClientSize;
+  if (!(place.flags & SWP_NOREDRAW)) SpoilByMove(window, oldWindow, oldClient, wasShown, place.flags);
+}
+
+HWND ParentHandle(HWND handle) {
+  const Guard guard;
+  const Window* window = FindWindowObject(handle);
+  return window != nullptr && window->IsChild() ? HandleOf(window->parent) : nullptr;
+}
+
+// What the display shows of a top-level window.
+void ShowOnDisplay(HWND handle) {
+  RECT rect{};
+  bool isShown = false;
+  {
+    const Guard guard;
+    const Window* window = FindWindowObject(handle);
+    if (window == nullptr || window->parent != Desktop()) return;
+    rect = window->window;
+    isShown = window->IsVisible();
+  }
+  TheDisplay().Show(handle, isShown, rect);
+}
+
+BOOL Place(WINDOWPOS& place) {
+  const HWND handle = place.hwnd;
+  if (!(place.flags & SWP_NOSENDCHANGING)) Send(handle, WM_WINDOWPOSCHANGING, 0, reinterpret_cast<LPARAM>(&place));
+  {
+    const Guard guard;
+    const Window* window = Expect(handle);
+    if (window == nullptr) return FALSE;
+    Settle(window, place);
+  }
+  const NewPlace to = Measure(handle, place);
+  {
+    const Guard guard;
+    Window* window = Expect(handle);
+    if (window == nullptr) return FALSE;
+    Apply(window, place, to);
+  }
+  ShowOnDisplay(handle);
+  if (!(place.flags & (SWP_NOACTIVATE | SWP_HIDEWINDOW))) {
+    if (ParentHandle(handle) != nullptr) {
+      Send(handle, WM_CHILDACTIVATE);
+    } else {
+      SetForegroundWindow(handle);
+    }
+  }
+  if (!(place.flags & (SWP_NOREDRAW | SWP_DEFERERASE))) {
+    if (const HWND parent = ParentHandle(handle)) EraseNow(parent);
+    EraseNow(handle);
+  }
+  if ((place.flags & kAnyChange) != kNoChange && IsWindow(handle)) {
+    Send(handle, WM_WINDOWPOSCHANGED, 0, reinterpret_cast<LPARAM>(&place));
+  }
+  return IsWindow(handle);
+}
+
+struct Batch : OnModelHeap {
+  List<WINDOWPOS> places;
+};
+
+}  // namespace
+
+LRESULT DefaultPosChanging(HWND handle, WINDOWPOS* place) {
+  if (place->flags & SWP_NOSIZE) return 0;
+  DWORD style = 0;
+  {
+    const Guard guard;
+    const Window* window = FindWindowObject(handle);
+    if (window == nullptr) return 0;
+    style = window->style;
+  }
+  if (!(style & WS_THICKFRAME) && (style & (WS_POPUP | WS_CHILD))) return 0;
+  const MINMAXINFO limits = AskLimits(handle);
+  place->cx = std::min<int>(place->cx, limits.ptMaxTrackSize.x);
+  place->cy = std::min<int>(place->cy, limits.ptMaxTrackSize.y);
+  if (!(style & WS_MINIMIZE)) {
+    place->cx = std::max<int>(place->cx, limits.ptMinTrackSize.x);
+    place->cy = std::max<int>(place->cy, limits.ptMinTrackSize.y);
+  }
+  return 0;
+}
+
+LRESULT DefaultPosChanged(HWND handle, const WINDOWPOS* place) {
+  RECT client{};
+  DWORD style = 0;
+  {
+    const Guard guard;
+    const Window* window = FindWindowObject(handle);
+    if (window == nullptr) return 0;
+    client = window->client;
+    style = window->style;
+  }
+  if (!(place->flags & kNoClientMove)) Send(handle, WM_MOVE, 0, PointParam(client.left, client.top));
+  if (!(place->flags & kNoClientSize) || (place->flags & kStateChanged)) {
+    const WPARAM how = style & WS_MINIMIZE ? SIZE_MINIMIZED : style & WS_MAXIMIZE ? SIZE_MAXIMIZED : SIZE_RESTORED;
+    if (how == SIZE_MINIMIZED) client = {};
+    Send(handle, WM_SIZE, how, PointParam(Width(client), Height(client)));
+  }
+  return 0;
+}
+
+}  // namespace platform::model
+
+using namespace platform::model;
+
+BOOL SetWindowPos(HWND handle, HWND after, int x, int y, int width, int height, UINT flags) {
+  CurrentThread();
+  {
+    const Guard guard;
+    const Window* window = Expect(handle);
+    if (window == nullptr) return FALSE;
+    if (IsRoot(window)) return FALSE;
+  }
+  WINDOWPOS place{handle, after, x, y, width, height, flags};
+  return Place(place);
+}
+
+BOOL MoveWindow(HWND window, int x, int y, int width, int height, BOOL repaint) {
+  return SetWindowPos(window, nullptr, x, y, width, height,
+                      SWP_NOZORDER | SWP_NOACTIVATE | (repaint ? 0u : SWP_NOREDRAW));
+}
+
+BOOL BringWindowToTop(HWND window) { return SetWindowPos(window, HWND_TOP, 0, 0, 0, 0, SWP_NOSIZE | SWP_NOMOVE); }
+
+HDWP BeginDeferWindowPos(int count) {
+  if (count < 0) return Fail<HDWP>(ERROR_INVALID_PARAMETER);
+  return OrNoMemory<HDWP>(nullptr, [&]() -> HDWP {
+    const Guard guard;
+    Batch* batch = new Batch;
+    try {
+      batch->places.reserve(static_cast<std::size_t>(count));
+      return static_cast<HDWP>(AddObject(Kind::Batch, batch, nullptr));
+    } catch (...) {
+      delete batch;
+      throw;
+    }
+  });
+}
+
+// A second request for a window joins the first. A failure ends the batch, as published.
+HDWP DeferWindowPos(HDWP handle, HWND window, HWND after, int x, int y, int width, int height, UINT flags) {
+  const Guard guard;
+  Batch* batch = FindAs<Batch, Kind::Batch>(handle);
+  if (batch == nullptr) return Fail<HDWP>(ERROR_INVALID_DWP_HANDLE);
+  if (Expect(window) == nullptr) return nullptr;
+  for (WINDOWPOS& place : batch->places) {
+    if (place.hwnd != window) continue;
+    if (!(flags & SWP_NOZORDER)) place.hwndInsertAfter = after;
+    if (!(flags & SWP_NOMOVE)) place.x = x, place.y = y;
+    if (!(flags & SWP_NOSIZE)) place.cx = width, place.cy = height;
+    constexpr UINT kDenials =
+        SWP_NOSIZE | SWP_NOMOVE | SWP_NOZORDER | SWP_NOREDRAW | SWP_NOACTIVATE | SWP_NOCOPYBITS | SWP_NOOWNERZORDER;
+    place.flags = (place.flags & flags & kDenials) | ((place.flags | flags) & ~kDenials);
+    return handle;
+  }
+  try {
+    batch->places.push_back({window, after, x, y, width, height, flags});
+    return handle;
+  } catch (const std::bad_alloc&) {
+    delete static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
+    return Fail<HDWP>(ERROR_NOT_ENOUGH_MEMORY);
+  }
+}
+
+BOOL EndDeferWindowPos(HDWP handle) {
+  Batch* batch = nullptr;
+  {
+    const Guard guard;
+    batch = static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
+  }
+  if (batch == nullptr) return Fail(ERROR_INVALID_DWP_HANDLE);
+  BOOL result = TRUE;
+  for (WINDOWPOS& place : batch->places)
+    if (!Place(place)) result = FALSE;
+  delete batch;
+  return result;
+}

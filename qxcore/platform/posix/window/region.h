@@ -1,0 +1,46 @@
+// A set of pixels that cleans up after itself; coordinates are relative to a window's top left corner unless a
+// comment says otherwise.
+#pragma once
+
+#include <pixman.h>
+
+#include "qxcore/platform/posix/window/memory.h"
+
+namespace platform::model {
+
+class Region {
+ public:
+  Region() { pixman_region32_init(&m_region); }
+  explicit Region(const RECT& rect) : Region() { Add(rect); }
+  Region(const Region& other) : Region() { pixman_region32_copy(&m_region, &other.m_region); }
+  Region& operator=(const Region& other) {
+    pixman_region32_copy(&m_region, &other.m_region);
+    return *this;
+  }
+  ~Region() { pixman_region32_fini(&m_region); }
+
+  bool IsEmpty() const { return !pixman_region32_not_empty(const_cast<pixman_region32_t*>(&m_region)); }
+  void Clear() { pixman_region32_clear(&m_region); }
+  void Add(const RECT& rect) {
+    if (rect.left < rect.right && rect.top < rect.bottom)
+      pixman_region32_union_rect(&m_region, &m_region, rect.left, rect.top, rect.right - rect.left,
+                                 rect.bottom - rect.top);
+  }
+  void Add(const Region& other) { pixman_region32_union(&m_region, &m_region, &other.m_region); }
+  void Subtract(const Region& other) { pixman_region32_subtract(&m_region, &m_region, &other.m_region); }
+  void Subtract(const RECT& rect) { Subtract(Region(rect)); }
+  void Intersect(const RECT& rect) { Intersect(Region(rect)); }
+  void Intersect(const Region& other) { pixman_region32_intersect(&m_region, &m_region, &other.m_region); }
+  void Move(int dx, int dy) { pixman_region32_translate(&m_region, dx, dy); }
+  RECT Bounds() const {
+    const pixman_box32_t* box = pixman_region32_extents(const_cast<pixman_region32_t*>(&m_region));
+    return {box->x1, box->y1, box->x2, box->y2};
+  }
+  pixman_region32_t* Pixman() { return &m_region; }
+  const pixman_region32_t* Pixman() const { return &m_region; }
+
+ private:
+  pixman_region32_t m_region;
+};
+
+}  // namespace platform::model

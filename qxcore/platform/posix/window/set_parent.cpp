@@ -1,0 +1,36 @@
+// Moving a window to another parent: it is hidden, moved in the tree, and shown again.
+
+#include "qxcore/platform/posix/window/paint.h"
+#include "qxcore/platform/posix/window/send.h"
+#include "qxcore/platform/posix/window/tree.h"
+
+using namespace platform::model;
+
+HWND SetParent(HWND handle, HWND newParent) {
+  {
+    const Guard guard;
+    Window* window = Expect(handle);
+    if (window == nullptr) return nullptr;
+    const Window* parent = newParent == nullptr        ? Desktop()
+                           : newParent == HWND_MESSAGE ? MessageRoot()
+                                                       : Expect(newParent);
+    if (parent == nullptr) return nullptr;
+    if (IsRoot(window) || parent == window || IsBelow(parent, window)) return Fail<HWND>(ERROR_INVALID_PARAMETER);
+  }
+  const bool wasVisible = ShowWindow(handle, SW_HIDE);
+  HWND oldParent = nullptr;
+  POINT place{};
+  {
+    const Guard guard;
+    Window* window = Expect(handle);
+    Window* parent = newParent == nullptr ? Desktop() : newParent == HWND_MESSAGE ? MessageRoot() : Expect(newParent);
+    if (window == nullptr || parent == nullptr) return nullptr;
+    oldParent = HandleOf(window->parent);
+    place = {window->window.left, window->window.top};
+    Unlink(window);
+    Link(window, parent, nullptr);
+  }
+  SetWindowPos(handle, HWND_TOP, place.x, place.y, 0, 0, SWP_NOSIZE | (wasVisible ? 0u : SWP_NOACTIVATE));
+  if (wasVisible) ShowWindow(handle, SW_SHOW);
+  return oldParent;
+}
