@@ -1,6 +1,8 @@
 // SBrush: what areas are filled with.
 #pragma once
 
+#include <type_traits>
+
 #include "qxcore/graphics/gdi_object.h"
 
 class QXCORE_API SBrush : public SGdiObject {
@@ -8,7 +10,11 @@ class QXCORE_API SBrush : public SGdiObject {
 
   SBrush() = default;
   // A brush of one colour; GetSafeHandle() is null when the system refuses.
-  explicit SBrush(COLORREF color) { CreateSolidBrush(color); }
+  template <class Color>
+    requires std::is_integral_v<Color>
+  explicit SBrush(Color color) {
+    CreateSolidBrush(static_cast<COLORREF>(color));
+  }
   explicit SBrush(HBRUSH brush) : SGdiObject(brush) {}
 
   // One colour.

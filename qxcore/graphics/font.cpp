@@ -149,7 +149,8 @@ Choice ReadFixed() {
     key.GetProfile(WTEXT("Size"), &choice.points, 0);
     key.GetProfile(WTEXT("Bold"), &bold, 0);
     key.GetProfile(WTEXT("Italic"), &italic, 0);
-    choice.style = static_cast<long>((bold ? SFont::kBold : SFont::kRegular) + (italic ? SFont::kItalic : SFont::kRegular));
+    choice.style =
+        static_cast<long>((bold ? SFont::kBold : SFont::kRegular) + (italic ? SFont::kItalic : SFont::kRegular));
     if (choice.IsUsable()) return choice;
   }
   return Choice();

@@ -50,3 +50,17 @@ SSize SImageList::GetImageSize() const {
   ::ImageList_GetIconSize(m_hImageList, &width, &height);
   return SSize(width, height);
 }
+
+int SImageList::Add(HBITMAP images, HBITMAP mask) { return ::ImageList_Add(m_hImageList, images, mask); }
+
+int SImageList::AddMasked(HBITMAP images, COLORREF transparent) {
+  return ::ImageList_AddMasked(m_hImageList, images, transparent);
+}
+
+int SImageList::Remove(int index) { return ::ImageList_Remove(m_hImageList, index); }
+
+int SImageList::GetImageCount() const { return ::ImageList_GetImageCount(m_hImageList); }
+
+int SImageList::Draw(HDC dc, int index, const POINT& at, unsigned int style) const {
+  return ::ImageList_Draw(m_hImageList, index, dc, at.x, at.y, style);
+}

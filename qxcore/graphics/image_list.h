@@ -27,20 +27,16 @@ class QXCORE_API SImageList : public SObject {
   int DeleteImageList();
   // Adds the pictures that stand side by side in a bitmap; black in `mask`, or every colour but `transparent`, is
   // drawn. Returns the number of the first one, or -1. The bitmap stays the caller's.
-  int Add(HBITMAP images, HBITMAP mask) { return ::ImageList_Add(m_hImageList, images, mask); }
-  int AddMasked(HBITMAP images, COLORREF transparent) {
-    return ::ImageList_AddMasked(m_hImageList, images, transparent);
-  }
+  int Add(HBITMAP images, HBITMAP mask);
+  int AddMasked(HBITMAP images, COLORREF transparent);
   // Removes one; those behind it move up. -1 removes all.
-  int Remove(int index) { return ::ImageList_Remove(m_hImageList, index); }
+  int Remove(int index);
   // How many there are.
-  int GetImageCount() const { return ::ImageList_GetImageCount(m_hImageList); }
+  int GetImageCount() const;
   // The size of each in pixels.
   SSize GetImageSize() const;
   // Draws one with its top left corner at a point; `style` is ILD_NORMAL or ILD_TRANSPARENT.
-  int Draw(HDC dc, int index, const POINT& at, unsigned int style = ILD_NORMAL) const {
-    return ::ImageList_Draw(m_hImageList, index, dc, at.x, at.y, style);
-  }
+  int Draw(HDC dc, int index, const POINT& at, unsigned int style = ILD_NORMAL) const;
 
   HIMAGELIST m_hImageList = nullptr;  // the handle; set it by Attach and Detach
 };

@@ -42,14 +42,25 @@ struct Conversion {
   }
 };
 
-// For each of `count` target pixels the source pixel it shows, by the nearest one; mirrored where a size is negative.
+// For each target pixel the source pixel that it shows. A larger target shows the one under its middle (the first of
+// two), a smaller one the last of those that fall on it.
 struct Axis {
-  long long to, toSize, from, fromSize;  // sizes above 0 for `to`; the sign of fromSize mirrors
+  long long to, toSize, from, fromSize;  // sizes above 0
+  bool mirrored;
 
   int At(int target) const {
-    long long index = (target - to) * std::llabs(fromSize) / toSize;
-    return static_cast<int>(fromSize > 0 ? from + index : from - 1 - index);
+    long long step = mirrored ? toSize - 1 - (target - to) : target - to;
+    long long index = fromSize <= toSize ? ((2 * step + 1) * fromSize - 1) / (2 * toSize)
+                                         : (2 * fromSize * (step + 1) - toSize) / (2 * toSize);
+    return static_cast<int>(from + index);
   }
+};
+
+// A length with a sign, as the pixels that it covers: a negative one goes left from its first pixel, that included.
+struct Extent {
+  int start, size;
+
+  Extent(int first, int length) : start(length < 0 ? first + length + 1 : first), size(std::abs(length)) {}
 };
 
 void StretchBox(const Context& to, const Box& part, const Source& source, const Axis& axisX, const Axis& axisY,
@@ -102,17 +113,16 @@ void Stretch(Context& to, const Rectangle4& target, const Surface& from, const S
   Source source = SourceOf(to, from);
   Conversion convert(to, fromSettings, from.mono);
   Paint pattern = UsesPattern(table) ? PaintOf(to, *to.m_settings.brush) : Paint();
-  Box box = BoxOf(target.x, target.y, target.x + target.width, target.y + target.height);
-  bool mirrorX = (target.width < 0) != (origin.width < 0), mirrorY = (target.height < 0) != (origin.height < 0);
-  int left = std::min(origin.x, origin.x + origin.width), top = std::min(origin.y, origin.y + origin.height);
-  int width = std::abs(origin.width), height = std::abs(origin.height);
-  Axis axisX{box.x1, box.x2 - box.x1, mirrorX ? left + width : left, mirrorX ? -width : width};
-  Axis axisY{box.y1, box.y2 - box.y1, mirrorY ? top + height : top, mirrorY ? -height : height};
-  bool plain = table == TableOf(SRCCOPY) && !convert.toColors && !convert.toMono && axisX.fromSize == axisX.toSize &&
-               axisY.fromSize == axisY.toSize;
+  Extent toX(target.x, target.width), toY(target.y, target.height);
+  Extent fromX(origin.x, origin.width), fromY(origin.y, origin.height);
+  Box box{toX.start, toY.start, toX.start + toX.size, toY.start + toY.size};
+  Axis axisX{toX.start, toX.size, fromX.start, fromX.size, (target.width < 0) != (origin.width < 0)};
+  Axis axisY{toY.start, toY.size, fromY.start, fromY.size, (target.height < 0) != (origin.height < 0)};
+  bool plain = table == TableOf(SRCCOPY) && !convert.toColors && !convert.toMono && !axisX.mirrored &&
+               !axisY.mirrored && toX.size == fromX.size && toY.size == fromY.size;
   ForVisible(to, box, [&](const Box& part) {
     if (plain)
-      CopyBox(to, part, source.surface, left - box.x1, top - box.y1);
+      CopyBox(to, part, source.surface, fromX.start - box.x1, fromY.start - box.y1);
     else
       StretchBox(to, part, source, axisX, axisY, convert, pattern, table);
   });

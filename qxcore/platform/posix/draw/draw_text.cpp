@@ -120,16 +120,15 @@ std::size_t Fitting(const Drawer& drawer, SStringView text, int width) {
   return std::max<std::size_t>(low, 1);
 }
 
-// The end of the first line of a paragraph that is too wide: behind the last word that fits, or within a word that is
-// wider than the line only where an edit control would.
+// The end of the first line of a paragraph that is too wide: behind the last blank that fits, or, where an edit control
+// would break, within a word that is wider than the line. The blank belongs to the line before, unless nothing fits.
 std::size_t BreakAt(const Drawer& drawer, SStringView text, int width, UINT format) {
   std::size_t fit = Fitting(drawer, text, width);
   if (fit >= text.size()) return text.size();
-  for (std::size_t at = fit + 1; at-- > 0;) {
-    if (text[at] == ' ' && at > 0) return at;
-  }
+  std::size_t blank = text.substr(0, fit).rfind(WCHAR{' '});
+  if (blank != SStringView::npos) return blank + 1;
   if (format & DT_EDITCONTROL) return fit;
-  std::size_t blank = text.find(WCHAR{' '}, 1);
+  blank = text.find(WCHAR{' '});
   return blank == SStringView::npos ? text.size() : blank;
 }
 
@@ -145,8 +144,8 @@ void AddParagraph(const Drawer& drawer, SStringView all, Line paragraph, int wid
     std::size_t length = BreakAt(drawer, rest, width, format);
     lines.push_back({start, length});
     start += length;
-    // The blank that the line was broken at belongs to no line.
-    if (start < end && all[start] == ' ') ++start;
+    // The blank behind a word that is too wide belongs to no line.
+    if (start < end && all[start] == ' ' && all[start - 1] != ' ') ++start;
   } while (start < end);
 }
 
@@ -209,7 +208,7 @@ int DrawTextW(HDC dc, LPCWSTR text, int count, RECT* rect, UINT format) {
   Drawer drawer(dc, format);
   if (given.empty()) {
     if (format & DT_CALCRECT) rect->right = rect->left, rect->bottom = rect->top + drawer.LineHeight();
-    return format & DT_SINGLELINE || format & DT_CALCRECT ? drawer.LineHeight() : 0;
+    return drawer.LineHeight();
   }
   Plain plain = format & DT_NOPREFIX ? AsItIs(given) : WithoutPrefixes(given);
   SStringView whole = plain.text;
@@ -219,6 +218,11 @@ int DrawTextW(HDC dc, LPCWSTR text, int count, RECT* rect, UINT format) {
   int top = TopOf(*rect, height, format), y = top, widest = 0;
   const RECT* clip = format & DT_NOCLIP ? nullptr : rect;
   for (std::size_t i = 0; i < lines.size(); ++i, y += drawer.LineHeight()) {
+    // What begins below the rectangle is not drawn and does not count.
+    if (clip && !(format & (DT_CALCRECT | DT_SINGLELINE)) && y > rect->bottom) {
+      height = y - top;
+      break;
+    }
     SStringView line = whole.substr(lines[i].start, lines[i].length);
     bool shorten = i + 1 == lines.size() || !(format & DT_END_ELLIPSIS);
     Text shown = shorten ? Shortened(drawer, line, rect->right - rect->left, format) : Text(line);
@@ -236,7 +240,6 @@ int DrawTextW(HDC dc, LPCWSTR text, int count, RECT* rect, UINT format) {
   if (format & DT_CALCRECT) {
     rect->right = rect->left + widest;
     rect->bottom = top + height;
-    if (format & DT_SINGLELINE && format & (DT_VCENTER | DT_BOTTOM)) rect->bottom = rect->top + height;
   }
   return top - rect->top + height;
 }

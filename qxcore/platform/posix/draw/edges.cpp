@@ -204,15 +204,18 @@ BOOL DrawFrameControl(HDC dc, RECT* rect, UINT type, UINT state) {
   return TRUE;
 }
 
-// A frame of every second pixel, inverted, so that drawing it again removes it.
+// A frame of every second pixel from the corner on, inverted, so that drawing it again removes it.
 BOOL DrawFocusRect(HDC dc, const RECT* rect) {
-  static const BYTE kDots[16] = {0x55, 0, 0xAA, 0, 0x55, 0, 0xAA, 0, 0x55, 0, 0xAA, 0, 0x55, 0, 0xAA, 0};
+  static const BYTE kDots[16] = {0xAA, 0, 0x55, 0, 0xAA, 0, 0x55, 0, 0xAA, 0, 0x55, 0, 0xAA, 0, 0x55, 0};
   if (!GetObjectType(dc)) return FALSE;
   if (rect->right <= rect->left || rect->bottom <= rect->top) return TRUE;
   HBITMAP bitmap = CreateBitmap(8, 8, 1, 1, kDots);
   HBRUSH dots = CreatePatternBrush(bitmap);
   HGDIOBJ brush = SelectObject(dc, dots);
   COLORREF text = SetTextColor(dc, 0), background = SetBkColor(dc, 0xFFFFFF);
+  POINT corner{rect->left, rect->top}, origin;
+  LPtoDP(dc, &corner, 1);
+  SetBrushOrgEx(dc, corner.x, corner.y, &origin);
   int width = rect->right - rect->left, height = rect->bottom - rect->top;
   PatBlt(dc, rect->left, rect->top, width, 1, PATINVERT);
   if (height > 1) PatBlt(dc, rect->left, rect->bottom - 1, width, 1, PATINVERT);
@@ -220,6 +223,7 @@ BOOL DrawFocusRect(HDC dc, const RECT* rect) {
     PatBlt(dc, rect->left, rect->top + 1, 1, height - 2, PATINVERT);
     if (width > 1) PatBlt(dc, rect->right - 1, rect->top + 1, 1, height - 2, PATINVERT);
   }
+  SetBrushOrgEx(dc, origin.x, origin.y, nullptr);
   SetTextColor(dc, text);
   SetBkColor(dc, background);
   SelectObject(dc, brush);

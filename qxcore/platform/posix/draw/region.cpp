@@ -68,12 +68,15 @@ HRGN CreateRectRgn(int left, int top, int right, int bottom) {
 
 HRGN CreateRectRgnIndirect(const RECT* rect) { return CreateRectRgn(rect->left, rect->top, rect->right, rect->bottom); }
 
+// A region loses the last row and column of the rectangle that it is made from.
 HRGN CreateRoundRectRgn(int left, int top, int right, int bottom, int width, int height) {
-  return EnterRegion(RoundRectArea(BoxOf(left, top, right, bottom), std::abs(width), std::abs(height)));
+  Box box = BoxOf(left, top, right, bottom);
+  --box.x2, --box.y2;
+  return EnterRegion(RoundRectArea(box, std::abs(width), std::abs(height)));
 }
 
 HRGN CreateEllipticRgn(int left, int top, int right, int bottom) {
-  return CreateRoundRectRgn(left, top, right, bottom, std::abs(right - left), std::abs(bottom - top));
+  return CreateRoundRectRgn(left, top, right, bottom, right - left, bottom - top);
 }
 
 HRGN CreatePolygonRgn(const POINT* points, int count, int mode) {

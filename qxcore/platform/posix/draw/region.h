@@ -50,6 +50,8 @@ class Area {
   void Less(const Area& other) { pixman_region32_subtract(&m_region, &m_region, other.Data()); }
   // RGN_AND to RGN_COPY with another one.
   void Combine(const Area& other, int mode);
+  // For calls that take the region itself.
+  pixman_region32_t* Pixman() { return &m_region; }
   // NULLREGION, SIMPLEREGION or COMPLEXREGION.
   int Complexity() const;
 

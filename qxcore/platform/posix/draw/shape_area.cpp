@@ -77,10 +77,10 @@ Area EllipseArea(const Box& box) { return RoundRectArea(box, box.x2 - box.x1, bo
 // The corners follow the midpoint algorithm of A. Zingl, "A Rasterizing Algorithm for Drawing Curves" (2012), for
 // an ellipse in a rectangle: the error of the implicit equation decides which coordinate steps.
 Area RoundRectArea(const Box& box, int cornerWidth, int cornerHeight) {
-  Box inside{box.x1, box.y1, box.x2 - 1, box.y2 - 1};  // a region loses its last row and column
-  (void)inside;
   int width = std::min(box.x2 - box.x1, cornerWidth), height = std::min(box.y2 - box.y1, cornerHeight);
   Area area;
+  constexpr int kLargest = 65535;  // beyond it the products of the error would not fit
+  if (IsEmpty(box) || width > kLargest || height > kLargest) return area;
   if (width < 2 || height < 2) {
     area.SetBox(box);
     return area;
@@ -88,9 +88,10 @@ Area RoundRectArea(const Box& box, int cornerWidth, int cornerHeight) {
   std::int64_t a = width - 1, b = height - 1;
   std::int64_t stepX = 8 * b * b, stepY = 8 * a * a;
   std::int64_t dx = 4 * b * b * (1 - a), dy = 4 * a * a * (1 + b % 2), error = dx + dy + a * a * (b % 2);
-  // rows[i] is the left inset of the row that lies i above the middle line of the corner.
+  // The inset of each row, from the middle of the ellipse to its tip, which is never without a pixel.
+  const int tip = (width - 1) / 2;
   int x = 0, y = height / 2;
-  std::vector<int> inset(static_cast<std::size_t>(height), 0);
+  std::vector<int> inset(static_cast<std::size_t>(height), tip);
   int row = y;
   inset[static_cast<std::size_t>(row)] = 0;
   while (x <= width / 2) {
@@ -102,7 +103,7 @@ Area RoundRectArea(const Box& box, int cornerWidth, int cornerHeight) {
     if (twice <= dy) {
       ++row;
       error += dy += stepY;
-      if (row < height) inset[static_cast<std::size_t>(row)] = x;
+      if (row < height) inset[static_cast<std::size_t>(row)] = std::min(x, tip);
     }
   }
   std::vector<Box> boxes;

@@ -29,17 +29,28 @@ Area OutlineOf(const Area& area, int width, int height) {
   return outline;
 }
 
-// Paints the inside and the outline of a shape that fills an area.
-void PaintShape(const Context& dc, const Area& area) {
+// Paints a round rectangle: the inside, and an outline that lies on the middle of a wide pen.
+void PaintRound(const Context& dc, const Box& box, int cornerWidth, int cornerHeight) {
   const Settings& set = dc.m_settings;
+  Area area = RoundRectArea(box, cornerWidth, cornerHeight);
+  int width = PenWidth(dc), out = set.pen->m_style == PS_INSIDEFRAME ? 0 : width / 2;
   if (set.pen->m_style == PS_NULL) {
     PaintArea(dc, area, PaintOf(dc, *set.brush), set.rop2);
     return;
   }
-  int width = PenWidth(dc);
-  Area outline = OutlineOf(area, width, width), inside = area;
-  inside.Less(outline);
-  PaintArea(dc, inside, PaintOf(dc, *set.brush), set.rop2);
+  Area outline;
+  if (width == 1) {
+    outline = OutlineOf(area, 1, 1);
+  } else {
+    int in = width - out, wider = 2 * out, narrower = 2 * in;
+    outline = RoundRectArea({box.x1 - out, box.y1 - out, box.x2 + out, box.y2 + out}, cornerWidth + wider,
+                            cornerHeight + wider);
+    area = RoundRectArea({box.x1 + in, box.y1 + in, box.x2 - in, box.y2 - in}, std::max(0, cornerWidth - narrower),
+                         std::max(0, cornerHeight - narrower));
+    outline.Less(area);
+  }
+  area.Less(outline);
+  PaintArea(dc, area, PaintOf(dc, *set.brush), set.rop2);
   PaintArea(dc, outline, PaintOf(dc, *set.pen), set.rop2);
 }
 
@@ -76,8 +87,7 @@ BOOL RoundRect(HDC handle, int left, int top, int right, int bottom, int width, 
   if (!dc) return FALSE;
   if (Record(*dc, [=](HDC to) { RoundRect(to, left, top, right, bottom, width, height); })) return TRUE;
   Box box = dc->Map(left, top, right, bottom);
-  if (dc->m_settings.pen->m_style == PS_NULL) --box.x2, --box.y2;
-  PaintShape(*dc, RoundRectArea(box, std::abs(dc->Map().Width(width)), std::abs(dc->Map().Height(height))));
+  PaintRound(*dc, box, std::abs(dc->Map().Width(width)), std::abs(dc->Map().Height(height)));
   return TRUE;
 }
 
@@ -86,8 +96,7 @@ BOOL Ellipse(HDC handle, int left, int top, int right, int bottom) {
   if (!dc) return FALSE;
   if (Record(*dc, [=](HDC to) { Ellipse(to, left, top, right, bottom); })) return TRUE;
   Box box = dc->Map(left, top, right, bottom);
-  if (dc->m_settings.pen->m_style == PS_NULL) --box.x2, --box.y2;
-  PaintShape(*dc, EllipseArea(box));
+  PaintRound(*dc, box, box.x2 - box.x1, box.y2 - box.y1);
   return TRUE;
 }
 

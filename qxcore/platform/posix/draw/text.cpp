@@ -155,9 +155,13 @@ BOOL GetTextExtentExPointW(HDC handle, LPCWSTR text, int count, int maxExtent, i
   if (!GetTextExtentPoint32W(handle, text, count, size)) return FALSE;
   auto* dc = Find<Context>(handle);
   SizedFace* face = FaceOf(*dc);
-  int total = 0;
+  bool plain = IsPlain(text, static_cast<std::size_t>(count));
+  int width = 0;
   for (int i = 0; i < count; ++i) {
-    total = ToLogicalX(*dc, WidthOf(*face, SStringView(text, static_cast<std::size_t>(i) + 1)));
+    // Elsewhere a character's form and place depend on those before it.
+    width =
+        plain ? width + face->Of(text[i]).advance : WidthOf(*face, SStringView(text, static_cast<std::size_t>(i) + 1));
+    int total = ToLogicalX(*dc, width);
     if (fit && total > maxExtent) {
       *fit = i;
       return TRUE;
