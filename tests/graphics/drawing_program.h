@@ -24,10 +24,19 @@ class Random {
     m_state = m_state * 1664525u + 1013904223u;
     return static_cast<int>((m_state >> 8) % static_cast<std::uint32_t>(bound));
   }
-  COLORREF Color() { return RGB(Below(256), Below(256), Below(256)); }
-  SPoint Point() { return SPoint(Below(kWidth + 80) - 40, Below(kHeight + 80) - 40); }
+  // One number a statement: compilers differ in the order of arguments.
+  COLORREF Color() { return static_cast<COLORREF>(Below(0x1000000)); }
+  SPoint Point() {
+    int x = Below(kWidth + 80) - 40, y = Below(kHeight + 80) - 40;
+    return SPoint(x, y);
+  }
+  SSize Size(int least, int range) {
+    int width = least + Below(range), height = least + Below(range);
+    return SSize(width, height);
+  }
   SRect Rect() {
-    SRect rect(Point(), Point());
+    SPoint first = Point(), second = Point();
+    SRect rect(first, second);
     rect.Normalize();
     return rect;
   }
@@ -38,11 +47,24 @@ class Random {
 
 inline void Fills(SDC& dc) {
   Random random(1);
-  for (int i = 0; i < 30; ++i) dc.FillSolidRect(random.Rect(), random.Color());
-  for (int i = 0; i < 20; ++i) dc.FillRect(random.Rect(), SBrush(random.Color()));
-  for (int i = 0; i < 20; ++i) dc.FrameRect(random.Rect(), SBrush(random.Color()));
+  for (int i = 0; i < 30; ++i) {
+    SRect rect = random.Rect();
+    dc.FillSolidRect(rect, random.Color());
+  }
+  for (int i = 0; i < 20; ++i) {
+    SBrush brush(random.Color());
+    dc.FillRect(random.Rect(), brush);
+  }
+  for (int i = 0; i < 20; ++i) {
+    SBrush brush(random.Color());
+    dc.FrameRect(random.Rect(), brush);
+  }
   for (int i = 0; i < 10; ++i) dc.InvertRect(random.Rect());
-  for (int i = 0; i < 10; ++i) dc.Draw3dRect(random.Rect(), random.Color(), random.Color());
+  for (int i = 0; i < 10; ++i) {
+    SRect rect = random.Rect();
+    COLORREF light = random.Color(), dark = random.Color();
+    dc.Draw3dRect(rect, light, dark);
+  }
 }
 
 inline void Brushes(SDC& dc) {
@@ -113,9 +135,11 @@ inline void Polygons(SDC& dc) {
   for (int i = 0; i < 24; ++i) {
     std::array<POINT, 6> points;
     int count = 3 + random.Below(4);
-    SPoint corner(random.Below(kWidth - 60), random.Below(kHeight - 60));
-    for (int k = 0; k < count; ++k)
-      points[static_cast<std::size_t>(k)] = SPoint(corner.x + random.Below(70), corner.y + random.Below(70));
+    int left = random.Below(kWidth - 60), top = random.Below(kHeight - 60);
+    for (int k = 0; k < count; ++k) {
+      SSize offset = random.Size(0, 70);
+      points[static_cast<std::size_t>(k)] = SPoint(left + offset.cx, top + offset.cy);
+    }
     SBrush brush(random.Color());
     SPen pen(PS_SOLID, 1, random.Color());
     SSelectObject selectBrush(dc, brush), selectPen(dc, i % 3 ? static_cast<HGDIOBJ>(pen) : GetStockObject(NULL_PEN));
@@ -128,7 +152,7 @@ inline void Ellipses(SDC& dc) {
   Random random(4);
   int x = 2, y = 2;
   for (int i = 0; i < 60; ++i) {
-    int width = 1 + i % 31, height = 1 + (i * 7) % 29;
+    int width = 8 + i % 20, height = 8 + i * 7 % 18;
     SBrush brush(random.Color());
     SPen pen(PS_SOLID, 1, random.Color());
     SSelectObject selectBrush(dc, brush),
@@ -148,8 +172,8 @@ inline void RoundRects(SDC& dc) {
     SPen pen(PS_SOLID, 1, random.Color());
     SSelectObject selectBrush(dc, brush), selectPen(dc, pen);
     int x = 5 + i % 6 * 52, y = 5 + i / 6 * 46;
-    dc.RoundRect(SRect(x, y, x + 20 + random.Below(28), y + 15 + random.Below(28)),
-                 SSize(random.Below(24), random.Below(24)));
+    SSize size = random.Size(20, 24), corner = random.Size(4, 20);
+    dc.RoundRect(SRect(SPoint(x, y), size), corner);
   }
 }
 
@@ -188,7 +212,8 @@ inline void Blits(SDC& dc) {
   SSelectObject select(memory, bitmap);
   Random random(6);
   for (int i = 0; i < 30; ++i) {
-    SRect rect(random.Below(60), random.Below(40), random.Below(60), random.Below(40));
+    SSize first = random.Size(0, 50), second = random.Size(0, 50);
+    SRect rect(SPoint(first.cx, first.cy), SPoint(second.cx, second.cy));
     rect.Normalize();
     memory.FillSolidRect(rect, random.Color());
   }
@@ -256,9 +281,8 @@ inline void WideLines(SDC& dc) {
     SSelectObject select(dc, pen);
     dc.MoveTo(10, 24 * (width - 1));
     dc.LineTo(120, 24 * (width - 1));
-    dc.MoveTo(140, 24 * (width - 1));
-    dc.LineTo(180, 24 * (width - 1) + 15);
-    dc.Rectangle(SRect(200, 24 * (width - 1), 230, 24 * (width - 1) + 18));
+    dc.MoveTo(130 + 8 * width, 60);
+    dc.LineTo(130 + 8 * width, 120 + width);
   }
 }
 

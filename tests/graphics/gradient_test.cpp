@@ -1,0 +1,200 @@
+// Gradients: the bands against a second reading of their rules, the clip rule, metafiles.
+#include "qxcore/graphics/gradient.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <vector>
+
+#include "qxcore/graphics/background.h"
+#include "qxcore/graphics/bitmap.h"
+#include "qxcore/graphics/color.h"
+#include "qxcore/graphics/metafile.h"
+
+namespace {
+
+constexpr unsigned long kFrom = 0x10C0F0, kTo = 0xE03005;
+
+// --- a second reading: the table of the colours of all bands ---
+
+unsigned long Mix(unsigned long from, unsigned long to, long part, long whole) {
+  if (whole == 0 || part == 0) return from;
+  if (part == whole) return to;
+  if (from == to) return from;
+  unsigned long mixed = 0;
+  for (int shift = 16; shift >= 0; shift -= 8) {
+    long a = static_cast<long>(from >> shift & 255), b = static_cast<long>(to >> shift & 255);
+    long d = (b - a) * part / whole;
+    if (d < 0) d += 1;
+    mixed = mixed << 8 | static_cast<unsigned long>((a + d) & 255);
+  }
+  return mixed;
+}
+
+std::vector<unsigned long> BandTable(int length, int variant) {
+  unsigned long from = kFrom, to = kTo;
+  if (variant == 1 || variant == 3) std::swap(from, to);
+  bool mirrored = variant >= 2;
+  long h = mirrored ? length / 2 : length;
+  unsigned long stops[5] = {from, Mix(from, to, 25, 100), Mix(from, to, 55, 100), Mix(from, to, 85, 100), to};
+  long borders[5] = {0, h / 4, h / 2, h / 2 + h / 4, h};
+  std::vector<unsigned long> table;
+  for (long p = 1; p <= length; ++p) {
+    long x = mirrored && p > h ? length - p : p;
+    int piece = 0;
+    while (piece < 3 && x > borders[piece + 1]) ++piece;
+    table.push_back(Mix(stops[piece], stops[piece + 1], x - borders[piece], borders[piece + 1] - borders[piece]));
+  }
+  return table;
+}
+
+class Canvas {
+ public:
+  Canvas(int width, int height) : m_width(width) {
+    m_bitmap.CreatePixels(width, height);
+    m_select = ::SelectObject(dc, m_bitmap);
+    dc.PatBlt(SRect(0, 0, width, height), WHITENESS);
+  }
+  ~Canvas() { ::SelectObject(dc, m_select); }
+  COLORREF At(int x, int y) {
+    GdiFlush();
+    std::uint32_t pixel = m_bitmap.GetBits()[y * m_width + x];
+    return RGB(pixel >> 16 & 255, pixel >> 8 & 255, pixel & 255);
+  }
+  std::vector<COLORREF> All() {
+    std::vector<COLORREF> all;
+    SSize size = m_bitmap.GetSize();
+    for (int y = 0; y < size.cy; ++y) {
+      for (int x = 0; x < size.cx; ++x) all.push_back(At(x, y));
+    }
+    return all;
+  }
+
+  SMemoryDC dc;
+
+ private:
+  int m_width;
+  SBitmap m_bitmap;
+  HGDIOBJ m_select;
+};
+
+TEST(Gradients, EveryBandOfHorizontalAndVerticalOnes) {
+  Canvas rows(4, 304), columns(304, 4);
+  for (int length = 0; length <= 300; ++length) {
+    for (int variant = 0; variant < 4; ++variant) {
+      std::vector<unsigned long> table = BandTable(length, variant);
+      rows.dc.PatBlt(SRect(0, 0, 4, 304), WHITENESS);
+      columns.dc.PatBlt(SRect(0, 0, 304, 4), WHITENESS);
+      SDrawGradient gradient;
+      // A rectangle whose corners are exchanged, which stays as it is.
+      const SRect across(3, 1 + length, 1, 1);
+      gradient.SetGradient(SDrawGradient::HORZ + variant, kFrom, kTo, across);
+      gradient.DrawGradient(rows.dc);
+      ASSERT_EQ(gradient.GetStartRect(), across);
+      gradient.SetGradient(SDrawGradient::VERT + variant, kFrom, kTo, SRect(1, 1, 1 + length, 3));
+      gradient.DrawGradient(columns.dc);
+      for (int band = 0; band < length; ++band) {
+        ASSERT_EQ(rows.At(1, 1 + band), table[static_cast<std::size_t>(band)])
+            << length << ' ' << variant << ' ' << band;
+        ASSERT_EQ(rows.At(2, 1 + band), table[static_cast<std::size_t>(band)]);
+        ASSERT_EQ(columns.At(1 + band, 1), table[static_cast<std::size_t>(band)])
+            << length << ' ' << variant << ' ' << band;
+      }
+      for (int outside : {0, length + 1}) {
+        ASSERT_EQ(rows.At(1, outside), 0xFFFFFFu);
+        ASSERT_EQ(columns.At(outside, 1), 0xFFFFFFu);
+      }
+      ASSERT_EQ(rows.At(0, 1), 0xFFFFFFu);
+      ASSERT_EQ(rows.At(3, 1), 0xFFFFFFu);
+    }
+  }
+}
+
+TEST(Gradients, AModeWithoutTheBitOrAnUnknownKindDrawsNothing) {
+  Canvas canvas(20, 20);
+  const std::vector<COLORREF> white = canvas.All();
+  const SRect rect(2, 2, 18, 18);
+  SDrawGradient gradient;
+  for (int mode : {0, 0x03, 0x2000, 0x30, 0x8000, 0x110}) {
+    gradient.SetGradient(mode, kFrom, kTo, rect);
+    gradient.DrawGradient(canvas.dc);
+  }
+  gradient.DrawHorzGradient(canvas.dc, rect, kFrom, kTo, 0x20);
+  gradient.DrawVertGradient(canvas.dc, rect, kFrom, kTo, 0x10);
+  for (int mode : {0x10, 0x20, 0x40, 0x80, 0x100, 0x200, 0x400, 0x800, 0x1005, 0x1007}) {
+    gradient.SetGradient(mode, kFrom, kTo, SRect(5, 5, 5, 5));
+    gradient.DrawGradient(canvas.dc);
+  }
+  EXPECT_EQ(canvas.All(), white);
+}
+
+TEST(Gradients, TheContextIsAsBefore) {
+  Canvas canvas(40, 40);
+  canvas.dc.SetBkColor(0x123456);
+  HGDIOBJ pen = canvas.dc.GetCurrentObject(OBJ_PEN), brush = canvas.dc.GetCurrentObject(OBJ_BRUSH);
+  for (int mode : {0x10, 0x20, 0x40, 0x80, 0x100, 0x200, 0x400, 0x800, 0x1005, 0x1006, 0x1007, 0x1008}) {
+    SDrawGradient gradient;
+    gradient.SetGradient(mode, kFrom, kTo, SRect(0, 0, 40, 40));
+    gradient.SetFrameType(SDrawGradient::FRAME_ROUND_RECT);
+    gradient.DrawGradient(canvas.dc);
+    EXPECT_EQ(canvas.dc.GetBkColor(), 0x123456u) << mode;
+    EXPECT_EQ(canvas.dc.GetCurrentObject(OBJ_PEN), pen) << mode;
+    EXPECT_EQ(canvas.dc.GetCurrentObject(OBJ_BRUSH), brush) << mode;
+  }
+}
+
+// Every kind fills its rectangle and nothing else; diagonals are constant along their lines and turn with a variant.
+TEST(Gradients, KindsFillTheirRectangle) {
+  for (int mode :
+       {0x10, 0x20, 0x40, 0x43, 0x80, 0x82, 0x100, 0x200, 0x201, 0x400, 0x800, 0x1005, 0x1006, 0x1007, 0x1008}) {
+    for (int frame = SDrawGradient::FRAME_NONE; frame <= SDrawGradient::FRAME_ETCHED; ++frame) {
+      if (frame == SDrawGradient::FRAME_ROUND_RECT) continue;
+      Canvas canvas(40, 30);
+      SDrawGradient gradient;
+      gradient.SetGradient(mode, 0x400000, 0x000040, SRect(5, 4, 34, 25));
+      gradient.SetFrameType(frame);
+      gradient.DrawGradient(canvas.dc);
+      for (int y = 0; y < 30; ++y) {
+        for (int x = 0; x < 40; ++x)
+          ASSERT_EQ(canvas.At(x, y) != 0xFFFFFF, SRect(5, 4, 34, 25).Contains(SPoint(x, y)))
+              << std::hex << mode << std::dec << ' ' << x << ' ' << y;
+      }
+    }
+  }
+  Canvas up(30, 30), down(30, 30), reversed(30, 30);
+  SDrawGradient gradient;
+  gradient.DrawDiagUpGradient(up.dc, SRect(0, 0, 30, 30), kFrom, kTo, SDrawGradient::DIAG_UP);
+  gradient.DrawDiagDownGradient(down.dc, SRect(0, 0, 30, 30), kFrom, kTo, SDrawGradient::DIAG_DOWN);
+  gradient.DrawDiagUpGradient(reversed.dc, SRect(0, 0, 30, 30), kTo, kFrom, SDrawGradient::DIAG_UP_REVERSED);
+  EXPECT_EQ(up.All(), reversed.All());
+  for (int y = 0; y < 29; ++y) {
+    for (int x = 0; x < 29; ++x) {
+      ASSERT_EQ(up.At(x, y), up.At(x + 1, y + 1));
+      ASSERT_EQ(down.At(x, y + 1), down.At(x + 1, y));
+      ASSERT_EQ(up.At(x, y), down.At(x, 29 - y));
+    }
+  }
+}
+
+// In an old metafile no rectangle is visible, and everything must be drawn.
+TEST(Gradients, MetafilesPlayAsDirectDrawing) {
+  for (int mode : {0x10, 0x13, 0x20, 0x21, 0x40, 0x80, 0x100, 0x200, 0x400, 0x800, 0x1005, 0x1006, 0x1007, 0x1008}) {
+    for (int frame : {SDrawGradient::FRAME_NONE, SDrawGradient::FRAME_ROUND_RECT, SDrawGradient::FRAME_ETCHED}) {
+      SDrawGradient gradient;
+      gradient.SetGradient(mode, kFrom, kTo, SRect(3, 5, 45, 37));
+      gradient.SetFrameType(frame);
+      gradient.SetRoundRectSize(SSize(14, 10));
+      Canvas direct(50, 40), played(50, 40);
+      gradient.DrawGradient(direct.dc);
+      SMetafileDC recording;
+      ASSERT_TRUE(recording.IsMetafile());
+      ASSERT_FALSE(recording.RectVisible(SRect(0, 0, 10, 10)));
+      gradient.DrawGradient(recording);
+      SMetafile metafile = recording.Close();
+      ASSERT_TRUE(metafile.Play(played.dc));
+      ASSERT_EQ(direct.All(), played.All()) << std::hex << mode << ' ' << frame;
+    }
+  }
+}
+
+}  // namespace
