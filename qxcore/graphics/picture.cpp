@@ -1,0 +1,118 @@
+#include "qxcore/graphics/picture.h"
+
+#include <cstring>
+#include <new>
+
+#include "qxcore/core/exception.h"
+#include "qxcore/platform/internal/png.h"
+
+namespace {
+
+HRESULT LastError() {
+  DWORD code = ::GetLastError();
+  return static_cast<HRESULT>(code ? 0x80070000u | (code & 0xFFFF) : static_cast<DWORD>(E_FAIL));
+}
+
+// A file handle that closes itself.
+class OpenedFile {
+ public:
+  OpenedFile(const SString& name, DWORD access, DWORD disposition)
+      : m_handle(::CreateFileW(name, access, FILE_SHARE_READ, nullptr, disposition, FILE_ATTRIBUTE_NORMAL, nullptr)) {}
+  ~OpenedFile() { Close(); }
+  OpenedFile(const OpenedFile&) = delete;
+  OpenedFile& operator=(const OpenedFile&) = delete;
+
+  bool IsOpen() const { return m_handle != INVALID_HANDLE_VALUE; }
+  HANDLE Handle() const { return m_handle; }
+  bool Close() {
+    HANDLE handle = m_handle;
+    m_handle = INVALID_HANDLE_VALUE;
+    return handle == INVALID_HANDLE_VALUE || ::CloseHandle(handle);
+  }
+
+ private:
+  HANDLE m_handle;
+};
+
+HRESULT WriteBytes(const SString& name, const std::vector<BYTE>& bytes) {
+  OpenedFile file(name, GENERIC_WRITE, CREATE_ALWAYS);
+  if (!file.IsOpen()) return LastError();
+  DWORD written = 0;
+  bool whole = ::WriteFile(file.Handle(), bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) &&
+               written == bytes.size();
+  HRESULT result = whole ? S_OK : LastError();
+  if (!file.Close() && whole) result = LastError();
+  if (result != S_OK) ::DeleteFileW(name);
+  return result;
+}
+
+HRESULT ReadBytes(const SString& name, std::vector<BYTE>* bytes) {
+  constexpr LONGLONG kLargestFile = 256 << 20;
+  OpenedFile file(name, GENERIC_READ, OPEN_EXISTING);
+  if (!file.IsOpen()) return LastError();
+  LARGE_INTEGER size;
+  if (!::GetFileSizeEx(file.Handle(), &size)) return LastError();
+  if (size.QuadPart > kLargestFile) return static_cast<HRESULT>(0x80070000u | ERROR_INVALID_DATA);
+  bytes->resize(static_cast<std::size_t>(size.QuadPart));
+  DWORD read = 0;
+  if (!::ReadFile(file.Handle(), bytes->data(), static_cast<DWORD>(bytes->size()), &read, nullptr)) return LastError();
+  bytes->resize(read);
+  return S_OK;
+}
+
+// The pixels of a bitmap of any depth, rows from the top.
+bool GetPixels(HBITMAP bitmap, platform::Pixels* pixels) {
+  BITMAP description;
+  if (!::GetObjectW(bitmap, sizeof description, &description)) return false;
+  pixels->width = description.bmWidth;
+  pixels->height = description.bmHeight;
+  pixels->data.resize(static_cast<std::size_t>(description.bmWidth) * static_cast<std::size_t>(description.bmHeight));
+  BITMAPINFO info{};
+  info.bmiHeader = {sizeof info.bmiHeader, description.bmWidth, -description.bmHeight, 1, 32, BI_RGB, 0, 0, 0, 0, 0};
+  HDC screen = ::GetDC(nullptr);
+  int lines =
+      ::GetDIBits(screen, bitmap, 0, static_cast<UINT>(pixels->height), pixels->data.data(), &info, DIB_RGB_COLORS);
+  ::ReleaseDC(nullptr, screen);
+  return lines == pixels->height;
+}
+
+HRESULT Write(const SString& file, HBITMAP bitmap) {
+  platform::Pixels pixels;
+  if (!GetPixels(bitmap, &pixels)) return E_INVALIDARG;
+  std::vector<BYTE> bytes;
+  HRESULT result = platform::EncodePng(pixels, &bytes);
+  return result == S_OK ? WriteBytes(file, bytes) : result;
+}
+
+HRESULT Read(const SString& file, SBitmap* bitmap) {
+  std::vector<BYTE> bytes;
+  platform::Pixels pixels;
+  HRESULT result = ReadBytes(file, &bytes);
+  if (result == S_OK) result = platform::DecodePng(bytes.data(), bytes.size(), &pixels);
+  if (result != S_OK) return result;
+  SBitmap made;
+  if (!made.CreatePixels(pixels.width, pixels.height)) return E_OUTOFMEMORY;
+  std::memcpy(made.GetBits(), pixels.data.data(), pixels.data.size() * 4);
+  bitmap->Attach(made.Detach());
+  return S_OK;
+}
+
+// The standard containers report a shortage in their own way.
+template <class F>
+HRESULT WithMemory(F work) {
+  try {
+    return work();
+  } catch (const std::bad_alloc&) {
+    throw SEOutOfMemory();
+  }
+}
+
+}  // namespace
+
+HRESULT SWritePicture(const SString& file, HBITMAP bitmap) {
+  return WithMemory([&] { return Write(file, bitmap); });
+}
+
+HRESULT SReadPicture(const SString& file, SBitmap* bitmap) {
+  return WithMemory([&] { return Read(file, bitmap); });
+}

@@ -1,0 +1,14 @@
+// Bitmaps to and from PNG files.
+#pragma once
+
+#include "qxcore/graphics/bitmap.h"
+
+// Writes a bitmap as a PNG file of 24 bits a pixel; a file that is there is replaced. Returns 0; E_INVALIDARG for an
+// invalid bitmap, the error of the file as an HRESULT, or E_FAIL where the encoder fails. A file that could not be
+// written whole is deleted. Throws SEOutOfMemory.
+QXCORE_API HRESULT SWritePicture(const SString& file, HBITMAP bitmap);
+
+// Reads a PNG file into a bitmap as CreatePixels makes it, transparent parts laid over white. Returns 0; the error of
+// the file, or ERROR_INVALID_DATA (0x8007000D) for one that is no PNG, is damaged or larger than 256 MiB or 32767
+// pixels on a side; the bitmap is as it was then. Throws SEOutOfMemory.
+QXCORE_API HRESULT SReadPicture(const SString& file, SBitmap* bitmap);
