@@ -1,7 +1,74 @@
-// Contexts of the screen and of windows.
-#include "qxcore/platform/posix/draw/context.h"
+// Contexts of the screen and of windows. A top-level window's pixels are a bitmap that keeps its content while the
+// window changes its size; the windows below it draw on parts of it.
+#include <algorithm>
+
+#include "qxcore/platform/posix/draw/fill.h"
+#include "qxcore/platform/posix/draw/window_surface.h"
+#include "qxcore/platform/posix/window/target.h"
 
 using namespace draw;
+
+namespace draw {
+
+namespace {
+
+using Kept = Ref<Bitmap>;
+
+// A bitmap of a new size with what the former one held.
+Ref<Bitmap> Resized(const Ref<Bitmap>& former, SIZE size) {
+  Ref<Bitmap> bitmap(Bitmap::Make(std::max(size.cx, 1), std::max(size.cy, 1), 32));
+  if (!bitmap) return former;
+  int width = former ? std::min(former->m_surface.width, bitmap->m_surface.width) : 0;
+  int height = former ? std::min(former->m_surface.height, bitmap->m_surface.height) : 0;
+  for (int y = 0; y < height; ++y) std::copy_n(former->m_surface.Row(y), width, bitmap->m_surface.Row(y));
+  return bitmap;
+}
+
+// The bitmap in a top-level window's slot, made or resized as needed; null when there is no memory.
+Ref<Bitmap> SurfaceIn(void** place, SIZE size) {
+  if (!*place) *place = new Kept;
+  Kept& slot = *static_cast<Kept*>(*place);
+  bool fits = slot && slot->m_surface.width == std::max(size.cx, 1) && slot->m_surface.height == std::max(size.cy, 1);
+  if (!fits) slot = Resized(slot, size);
+  return slot;
+}
+
+Area AreaOf(const pixman_region32_t* region) {
+  int count;
+  const Box* boxes = pixman_region32_rectangles(const_cast<pixman_region32_t*>(region), &count);
+  Area area;
+  area.SetBoxes(std::vector<Box>(boxes, boxes + count));
+  return area;
+}
+
+}  // namespace
+
+// `clip` is in the context's own coordinates; null takes all that is visible.
+HDC OpenWindow(HWND window, bool isWhole, const pixman_region32_t* clip) {
+  platform::model::Target target;
+  if (!platform::model::FindTarget(window, isWhole, &target)) return nullptr;
+  Ref<Bitmap> surface = SurfaceIn(target.surface, target.size);
+  auto* dc = surface ? new Context(OBJ_DC) : nullptr;
+  if (!dc) return Fail<HDC>(nullptr, ERROR_NOT_ENOUGH_MEMORY);
+  Area visible = AreaOf(target.visible.Pixman());
+  if (clip) {
+    Area within = AreaOf(clip);
+    within.Offset(target.origin.x, target.origin.y);
+    visible.And(within);
+  }
+  dc->m_window = window;
+  dc->SetTarget(surface, target.origin, visible);
+  return EnterAs<HDC>(dc);
+}
+
+void FreeWindowSurface(void* surface) { delete static_cast<Kept*>(surface); }
+
+const Surface* WindowSurface(void* surface) {
+  auto* slot = static_cast<Kept*>(surface);
+  return slot && *slot ? &(*slot)->m_surface : nullptr;
+}
+
+}  // namespace draw
 
 namespace {
 
@@ -19,9 +86,9 @@ HDC ScreenContext() {
 
 }  // namespace
 
-HDC GetDC(HWND window) { return window ? Fail<HDC>(nullptr, ERROR_INVALID_HANDLE) : ScreenContext(); }
+HDC GetDC(HWND window) { return window ? OpenWindow(window, false, nullptr) : ScreenContext(); }
 
-HDC GetWindowDC(HWND window) { return GetDC(window); }
+HDC GetWindowDC(HWND window) { return window ? OpenWindow(window, true, nullptr) : ScreenContext(); }
 
 int ReleaseDC(HWND, HDC handle) {
   auto* dc = Find<Context>(handle);
