@@ -1,7 +1,7 @@
 # The examples of the guides, run as a reader would run them. A guide with C++ examples has them all
 # in one program.
 set(guides README.md docs/strings.md docs/writing-text.md docs/text-encodings.md docs/containers.md docs/binary-format.md docs/notifications.md
-  docs/files-and-finders.md docs/time.md docs/settings.md docs/archives.md docs/mapped-files.md)
+  docs/files-and-finders.md docs/time.md docs/settings.md docs/archives.md docs/mapped-files.md docs/drawing.md)
 if(TARGET qxtool)
   find_package(Python3 REQUIRED COMPONENTS Interpreter)
   foreach(guide ${guides})
