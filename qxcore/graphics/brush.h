@@ -11,10 +11,8 @@ class QXCORE_API SBrush : public SGdiObject {
   SBrush() = default;
   // A brush of one colour; GetSafeHandle() is null when the system refuses.
   template <class Color>
-    requires std::is_integral_v<Color>
-  explicit SBrush(Color color) {
-    CreateSolidBrush(static_cast<COLORREF>(color));
-  }
+  requires std::is_integral_v<Color>
+  explicit SBrush(Color color) { CreateSolidBrush(static_cast<COLORREF>(color)); }
   explicit SBrush(HBRUSH brush) : SGdiObject(brush) {}
 
   // One colour.
