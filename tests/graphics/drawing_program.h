@@ -172,8 +172,9 @@ inline void RoundRects(SDC& dc) {
     SPen pen(PS_SOLID, 1, random.Color());
     SSelectObject selectBrush(dc, brush), selectPen(dc, pen);
     int x = 5 + i % 6 * 52, y = 5 + i / 6 * 46;
-    SSize size = random.Size(20, 24), corner = random.Size(4, 20);
-    dc.RoundRect(SRect(SPoint(x, y), size), corner);
+    SSize size = random.Size(20, 24);
+    int corner = 4 + random.Below(16);
+    dc.RoundRect(SRect(SPoint(x, y), size), SSize(corner + i % 3, corner));
   }
 }
 
@@ -320,14 +321,14 @@ inline void TextBoxes(SDC& dc) {
                             DT_RIGHT | DT_WORDBREAK,
                             DT_SINGLELINE | DT_VCENTER,
                             DT_SINGLELINE | DT_BOTTOM | DT_RIGHT,
-                            DT_WORDBREAK | DT_EXPANDTABS,
+                            DT_EXPANDTABS,
                             DT_WORDBREAK | DT_NOPREFIX | DT_EXTERNALLEADING,
                             DT_SINGLELINE | DT_END_ELLIPSIS};
   int i = 0;
   for (const WCHAR* face : {WTEXT("Liberation Sans"), WTEXT("DejaVu Sans")}) {
     for (unsigned int format : formats) {
       SFontOld font;
-      SSelectObject select(dc, UseFont(font, face, i % 2 ? -11 : 15));
+      SSelectObject select(dc, UseFont(font, face, i % 2 ? -11 : i < 8 ? 15 : 12));
       SRect rect(SPoint(4 + i % 4 * 78, 4 + i / 4 * 58), SSize(70, 50));
       SRect measured = rect;
       int height = dc.DrawTextW(text, measured, format | DT_CALCRECT);

@@ -43,17 +43,19 @@ struct Conversion {
 };
 
 // For each target pixel the source pixel that it shows. A larger target shows the one under its middle (the first of
-// two), a smaller one the last of those that fall on it.
+// two), a smaller one the last of the columns, but the first of the rows that fall on it.
 struct Axis {
   long long to, toSize, from, fromSize;  // sizes above 0
-  bool mirrored;
+  bool mirrored, showsFirst;
 
   int At(int target) const {
     long long step = mirrored ? toSize - 1 - (target - to) : target - to;
-    long long index = fromSize <= toSize ? ((2 * step + 1) * fromSize - 1) / (2 * toSize)
-                                         : (2 * fromSize * (step + 1) - toSize) / (2 * toSize);
-    return static_cast<int>(from + index);
+    if (fromSize <= toSize) return static_cast<int>(from + ((2 * step + 1) * fromSize - 1) / (2 * toSize));
+    if (showsFirst) return static_cast<int>(from + (step == 0 ? 0 : LastOf(step - 1) + 1));
+    return static_cast<int>(from + LastOf(step));
   }
+
+  long long LastOf(long long step) const { return (2 * fromSize * (step + 1) - toSize) / (2 * toSize); }
 };
 
 // A length with a sign, as the pixels that it covers: a negative one goes left from its first pixel, that included.
@@ -116,8 +118,8 @@ void Stretch(Context& to, const Rectangle4& target, const Surface& from, const S
   Extent toX(target.x, target.width), toY(target.y, target.height);
   Extent fromX(origin.x, origin.width), fromY(origin.y, origin.height);
   Box box{toX.start, toY.start, toX.start + toX.size, toY.start + toY.size};
-  Axis axisX{toX.start, toX.size, fromX.start, fromX.size, (target.width < 0) != (origin.width < 0)};
-  Axis axisY{toY.start, toY.size, fromY.start, fromY.size, (target.height < 0) != (origin.height < 0)};
+  Axis axisX{toX.start, toX.size, fromX.start, fromX.size, (target.width < 0) != (origin.width < 0), false};
+  Axis axisY{toY.start, toY.size, fromY.start, fromY.size, (target.height < 0) != (origin.height < 0), true};
   bool plain = table == TableOf(SRCCOPY) && !convert.toColors && !convert.toMono && !axisX.mirrored &&
                !axisY.mirrored && toX.size == fromX.size && toY.size == fromY.size;
   ForVisible(to, box, [&](const Box& part) {

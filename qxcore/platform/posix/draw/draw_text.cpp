@@ -8,7 +8,15 @@
 namespace {
 
 using Text = std::basic_string<WCHAR>;
-constexpr WCHAR kEllipsis[] = {'.', '.', '.', 0};
+constexpr WCHAR kEllipsis[] = {'.', '.', '.', 0}, kBlanks[] = {' ', '\t', 0};
+
+bool IsBlank(WCHAR character) { return character == ' ' || character == '\t'; }
+
+// Blanks at the end of a broken line have no width where it is centred or stands at the right.
+SStringView WithoutBlanksAtEnd(SStringView text) {
+  while (!text.empty() && IsBlank(text.back())) text.remove_suffix(1);
+  return text;
+}
 
 // A text without its prefix signs: "&" marks the character behind it, "&&" is one "&".
 struct Plain {
@@ -125,10 +133,10 @@ std::size_t Fitting(const Drawer& drawer, SStringView text, int width) {
 std::size_t BreakAt(const Drawer& drawer, SStringView text, int width, UINT format) {
   std::size_t fit = Fitting(drawer, text, width);
   if (fit >= text.size()) return text.size();
-  std::size_t blank = text.substr(0, fit).rfind(WCHAR{' '});
+  std::size_t blank = text.substr(0, fit).find_last_of(kBlanks);
   if (blank != SStringView::npos) return blank + 1;
   if (format & DT_EDITCONTROL) return fit;
-  blank = text.find(WCHAR{' '});
+  blank = text.find_first_of(kBlanks);
   return blank == SStringView::npos ? text.size() : blank;
 }
 
@@ -145,7 +153,7 @@ void AddParagraph(const Drawer& drawer, SStringView all, Line paragraph, int wid
     lines.push_back({start, length});
     start += length;
     // The blank behind a word that is too wide belongs to no line.
-    if (start < end && all[start] == ' ' && all[start - 1] != ' ') ++start;
+    if (start < end && IsBlank(all[start]) && !IsBlank(all[start - 1])) ++start;
   } while (start < end);
 }
 
@@ -226,7 +234,8 @@ int DrawTextW(HDC dc, LPCWSTR text, int count, RECT* rect, UINT format) {
     SStringView line = whole.substr(lines[i].start, lines[i].length);
     bool shorten = i + 1 == lines.size() || !(format & DT_END_ELLIPSIS);
     Text shown = shorten ? Shortened(drawer, line, rect->right - rect->left, format) : Text(line);
-    int width = drawer.Width(shown);
+    bool trims = format & DT_WORDBREAK && format & (DT_CENTER | DT_RIGHT);
+    int width = drawer.Width(trims ? WithoutBlanksAtEnd(shown) : shown);
     widest = std::max(widest, width);
     if (format & DT_CALCRECT) continue;
     if (format & DT_EDITCONTROL && y + drawer.LineHeight() > rect->bottom) break;
