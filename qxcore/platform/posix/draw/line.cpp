@@ -231,8 +231,8 @@ BOOL Polygon(HDC handle, const POINT* points, int count) {
       }))
     return TRUE;
   std::vector<POINT> mapped = Mapped(*dc, points, count);
-  PaintArea(*dc, PolygonArea(mapped.data(), count, dc->m_settings.polyFillMode), PaintOf(*dc, *dc->m_settings.brush),
-            dc->m_settings.rop2);
+  PaintArea(*dc, PolygonArea(mapped.data(), count, dc->m_settings.polyFillMode, dc->Clip().Extents()),
+            PaintOf(*dc, *dc->m_settings.brush), dc->m_settings.rop2);
   DrawLines(*dc, mapped.data(), count, true);
   return TRUE;
 }

@@ -61,7 +61,9 @@ class Area {
 };
 
 // The pixels of the shapes, by the rules of the shapes' calls: right and bottom edges lie outside.
-Area PolygonArea(const POINT* points, int count, int fillMode);
+// Of a polygon only the rows within `rows` are taken.
+constexpr Box kEverywhere{-(1 << 27), -(1 << 27), 1 << 27, 1 << 27};
+Area PolygonArea(const POINT* points, int count, int fillMode, const Box& rows = kEverywhere);
 Area EllipseArea(const Box& box);
 Area RoundRectArea(const Box& box, int cornerWidth, int cornerHeight);
 

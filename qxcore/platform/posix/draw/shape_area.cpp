@@ -53,15 +53,16 @@ void AddSpans(const std::vector<Crossing>& crossings, int y, int fillMode, std::
 
 }  // namespace
 
-Area PolygonArea(const POINT* points, int count, int fillMode) {
+Area PolygonArea(const POINT* points, int count, int fillMode, const Box& rows) {
   std::vector<Edge> edges = EdgesOf(points, count);
   std::vector<Box> boxes;
   std::vector<const Edge*> active;
   std::vector<Crossing> crossings;
   std::size_t next = 0;
-  for (int y = edges.empty() ? 0 : static_cast<int>(edges.front().y); next < edges.size() || !active.empty(); ++y) {
-    std::erase_if(active, [y](const Edge* edge) { return edge->bottom <= y; });
+  int y = edges.empty() ? rows.y2 : std::max(static_cast<int>(edges.front().y), rows.y1);
+  for (; y < rows.y2 && (next < edges.size() || !active.empty()); ++y) {
     for (; next < edges.size() && edges[next].y <= y; ++next) active.push_back(&edges[next]);
+    std::erase_if(active, [y](const Edge* edge) { return edge->bottom <= y; });
     crossings.clear();
     for (const Edge* edge : active) crossings.push_back({edge->At(y), edge->direction});
     std::stable_sort(crossings.begin(), crossings.end());
