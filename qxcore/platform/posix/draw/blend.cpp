@@ -37,7 +37,7 @@ __m128i Average2(__m128i to, __m128i color, __m128i cover) {
 }
 
 void BlendRow(std::uint32_t* row, const std::uint8_t* mask, int count, std::uint32_t color) {
-  const __m128i zero = _mm_setzero_si128(), channels = _mm_set1_epi32(0xFFFFFF);
+  const __m128i zero = _mm_setzero_si128();
   const __m128i wide = _mm_unpacklo_epi8(_mm_set1_epi32(static_cast<int>(color)), zero);
   int x = 0;
   for (; x + 4 <= count; x += 4) {
@@ -50,7 +50,7 @@ void BlendRow(std::uint32_t* row, const std::uint8_t* mask, int count, std::uint
     cover = _mm_unpacklo_epi16(cover, cover);  // each cover four times
     __m128i low = Average2(_mm_unpacklo_epi8(pixels, zero), wide, _mm_unpacklo_epi8(cover, zero));
     __m128i high = Average2(_mm_unpackhi_epi8(pixels, zero), wide, _mm_unpackhi_epi8(cover, zero));
-    _mm_storeu_si128(reinterpret_cast<__m128i*>(row + x), _mm_and_si128(_mm_packus_epi16(low, high), channels));
+    _mm_storeu_si128(reinterpret_cast<__m128i*>(row + x), _mm_packus_epi16(low, high));
   }
   BlendPixels(row + x, mask + x, count - x, color);
 }
@@ -72,14 +72,16 @@ void SetRow(std::uint32_t* row, const std::uint8_t* mask, int count, std::uint32
 void BlendGlyph(const Surface& surface, const Box& clip, int x, int y, const Glyph& glyph, std::uint32_t pixel) {
   Box part = Intersect({x, y, x + glyph.width, y + glyph.height}, clip);
   if (IsEmpty(part)) return;
+  // Where there is room, the zeros behind a row are blended as well: they change nothing and keep to whole vectors.
+  int count = part.x1 == x && x + glyph.stride <= clip.x2 ? glyph.stride : part.x2 - part.x1;
   const std::uint8_t* mask =
-      glyph.mask.data() + static_cast<std::ptrdiff_t>(glyph.width) * (part.y1 - y) + (part.x1 - x);
+      glyph.mask.data() + static_cast<std::ptrdiff_t>(glyph.stride) * (part.y1 - y) + (part.x1 - x);
   std::uint32_t* row = surface.Row(part.y1) + part.x1;
-  for (int line = part.y1; line < part.y2; ++line, mask += glyph.width, row += surface.stride) {
+  for (int line = part.y1; line < part.y2; ++line, mask += glyph.stride, row += surface.stride) {
     if (surface.mono)
-      SetRow(row, mask, part.x2 - part.x1, pixel);
+      SetRow(row, mask, count, pixel);
     else
-      BlendRow(row, mask, part.x2 - part.x1, pixel);
+      BlendRow(row, mask, count, pixel);
   }
 }
 

@@ -171,11 +171,11 @@ std::unique_ptr<Glyph> SizedFace::Render(unsigned index) {
   glyph->top = slot->bitmap_top;
   glyph->width = static_cast<int>(bitmap.width);
   glyph->height = static_cast<int>(bitmap.rows);
-  constexpr std::size_t kBeyond = 16;  // so that readers may read a whole vector
-  glyph->mask.resize(static_cast<std::size_t>(glyph->width) * glyph->height + kBeyond);
+  glyph->stride = (glyph->width + 3) / 4 * 4;
+  glyph->mask.resize(static_cast<std::size_t>(glyph->stride) * glyph->height);
   for (int y = 0; y < glyph->height; ++y) {
     const unsigned char* row = bitmap.buffer + static_cast<std::ptrdiff_t>(bitmap.pitch) * y;
-    std::uint8_t* to = &glyph->mask[static_cast<std::size_t>(glyph->width) * y];
+    std::uint8_t* to = glyph->mask.data() + static_cast<std::ptrdiff_t>(glyph->stride) * y;
     for (int x = 0; x < glyph->width; ++x)
       to[x] = bitmap.pixel_mode == FT_PIXEL_MODE_MONO ? (row[x / 8] >> (7 - x % 8) & 1 ? 255 : 0) : row[x];
   }

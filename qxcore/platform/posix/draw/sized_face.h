@@ -17,7 +17,8 @@ struct Glyph {
   int advance = 0;        // pixels to the next one
   int left = 0, top = 0;  // from the pen to the mask's corner; up is positive
   int width = 0, height = 0;
-  std::vector<std::uint8_t> mask;  // `width` bytes a row and 16 more at the end; 255 is full cover
+  int stride = 0;                  // bytes of a row of the mask: the width and zeros up to a multiple of four
+  std::vector<std::uint8_t> mask;  // 255 is full cover
 };
 
 class SizedFace {
