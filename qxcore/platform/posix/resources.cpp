@@ -6,6 +6,7 @@
 #include <string_view>
 
 #include "qxcore/platform/module.h"
+#include "qxcore/platform/resource_table.h"
 
 namespace {
 
@@ -153,6 +154,8 @@ int LoadStringW(HINSTANCE instance, UINT id, LPWSTR buffer, int size) {
 
 HRSRC FindResourceW(HMODULE module, LPCWSTR name, LPCWSTR type) {
   if (reinterpret_cast<std::uintptr_t>(type) != reinterpret_cast<std::uintptr_t>(RT_STRING)) {
+    const void* registered = platform::FindRegisteredResource(module, type, name).data;
+    if (registered != nullptr) return reinterpret_cast<HRSRC>(const_cast<void*>(registered));
     SetLastError(ERROR_RESOURCE_TYPE_NOT_FOUND);
     return nullptr;
   }
@@ -167,3 +170,8 @@ HRSRC FindResourceW(HMODULE module, LPCWSTR name, LPCWSTR type) {
   SetLastError(ERROR_RESOURCE_NAME_NOT_FOUND);
   return nullptr;
 }
+
+// What FindResourceW returns for a registered resource are its bytes.
+HGLOBAL LoadResource(HMODULE, HRSRC resource) { return resource; }
+
+LPVOID LockResource(HGLOBAL resource) { return resource; }

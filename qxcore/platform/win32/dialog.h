@@ -161,7 +161,7 @@ QXCORE_API BOOL MessageBeep(UINT kind);
 #define RT_DIALOG MAKEINTRESOURCEW(5)
 #define RT_ACCELERATOR MAKEINTRESOURCEW(9)
 
-QXCORE_API DWORD SizeofResource(HMODULE module, HRSRC resource);
+// The bytes of a resource that FindResourceW found; not for texts, which LoadStringW loads.
 QXCORE_API HGLOBAL LoadResource(HMODULE module, HRSRC resource);
 QXCORE_API LPVOID LockResource(HGLOBAL resource);
 

@@ -111,6 +111,16 @@ QXCORE_API int MulDiv(int number, int numerator, int denominator);
 QXCORE_API UINT GetACP();
 QXCORE_API UINT GetOEMCP();
 
+// --- the program ---
+
+// The words that the program was started with, quoted where they need it.
+QXCORE_API LPWSTR GetCommandLineW();
+// The program's own file, for a null module only; others give ERROR_MOD_NOT_FOUND. A path that does not fit is cut,
+// with ERROR_INSUFFICIENT_BUFFER.
+QXCORE_API DWORD GetModuleFileNameW(HMODULE module, LPWSTR path, DWORD capacity);
+#define GetCommandLine GetCommandLineW
+#define GetModuleFileName GetModuleFileNameW
+
 // --- time ---
 
 QXCORE_API void GetSystemTime(SYSTEMTIME* time);
