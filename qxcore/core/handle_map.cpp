@@ -29,14 +29,24 @@ void SHandleMap::SetPermanent(void* handle, SObject* object) { m_permanent.Add(h
 
 void SHandleMap::RemovePermanent(void* handle) { m_permanent.Remove(handle); }
 
-void SHandleMap::RemoveTemporary(void* handle) { m_temporary.Remove(handle); }
+void SHandleMap::DiscardTemporary(void* handle) {
+  SObject* object = FromHandleTemporary(handle);
+  if (object == nullptr) return;
+  m_discarded.Add(object, object);
+  m_temporary.Remove(handle);
+}
 
 // One at a time, so that a destructor may look into the map.
-void SHandleMap::DeleteTempMap() {
-  while (!m_temporary.empty()) {
-    auto first = m_temporary.begin();
+void SHandleMap::DestroyAll(SMap<void*, SObject*>& map) {
+  while (!map.empty()) {
+    auto first = map.begin();
     SObject* object = first->m_value;
-    m_temporary.Remove(first);
+    map.Remove(first);
     DestroyTemporary(object);
   }
+}
+
+void SHandleMap::DeleteTempMap() {
+  DestroyAll(m_temporary);
+  DestroyAll(m_discarded);
 }

@@ -32,10 +32,11 @@ class QXCORE_API SHandleMap {
   void SetPermanent(void* handle, SObject* object);
   // Takes the handle out of the permanent map; nothing happens when it is not there.
   void RemovePermanent(void* handle);
-  // Takes the handle out of the temporary map without destroying the object, which the caller then owns.
-  void RemoveTemporary(void* handle);
+  // Makes the handle's temporary object unknown without destroying it before the others; nothing happens when
+  // there is none. Throws SEOutOfMemory and then changes nothing.
+  void DiscardTemporary(void* handle);
 
-  // Destroys all temporary objects, in the order of their handles.
+  // Destroys all temporary objects, in the order of their handles, then the discarded ones.
   void DeleteTempMap();
 
   int GetPermanentCount() const { return m_permanent.GetCount(); }  // entries of the permanent map
@@ -48,6 +49,9 @@ class QXCORE_API SHandleMap {
   virtual void DestroyTemporary(SObject* object) = 0;
 
  private:
+  void DestroyAll(SMap<void*, SObject*>& map);
+
   SMap<void*, SObject*> m_permanent;
   SMap<void*, SObject*> m_temporary;
+  SMap<void*, SObject*> m_discarded;  // by the object itself
 };

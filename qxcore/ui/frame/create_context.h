@@ -1,0 +1,12 @@
+// SCreateContext: what a frame's client is created from; passed on through Create to WM_CREATE.
+#pragma once
+
+#include "qxcore/core/object.h"
+
+class SFrameWnd;
+
+struct SCreateContext {
+  SClassInfo* m_viewClass = nullptr;    // the class of the view that fills the frame; null for no view
+  void* m_document = nullptr;           // what the view shows; its meaning is the program's
+  SFrameWnd* m_currentFrame = nullptr;  // the frame on which a new one is modelled, or null
+};

@@ -1,0 +1,37 @@
+// SView: a child window that shows something; derive from it and override OnDraw.
+//
+// A click makes a view the active one of its frame, which then offers it all commands first. A view is made with new,
+// usually by a frame from an SCreateContext, and deletes itself with its window.
+#pragma once
+
+#include "qxcore/ui/frame/create_context.h"
+#include "qxcore/ui/window/window.h"
+
+class QXCORE_API SView : public SWnd {
+  QXCORE_DECLARE_CLASS(SView)
+
+ public:
+  SView() = default;
+  ~SView() override;
+
+  int PreCreateWindow(CREATESTRUCTW* create) override;
+
+  // Draws the view. The context's clip region is what must be drawn.
+  virtual void OnDraw(SDC* dc) = 0;
+  // Called when the view becomes (1) or ceases to be (0) its frame's active one. Here it takes the focus.
+  virtual void OnActivateView(int activate, SView* active, SView* former);
+
+ protected:
+  void PostNcDestroy() override;  // deletes the view
+
+  void OnPaint();
+  int OnEraseBkgnd(SDC* dc);
+  void OnSetFocus(SWnd* oldFocus);
+  int OnMouseActivate(SWnd* top, UINT hit, UINT message);
+
+  QXCORE_DECLARE_MESSAGE_MAP()
+
+ private:
+  friend class SFrameWnd;
+  SFrameWnd* m_activeIn = nullptr;  // the frame whose active view this is; null for none
+};

@@ -1,0 +1,126 @@
+// The road of a message: from the window procedure through the object to its handler.
+
+#include "qxcore/ui/app/temp_maps.h"
+#include "qxcore/ui/frame/dialog.h"
+#include "qxcore/ui/window/internal/cross_thread.h"
+#include "qxcore/ui/window/internal/guard.h"
+#include "qxcore/ui/window/window.h"
+
+namespace {
+
+// The message that the thread is handling, for as long as it is; then the outer one is current again.
+class CurrentMessage {
+ public:
+  CurrentMessage(SWndThreadState& state, const SCurrentMessage& message) : m_state(state), m_outer(state.m_current) {
+    state.m_current = message;
+    SLockTempMaps();
+  }
+  CurrentMessage(const CurrentMessage&) = delete;
+  CurrentMessage& operator=(const CurrentMessage&) = delete;
+  ~CurrentMessage() {
+    m_state.m_current = m_outer;
+    SUnlockTempMaps(0);
+  }
+
+ private:
+  SWndThreadState& m_state;
+  const SCurrentMessage m_outer;
+};
+
+// What a message returns whose handler threw.
+LRESULT RefusalOf(UINT message) { return message == WM_CREATE ? -1 : 0; }
+
+}  // namespace
+
+LRESULT CALLBACK SWindowProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
+  const LRESULT result = SGuarded(RefusalOf(message), [=] {
+    SWnd* object = SWnd::FromHandlePermanent(window);
+    if (object == nullptr) return ::DefWindowProcW(window, message, wParam, lParam);
+    const CurrentMessage current(SWndThreadState::Get(), {window, message, wParam, lParam});
+    if (message == WM_INITDIALOG && object->IsKindOf(&SDlg::classSDlg)) {
+      return static_cast<SDlg*>(object)->HandleInitDialog(wParam, lParam);
+    }
+    return object->WindowProc(message, wParam, lParam);
+  });
+  SCrossThreadSend::Deliver(window, message, wParam, lParam);
+  return result;
+}
+
+LRESULT SWnd::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+  LRESULT result = 0;
+  if (OnWndMsg(message, wParam, lParam, &result)) return result;
+  return DefWindowProcW(message, wParam, lParam);
+}
+
+int SWnd::OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* result) {
+  if (message == WM_COMMAND) {
+    const int handled = OnCommand(wParam, lParam);
+    if (handled && result != nullptr) *result = 1;
+    return handled;
+  }
+  if (message == WM_NOTIFY) return OnNotify(wParam, lParam, result);
+  const SMsgEntry* entry = SFindMessageEntryCached(GetMessageMap(), message);
+  if (entry == nullptr) return 0;
+  return CallMapped(*entry, wParam, lParam, result);
+}
+
+// Shapes that are no shapes, and those of commands, handle no message. A registered entry's shape is fixed; its
+// signature is an address.
+int SWnd::CallMapped(const SMsgEntry& entry, WPARAM wParam, LPARAM lParam, LRESULT* result) {
+  const std::uintptr_t shape = entry.m_signature.m_number;
+  if (entry.m_message != kSMsgRegistered) {
+    if (shape > 52 || shape == 2 || shape == 4 || shape == 47 || shape == 49 || shape == 50) return 0;
+  }
+  const LRESULT returned = entry.m_handler(this, wParam, lParam);
+  if (result != nullptr) *result = returned;
+  return 1;
+}
+
+LRESULT SWnd::DefWindowProcW(UINT message, WPARAM wParam, LPARAM lParam) {
+  if (m_superWndProc != nullptr) return SSent(::CallWindowProcW(m_superWndProc, m_hWnd, message, wParam, lParam));
+  if (const WNDPROC super = GetSuperWndProc()) {
+    return SSent(::CallWindowProcW(super, m_hWnd, message, wParam, lParam));
+  }
+  return SSent(::DefWindowProcW(m_hWnd, message, wParam, lParam));
+}
+
+LRESULT SWnd::Default() {
+  const SCurrentMessage& current = SWndThreadState::Get().m_current;
+  return DefWindowProcW(current.m_message, current.m_wParam, current.m_lParam);
+}
+
+LRESULT SWnd::SendMessageW(UINT message, WPARAM wParam, LPARAM lParam) const {
+  const SCrossThreadSend send(m_hWnd, message, wParam, lParam);
+  const LRESULT result = ::SendMessageW(m_hWnd, message, wParam, lParam);
+  send.ThrowException();
+  return SSent(result);
+}
+
+int SWnd::PostMessageW(UINT message, WPARAM wParam, LPARAM lParam) const {
+  return ::PostMessageW(m_hWnd, message, wParam, lParam);
+}
+
+// The next sibling is asked for before the message is sent: the child may be gone afterwards.
+static void SendToChildren(HWND parent, const SCurrentMessage& message, bool deep, bool onlyPermanent) {
+  HWND next = nullptr;
+  for (HWND child = ::GetWindow(parent, GW_CHILD); child != nullptr; child = next) {
+    next = ::GetWindow(child, GW_HWNDNEXT);
+    if (!onlyPermanent || SWnd::FromHandlePermanent(child) != nullptr) {
+      SSent(::SendMessageW(child, message.m_message, message.m_wParam, message.m_lParam));
+    }
+    if (deep) SendToChildren(child, message, deep, onlyPermanent);
+  }
+}
+
+void SWnd::SendMessageToDescendants(UINT message, WPARAM wParam, LPARAM lParam, int deep, int onlyPermanent) {
+  SendToChildren(m_hWnd, {m_hWnd, message, wParam, lParam}, deep != 0, onlyPermanent != 0);
+}
+
+int SWnd::WalkPreTranslateTree(HWND stop, MSG* message) {
+  for (HWND window = message->hwnd; window != nullptr; window = ::GetParent(window)) {
+    SWnd* object = FromHandlePermanent(window);
+    if (object != nullptr && object->PreTranslateMessage(message)) return 1;
+    if (window == stop || (::GetWindowLongW(window, GWL_STYLE) & WS_CHILD) == 0) break;
+  }
+  return 0;
+}
