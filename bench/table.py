@@ -81,6 +81,12 @@ ROWS = [
     ("escape 64 MB of mixed UTF-16", "memcpy", "speed", 0.1),
     ("unescape 64 MB without escapes", "memcpy", "speed", 0.5),
     ("unescape 64 MB with escapes", "memcpy", "speed", 0.1),
+    ("a handled message, three bases down", "virtual call", "time", 3.0),
+    ("a handled message, three bases down", "wxWidgets", "time", 0.4),
+    ("a handled message, three bases down", "Qt sendEvent", "time", 0.25),
+    ("an unhandled message", "virtual call", "time", 2.0),
+    ("SendMessage to a handler", "Qt sendEvent", "time", 1.0),
+    ("a command through view, frame and application", "wxWidgets", "time", 1.0),
 ]
 
 TO_NANOSECONDS = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}

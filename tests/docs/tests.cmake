@@ -1,13 +1,14 @@
 # The examples of the guides, run as a reader would run them. A guide with C++ examples has them all
 # in one program.
 set(guides README.md docs/strings.md docs/writing-text.md docs/text-encodings.md docs/containers.md docs/binary-format.md docs/notifications.md
-  docs/files-and-finders.md docs/time.md docs/settings.md docs/archives.md docs/mapped-files.md docs/drawing.md)
+  docs/files-and-finders.md docs/time.md docs/settings.md docs/archives.md docs/mapped-files.md docs/drawing.md
+  docs/windows.md docs/unattended.md)
 if(TARGET qxtool)
   find_package(Python3 REQUIRED COMPONENTS Interpreter)
   foreach(guide ${guides})
     string(MAKE_C_IDENTIFIER ${guide} name)
     set(program)
-    file(STRINGS ${PROJECT_SOURCE_DIR}/${guide} cpp_blocks REGEX "^```cpp$")
+    file(STRINGS ${PROJECT_SOURCE_DIR}/${guide} cpp_blocks REGEX "^```cpp( program)?$")
     if(cpp_blocks)
       set(source ${CMAKE_CURRENT_BINARY_DIR}/${name}.cpp)
       add_custom_command(OUTPUT ${source}

@@ -1,0 +1,203 @@
+// Messages and commands, beside virtual calls, events of Qt and of wxWidgets.
+
+#if BENCH_PEERS
+#include <QCoreApplication>
+#include <QEvent>
+#include <QObject>
+#endif
+#if defined(BENCH_WX)
+#include <wx/app.h>
+#include <wx/event.h>
+#endif
+
+#include "bench/bench.h"
+#include "qxcore/ui/app/application.h"
+#include "qxcore/ui/frame/frame.h"
+#include "qxcore/ui/frame/view.h"
+#include "qxcore/ui/window/message_entries.h"
+#include "qxcore/ui/window/window.h"
+
+namespace {
+
+constexpr UINT kHandled = WM_USER + 1;
+constexpr UINT kUnhandled = WM_USER + 2;
+constexpr UINT kCommand = 0x8001;
+
+// The handler stands in the map of the outermost class, three bases below the object's own.
+class Handling : public SWnd {
+ public:
+  LRESULT OnHandled(WPARAM wParam, LPARAM) { return static_cast<LRESULT>(m_sum += wParam); }
+  WPARAM m_sum = 0;
+  QXCORE_DECLARE_MESSAGE_MAP()
+};
+QXCORE_IMPLEMENT_MESSAGE_MAP(Handling, SWnd, on<kHandled, &Handling::OnHandled>())
+#define LEVEL(Class, Base)       \
+  class Class : public Base {    \
+    QXCORE_DECLARE_MESSAGE_MAP() \
+  };                             \
+  QXCORE_IMPLEMENT_MESSAGE_MAP(Class, Base)
+LEVEL(One, Handling)
+LEVEL(Two, One)
+LEVEL(Three, Two)
+
+struct Virtual {
+  virtual ~Virtual() = default;
+  virtual LRESULT Call(UINT message, WPARAM wParam, LPARAM lParam) = 0;
+};
+struct Called final : Virtual {
+  LRESULT Call(UINT, WPARAM wParam, LPARAM) override { return static_cast<LRESULT>(m_sum += wParam); }
+  WPARAM m_sum = 0;
+};
+
+BENCH("a handled message, three bases down/ours") {
+  Three window;
+  SWnd* object = &window;
+  benchmark::DoNotOptimize(object);
+  for (auto _ : state) {
+    LRESULT result = 0;
+    benchmark::DoNotOptimize(object->OnWndMsg(kHandled, 1, 0, &result));
+    benchmark::DoNotOptimize(result);
+  }
+}
+
+BENCH("an unhandled message/ours") {
+  Three window;
+  SWnd* object = &window;
+  benchmark::DoNotOptimize(object);
+  for (auto _ : state) {
+    LRESULT result = 0;
+    benchmark::DoNotOptimize(object->OnWndMsg(kUnhandled, 1, 0, &result));
+  }
+}
+
+void VirtualCalls(benchmark::State& state) {
+  Called called;
+  Virtual* object = &called;
+  benchmark::DoNotOptimize(object);
+  for (auto _ : state) benchmark::DoNotOptimize(object->Call(kHandled, 1, 0));
+}
+BENCH("a handled message, three bases down/virtual call") { VirtualCalls(state); }
+BENCH("an unhandled message/virtual call") { VirtualCalls(state); }
+
+BENCH("SendMessage to a handler/ours") {
+  Three window;
+  window.CreateEx(0, nullptr, nullptr, WS_POPUP, 0, 0, 9, 9, nullptr, nullptr);
+  for (auto _ : state) benchmark::DoNotOptimize(window.SendMessageW(kHandled, 1, 0));
+  window.DestroyWindow();
+}
+
+LRESULT CALLBACK PlainProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
+  return message == kHandled ? static_cast<LRESULT>(wParam) : ::DefWindowProcW(window, message, wParam, lParam);
+}
+
+BENCH("SendMessage to a handler/plain procedure") {
+  WNDCLASSEXW registered = {};
+  registered.cbSize = sizeof(registered);
+  registered.lpfnWndProc = &PlainProcedure;
+  registered.hInstance = SGetInstance();
+  registered.lpszClassName = WTEXT("bench plain");
+  ::RegisterClassExW(&registered);
+  const HWND window = ::CreateWindowExW(0, WTEXT("bench plain"), nullptr, WS_POPUP, 0, 0, 9, 9, nullptr, nullptr,
+                                        SGetInstance(), nullptr);
+  for (auto _ : state) benchmark::DoNotOptimize(::SendMessageW(window, kHandled, 1, 0));
+  ::DestroyWindow(window);
+}
+
+// A command that only the application handles: past the maps of view and frame.
+class BenchView : public SView {
+  QXCORE_DECLARE_CREATABLE_CLASS(BenchView)
+ public:
+  void OnDraw(SDC*) override {}
+  void OnOther() {}
+  QXCORE_DECLARE_MESSAGE_MAP()
+};
+QXCORE_IMPLEMENT_CREATABLE_CLASS(BenchView, SView, 2)
+QXCORE_IMPLEMENT_MESSAGE_MAP(BenchView, SView, command<1, &BenchView::OnOther>(), command<2, &BenchView::OnOther>(),
+                             command<3, &BenchView::OnOther>(), command<4, &BenchView::OnOther>())
+class BenchApp : public SWinApp {
+ public:
+  void OnCommand() { ++m_count; }
+  void OnOther() {}
+  long m_count = 0;
+  QXCORE_DECLARE_MESSAGE_MAP()
+};
+QXCORE_IMPLEMENT_MESSAGE_MAP(BenchApp, SWinApp, command<1, &BenchApp::OnOther>(), command<2, &BenchApp::OnOther>(),
+                             command<3, &BenchApp::OnOther>(), command<kCommand, &BenchApp::OnCommand>())
+
+BENCH("a command through view, frame and application/ours") {
+  BenchApp app;
+  SCreateContext context;
+  context.m_viewClass = &BenchView::classBenchView;
+  auto* frame = new SFrameWnd;
+  frame->Create(nullptr, nullptr, WS_OVERLAPPEDWINDOW, SRect(0, 0, 99, 99), nullptr, nullptr, 0, &context);
+  for (auto _ : state) benchmark::DoNotOptimize(frame->OnCmdMsg(kCommand, 0, nullptr, nullptr));
+  frame->DestroyWindow();
+}
+
+#if BENCH_PEERS
+class QtReceiver : public QObject {
+ public:
+  bool event(QEvent* event) override {
+    if (event->type() == QEvent::User) return ++m_count, true;
+    return QObject::event(event);
+  }
+  long m_count = 0;
+};
+
+void QtSends(benchmark::State& state) {
+  int argc = 0;
+  QCoreApplication app(argc, nullptr);
+  QtReceiver receiver;
+  QEvent event(QEvent::User);
+  for (auto _ : state) benchmark::DoNotOptimize(QCoreApplication::sendEvent(&receiver, &event));
+}
+BENCH("a handled message, three bases down/Qt sendEvent") { QtSends(state); }
+BENCH("SendMessage to a handler/Qt sendEvent") { QtSends(state); }
+#endif
+
+#if defined(BENCH_WX)
+wxDEFINE_EVENT(kWxHandled, wxCommandEvent);
+class WxHandling : public wxEvtHandler {
+ public:
+  void OnHandled(wxCommandEvent&) { ++m_count; }
+  void OnOther(wxCommandEvent&) {}
+  long m_count = 0;
+  wxDECLARE_EVENT_TABLE();
+};
+wxBEGIN_EVENT_TABLE(WxHandling, wxEvtHandler) EVT_COMMAND(wxID_ANY, kWxHandled, WxHandling::OnHandled)
+    wxEND_EVENT_TABLE() class WxOne : public WxHandling {
+  wxDECLARE_EVENT_TABLE();
+};
+wxBEGIN_EVENT_TABLE(WxOne, WxHandling) wxEND_EVENT_TABLE() class WxTwo : public WxOne { wxDECLARE_EVENT_TABLE(); };
+wxBEGIN_EVENT_TABLE(WxTwo, WxOne) wxEND_EVENT_TABLE()
+
+    class WxOther : public wxEvtHandler {
+ public:
+  void OnOther(wxCommandEvent&) {}
+  wxDECLARE_EVENT_TABLE();
+};
+wxBEGIN_EVENT_TABLE(WxOther, wxEvtHandler) EVT_COMMAND(1, kWxHandled, WxOther::OnOther)
+    EVT_COMMAND(2, kWxHandled, WxOther::OnOther) EVT_COMMAND(3, kWxHandled, WxOther::OnOther)
+        EVT_COMMAND(4, kWxHandled, WxOther::OnOther) wxEND_EVENT_TABLE()
+
+            BENCH("a handled message, three bases down/wxWidgets") {
+  WxTwo handler;
+  wxCommandEvent event(kWxHandled, 7);
+  for (auto _ : state) benchmark::DoNotOptimize(handler.ProcessEvent(event));
+}
+BENCH("a command through view, frame and application/wxWidgets") {
+  WxOther view, frame;
+  WxTwo app;
+  view.SetNextHandler(&frame);
+  frame.SetPreviousHandler(&view);
+  frame.SetNextHandler(&app);
+  app.SetPreviousHandler(&frame);
+  wxCommandEvent event(kWxHandled, 7);
+  for (auto _ : state) benchmark::DoNotOptimize(view.ProcessEvent(event));
+  view.Unlink();
+  frame.Unlink();
+  app.Unlink();
+}
+#endif
+
+}  // namespace
