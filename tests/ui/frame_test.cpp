@@ -58,7 +58,8 @@ TEST_F(Frames, TheView_FillsWhatBarsLeave) {
   SView* view = frame->GetActiveView();
   ASSERT_NE(view, nullptr);
   EXPECT_EQ(view->GetDlgCtrlID(), static_cast<int>(kSFirstPane));
-  EXPECT_EQ(view->GetWindowRect().Size(), frame->GetClientRect().Size());
+  EXPECT_EQ(view->GetWindowRect().Width(), frame->GetClientRect().Width());
+  EXPECT_EQ(view->GetWindowRect().Height(), frame->GetClientRect().Height());
   ASSERT_TRUE(bar.Child(frame, 77));
   frame->MoveWindow(SRect(0, 0, 300, 200));
   const SRect client = frame->GetClientRect();

@@ -40,7 +40,7 @@ int SFrameWnd::Create(LPCWSTR className, LPCWSTR title, DWORD style, const SRect
       return 0;
     }
   }
-  const bool isDefault = rect == m_rcDefault;
+  const bool isDefault = rect == static_cast<const RECT&>(m_rcDefault);
   int created = 0;
   try {
     created = CreateEx(exStyle, className, title, style, rect.left, rect.top, isDefault ? CW_USEDEFAULT : rect.Width(),

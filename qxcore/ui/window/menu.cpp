@@ -38,6 +38,10 @@ SMenu* SMenu::FromHandle(HMENU menu) { return static_cast<SMenu*>(HandleMap().Fr
 SMenu* SMenu::FromHandlePermanent(HMENU menu) { return static_cast<SMenu*>(HandleMap().FromHandlePermanent(menu)); }
 void SMenu::DeleteTempMap() { HandleMap().DeleteTempMap(); }
 
+static HMENU HandleOrNull(const SMenu* menu) { return menu != nullptr ? menu->m_hMenu : nullptr; }
+
+HMENU SMenu::GetSafeHandle() const { return HandleOrNull(this); }
+
 SMenu::~SMenu() { DestroyMenu(); }
 
 int SMenu::Attach(HMENU menu) {

@@ -31,7 +31,7 @@ class QXCORE_API SMenu : public SObject {
 
   int Attach(HMENU menu);  // owns the menu from now on; 0 for a null handle. Throws SEOutOfMemory
   HMENU Detach();          // gives the menu up; returns its handle
-  HMENU GetSafeHandle() const { return this != nullptr ? m_hMenu : nullptr; }  // null also through a null pointer
+  HMENU GetSafeHandle() const;  // the handle; null for a null object pointer, too
 
   // The object of a menu: the permanent one, else a temporary one; null for a null handle.
   static SMenu* FromHandle(HMENU menu);

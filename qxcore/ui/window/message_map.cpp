@@ -28,7 +28,7 @@ struct CacheSlot {
   const SMsgEntry* m_entry;
   const SMsgMap* m_map;  // null while the slot was never used
 };
-constinit CacheSlot g_cache[256];
+constinit CacheSlot g_cache[256] = {};
 
 }  // namespace
 

@@ -44,6 +44,11 @@ SWnd* SWnd::FromHandlePermanent(HWND window) { return static_cast<SWnd*>(HandleM
 
 void SWnd::DeleteTempMap() { HandleMap().DeleteTempMap(); }
 
+// Takes the pointer by value, so that no compiler concludes from `this` that it cannot be null.
+static HWND HandleOrNull(const SWnd* window) { return window != nullptr ? window->m_hWnd : nullptr; }
+
+HWND SWnd::GetSafeHwnd() const { return HandleOrNull(this); }
+
 int SWnd::Attach(HWND window) {
   if (window == nullptr) return 0;
   HandleMap().SetPermanent(window, this);

@@ -117,7 +117,7 @@ class QXCORE_API SWnd : public SCmdTarget {
   int SubclassWindow(HWND window);
   // The same for the child with this identifier, bound to `child`; 0 when there is no such child.
   int SubclassChild(int id, SWnd* child);
-  HWND GetSafeHwnd() const { return this != nullptr ? m_hWnd : nullptr; }  // null also through a null pointer
+  HWND GetSafeHwnd() const;  // the handle; null for a null object pointer, too
 
   // The object of a window: the permanent one, else a temporary one; null for a null handle.
   static SWnd* FromHandle(HWND window);
