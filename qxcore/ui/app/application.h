@@ -27,7 +27,7 @@ class QXCORE_API SWinApp : public SCmdTarget {
   QXCORE_DECLARE_CLASS(SWinApp)
 
  public:
-  // The application's name; null for the name of the program's file. The object becomes the application object.
+  // Makes the application object. A null name stands for the name of the program's file.
   explicit SWinApp(LPCWSTR name = nullptr);
   SWinApp(const SWinApp&) = delete;
   SWinApp& operator=(const SWinApp&) = delete;

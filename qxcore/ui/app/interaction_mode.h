@@ -30,12 +30,12 @@ inline bool SIsInteractive() { return SInteractionModeInForce() == kInteractiveS
 // Sets the current mode and puts the former one back when it ends.
 class QXCORE_API SetInteractiveMode {
  public:
-  SetInteractiveMode();  // changes nothing yet
-  explicit SetInteractiveMode(InteractiveMode mode);
+  SetInteractiveMode();                               // changes nothing yet
+  explicit SetInteractiveMode(InteractiveMode mode);  // sets the mode
   SetInteractiveMode(const SetInteractiveMode&) = delete;
   SetInteractiveMode& operator=(const SetInteractiveMode&) = delete;
   virtual ~SetInteractiveMode();
-  virtual void Set(InteractiveMode mode);
+  virtual void Set(InteractiveMode mode);  // sets another mode
 
  private:
   InteractiveMode m_former;  // at construction
@@ -44,12 +44,12 @@ class QXCORE_API SetInteractiveMode {
 // The same for the default mode.
 class QXCORE_API SetDeftInteractiveMode {
  public:
-  SetDeftInteractiveMode();  // changes nothing yet
-  explicit SetDeftInteractiveMode(InteractiveMode mode);
+  SetDeftInteractiveMode();                               // changes nothing yet
+  explicit SetDeftInteractiveMode(InteractiveMode mode);  // sets the mode
   SetDeftInteractiveMode(const SetDeftInteractiveMode&) = delete;
   SetDeftInteractiveMode& operator=(const SetDeftInteractiveMode&) = delete;
   virtual ~SetDeftInteractiveMode();
-  virtual void Set(InteractiveMode mode);
+  virtual void Set(InteractiveMode mode);  // sets another mode
 
  private:
   InteractiveMode m_former;  // at construction

@@ -10,8 +10,8 @@ class SWnd;
 
 class QXCORE_API SLockRedraw {
  public:
-  SLockRedraw() noexcept = default;  // locks nothing
-  explicit SLockRedraw(SWnd* window) { Lock(window); }
+  SLockRedraw() noexcept = default;                     // locks nothing
+  explicit SLockRedraw(SWnd* window) { Lock(window); }  // locks the window
   SLockRedraw(const SLockRedraw&) = delete;
   SLockRedraw& operator=(const SLockRedraw&) = delete;
   ~SLockRedraw();  // unlocks and draws anew; what a handler throws meanwhile is kept

@@ -16,10 +16,10 @@ class QXCORE_API SButton : public SWnd {
   // Creates the control as a child; `style` has the system's BS_ bits. Returns nonzero on success.
   int Create(LPCWSTR text, DWORD style, const SRect& rect, SWnd* parent, UINT id);
 
-  int GetCheck() const;  // 0, 1, or 2 for undecided
-  void SetCheck(int check);
-  UINT GetState() const;        // the system's BST_ bits
-  void SetState(int pressed);   // draws it pressed or not
-  UINT GetButtonStyle() const;  // the BS_ bits
-  void SetButtonStyle(UINT style, int redraw = 1);
+  int GetCheck() const;                             // 0, 1, or 2 for undecided
+  void SetCheck(int check);                         // sets it
+  UINT GetState() const;                            // the system's BST_ bits
+  void SetState(int pressed);                       // draws it pressed or not
+  UINT GetButtonStyle() const;                      // the BS_ bits
+  void SetButtonStyle(UINT style, int redraw = 1);  // sets them
 };

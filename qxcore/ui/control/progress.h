@@ -16,8 +16,8 @@ class QXCORE_API SProgressCtrl : public SWnd {
 
   void SetRange(int low, int high);  // 0 to 100 at the start
   int SetPos(int position);          // returns the old position
-  int GetPos() const;
-  int OffsetPos(int by);  // returns the old position
-  int SetStep(int step);  // returns the old step, 10 at the start
-  int StepIt();           // returns the old position; behind the end it begins anew
+  int GetPos() const;                // the position now
+  int OffsetPos(int by);             // returns the old position
+  int SetStep(int step);             // returns the old step, 10 at the start
+  int StepIt();                      // returns the old position; behind the end it begins anew
 };

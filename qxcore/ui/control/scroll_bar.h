@@ -16,11 +16,11 @@ class QXCORE_API SScrollBar : public SWnd {
   // Creates the control as a child; `style` has the system's SBS_ bits. Returns nonzero on success.
   int Create(DWORD style, const SRect& rect, SWnd* parent, UINT id);
 
-  int GetPos() const;
-  int SetPos(int position, int redraw = 1);  // returns the old position
-  void GetRange(int* low, int* high) const;
-  void SetRange(int low, int high, int redraw = 1);
-  int GetInfo(SCROLLINFO* info, UINT mask = SIF_ALL) const;
-  int SetInfo(SCROLLINFO* info, int redraw = 1);
-  int EnableArrows(UINT arrows = ESB_ENABLE_BOTH);
+  int GetPos() const;                                        // the position now
+  int SetPos(int position, int redraw = 1);                  // returns the old position
+  void GetRange(int* low, int* high) const;                  // both ends of the range
+  void SetRange(int low, int high, int redraw = 1);          // sets them
+  int GetInfo(SCROLLINFO* info, UINT mask = SIF_ALL) const;  // see SWnd::GetScrollInfo
+  int SetInfo(SCROLLINFO* info, int redraw = 1);             // by the flags in info->fMask
+  int EnableArrows(UINT arrows = ESB_ENABLE_BOTH);           // the system's ESB_ numbers
 };

@@ -16,6 +16,7 @@ inline constexpr UINT kSFirstPane = 0xE900;
 // strip off m_rect, and moves itself in the batch, if there is one.
 inline constexpr UINT kSMsgSizeParent = 0x0361;
 
+// What a frame and its bars share while they are laid out.
 struct SSizeParent {
   HDWP m_batch;   // the moves so far, to be replaced by DeferWindowPos; null when only the space is asked for
   SRect m_rect;   // what is left of the client area
@@ -23,6 +24,7 @@ struct SSizeParent {
   int m_stretch;  // nonzero: bars are as long as the area
 };
 
+// A frame window; see above.
 class QXCORE_API SFrameWnd : public SWnd {
   QXCORE_DECLARE_CREATABLE_CLASS(SFrameWnd)
 

@@ -24,6 +24,7 @@ class QXCORE_API SView : public SWnd {
  protected:
   void PostNcDestroy() override;  // deletes the view
 
+  // Handlers of the view's messages; a derived class's own call them.
   void OnPaint();
   int OnEraseBkgnd(SDC* dc);
   void OnSetFocus(SWnd* oldFocus);

@@ -22,6 +22,7 @@
 #include "qxcore/ui/window/message_map.h"
 #include "qxcore/ui/window/message_shapes.h"
 
+//! @cond
 // The class and the function type of a handler.
 template <class Member>
 struct SMsgMember;
@@ -83,6 +84,8 @@ template <UINT message, unsigned number, auto handler>
 consteval SMsgEntry SMsgMakeEntry(int code, UINT firstId, UINT lastId) {
   return {message, static_cast<std::uint32_t>(code), firstId, lastId, {number}, &SMsgThunk<message, number, handler>};
 }
+
+//! @endcond
 
 // A window message.
 template <UINT message, auto handler>

@@ -148,8 +148,8 @@ LRESULT SMsgCallShape(Call call, const SMsgArguments& a) {
 
 // The argument `extra` of a notification: its header, and where the result goes.
 struct SMsgNotify {
-  NMHDR* m_header;
-  LRESULT* m_result;
+  NMHDR* m_header;    // what the control sent
+  LRESULT* m_result;  // never null
 };
 
 // Calls the handler of a notification, with the identifier when the entry is for a range of them.
@@ -166,6 +166,7 @@ LRESULT SMsgCallNotify(Call call, const SMsgArguments& a) {
 // The shape that a message has whose handlers may have any: the one with these types; 0 when there is none.
 template <class Handler>
 inline constexpr unsigned kSMsgShapeOf = 0;
+//! @cond
 #define QXCORE_SHAPE(number, ...) \
   template <>                     \
   inline constexpr unsigned kSMsgShapeOf<__VA_ARGS__> = number;
@@ -217,11 +218,14 @@ inline constexpr unsigned kSMsgShapeOf<void(UINT, T*)> = 51;
 template <>
 inline constexpr unsigned kSMsgShapeOf<void(SCmdUI*)> = 0;
 
+//! @endcond
+
 // The shape and the handler type that a message has; for other messages the type alone decides.
 template <UINT message>
 struct SMsgRule {
   static constexpr unsigned kNumber = 0;  // any
 };
+//! @cond
 #define QXCORE_MESSAGE(message, number, ...)    \
   template <>                                   \
   struct SMsgRule<message> {                    \
@@ -334,3 +338,4 @@ struct SMsgRule<0x0233> {
   static constexpr unsigned kNumber = 52;
   using Handler = void;
 };
+//! @endcond
