@@ -37,6 +37,9 @@ class QXCORE_API SZipEntry {
   std::int64_t GetOffset() const { return m_offset; }
   // Of the enumeration above.
   unsigned long GetAttributes() const { return m_attributes; }
+  // Type and rights of the file where the archive was made on a Unix system (st_mode), else 0. Only the central
+  // directory has them.
+  unsigned GetUnixMode() const { return m_unixMode; }
   int IsDirectory() const { return (m_attributes & kDirectory) != 0; }
 
  private:
@@ -61,4 +64,5 @@ class QXCORE_API SZipEntry {
   std::int64_t m_size = kUnknown;
   std::int64_t m_offset = 0;
   unsigned long m_attributes = kReadOnly;
+  unsigned m_unixMode = 0;
 };

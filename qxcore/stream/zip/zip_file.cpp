@@ -177,6 +177,9 @@ void SZipFile::ReadEntry() {
   m_entry.m_compressedSize = SZipGet32(header + SZipCEN::kCompressedSize);
   m_entry.m_size = SZipGet32(header + SZipCEN::kSize);
   m_entry.m_offset = SZipGet32(header + SZipCEN::kLocalOffset);
+  constexpr unsigned kUnix = 3;
+  const bool isFromUnix = SZipGet16(header + SZipCEN::kMadeBy) >> 8 == kUnix;
+  m_entry.m_unixMode = isFromUnix ? SZipGet32(header + SZipCEN::kExternalAttributes) >> 16 : 0;
   if (m_entry.m_offset + m_entry.m_compressedSize > m_directoryOffset) SThrowZip(WTEXT("invalid CEN entry size"));
   ReadNames(SZipGet16(header + SZipCEN::kNameLength), SZipGet16(header + SZipCEN::kExtraLength),
             SZipGet16(header + SZipCEN::kCommentLength));

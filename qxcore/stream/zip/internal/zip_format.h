@@ -56,6 +56,7 @@ struct SZipCEN {
   // The record's first four bytes; behind them its fields.
   static constexpr std::uint32_t kSignature = 0x02014B50;
   enum : int {
+    kMadeBy = 4,  // the version, and above it the system
     kFlags = 8,
     kMethod = 10,
     kTime = 12,
@@ -66,6 +67,7 @@ struct SZipCEN {
     kNameLength = 28,
     kExtraLength = 30,
     kCommentLength = 32,
+    kExternalAttributes = 38,
     kLocalOffset = 42,
     kRecordSize = 46
   };
