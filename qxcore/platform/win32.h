@@ -22,6 +22,7 @@
 #include <windows.h>
 
 #include <commctrl.h>
+#include <commdlg.h>
 
 // From a header whose other macros are named like members of the library.
 #ifndef GET_X_LPARAM

@@ -13,6 +13,7 @@
 #include "qxcore/container/string_table.h"
 #include "qxcore/stream/input_file.h"
 #include "qxcore/string/md5.h"
+#include "qxcore/system/file/file.h"
 #include "qxcore/system/file/recurse_find.h"
 
 // The files of one length or one digest.
@@ -47,7 +48,7 @@ int main(int argc, char** argv) {
   return RunProgram("find_duplicates", [&] {
     Groups byLength;
     SRecurseFindFiles files;
-    const SString mask = SString::FromUtf8(argv[1]) + WTEXT("\\*");
+    const SString mask = SFile::FromNative(argv[1]) + WTEXT("\\*");
     for (int found = files.FindFile(mask); found; found = files.FindNextFileW()) {
       SString length;
       length.Format(WTEXT("%I64u"), files.GetLength());

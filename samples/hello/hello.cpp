@@ -4,6 +4,7 @@
 #include "../program.h"
 #include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_file.h"
+#include "qxcore/system/file/file.h"
 
 using Encodings = SAbstractIO::SMultiFormatSupport;
 
@@ -13,7 +14,7 @@ int main(int argc, char** argv) {
     return 2;
   }
   return RunProgram("hello", [&] {
-    SInputFile file(SString::FromUtf8(argv[1]));
+    SInputFile file(SFile::FromNative(argv[1]));
     SMultiFormatReaderUnicode reader(file, Encodings::kANSI | Encodings::kFullDetect | Encodings::kFavorGuess);
     SString line = reader.ReadLn();
     PrintLine(Encodings::GetEncodingName(reader.GetFormat()));

@@ -8,6 +8,7 @@
 #include "../program.h"
 #include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_file.h"
+#include "qxcore/system/file/file.h"
 #include "qxcore/system/settings/registry.h"
 
 using Encodings = SAbstractIO::SMultiFormatSupport;
@@ -43,7 +44,7 @@ int main(int argc, char** argv) {
       std::fprintf(stderr, "import_settings: %s: the key cannot be opened\n", argv[1]);
       return 1;
     }
-    for (int i = 2; i < argc; ++i) Import(SString::FromUtf8(argv[i]), key);
+    for (int i = 2; i < argc; ++i) Import(SFile::FromNative(argv[i]), key);
     // Read back what the next program will find there.
     SString name, value;
     for (long index = 0; key.GetEnumValue(index, &name, &value) == 0; ++index) PrintLine(name + WTEXT(" = ") + value);

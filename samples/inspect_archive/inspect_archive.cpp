@@ -8,6 +8,7 @@
 #include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_file.h"
 #include "qxcore/stream/zip/zip_input_stream.h"
+#include "qxcore/system/file/file.h"
 
 using Encodings = SAbstractIO::SMultiFormatSupport;
 
@@ -17,7 +18,7 @@ int main(int argc, char** argv) {
     return 2;
   }
   return RunProgram("inspect_archive", [&] {
-    SInputFile file(SString::FromUtf8(argv[1]));
+    SInputFile file(SFile::FromNative(argv[1]));
     SZipInputStream archive(file);
     while (const SZipEntry* entry = archive.GetNextEntry()) {
       if (entry->IsDirectory()) continue;

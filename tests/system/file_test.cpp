@@ -4,12 +4,17 @@
 
 #include <gtest/gtest.h>
 
+#ifndef _WIN32
+#include <sys/stat.h>
+#endif
+
 #include <set>
 #include <string>
 #include <tuple>
 
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"
+#include "tests/support/wine.h"
 
 namespace {
 
@@ -385,6 +390,10 @@ TEST(Files, FolderPaths) {
   WriteAll(folder.File(WTEXT("f")), "");
   EXPECT_EQ(SFile::CreateFilePath(Str(folder.File(WTEXT("f\\g\\h"))), &created), Code(SFile::kCreateDirectoryFailed));
   EXPECT_EQ(SFile::CreateFilePath(WTEXT("nofolder"), nullptr), Code(SFile::kOk));
+  SString slashes = Str(folder.File(WTEXT("x\\y\\f.txt")));
+  slashes.ReplaceAll(WCHAR('\\'), WCHAR('/'));
+  EXPECT_EQ(SFile::CreateFilePath(slashes, &created), Code(SFile::kOk));
+  EXPECT_TRUE(SFile::IsDirectory(Str(folder.File(WTEXT("x\\y")))));
   const SString before = SFile::NormalizeDirectoryName(WTEXT("."));
   EXPECT_EQ(SFile::SetCurrentDrive(Str(folder.Path())), Code(SFile::kOk));
   EXPECT_EQ((SFile::GetCurrentDrive() + Here()).Right(12), Str(folder.Path()).Right(12));
@@ -418,6 +427,38 @@ TEST(FilesOnLinux, ReadErrors) {
   unsigned long count = 4;
   EXPECT_EQ(file.Read(bytes, count), Code(SFile::kReadFailed));
   EXPECT_EQ(count, 0u);
+}
+#endif
+
+TEST(Files, NativePathsAndBack) {
+  if (IsWindows()) {
+    EXPECT_EQ(SFile::FromNative("C:\\Gr\xC3\xB6\xC3\x9F"
+                                "e\\\xF0\x9F\x99\x82"),
+              SString(WTEXT("C:\\Gr\xF6\xDF"
+                            "e\\\xD83D\xDE42")));
+    EXPECT_EQ(SFile::ToNative(SString(WTEXT("a\\\xD83D\xDE42"))), "a\\\xF0\x9F\x99\x82");
+    return;
+  }
+  for (const char* path : {"/", "/usr/a:b", "rel/a?b", "x/", "/latin\xE9/back\\slash",
+                           "/Gr\xC3\xB6\xC3\x9F"
+                           "e/\xF0\x9F\x99\x82",
+                           "..", "/private\xEF\x81\x81", ""})
+    EXPECT_EQ(SFile::ToNative(SFile::FromNative(path)), path);
+  EXPECT_EQ(SFile::FromNative("/usr/a:b"), SString(WTEXT("C:\\usr\\a\xF03A"
+                                                         "b")));
+  EXPECT_EQ(SFile::ToNative(SString(WTEXT("c:/usr\\x"))), "/usr/x");
+  EXPECT_EQ(SFile::ToNative(SString(WTEXT("D:\\x"))), "");
+  EXPECT_EQ(SFile::ToNative(SString(WTEXT("\\\\server\\share"))), "");
+}
+
+#ifndef _WIN32
+TEST(Files, APipeIsNotWaitedFor) {
+  TempFolder folder;
+  const SString pipe = Str(folder.File(WTEXT("pipe")));
+  ASSERT_EQ(mkfifo(SFile::ToNative(pipe).c_str(), 0600), 0);
+  short type = 99;
+  EXPECT_EQ(SFile(pipe).GetContentType(&type), Code(SFile::kOpenFailed));
+  EXPECT_EQ(type, 99);
 }
 #endif
 

@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "qxcore/system/file/file.h"
+#include "qxcore/system/file/internal/links.h"
 #include "qxcore/system/file/ordered_recurse_find_files.h"
 #include "qxcore/system/file/recurse_find.h"
 #include "qxcore/system/time/time.h"
@@ -115,7 +116,7 @@ TEST(FileFind, OneFolder) {
   EXPECT_EQ(find.GetRoot(), SString());
 
   find.FindFile(tree.Path(WTEXT("*.gz")));
-  EXPECT_EQ(find.GetFileTitleW(), SString(WTEXT("b.tar")));
+  EXPECT_EQ(find.GetFileTitle(), SString(WTEXT("b.tar")));  // either form of the name
   find.FindFile(tree.Path(WTEXT(".p*")));
   EXPECT_EQ(find.GetFileTitleW(), SString(WTEXT(".profile")));
   find.FindFile(tree.Path(WTEXT("sub")));
@@ -285,6 +286,19 @@ TEST(RecurseFindFiles, AgreesWithTheStandardLibraryOnTheSources) {
     EXPECT_TRUE(found.emplace(test::Narrow(test::Text(relative)), files.GetLength()).second);
   }
   EXPECT_EQ(found, expected);
+}
+
+// Folders that a cloud service fills when they are opened carry the mark of links and are none.
+TEST(FileFind, OnlyNameSurrogatesAreLinks) {
+  constexpr DWORD kFolder = FILE_ATTRIBUTE_DIRECTORY, kMark = FILE_ATTRIBUTE_REPARSE_POINT;
+  constexpr DWORD kSymbolicLink = 0xA000000C, kMountPoint = 0xA0000003, kCloud = 0x9000601A, kDeduplicated = 0x80000013;
+  for (const DWORD tag : {kSymbolicLink, kMountPoint, kCloud, kDeduplicated}) {
+    WIN32_FIND_DATAW data = {};
+    data.dwFileAttributes = kFolder | kMark;
+    data.dwReserved0 = tag;
+    KeepLinkMark(data);
+    EXPECT_EQ(data.dwFileAttributes, tag == kSymbolicLink || tag == kMountPoint ? kFolder | kMark : kFolder) << tag;
+  }
 }
 
 }  // namespace

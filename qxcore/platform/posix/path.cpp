@@ -12,7 +12,6 @@
 namespace platform {
 namespace {
 
-bool IsSeparator(WCHAR c) { return c == '\\' || c == '/'; }
 bool IsDriveLetter(WCHAR c) { return (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z'); }
 
 // Absolute on a drive, with backslashes only, and without empty, "." and ".." parts: its own full path.
@@ -163,6 +162,18 @@ std::u16string MakeFullPath(std::u16string_view path) {
   return full;
 }
 
+namespace {
+
+// There are no servers; what is wrong with a path that names one, or a device.
+DWORD ErrorOfServer(std::u16string_view full) {
+  const std::u16string_view name = full.substr(2);
+  if (name.starts_with(u"?\\") || name.starts_with(u".\\"))
+    return name.size() == 2 ? ERROR_INVALID_NAME : ERROR_FILE_NOT_FOUND;
+  return name.find(u'\\') == std::u16string_view::npos ? ERROR_PATH_NOT_FOUND : ERROR_BAD_NETPATH;
+}
+
+}  // namespace
+
 FullPath::FullPath(std::u16string_view path) {
   if (IsFull(path)) {
     m_view = path;
@@ -175,7 +186,7 @@ FullPath::FullPath(std::u16string_view path) {
 DWORD SpellExactly(std::u16string_view full, std::string& exact) {
   exact.clear();
   if (full.empty()) return ERROR_PATH_NOT_FOUND;
-  if (full[0] == '\\') return ERROR_BAD_NETPATH;
+  if (full[0] == '\\') return ErrorOfServer(full);
   if (full[0] != 'C' && full[0] != 'c') return ERROR_PATH_NOT_FOUND;
   if (full.back() == '\\') full.remove_suffix(1);
   exact.reserve(full.size());
@@ -282,6 +293,8 @@ DWORD ErrorFromErrno(int error) {
       return ERROR_SHARING_VIOLATION;
     case EPIPE:
       return ERROR_BROKEN_PIPE;
+    case EFAULT:
+      return ERROR_NOACCESS;
     case EIO:
       return ERROR_IO_DEVICE;
     default:

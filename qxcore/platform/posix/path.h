@@ -15,6 +15,8 @@
 
 namespace platform {
 
+constexpr bool IsSeparator(char16_t c) { return c == '\\' || c == '/'; }
+
 // A whole absolute path of the file system as a Windows path, without a trailing backslash but for the root.
 std::u16string ToWindowsPath(std::string_view path);
 

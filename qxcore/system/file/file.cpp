@@ -266,6 +266,12 @@ int SFile::CanBeWritten() const {
 }
 
 HRESULT SFile::GetContentType(short* type) const {
+  // A pipe would be waited for, and a device has no content of its own.
+  const DWORD attributes = ::GetFileAttributesW(m_fullName);
+  if (attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DEVICE) != 0) {
+    ::SetLastError(ERROR_INVALID_FUNCTION);
+    return Result(kOpenFailed);
+  }
   const Probe file(m_fullName, GENERIC_READ);
   if (file.Get() == nullptr) return Result(kOpenFailed);
   unsigned char bytes[4096];

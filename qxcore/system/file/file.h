@@ -8,6 +8,8 @@
 #pragma once
 
 #include <cstdint>
+#include <string>
+#include <string_view>
 
 #include "qxcore/platform/export.h"
 #include "qxcore/platform/win32.h"
@@ -140,7 +142,7 @@ class QXCORE_API SFile {
   int IsReadOnly() const;
   // 1 for a file that exists and can be opened for writing now; tries it, without a change.
   int CanBeWritten() const;
-  // What the first 4096 bytes look like.
+  // What the first 4096 bytes look like. Devices and pipes are kOpenFailed; they are not read.
   enum ContentType : short {
     kEmptyContent = 0,
     kBinaryContent = 1,      // NULs, or control characters that texts do not hold
@@ -206,6 +208,16 @@ class QXCORE_API SFile {
   // In bytes, of the volume that holds the folder `path`; free for the caller. 0 on failure.
   static std::uint64_t GetFreeDiskSpace(const SString& path);
   static std::uint64_t GetTotalDiskSpace(const SString& path);
+
+  // --- the system's own paths: program arguments, std::filesystem, other libraries ---
+
+  // The name for a path as the system has it. On Windows that is UTF-8 of the same text. On Linux slashes become
+  // backslashes and "/" in front "C:\"; a character that Windows allows in no name, and each byte that is no UTF-8,
+  // becomes U+F000 plus the byte, as the finders return them. Relative paths stay relative.
+  static SString FromNative(std::string_view path);
+  // The way back, byte for byte. Empty for a path that the system has no path for (on Linux other drives and
+  // servers). May throw std::bad_alloc.
+  static std::string ToNative(const SString& path);
 
   // --- names as texts ---
 

@@ -4,6 +4,7 @@
 
 #include "qxcore/platform/wide.h"
 #include "qxcore/system/file/file.h"
+#include "qxcore/system/file/internal/links.h"
 #include "qxcore/system/time/time.h"
 
 namespace {
@@ -64,6 +65,7 @@ int SFileFind::FindFile(const WCHAR* mask, unsigned long) {
     return 0;
   }
   m_search = search;
+  KeepLinkMark(m_data);
   WCHAR full[MAX_PATH];
   if (platform::WideFullPath(full, m_mask, MAX_PATH) == nullptr) {
     SFileFind::Close();
@@ -82,7 +84,10 @@ int SFileFind::FindFile(const WCHAR* mask, unsigned long) {
 }
 
 int SFileFind::FindNextFileW() {
-  if (m_search != nullptr && ::FindNextFileW(m_search, &m_data)) return 1;
+  if (m_search != nullptr && ::FindNextFileW(m_search, &m_data)) {
+    KeepLinkMark(m_data);
+    return 1;
+  }
   if (m_search == nullptr) ::SetLastError(ERROR_NO_MORE_FILES);
   m_data.cFileName[0] = 0;
   m_data.dwFileAttributes = 0;

@@ -100,9 +100,11 @@ HRESULT SFile::CreateFilePath(const SString& path, SString* created, int isFile)
   if (created != nullptr) *created = SString();
   SString folder = path;
   if (isFile != 0) {
-    const int last = path.ReverseFindPos('\\', path.Length() - 1);
-    if (last <= 0) return Result(true, kOk);
-    folder = path.Left(last);
+    // The platform takes both slashes.
+    const std::size_t last = path.View().find_last_of(WTEXT("\\/"));
+    if (last == SStringView::npos || last == 0) return Result(true, kOk);
+    folder = path.Left(static_cast<int>(last));
+    if (folder[folder.Length() - 1] == ':') folder += WCHAR('\\');
   }
   folder = NormalizeDirectoryName(folder);
   if (folder.IsEmpty()) return Result(false, kCreateDirectoryFailed);
