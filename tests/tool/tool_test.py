@@ -94,9 +94,6 @@ class ToolTest(ToolCase):
             "xml-utf16be-bom.xml": ("Unicode big endian", True, True),
             "late-accent.txt": ("UTF-8", False, False),
         }
-        if ON_WINE:
-            # Wine's IsTextUnicode never reports ASCII characters in UTF-16 as such.
-            expected["utf16le-english.txt"] = expected["utf16be-english.txt"] = ("ASCII", False, False)
         for name in expected:
             self.sample(name)
         result = self.run_tool("detect", "--json", *expected)
@@ -166,7 +163,7 @@ class ToolTest(ToolCase):
         self.assertEqual(entry["file"], name.replace("\\", ""))
         broken = subprocess.run(TOOL + ["detect", "--json", b"no-utf8-\xff.txt"], cwd=self.folder, capture_output=True, timeout=120)
         self.assertEqual(broken.returncode, 1)
-        self.assertEqual(json.loads(broken.stdout.decode("utf-8"))["files"][0]["file"], "no-utf8-\ufffd.txt")
+        self.assertEqual(json.loads(broken.stdout.decode("utf-8"))["files"][0]["file"], "no-utf8-\uf0ff.txt")
 
     def test_tiny_inputs(self):
         for content in (b"", b"a", b"\xff\xfe", b"\xef\xbb\xbf"):
@@ -302,29 +299,93 @@ class ToolTest(ToolCase):
         self.write("in.txt", "5 € für Ωmega\n")
         for replacement, out in (([], None), (["--replacement", "*"], b"5 * f*r *mega\n"), (["--replacement", "drop"], b"5  fr mega\n")):
             result = self.run_tool("convert", "--from", "UTF-8", "--to", "ASCII", *replacement, "in.txt", "out.txt")
-            self.assertEqual(result.returncode, 0)
+            self.assertEqual(result.returncode, 3)
             self.assertIn("in.txt: Some characters were re", result.stderr.decode("utf-8"))
             if out is not None:
                 self.assertEqual((self.folder / "out.txt").read_bytes(), out)
         self.write("damaged.txt", b"caf\xc3 noir\n")
         result = self.run_tool("convert", "--from", "UTF-8", "--replacement", "#", "damaged.txt", "out.txt")
-        self.assertEqual((result.returncode, (self.folder / "out.txt").read_bytes()), (0, b"caf# noir\n"))
+        self.assertEqual((result.returncode, (self.folder / "out.txt").read_bytes()), (3, b"caf# noir\n"))
         self.assertIn("during read", result.stderr.decode("utf-8"))
+        quiet = self.run_tool("convert", "--quiet", "--from", "UTF-8", "damaged.txt", "out.txt")
+        self.assertEqual((quiet.returncode, quiet.stderr), (3, b""))
 
     def test_lossless_fails_and_leaves_the_target_alone(self):
         self.write("in.txt", "5 € für Ωmega\n")
         self.write("damaged.txt", b"fine so far\ncaf\xc3 noir\n")
         self.write("out.txt", "precious")
         for arguments, words in (
-            (["--lossless", "--to", "ASCII", "in.txt"], "out.txt: Illegal non ASCII character"),
-            (["--lossless", "--to", "windows-1252", "in.txt"], "out.txt: Some characters could not be mapped through UTF-16 --> ANSI"),
-            (["--lossless", "--from", "UTF-8", "damaged.txt"], "damaged.txt: Illegal non UTF8 sequence"),
-            (["--from", "UTF-8", "--to", "ASCII+Lossless", "in.txt"], "out.txt: Illegal non ASCII character"),
+            (["--lossless", "--to", "ASCII", "in.txt"], "in.txt: line 1, character 3 (U+20AC): Illegal non ASCII character"),
+            (["--lossless", "--to", "windows-1252", "in.txt"], "in.txt: line 1, character 9 (U+03A9): Some characters could not be mapped through UTF-16 --> ANSI"),
+            (["--lossless", "--from", "UTF-8", "damaged.txt"], "damaged.txt: line 2, character 4: Illegal non UTF8 sequence"),
+            (["--from", "UTF-8", "--to", "ASCII+Lossless", "in.txt"], "in.txt: line 1, character 3 (U+20AC): Illegal non ASCII character"),
         ):
             with self.subTest(arguments=arguments):
                 self.assert_one_line(self.run_tool("convert", *arguments, "out.txt"), 1, words)
                 self.assertEqual((self.folder / "out.txt").read_text(), "precious")
                 self.assertEqual(self.names(), ["damaged.txt", "in.txt", "out.txt"])
+
+    def test_many_files_are_converted(self):
+        for folder in ("in", "in/sub"):
+            (self.folder / folder).mkdir()
+        texts = {"in/a.txt": "ä\n", "in/sub/b.txt": "ö\n", "in/sub/c.dat": "plain\n"}
+        for name, text in texts.items():
+            self.write(name, text)
+        self.assert_one_line(self.run_tool("convert", "--to", "UTF-16", "--output-dir", "out", "in"), 1, "--recursive")
+        self.assert_done(self.run_tool("convert", "--to", "UTF-16", "--output-dir", "out", "--recursive", "in"))
+        for name, text in texts.items():
+            self.assertEqual((self.folder / "out" / name.removeprefix("in/")).read_bytes(), text.encode("utf-16-le"))
+        result = self.run_tool("convert", "--verbose", "--to", "windows-1252", "--output-dir", "flat", "in/a.txt", "in/sub/b.txt")
+        self.assertEqual((result.returncode, result.stderr.decode().count(" -> ")), (0, 2))
+        self.assertEqual((self.folder / "flat/b.txt").read_bytes(), b"\xf6\n")
+        self.assert_one_line(self.run_tool("convert", "--output-dir", "flat", "in/a.txt", "in/a.txt"), 1, "would become this one")
+        # One that fails does not keep the others back.
+        result = self.run_tool("convert", "--in-place", "--to", "UTF-16", "in/a.txt", "none.txt", "in/sub/b.txt")
+        self.assertEqual(result.returncode, 1)
+        self.assertEqual((self.folder / "in/sub/b.txt").read_bytes(), "ö\n".encode("utf-16-le"))
+        for arguments in (["--in-place", "--output-dir", "x", "in/a.txt"], ["--recursive", "in", "x"], ["a", "b", "c"], ["--in-place", "-"]):
+            self.assert_one_line(self.run_tool("convert", *arguments), 2)
+
+    def test_in_place_loses_nothing_unless_that_is_wanted(self):
+        self.write("a.txt", "5 €\n")
+        self.assert_one_line(self.run_tool("convert", "--in-place", "--to", "ASCII", "a.txt"), 1, "a.txt: line 1, character 3 (U+20AC)")
+        self.assertEqual((self.folder / "a.txt").read_text(encoding="utf-8"), "5 €\n")
+        self.assertEqual(self.run_tool("convert", "--in-place", "--quiet", "--replacement", "?", "--to", "ASCII", "a.txt").returncode, 3)
+        self.assertEqual((self.folder / "a.txt").read_bytes(), b"5 ?\n")
+
+    @unittest.skipIf(ON_WINE, "such names do not exist there")
+    def test_files_with_every_name_can_be_opened(self):
+        names = [b"a:b", b"q?*", b'quote"', b"<x>", b"pipe|", b"back\\slash", b"tab\tx", b"latin\xe9", b"C:\\x.txt"]
+        root = os.fsencode(self.folder)
+        for name in names:
+            with open(os.path.join(root, name), "wb") as file:
+                file.write(GERMAN.encode())
+
+        def run(*arguments):
+            return subprocess.run(TOOL + list(arguments), cwd=self.folder, capture_output=True, timeout=120)
+
+        listed = [entry["path"] for entry in json.loads(run("find", self.folder, "--json").stdout)["entries"]]
+        self.assertEqual(len(listed), len(names))
+        for argument in [*names, *listed]:
+            with self.subTest(argument=argument):
+                self.assertEqual(run("detect", argument).returncode, 0)
+                self.assertEqual(run("convert", "--in-place", "--to", "UTF-8", argument).stderr, b"")
+                self.assertEqual(run("info", argument).returncode, 0)
+        bytes_of = run("find", "--native", "-0", self.folder).stdout
+        self.assertEqual(set(bytes_of.split(b"\0")[:-1]), {os.path.join(root, name) for name in names})
+        self.assertEqual(run("convert", "--to", "UTF-16", b"a:b", b"new:\xff").returncode, 0)
+        self.assertTrue(os.path.exists(os.path.join(root, b"new:\xff")))
+
+    def test_detected_names_are_understood(self):
+        for name in ("utf8-bom-german.txt", "xml-utf16le.xml", "windows1252-spanish.txt"):
+            self.sample(name)
+            entry = json.loads(self.run_tool("detect", "--json", name).stdout.decode())["files"][0]
+            for shown in (entry["encoding"], entry["value"]):
+                self.assert_done(self.run_tool("convert", "--from", shown, name, "out.txt"))
+            self.assertNotIn("(Active Code Page)", entry["encoding"])
+        self.write("a.txt", "abc")
+        for name in ("UTF-16LE", "utf-16be", "latin2", "latin9", "SJIS", "TIS-620", "MacRoman", "EUC-JP"):
+            self.assertNotEqual(self.run_tool("convert", "--from", name, "a.txt", "out.txt").returncode, 2, name)
 
     def test_if_changed_keeps_the_time(self):
         self.write("in.txt", GERMAN)

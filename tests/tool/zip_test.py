@@ -80,6 +80,17 @@ class ZipTest(ToolCase):
 
     # --- list ---
 
+    def test_times_and_execute_bits_are_kept(self):
+        script = entry("run.sh")
+        script.create_system, script.external_attr = 3, 0o100755 << 16
+        self.make([(script, b"#!/bin/sh\n"), (entry("plain.txt"), b"x")])
+        self.assert_done(self.run_tool("extract-all", "a.zip", "out"))
+        for name in ("run.sh", "plain.txt"):
+            written = (self.folder / "out" / name).stat()
+            self.assertEqual(time.localtime(written.st_mtime)[:6], STAMP)
+            if not ON_WINE:
+                self.assertEqual(bool(written.st_mode & 0o100), name == "run.sh")
+
     def test_list_tells_every_field(self):
         result = self.run_tool("list", "--json", self.sound())
         self.assert_done(result)

@@ -20,7 +20,7 @@ constexpr Attribute kAttributes[] = {
     {FILE_ATTRIBUTE_REPARSE_POINT, 'l', "link"},
 };
 
-// 0 for a letter that is none.
+// 0 for an unknown letter.
 unsigned long ValueOf(char letter) {
   for (const Attribute& attribute : kAttributes)
     if (attribute.letter == (letter | 0x20)) return attribute.value;

@@ -28,6 +28,7 @@ class CommandLine {
   // A command that does something itself, with what does it.
   CLI::App* Add(CLI::App* parent, const char* name, const char* description, Action action);
   CLI::App* AddGroup(const char* name, const char* description);
+  static void AddUnicodePolicy(CLI::App* command, bool& isFull);
   void AddDetect();
   void AddTextPipe(const char* name, const char* description, int (*run)(const TextPipeOptions&));
   void AddEncodings();
@@ -90,6 +91,11 @@ CLI::App* CommandLine::AddGroup(const char* name, const char* description) {
   return group;
 }
 
+void CommandLine::AddUnicodePolicy(CLI::App* command, bool& isFull) {
+  command->add_flag("!--no-full-unicode", isFull,
+                    "Take UTF-8 of up to three bytes only and UTF-16 without a mark as the library does by itself");
+}
+
 void CommandLine::AddDetect() {
   CLI::App* command = Add(&m_app, "detect", "Find out how text files are encoded", [this] { return Detect(m_detect); });
   command->add_option("--hint", m_detect.hint, "The encoding that is expected")
@@ -97,12 +103,15 @@ void CommandLine::AddDetect() {
       ->capture_default_str();
   command->add_option("--level", m_detect.level, "How much of a file decides: none, quick (4 KB), fair (16 KB) or full")
       ->check(CLI::IsMember({"none", "quick", "fair", "full"}))
-      ->type_name("LEVEL");
+      ->type_name("LEVEL")
+      ->default_str("full");
   command
       ->add_option("--favor", m_detect.favor,
                    "What wins when both are possible: hint, guess, or none for the hint with a warning")
       ->check(CLI::IsMember({"hint", "guess", "none"}))
-      ->type_name("WHICH");
+      ->type_name("WHICH")
+      ->default_str("guess");
+  AddUnicodePolicy(command, m_detect.fullUnicode);
   command->add_flag("--json", m_detect.json, "Print one JSON object instead of lines");
   command->add_option("FILE", m_detect.files, "Files; - is standard input")->required();
 }
@@ -112,14 +121,28 @@ void CommandLine::AddTextPipe(const char* name, const char* description, int (*r
   command
       ->add_option("--from", m_textPipe.from,
                    "The encoding of IN, with +Detect as a hint only; without it, it is detected")
-      ->type_name("NAME");
+      ->type_name("NAME")
+      ->default_str("ANSI+FullDetect+FavorGuess");
   command->add_option("--to", m_textPipe.to, "The encoding of OUT")->type_name("NAME")->capture_default_str();
   command->add_option("--replacement", m_textPipe.replacement, "The character for what cannot be converted, or drop")
-      ->type_name("C|drop");
+      ->type_name("C|drop")
+      ->default_str("U+FFFD in Unicode, ? elsewhere");
   command->add_flag("--lossless", m_textPipe.lossless, "Fail instead of losing characters");
   command->add_flag("--if-changed", m_textPipe.ifChanged, "Leave OUT alone when it has the same content already");
-  command->add_option("IN", m_textPipe.in, "The file to read; - is standard input")->required();
-  command->add_option("OUT", m_textPipe.out, "The file to write; - is standard output")->required();
+  command
+      ->add_option("--output-dir", m_textPipe.outputDir,
+                   "Write any number of files below this folder, under their own names")
+      ->type_name("DIR");
+  command->add_flag(
+      "--in-place", m_textPipe.inPlace,
+      "Replace any number of files; one that would lose characters is left alone, unless --replacement is "
+      "given");
+  command->add_flag("--recursive", m_textPipe.recursive, "Take the files of folders, too");
+  command->add_flag("--quiet", m_textPipe.quiet, "Say nothing about losses; the exit status is 3 all the same");
+  command->add_flag("--verbose", m_textPipe.verbose, "Name each file and the encoding that it was read in");
+  AddUnicodePolicy(command, m_textPipe.fullUnicode);
+  command->add_option("IN OUT", m_textPipe.files, "The file to read and the one to write; - is a standard stream")
+      ->required();
 }
 
 void CommandLine::AddEncodings() {
@@ -207,6 +230,8 @@ void CommandLine::AddFind() {
   command->add_option("--match", m_find.match, "Only entries with one of these attributes: letters, or a number")
       ->type_name("ATTRS");
   command->add_option("--reject", m_find.reject, "Only entries with none of these attributes")->type_name("ATTRS");
+  command->add_flag("--native", m_find.native, "Print paths of the system, byte for byte");
+  command->add_flag("-0,--null", m_find.nulls, "End each path with NUL instead of a line end");
   command->add_flag("--json", m_find.json, "Print one JSON object instead of lines");
   command->add_option("DIR", m_find.folder, "The folder to look in")->required();
   command->add_option("MASK", m_find.mask, "Only names that fit, * and ? standing for any characters")
@@ -224,7 +249,9 @@ void CommandLine::AddSort() {
   command
       ->add_option("--from", m_sort.from,
                    "The encoding of FILE, with +Detect as a hint only; without it, it is detected")
-      ->type_name("NAME");
+      ->type_name("NAME")
+      ->default_str("ANSI+FullDetect+FavorGuess");
+  AddUnicodePolicy(command, m_sort.fullUnicode);
   command->add_option("FILE", m_sort.file, "The file to read; - is standard input")->required();
 }
 

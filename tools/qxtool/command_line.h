@@ -4,6 +4,6 @@
 #include <string>
 #include <vector>
 
-// Runs the command that the arguments (without the program's name) ask for, or prints help or version, and gives
+// Runs the command that the arguments (without the program's name) ask for, or prints help or version, and returns
 // the exit code. Throws Failure for wrong usage, and what commands throw (see commands.h).
 int RunCommandLine(std::vector<std::string> arguments);

@@ -1,5 +1,5 @@
 // The commands of the tool and what can be asked of each. A command returns its exit code, or throws
-// Failure, SException or BrokenPipe for main to tell.
+// Failure, SException or BrokenPipe for main to report.
 #pragma once
 
 #include <cstdint>
@@ -10,20 +10,26 @@ struct DetectOptions {
   std::string hint = "ANSI";
   std::string level;  // none, quick, fair or full; empty: what the hint's suffixes say, or full
   std::string favor;  // hint, guess or none; empty: what the hint's suffixes say, or guess
+  bool fullUnicode = true;
   bool json = false;
   std::vector<std::string> files;
 };
 int Detect(const DetectOptions& options);
 
-// One text file to another: convert, and with the text changed escape and unescape.
+// Text files to others: convert, and with the text changed escape and unescape.
 struct TextPipeOptions {
   std::string from;  // empty: detect as Detect does
   std::string to = "UTF-8";
   std::string replacement;  // one character, "drop", or empty for the library's own
   bool lossless = false;
   bool ifChanged = false;
-  std::string in;
-  std::string out;
+  bool fullUnicode = true;
+  std::string outputDir;  // where the new files go, under the names of the old ones
+  bool inPlace = false;
+  bool recursive = false;
+  bool quiet = false;
+  bool verbose = false;
+  std::vector<std::string> files;  // one and its target, or any number with one of the options for where to write
 };
 int Convert(const TextPipeOptions& options);
 int Escape(const TextPipeOptions& options);
@@ -80,8 +86,10 @@ struct FindOptions {
   std::string mask = "*.*";
   bool folders = false;
   bool sorted = false;
-  std::string match;   // attributes, see attributes.h; empty: all entries
-  std::string reject;  // empty: none
+  std::string match;    // attributes, see attributes.h; empty: all entries
+  std::string reject;   // empty: none
+  bool native = false;  // paths of the system
+  bool nulls = false;   // NUL behind each instead of a line end
   bool json = false;
 };
 int Find(const FindOptions& options);
@@ -91,6 +99,7 @@ struct SortOptions {
   bool ignoreCase = false;
   bool reverse = false;
   std::string from;  // empty: detect as Detect does
+  bool fullUnicode = true;
   std::string file;
 };
 int Sort(const SortOptions& options);

@@ -1,8 +1,11 @@
 #include "tools/qxtool/console.h"
 
+#include <cctype>
 #include <cerrno>
 #include <csignal>
 #include <cstdlib>
+
+#include "qxcore/system/file/file.h"
 
 #ifdef _WIN32
 #include "qxcore/platform/win32.h"
@@ -140,8 +143,28 @@ bool Synchronise(std::FILE* file) {
 
 #endif
 
-std::filesystem::path PathOf(std::string_view utf8) {
-  return std::filesystem::path(std::u8string(utf8.begin(), utf8.end()));
+namespace {
+
+bool HasDrive(const std::string& text) {
+  return text.size() >= 3 && std::isalpha(static_cast<unsigned char>(text[0])) != 0 && text[1] == ':' &&
+         (text[2] == '\\' || text[2] == '/');
 }
+
+}  // namespace
+
+SString NameOf(const std::string& argument) {
+  const SString native = SFile::FromNative(argument);
+  return HasDrive(argument) && !SFile::Exists(native) ? SString::FromUtf8(argument) : native;
+}
+
+std::string NativeOf(const std::string& argument) { return SFile::ToNative(NameOf(argument)); }
+
+#ifdef _WIN32
+std::filesystem::path PathOf(const std::string& native) {
+  return std::filesystem::path(std::u8string(native.begin(), native.end()));
+}
+#else
+std::filesystem::path PathOf(const std::string& native) { return std::filesystem::path(native); }
+#endif
 
 }  // namespace console

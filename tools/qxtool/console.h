@@ -1,5 +1,5 @@
 // What the tool needs of the system around a process and what the library does not offer: arguments
-// and paths in UTF-8, binary standard streams, terminals, interruption. The only part of the tool
+// and paths, binary standard streams, terminals, interruption. The only part of the tool
 // that knows which system it runs on.
 #pragma once
 
@@ -9,13 +9,15 @@
 #include <string_view>
 #include <vector>
 
+#include "qxcore/string/string.h"
+
 namespace console {
 
 // Binary standard streams, UTF-8 on the screen, no death by a broken pipe, and an interruption
 // (Ctrl-C, termination, a terminal that is closed) that is remembered. Call it once, first.
 void SetUp();
 
-// The arguments behind the program's name, in UTF-8.
+// The arguments behind the program's name: UTF-8 on Windows, elsewhere the bytes as they are.
 std::vector<std::string> Arguments(int argc, char** argv);
 
 // True once the user asked for an end. A second request ends the process at once.
@@ -31,7 +33,12 @@ bool IsTerminal(std::FILE* stream);
 // True when the last failed write of the C library says that the reader of a pipe has gone.
 bool IsBrokenPipe(int error);
 
-std::filesystem::path PathOf(std::string_view utf8);
+// The file that an argument names, as the library spells it. An argument is a path of the system; what the library
+// itself writes ("C:\..." on every system) is understood, too, unless a file of just this name exists.
+SString NameOf(const std::string& argument);
+// The same as a path of the system.
+std::string NativeOf(const std::string& argument);
+std::filesystem::path PathOf(const std::string& native);
 
 // Opens a file that is written from its start, in binary; null and errno on failure.
 std::FILE* OpenForWriting(const std::filesystem::path& path);

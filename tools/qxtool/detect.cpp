@@ -37,12 +37,12 @@ Encoding RequestOf(const DetectOptions& options) {
   if (options.favor == "none") favor = 0;
   if (options.favor == "hint") favor = Encodings::kFavorHint;
   if (options.favor == "guess" || (options.favor.empty() && favor == 0)) favor = Encodings::kFavorGuess;
-  return (hint & ~(Encodings::kLevelMask | kFavors)) | level | favor;
+  return (hint & ~(Encodings::kLevelMask | kFavors)) | level | favor | UnicodePolicy(options.fullUnicode);
 }
 
 Finding Look(const std::string& name, Encoding request) {
   Finding finding;
-  finding.file = FromUtf8(name);
+  finding.file = ShownArgument(name);
   try {
     TextSource source(name, request);
     source.Select();
@@ -70,13 +70,15 @@ std::string AsJson(const Finding& finding) {
   return json + ",\"error\":" + JsonStringOrNull(FromUtf8(finding.error)) + "}";
 }
 
-std::string Padded(const SString& text, int width) {
-  return ToUtf8(text) + std::string(static_cast<std::size_t>(std::max(0, width - DisplayWidth(text))), ' ');
+std::string Blanks(const SString& text, int width) {
+  return std::string(static_cast<std::size_t>(std::max(0, width - DisplayWidth(text))), ' ');
 }
+std::string Padded(const SString& text, int width) { return ToUtf8(text) + Blanks(text, width); }
 
-std::string AsLine(const Finding& finding, int nameWidth) {
+// The name stands in it as it was given, so that other programs find the file.
+std::string AsLine(const Finding& finding, const std::string& name, int nameWidth) {
   constexpr int kEncodingWidth = 24;
-  std::string line = Padded(finding.file, nameWidth) + "  ";
+  std::string line = name + Blanks(finding.file, nameWidth) + "  ";
   if (finding.warning.IsEmpty()) return line + ToUtf8(finding.encoding) + "\n";
   return line + Padded(finding.encoding, kEncodingWidth) + "  " + ToUtf8(finding.warning) + "\n";
 }
@@ -86,7 +88,7 @@ std::string AsLine(const Finding& finding, int nameWidth) {
 int Detect(const DetectOptions& options) {
   Encoding request = RequestOf(options);
   int nameWidth = 0;
-  for (const std::string& name : options.files) nameWidth = std::max(nameWidth, DisplayWidth(FromUtf8(name)));
+  for (const std::string& name : options.files) nameWidth = std::max(nameWidth, DisplayWidth(ShownArgument(name)));
   int code = kDone;
   const char* separator = "";
   if (options.json) Print("{\"version\":1,\"files\":[");
@@ -94,15 +96,15 @@ int Detect(const DetectOptions& options) {
     Finding finding = Look(name, request);
     if (!finding.error.empty()) {
       code = kFailed;
-      FlushPrinted();  // so that both streams tell the files in the same order
       Complain(name + ": " + finding.error);
     }
     if (options.json) {
       Print(separator + std::string("\n") + AsJson(finding));
       separator = ",";
     } else if (finding.error.empty()) {
-      Print(AsLine(finding, nameWidth));
+      Print(AsLine(finding, name, nameWidth));
     }
+    FlushPrinted();  // whoever waits for the next file sees this one
   }
   if (options.json) Print("\n]}\n");
   return code;

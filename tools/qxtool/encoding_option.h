@@ -13,6 +13,9 @@ using Encoding = Encodings::Encoding;
 // behind it. Throws Failure with the exit code for wrong usage; `option` says where the text stood.
 Encoding EncodingOf(std::string_view text, const char* option);
 
+// The policy for Unicode: by the published standards, or as the library does by itself.
+inline Encoding UnicodePolicy(bool isFull) { return isFull ? Encodings::kFullUnicode : Encoding{0}; }
+
 // Throws Failure when this machine lacks the encoding's code page.
 void RequireOnThisMachine(Encoding encoding);
 

@@ -25,7 +25,8 @@ bool IsLink(const std::string& path) {
   if (fs::is_symlink(fs::symlink_status(console::PathOf(path), error))) return true;
   // What the standard library does not know: Windows has more kinds of links.
   unsigned long attributes = 0;
-  return SFile(FromUtf8(path)).GetAttributes(attributes) == S_OK && (attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0;
+  return SFile(SFile::FromNative(path)).GetAttributes(attributes) == S_OK &&
+         (attributes & FILE_ATTRIBUTE_REPARSE_POINT) != 0;
 }
 
 std::string CheckedPart(const SString& name, SStringView part) {

@@ -13,7 +13,7 @@ constexpr unsigned kPiece = 65536;
 // Text with escapes that comes in pieces.
 class Unescaper {
  public:
-  explicit Unescaper(SOutputStringStream& target) : m_target(target) {}
+  Unescaper(const std::string& source, TextTarget& target) : m_source(source), m_target(target) {}
 
   void Write(const WCHAR* text, unsigned count) {
     for (const WCHAR* end = text + count; text != end;) {
@@ -23,7 +23,7 @@ class Unescaper {
       Flush(m_plain.size());
       const WCHAR* start = text;
       while (text != end && !IsPlain(*text)) ++text;
-      m_target.Write(start, static_cast<unsigned>(text - start));
+      m_target.Write(m_source, {start, static_cast<std::size_t>(text - start)});
     }
     Flush(m_plain.size() - OpenTail());
   }
@@ -46,35 +46,36 @@ class Unescaper {
   void Flush(std::size_t count) {
     if (count == 0) return;
     const SString text = SJavaUnicodeEscapeFilterStream::Unescape(m_plain.data(), m_plain.data() + count);
-    m_target.Write(text.GetSafePointer(), static_cast<unsigned>(text.Length()));
+    m_target.Write(m_source, text.View());
     m_plain.erase(0, count);
   }
 
-  SOutputStringStream& m_target;
+  const std::string& m_source;
+  TextTarget& m_target;
   std::string m_plain;  // 7-bit text that was not written yet
 };
 
 }  // namespace
 
 int Escape(const TextPipeOptions& options) {
-  return PipeText(options, [&options](TextSource& source, SOutputStringStream& target) {
-    SJavaUnicodeEscapeFilterStream filter(source.Reader());
+  return PipeText(options, [](PipeSource& source, TextTarget& target) {
+    SJavaUnicodeEscapeFilterStream filter(source.text.Reader());
     std::vector<char> escaped(kPiece);
     std::vector<WCHAR> text(kPiece);
     auto read = [&filter](void* buffer, unsigned long size) { return filter.Read(buffer, size); };
-    while (unsigned count = ReadPiece(source, options.in, escaped.data(), kPiece, read)) {
+    while (unsigned count = ReadPiece(source, escaped.data(), kPiece, read)) {
       text.assign(escaped.begin(), escaped.begin() + count);
-      target.Write(text.data(), count);
+      target.Write(source.name, {text.data(), count});
     }
   });
 }
 
 int Unescape(const TextPipeOptions& options) {
-  return PipeText(options, [&options](TextSource& source, SOutputStringStream& target) {
-    Unescaper unescaper(target);
+  return PipeText(options, [](PipeSource& source, TextTarget& target) {
+    Unescaper unescaper(source.name, target);
     std::vector<WCHAR> text(kPiece / sizeof(WCHAR));
-    auto read = [&source](void* buffer, unsigned long size) { return source.Reader().Read(buffer, size); };
-    while (unsigned bytes = ReadPiece(source, options.in, text.data(), kPiece, read)) {
+    auto read = [&source](void* buffer, unsigned long size) { return source.text.Reader().Read(buffer, size); };
+    while (unsigned bytes = ReadPiece(source, text.data(), kPiece, read)) {
       unescaper.Write(text.data(), bytes / static_cast<unsigned>(sizeof(WCHAR)));
     }
     unescaper.Finish();

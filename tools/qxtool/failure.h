@@ -4,7 +4,7 @@
 #include <string>
 #include <string_view>
 
-enum ExitCode { kDone = 0, kFailed = 1, kWrongUsage = 2 };
+enum ExitCode { kDone = 0, kFailed = 1, kWrongUsage = 2, kLossy = 3 };
 
 // Something that ends a command, in words for the user. `place` is the file that it happened to, where
 // that is known already.

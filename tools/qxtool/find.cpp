@@ -33,7 +33,7 @@ struct Unread {
   unsigned long error;
 };
 
-// Keeps what could not be read until it can be told.
+// Keeps what could not be read until it can be said.
 class UnreadFolders final : public SFindFailureSink {
  public:
   void OnFolderNotRead(const SString& folder, unsigned long error) override {
@@ -46,7 +46,7 @@ class UnreadFolders final : public SFindFailureSink {
   // Says on standard error what came since the last time.
   void Tell() {
     for (; m_told < m_all.size(); ++m_told) {
-      FlushPrinted();  // so that both streams tell things in the same order
+      FlushPrinted();  // so that both streams say things in the same order
       Complain(ToUtf8(m_all[m_told].folder) + ": " + SystemText(m_all[m_told].error));
     }
     if (!m_isComplete) throw Failure{"memory is out"};
@@ -94,7 +94,10 @@ class Output {
 
  private:
   void Put(const Entry& entry) {
-    if (!m_options.json) return Print(ToUtf8(entry.path) + "\n");
+    if (!m_options.json) {
+      Print(m_options.native ? SFile::ToNative(entry.path) : ToUtf8(entry.path));
+      return Print(std::string_view(m_options.nulls ? "\0" : "\n", 1));
+    }
     Print(m_separator + entry.json);
     m_separator = ",\n";
   }
@@ -104,13 +107,25 @@ class Output {
   std::vector<Entry> m_entries;
 };
 
+// A mask with its characters as names have them; * and ? stand for any.
+SString MaskOf(const std::string& mask) {
+  SString text;
+  for (std::size_t at = 0; at <= mask.size();) {
+    const std::size_t end = std::min(mask.find_first_of("*?", at), mask.size());
+    text += SFile::FromNative(std::string_view(mask).substr(at, end - at));
+    if (end < mask.size()) text += static_cast<WCHAR>(mask[end]);
+    at = end + 1;
+  }
+  return text;
+}
+
 // What a name must be like to be listed, as far as the finders leave that to their caller.
 class Wanted {
  public:
   explicit Wanted(const FindOptions& options)
       : m_match(AttributesOf(options.match, "--match")),
         m_reject(AttributesOf(options.reject, "--reject")),
-        m_mask(IsFoundByFinder(options) ? SString(kEverything) : FromUtf8(options.mask)) {
+        m_mask(IsFoundByFinder(options) ? SString(kEverything) : MaskOf(options.mask)) {
     if (options.mask.find_first_of("\\/") != std::string::npos)
       throw Failure{"MASK: \"" + options.mask + "\" is a path; names are looked for in every folder", kWrongUsage};
   }
@@ -168,11 +183,11 @@ void PrintErrors(const std::vector<Unread>& unread) {
 
 int Find(const FindOptions& options) {
   const Wanted wanted(options);
-  const SString folder = SFile::NormalizeDirectoryName(FromUtf8(options.folder));
+  const SString folder = SFile::NormalizeDirectoryName(console::NameOf(options.folder));
   if (!SFile::IsDirectory(folder)) throw Failure{"there is no such folder", kFailed, options.folder};
   const bool isRoot = folder[folder.Length() - 1] == '\\';
   const SString mask = folder + (isRoot ? WTEXT("") : WTEXT("\\")) +
-                       (Wanted::IsFoundByFinder(options) ? FromUtf8(options.mask) : SString(kEverything));
+                       (Wanted::IsFoundByFinder(options) ? MaskOf(options.mask) : SString(kEverything));
   Output output(options);
   UnreadFolders unread;
   if (options.json) Print("{\"version\":1,\"entries\":[");

@@ -5,6 +5,7 @@
 #include "qxcore/system/file/file.h"
 #include "tools/qxtool/attributes.h"
 #include "tools/qxtool/commands.h"
+#include "tools/qxtool/console.h"
 #include "tools/qxtool/failure.h"
 #include "tools/qxtool/file_time.h"
 #include "tools/qxtool/json.h"
@@ -35,7 +36,7 @@ TimeTexts TimeOf(const SFile& file, int creation) {
 
 Facts Look(const std::string& name) {
   Facts facts;
-  facts.path = SFile::NormalizeFileName(FromUtf8(name), 1);
+  facts.path = SFile::NormalizeFileName(console::NameOf(name), 1);
   if (facts.path.IsEmpty()) Require(static_cast<HRESULT>(SFile::kInvalidFilename));
   if (!SFile::Exists(facts.path)) throw Failure{SystemText(GetLastError())};
   SFile file(facts.path);
@@ -62,7 +63,7 @@ std::string JsonTime(const TimeTexts& time) {
 }
 
 std::string AsJson(const std::string& given, const Facts& facts) {
-  std::string json = "{\"file\":" + JsonString(FromUtf8(given)) + ",\"path\":" + JsonString(facts.path);
+  std::string json = "{\"file\":" + JsonString(ShownArgument(given)) + ",\"path\":" + JsonString(facts.path);
   json += ",\"bytes\":" + (facts.isFolder ? "null" : std::to_string(facts.bytes));
   json += ",\"created\":" + JsonTime(facts.created) + ",\"written\":" + JsonTime(facts.written);
   json += ",\"attributes\":" + JsonValue(facts.attributes) + ",\"attributeNames\":[";
@@ -122,10 +123,10 @@ int Info(const InfoOptions& options) {
     } catch (...) {
       const std::string reason = ReasonOfCurrentException();
       code = kFailed;
-      FlushPrinted();  // so that both streams tell the files in the same order
+      FlushPrinted();  // so that both streams name the files in the same order
       Complain(name + ": " + reason);
       if (options.json)
-        text = "{\"file\":" + JsonString(FromUtf8(name)) + ",\"error\":" + JsonString(FromUtf8(reason)) + "}";
+        text = "{\"file\":" + JsonString(ShownArgument(name)) + ",\"error\":" + JsonString(FromUtf8(reason)) + "}";
     }
     if (options.json) {
       Print(separator + ("\n" + text));

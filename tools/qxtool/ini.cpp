@@ -9,6 +9,7 @@
 #include "qxcore/system/file/file.h"
 #include "qxcore/system/settings/profile.h"
 #include "tools/qxtool/commands.h"
+#include "tools/qxtool/console.h"
 #include "tools/qxtool/failure.h"
 #include "tools/qxtool/json.h"
 #include "tools/qxtool/standard_streams.h"
@@ -20,7 +21,7 @@ using Text = std::basic_string<WCHAR>;
 
 // The whole path; a name without a folder would be looked for elsewhere.
 SString PathOf(const IniOptions& options) {
-  const SString path = SFile::NormalizeFileName(FromUtf8(options.file), 1);
+  const SString path = SFile::NormalizeFileName(console::NameOf(options.file), 1);
   if (path.IsEmpty())
     throw Failure{ToUtf8(SFile::GetStatusText(static_cast<HRESULT>(SFile::kInvalidFilename))), kFailed, options.file};
   return path;

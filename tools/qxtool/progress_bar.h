@@ -1,4 +1,4 @@
-// A bar on standard error that tells how far a file has been read, or how many files a walk has seen. It
+// A bar on standard error that shows how far a file has been read, or how many files a walk has seen. It
 // appears on a terminal only, and only when the work takes longer than a second; it also carries the
 // user's wish to end.
 #pragma once

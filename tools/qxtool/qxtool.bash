@@ -36,8 +36,9 @@ _qxtool() {
   if [[ $cur == -* ]]; then
     local options=--help
     case $command in
-      detect) options="--hint --level --favor --json --help" ;;
-      convert | escape | unescape) options="--from --to --replacement --lossless --if-changed --help" ;;
+      detect) options="--hint --level --favor --no-full-unicode --json --help" ;;
+      convert | escape | unescape) options="--from --to --replacement --lossless --if-changed --output-dir --in-place --recursive --quiet --verbose
+        --no-full-unicode --help" ;;
       encodings) options="--installed --json --help" ;;
       zip)
         case ${COMP_WORDS[2]} in
@@ -54,8 +55,8 @@ _qxtool() {
         esac
         ;;
       ini) [ "${COMP_WORDS[2]}" = set ] || options="--json --help" ;;
-      find) options="--folders --sorted --match --reject --json --help" ;;
-      sort) options="--by --ignore-case --reverse --from --help" ;;
+      find) options="--folders --sorted --match --reject --native --null --json --help" ;;
+      sort) options="--by --ignore-case --reverse --from --no-full-unicode --help" ;;
       info) options="--json --help" ;;
     esac
     mapfile -t COMPREPLY < <(compgen -W "$options" -- "$cur")

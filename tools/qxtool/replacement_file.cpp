@@ -55,7 +55,7 @@ bool IsSameContent(const fs::path& a, const fs::path& b) {
 
 }  // namespace
 
-ReplacementFile::ReplacementFile(std::string_view target, Durability durability)
+ReplacementFile::ReplacementFile(const std::string& target, Durability durability)
     : m_durability(durability), m_target(BehindLinks(console::PathOf(target))) {
   std::error_code error;
   fs::file_status status = fs::status(m_target, error);

@@ -8,15 +8,15 @@
 
 #include <cstdio>
 #include <filesystem>
-#include <string_view>
+#include <string>
 
 class ReplacementFile {
  public:
   // Whether the content is on the disk when Commit comes back, or whenever the system likes.
   enum class Durability { kOnDisk, kLater };
 
-  // Throws Failure when the target's folder does not let itself be written.
-  explicit ReplacementFile(std::string_view target, Durability durability = Durability::kOnDisk);
+  // `target` is a path of the system. Throws Failure when the target's folder does not let itself be written.
+  explicit ReplacementFile(const std::string& target, Durability durability = Durability::kOnDisk);
   ReplacementFile(const ReplacementFile&) = delete;
   ReplacementFile& operator=(const ReplacementFile&) = delete;
   // Removes the temporary file unless it was committed.

@@ -46,7 +46,7 @@ class Lines {
 void ReadLines(const SortOptions& options, Lines& lines, SString& warning) {
   const Encoding from = options.from.empty() ? Encodings::kANSI | Encodings::kFullDetect | Encodings::kFavorGuess
                                              : EncodingOf(options.from, "--from");
-  TextSource source(options.file, from);
+  TextSource source(options.file, from | UnicodePolicy(options.fullUnicode));
   source.Select();
   WCHAR text[8192];
   while (const unsigned long bytes = source.Reader().Read(text, sizeof text)) {

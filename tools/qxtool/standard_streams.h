@@ -9,7 +9,7 @@
 #include "qxcore/stream/input_stream.h"
 #include "qxcore/stream/output_stream.h"
 
-// Reads standard input. A failed read ends the data and is told by GetError; the user's wish to end
+// Reads standard input. A failed read ends the data and is reported by GetError; the user's wish to end
 // throws SEIOAbortedException.
 class StandardInput : public SInputStream {
  public:

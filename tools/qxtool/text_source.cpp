@@ -32,13 +32,14 @@ bool CountingInput::StartsWith(std::string_view bytes) const {
 
 namespace {
 
-// What the system has against opening the file; the library's exception only tells that it could not.
+// What the system has against opening the file; the library's exception only says that it could not.
 std::string WhyNotOpened(const std::string& name) {
   std::error_code error;
-  std::filesystem::file_status status = std::filesystem::status(console::PathOf(name), error);
+  const std::filesystem::path path = console::PathOf(console::NativeOf(name));
+  std::filesystem::file_status status = std::filesystem::status(path, error);
   if (std::filesystem::is_directory(status)) return "it is a folder";
   if (!std::filesystem::exists(status)) return error ? error.message() : "there is no such file";
-  std::ifstream attempt(console::PathOf(name), std::ios::binary);
+  std::ifstream attempt(path, std::ios::binary);
   return attempt ? "" : std::strerror(errno);
 }
 
@@ -46,7 +47,7 @@ std::string WhyNotOpened(const std::string& name) {
 
 std::unique_ptr<SInputFile> OpenInput(const std::string& name, ProgressBar& progress) {
   try {
-    return std::make_unique<SInputFile>(FromUtf8(name), &progress);
+    return std::make_unique<SInputFile>(console::NameOf(name), &progress);
   } catch (const SEIOCantOpenForReading& e) {
     std::string why = WhyNotOpened(name);
     throw Failure{ToUtf8(e.GetText()) + (why.empty() ? why : ": " + why)};
@@ -86,7 +87,7 @@ bool TextSource::HasMark() {
 }
 
 unsigned long long TextSource::CountBytes() {
-  // Some files tell no size or a wrong one; they and standard input are counted.
+  // Some files report no size or a wrong one; they and standard input are counted.
   if (m_size > m_bytes->Count()) return m_size;
   char skipped[65536];
   while (m_bytes->Read(skipped, sizeof skipped) != 0) {

@@ -47,7 +47,7 @@ class TextSource {
   // Whether the input starts with the mark of the encoding that was selected.
   bool HasMark();
 
-  // The size of the whole input; reads what is left of it where the system does not tell.
+  // The size of the whole input; reads what is left of it where the system does not know it.
   unsigned long long CountBytes();
 
   // Throws when the end that the reader saw was a failed read.

@@ -20,7 +20,7 @@ std::string Quoted(const SString& name) { return "entry \"" + Shown(name) + "\""
 
 std::unique_ptr<SZipFile> OpenDirectory(const std::string& path) {
   try {
-    return std::make_unique<SZipFile>(FromUtf8(path));
+    return std::make_unique<SZipFile>(console::NameOf(path));
   } catch (const SEZipException& e) {
     const std::string text = ToUtf8(e.GetText());
     throw Failure{text.empty() ? "cannot be opened or read" : text, kFailed, path};

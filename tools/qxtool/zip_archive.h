@@ -28,7 +28,7 @@ class ZipArchive {
   // The entries of the directory, by their places in the archive.
   const std::vector<SZipEntry>& Entries() const { return m_entries; }
 
-  // Goes to the next entry of the archive, which gives its directory entry; null at the end. Throws Failure when the
+  // Goes to the next entry of the archive, and returns its directory entry; null at the end. Throws Failure when the
   // directory has no entry at this place, one of another name, or more entries than were met.
   const SZipEntry* Next();
   // The present entry's data; 0 at its end. Throws Failure, and SEIOAbortedException when the user wants to end.

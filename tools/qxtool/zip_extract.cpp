@@ -33,7 +33,7 @@ class WatchedOutput : public FileOutput {
 
 void ExtractTo(const ZipOptions& options, std::FILE* file) {
   WatchedOutput output(file, options.archive);
-  SZipFile::ExtractTo(FromUtf8(options.archive), FromUtf8(options.entry), output);
+  SZipFile::ExtractTo(console::NameOf(options.archive), FromUtf8(options.entry), output);
   output.Flush();
 }
 
@@ -44,7 +44,7 @@ int ExtractZipEntry(const ZipOptions& options) try {
   if (options.out == kStandard) {
     ExtractTo(options, stdout);
   } else {
-    ReplacementFile target(options.out);
+    ReplacementFile target(console::NativeOf(options.out));
     ExtractTo(options, target.File());
     target.Commit(false);
   }
