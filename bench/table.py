@@ -4,6 +4,9 @@
 usage: table.py PROGRAM [FILTER]          the table of ratios; FILTER is a regular expression
        table.py --wine PROGRAM [FILTER]   our figures alone, of a Windows program under Wine
 
+Under Wine each row runs in a process of its own that is ended when it takes longer than a minute, and the whole ends
+after five; what was left out is said.
+
 Every figure is the median of the repetitions of one run, in which the benchmarks take turns. The
 rows with two threads run in a process of their own: once a process has started a thread, the runtime's
 heap and our counters take locks that a program with one thread does without.
@@ -14,6 +17,7 @@ import re
 import statistics
 import subprocess
 import sys
+import time
 
 REPETITIONS = 5
 MIN_TIME = 0.2  # seconds a repetition
@@ -92,7 +96,27 @@ ROWS = [
 TO_NANOSECONDS = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}
 
 
-def run(command, works):
+WINE_ROW_SECONDS = 60
+WINE_SECONDS = 300
+
+
+def run_bounded(command, works):
+    """As run, row by row on standard error, each and all of them within their time."""
+    figures, end = {}, time.monotonic() + WINE_SECONDS
+    for number, work in enumerate(works, 1):
+        left = min(WINE_ROW_SECONDS, end - time.monotonic())
+        if left <= 1:
+            print(f"left out, the time is over: {work}", file=sys.stderr)
+            continue
+        print(f"{number} of {len(works)}: {work}", file=sys.stderr)
+        try:
+            figures |= run(command, {work}, left, repetitions=3)
+        except subprocess.TimeoutExpired:
+            print(f"left out, longer than {left:.0f} s: {work}", file=sys.stderr)
+    return figures
+
+
+def run(command, works, seconds=None, repetitions=REPETITIONS):
     """The median figure of every benchmark, by name: nanoseconds, or bytes where it counts them."""
     if not works:
         return {}
@@ -100,11 +124,11 @@ def run(command, works):
     options = [
         f"--benchmark_filter=^({names})/",
         "--benchmark_format=json",
-        f"--benchmark_repetitions={REPETITIONS}",
+        f"--benchmark_repetitions={repetitions}",
         f"--benchmark_min_time={MIN_TIME}",
         "--benchmark_enable_random_interleaving=true",
     ]
-    output = subprocess.run(command + options, check=True, stdout=subprocess.PIPE).stdout
+    output = subprocess.run(command + options, check=True, stdout=subprocess.PIPE, timeout=seconds).stdout
     samples = {}
     for one in json.loads(output)["benchmarks"]:
         if one["run_type"] != "iteration":
@@ -159,13 +183,13 @@ def main():
     command = (["wine"] if under_wine else []) + arguments[:1]
     works = {row[0] for row in ROWS if re.search(pattern, f"{row[0]}/ours") or re.search(pattern, f"{row[0]}/{row[1]}")}
     threaded = {work for work in works if "two threads" in work}
-    figures = run(command, works - threaded) | run(command, threaded)
     if under_wine:
+        figures = run_bounded(command, [work for work in dict.fromkeys(row[0] for row in ROWS) if work in works])
         works = dict.fromkeys(row[0] for row in ROWS)
         print_table(["work", "ours"], [[work, show(figures[f"{work}/ours"], "time")]
                                        for work in works if f"{work}/ours" in figures])
     else:
-        compare(figures)
+        compare(run(command, works - threaded) | run(command, threaded))
 
 
 if __name__ == "__main__":

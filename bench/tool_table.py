@@ -1,0 +1,95 @@
+#!/usr/bin/env python3
+"""Measures qxtool beside the tools that people use for the same work, and prints the ratios.
+
+usage: tool_table.py QXTOOL [FILTER]   FILTER is a regular expression for the work
+
+Every figure is the median of five runs of a whole process, ours and the peer's in turn, on files that were read before.
+Output goes to /dev/null or to a file that is replaced; the files are made anew for each row.
+"""
+
+import pathlib
+import random
+import re
+import shutil
+import statistics
+import subprocess
+import sys
+import tempfile
+import time
+
+from table import print_table, show
+
+RUNS = 5
+TEXT = "Größe, Übermaß und Äpfel für jeden 5 €; съёмка северного склона; 北斜面の測量は; plain English in between. "
+
+
+def large_text(folder):
+    piece = "".join(TEXT + str(i) + "\n" for i in range(1000)).encode()
+    (folder / "large.txt").write_bytes(piece * (300_000_000 // len(piece)))
+
+
+def many_files(folder):
+    (folder / "many").mkdir()
+    for i in range(20_000):
+        (folder / "many" / f"{i}.txt").write_text(TEXT * (i % 20 + 1), encoding="utf-8")
+
+
+def many_lines(folder):
+    numbers = random.Random(1)
+    (folder / "lines.txt").write_text("".join(f"line{numbers.randrange(10**9)} {i}\n" for i in range(2_000_000)))
+
+
+def nothing(_):
+    pass
+
+
+# work, what makes its files, ours, peer, the peer's name, goal. "@" is the tool; commands run in the folder, by the shell.
+ROWS = [
+    ("convert 300 MB UTF-8 to UTF-16", large_text, "@ convert --from UTF-8 --to UTF-16 large.txt - >/dev/null",
+     "iconv -f UTF-8 -t UTF-16LE large.txt >/dev/null", "iconv", 0.5),
+    ("detect 20,000 files", many_files, "find many -type f -print0 | xargs -0 @ detect >/dev/null",
+     "find many -type f -print0 | xargs -0 file -i >/dev/null", "file -i", 0.07),
+    ("find over /usr", nothing, "@ find /usr >/dev/null", "find /usr ! -type d >/dev/null", "find", 1.3),
+    ("sort 2 million lines", many_lines, "@ sort --from ASCII lines.txt >/dev/null",
+     "LC_ALL=C.UTF-8 sort --parallel=1 lines.txt >/dev/null", "sort", 0.7),
+    ("sort 2 million lines in natural order", many_lines, "@ sort --by number --from ASCII lines.txt >/dev/null",
+     "LC_ALL=C.UTF-8 sort -V --parallel=1 lines.txt >/dev/null", "sort -V", 0.6),
+    ("--version", nothing, "for i in 1 2 3 4 5 6 7 8 9 10; do @ --version; done >/dev/null",
+     "for i in 1 2 3 4 5 6 7 8 9 10; do iconv --version; done >/dev/null", "iconv", 4.0),
+]
+
+
+def seconds(command, folder):
+    start = time.perf_counter()
+    subprocess.run(["sh", "-c", command], cwd=folder, check=True)
+    return time.perf_counter() - start
+
+
+def measure(make, ours, peer):
+    folder = pathlib.Path(tempfile.mkdtemp(prefix="qxtool-bench-"))
+    try:
+        make(folder)
+        for command in (ours, peer):
+            seconds(command, folder)
+        pairs = [(seconds(ours, folder), seconds(peer, folder)) for _ in range(RUNS)]
+        return [statistics.median(column) for column in zip(*pairs)]
+    finally:
+        shutil.rmtree(folder, ignore_errors=True)
+
+
+def main():
+    if not 2 <= len(sys.argv) <= 3:
+        sys.exit(__doc__)
+    tool = str(pathlib.Path(sys.argv[1]).resolve())
+    lines = []
+    for work, make, ours, peer, name, goal in ROWS:
+        if not re.search(sys.argv[2] if len(sys.argv) == 3 else ".", work):
+            continue
+        mine, theirs = measure(make, ours.replace("@", tool), peer)
+        ratio = mine / theirs
+        lines.append([work, name, show(mine * 1e9, "time"), show(theirs * 1e9, "time"), f"{ratio:.3g}", f"at most {goal:g}",
+                      "yes" if ratio <= goal else "NO"])
+    print_table(["work", "peer", "qxtool", "peer's", "ratio", "goal", "met"], lines)
+
+
+main()

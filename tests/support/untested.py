@@ -1,0 +1,68 @@
+#!/usr/bin/env python3
+"""Lists the public functions and members whose name is called in no test.
+
+usage: untested.py LIBRARY TESTS
+LIBRARY is the shared library of Linux, whose exported names are looked at; TESTS the folder of the tests. Overloads are
+not told apart. The exit status is 1 when something is listed.
+"""
+
+import pathlib
+import re
+import subprocess
+import sys
+
+SPECIAL = re.compile(r"^(vtable|typeinfo|VTT|guard variable|non-virtual thunk|virtual thunk|construction vtable)")
+
+
+def exported(library):
+    """Qualified names of functions, without arguments."""
+    listed = subprocess.run(["nm", "-DC", "--defined-only", library], capture_output=True, text=True, check=True).stdout
+    names = set()
+    for line in listed.splitlines():
+        _, kind, name = line.split(" ", 2)
+        if kind not in "TW" or SPECIAL.match(name) or name.startswith("std::"):
+            continue
+        name = re.sub(r"\[abi:\w+\]|<[^<>]*(<[^<>]*>[^<>]*)*>", "", name).split("(")[0].split(" ")[-1]
+        if not re.search(r"operator|~", name):
+            names.add(name)
+    return names
+
+
+def hidden(headers):
+    """Class and name of the members that the headers declare below "private" or "protected" only."""
+    seen = {True: set(), False: set()}
+    for path in pathlib.Path(headers).rglob("*.h"):
+        name, is_public = "", True
+        for line in path.read_text(encoding="utf-8").splitlines():
+            if begin := re.match(r"\s*(class|struct) (?:QXCORE_API )?(\w+)[^;]*\{", line):
+                name, is_public = begin[2], begin[1] == "struct"
+            elif access := re.match(r"\s*(public|protected|private):", line):
+                is_public = access[1] == "public"
+            seen[is_public].update((name, member) for member in re.findall(r"(\w+)\(", line))
+    return seen[False] - seen[True]
+
+
+def called(tests):
+    words = set()
+    for path in pathlib.Path(tests).rglob("*"):
+        if path.suffix in (".cpp", ".h", ".md"):
+            words.update(re.findall(r"\w+", path.read_text(encoding="utf-8", errors="replace")))
+    return words
+
+
+def main():
+    library, tests = sys.argv[1:]
+    words, private = called(tests), hidden(pathlib.Path(__file__).resolve().parents[2] / "qxcore")
+    missing = []
+    for name in sorted(exported(library)):
+        last = name.split("::")[-1]
+        if tuple(name.split("::")[-2:]) in private:
+            continue
+        # A client may write the name of a member that the Windows headers change without its W.
+        if last not in words and (not last.endswith("W") or last[:-1] not in words):
+            missing.append(name)
+    print("\n".join(missing) if missing else "every exported name is called in a test")
+    sys.exit(1 if missing else 0)
+
+
+main()
