@@ -51,9 +51,10 @@ QXCORE_API std::size_t WideSpanNot(const WCHAR* text, const WCHAR* set);
 
 // --- numbers ---
 
-// White space, a sign, a prefix ("0x" for base 16, also "0" for base 8 when base is 0), digits of
-// ASCII. What exceeds 32 bits is clipped to the nearest value and sets errno to ERANGE. *end (if not
-// null) is set behind the last character used, to the start when there was no number.
+// White space, a sign, a prefix ("0x" for base 16, also "0" for base 8 when base is 0), digits of ASCII. A prefix
+// without a digit behind it is not one: the number in "0x" is "0", as in C. What exceeds 32 bits is clipped to the
+// nearest value and sets errno to ERANGE. *end (if not null) is set behind the last character used, to the start when
+// there was no number.
 QXCORE_API long WideToLong(const WCHAR* text, const WCHAR** end = nullptr, int base = 10);
 // A negative number is taken modulo 2^32.
 QXCORE_API unsigned long WideToULong(const WCHAR* text, const WCHAR** end = nullptr, int base = 10);

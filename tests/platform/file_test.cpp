@@ -61,6 +61,13 @@ TEST(Files, Dispositions) {
   EXPECT_EQ(OpenError(folder.File(WTEXT("a?b")), GENERIC_WRITE, CREATE_NEW), DWORD(ERROR_INVALID_NAME));
 }
 
+// The position, or -1.
+LONGLONG Seek(HANDLE file, LONGLONG distance, DWORD method) {
+  LARGE_INTEGER wanted, position;
+  wanted.QuadPart = distance;
+  return SetFilePointerEx(file, wanted, &position, method) ? position.QuadPart : -1;
+}
+
 TEST(Files, PositionsAndSizes) {
   TempFolder folder;
   const HANDLE file = Open(folder.File(WTEXT("a")), GENERIC_READ | GENERIC_WRITE, CREATE_NEW);
@@ -69,21 +76,20 @@ TEST(Files, PositionsAndSizes) {
   char bytes[16] = {};
   EXPECT_TRUE(WriteFile(file, "0123456789", 10, &done, nullptr));
   EXPECT_EQ(done, 10u);
-  EXPECT_EQ(SetFilePointer(file, -4, nullptr, FILE_END), 6u);
+  EXPECT_EQ(Seek(file, -4, FILE_END), 6);
   EXPECT_TRUE(ReadFile(file, bytes, 16, &done, nullptr));
   EXPECT_EQ(std::string(bytes, done), "6789");
   EXPECT_TRUE(ReadFile(file, bytes, 16, &done, nullptr));  // the end is no error
   EXPECT_EQ(done, 0u);
-  EXPECT_EQ(SetFilePointer(file, -11, nullptr, FILE_END), DWORD(INVALID_SET_FILE_POINTER));
+  EXPECT_EQ(Seek(file, -11, FILE_END), -1);
   EXPECT_EQ(GetLastError(), DWORD(ERROR_NEGATIVE_SEEK));
-  EXPECT_EQ(SetFilePointer(file, 4, nullptr, FILE_BEGIN), 4u);
+  EXPECT_EQ(Seek(file, 4, FILE_BEGIN), 4);
   EXPECT_TRUE(SetEndOfFile(file));
   DWORD high = 1;
   EXPECT_EQ(GetFileSize(file, &high), 4u);
   EXPECT_EQ(high, 0u);
-  LONG highPart = 3;  // behind 12 GiB, in a file with holes
-  EXPECT_EQ(SetFilePointer(file, 5, &highPart, FILE_BEGIN), 5u);
-  EXPECT_EQ(highPart, 3);
+  constexpr LONGLONG kFar = (LONGLONG{3} << 32) + 5;  // behind 12 GiB, in a file with holes
+  EXPECT_EQ(Seek(file, kFar, FILE_BEGIN), kFar);
   EXPECT_TRUE(FlushFileBuffers(file));
   EXPECT_TRUE(CloseHandle(file));
   EXPECT_FALSE(CloseHandle(file));

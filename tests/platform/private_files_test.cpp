@@ -335,6 +335,21 @@ TEST_F(PrivateFiles, TheRegistryIsForItsUserAlone) {
   }
 }
 
+TEST_F(PrivateFiles, TheRegistryIsKeptInTheUsersDataFolder) {
+  const test::RegistryRoot root;
+  const char* const former = getenv("XDG_DATA_HOME");
+  const std::string kept = former == nullptr ? "" : former, folder = Native(Path(u"data"));
+  test::SetVariable("XDG_DATA_HOME", folder + "/x");
+  test::SetVariable("QXCORE_REGISTRY", "");
+  const BYTE byte = 1;
+  EXPECT_EQ(RegSetValueExW(HKEY_CURRENT_USER, u"v", 0, REG_BINARY, &byte, 1), 0);
+  test::SetVariable("QXCORE_REGISTRY", root.File());
+  test::SetVariable("XDG_DATA_HOME", kept);
+  EXPECT_EQ(RightsOf(Path(u"data\\x\\qxcore\\registry.db")), 0600u);
+  EXPECT_EQ(RightsOf(Path(u"data\\x\\qxcore")), 0700u);
+  EXPECT_NE(RegQueryValueExW(HKEY_CURRENT_USER, u"v", nullptr, nullptr, nullptr, nullptr), 0);
+}
+
 TEST_F(PrivateFiles, ARegistryThatCannotBeOpenedNowIsThereLater) {
   const test::RegistryRoot root;
   const BYTE byte = 1;

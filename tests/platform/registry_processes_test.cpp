@@ -263,6 +263,28 @@ TEST(DISABLED_RegistryProcesses, ReadersOfAForeignDatabase) {
   }));
   chmod(path.c_str(), 0644);  // its user lets others read it
   EXPECT_TRUE(asNobody([&] { return reads(u"first"); }));
+  // One that has read already sees what is written later.
+  int ready[2], written[2];
+  ASSERT_EQ(pipe(ready) | pipe(written), 0);
+  const pid_t reader = fork();
+  if (reader == 0) {
+    char byte = 'r';
+    const bool isNobody = setegid(65534) == 0 && seteuid(65534) == 0;
+    const int before = reads(u"first");
+    if (write(ready[1], &byte, 1) != 1 || read(written[0], &byte, 1) != 1) _exit(2);
+    _exit(isNobody && before == 0 && reads(u"later") == 0 ? 0 : 1);
+  }
+  char byte = 'w';
+  EXPECT_EQ(read(ready[0], &byte, 1), 1);
+  ASSERT_TRUE(InChild([&] {
+    const bool isWritten = writeOne(u"later");
+    std::exit(isWritten ? 0 : 1);
+    return isWritten;
+  }));
+  EXPECT_EQ(write(written[1], &byte, 1), 1);
+  int status = 0;
+  waitpid(reader, &status, 0);
+  EXPECT_EQ(WEXITSTATUS(status), 0);
   // Now another process has it open, with what it wrote in the log.
   Writer holder([&](int n) {
     if (n == 1) return writeOne(u"second");

@@ -109,7 +109,7 @@ TEST(System, SmallQuestions) {
   EXPECT_EQ(GetOEMCP(), 437u);
 }
 
-TEST(Folding, CompositionAndOem) {
+TEST(Folding, Composition) {
   WCHAR text[16];
   EXPECT_EQ(FoldStringW(MAP_COMPOSITE, WTEXT("\x00E9x"), -1, text, 16), 4);
   EXPECT_EQ(Text(text), WTEXT("e\x0301x"));
@@ -120,11 +120,6 @@ TEST(Folding, CompositionAndOem) {
   EXPECT_EQ(GetLastError(), DWORD(ERROR_INSUFFICIENT_BUFFER));
 #endif
   EXPECT_EQ(FoldStringW(MAP_COMPOSITE, WTEXT("\x00E9"), 1, nullptr, 0), 2);
-  char oem[8];
-  EXPECT_TRUE(CharToOemBuffW(WTEXT("\x00E9\x2592"), oem, 2));
-  EXPECT_EQ(std::string(oem, 2), "\x82\xB1");
-  EXPECT_TRUE(OemToCharBuffW("\x82\xB1", text, 2));
-  EXPECT_EQ(Text(text, 2), WTEXT("\x00E9\x2592"));
 }
 
 }  // namespace

@@ -4,6 +4,12 @@ if(NOT WIN32)
     "! nm -D --undefined-only '$<TARGET_FILE:qxcore11e>' | grep -E ' (wcs|wmem|wprintf|v?[fs]wprintf|isw|tow[lu]|fputw|fgetw|putw|getw|btowc|wctob|mbs|mbr|wcr)|basic_stringIw'")
 endif()
 
+# File times in zones that are not UTC.
+foreach(zone America/New_York Asia/Kathmandu Australia/Sydney)
+  add_test(NAME platform.zone.${zone} COMMAND test_platform --gtest_filter=FileTimes.*)
+  set_tests_properties(platform.zone.${zone} PROPERTIES ENVIRONMENT TZ=${zone})
+endforeach()
+
 # Each in a process of its own.
 if(NOT WIN32)
   foreach(case RegistryProcesses.EveryAcknowledgedWriteIsThere RegistryProcesses.ReadersSeeWritesAtOnce

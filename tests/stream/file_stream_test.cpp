@@ -334,8 +334,9 @@ TEST(RealFilesOnLinux, LargePositionsAreNotWrapped) {
   TempFolder folder;
   const test::Text path = folder.File(WTEXT("sparse"));
   const HANDLE sparse = CreateFileW(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_NEW, 0, nullptr);
-  LONG high = 1;
-  SetFilePointer(sparse, 5, &high, FILE_BEGIN);
+  LARGE_INTEGER size;
+  size.QuadPart = 0x100000005;
+  SetFilePointerEx(sparse, size, nullptr, FILE_BEGIN);
   SetEndOfFile(sparse);
   CloseHandle(sparse);
   SInputFile file{Path(path)};

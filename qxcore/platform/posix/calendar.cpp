@@ -6,7 +6,9 @@
 #include <unicode/ucnv.h>
 
 #include <climits>
+#include <clocale>
 #include <cstring>
+#include <string_view>
 
 #include "qxcore/platform/wide.h"
 
@@ -72,6 +74,11 @@ bool PutByRuntime(Output& out, WCHAR code, const std::tm& fields) {
   text[0] = 0;
   if (std::strftime(text, sizeof text, format, &fields) == 0) text[0] = 0;  // %p and %Z can be empty
   return PutLocaleText(out, text);
+}
+
+bool IsPlainLocale() {
+  const std::string_view locale = std::setlocale(LC_TIME, nullptr);
+  return locale == "C" || locale == "POSIX" || locale.starts_with("C.");
 }
 
 int Hour12(const std::tm& fields) { return fields.tm_hour % 12 == 0 ? 12 : fields.tm_hour % 12; }
@@ -151,7 +158,8 @@ bool PutCode(Output& out, WCHAR code, bool plain, const std::tm& fields) {
       return true;
     case 'c':
       if (plain) return PutAll(out, u"%A, %B %d, %Y %H:%M:%S", fields);
-      return PutByRuntime(out, code, fields);
+      // Without a locale the C library and msvcrt have their own ideas; msvcrt's holds.
+      return IsPlainLocale() ? PutAll(out, u"%m/%d/%y %H:%M:%S", fields) : PutByRuntime(out, code, fields);
     case 'x':
       if (plain) return PutAll(out, u"%A, %B %d, %Y", fields);
       return PutByRuntime(out, code, fields);

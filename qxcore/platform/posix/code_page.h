@@ -1,7 +1,7 @@
 // The code pages of the portable layer, as its own sources see them.
 //
 // Single-byte pages and those of one or two bytes are tables, filled once from ICU's converter and
-// corrected where the published tables differ; reading them takes no lock. UTF-8 is written by hand;
+// corrected where the published tables differ; reading them takes no lock. UTF-7 and UTF-8 are written by hand;
 // the stateful and the longer ones go through ICU's converters, one a page, made once.
 #pragma once
 
@@ -14,7 +14,7 @@
 
 namespace platform {
 
-enum class CodePageKind : std::uint8_t { kTable, kUtf8, kIcu, kSymbol };
+enum class CodePageKind : std::uint8_t { kTable, kUtf7, kUtf8, kIcu, kSymbol };
 
 struct CodePageInfo {
   UINT number;
@@ -40,7 +40,7 @@ struct DecodeTable {
 
   WCHAR single[256];
   std::uint8_t kind[256];            // 0, kInvalid or kLead
-  std::unique_ptr<WCHAR[]> doubles;  // [lead * 256 + trail]; 0 where there is none
+  std::unique_ptr<WCHAR[]> doubles;  // [lead * 256 + trail]; 0 where it is missing
   WCHAR defaultChar;
   bool asciiIdentity;  // the first 128 bytes stand for themselves
   bool hasInvalid;     // some single byte is invalid
@@ -58,7 +58,7 @@ struct EncodeTable {
   }
 };
 
-// The page of a number, or null when it is none or not installed. CP_ACP and its kin are resolved first.
+// The page of a number, or null when it is unknown or not installed. CP_ACP and its kin are resolved first.
 UINT ResolveCodePage(UINT page);
 const CodePageInfo* FindCodePage(UINT resolved);
 // All pages of the list, for enumeration; not all need be installed.
@@ -79,6 +79,8 @@ struct Decoded {
 };
 Decoded DecodeUtf8(const char* bytes, std::size_t count, WCHAR* text, std::size_t capacity, bool stopAtInvalid);
 Decoded EncodeUtf8(const WCHAR* text, std::size_t count, char* bytes, std::size_t capacity);
+Decoded DecodeUtf7(const char* bytes, std::size_t count, WCHAR* text, std::size_t capacity);
+Decoded EncodeUtf7(const WCHAR* text, std::size_t count, char* bytes, std::size_t capacity);
 Decoded DecodeIcu(const CodePageInfo& page, const char* bytes, std::size_t count, WCHAR* text, std::size_t capacity);
 Decoded EncodeIcu(const CodePageInfo& page, const WCHAR* text, std::size_t count, char* bytes, std::size_t capacity);
 

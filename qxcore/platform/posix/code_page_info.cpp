@@ -58,8 +58,6 @@ BOOL IsDBCSLeadByteEx(UINT number, BYTE byte) {
   return page != nullptr && page->IsLead(byte);
 }
 
-BOOL IsDBCSLeadByte(BYTE byte) { return IsDBCSLeadByteEx(CP_ACP, byte); }
-
 BOOL IsValidCodePage(UINT number) {
   const CodePageInfo* page = FindCodePage(number);
   return page != nullptr && page->kind != CodePageKind::kSymbol;

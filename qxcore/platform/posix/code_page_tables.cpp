@@ -109,6 +109,15 @@ class Converter {
   iconv_t m_iconv = reinterpret_cast<iconv_t>(-1);
 };
 
+// What a lead and a trail stand for, or 0. Page 20932 is EUC-JP in two bytes at most: its characters of three bytes
+// leave the first one, 8F, out and have a trail below 80.
+WCHAR DecodePair(const CodePageInfo& page, Converter& converter, unsigned lead, unsigned trail) {
+  const bool isShortened = page.number == 20932 && lead != 0x8E && trail < 0x80;
+  const char whole[3] = {'\x8F', static_cast<char>(lead), static_cast<char>(trail | (isShortened ? 0x80 : 0))};
+  const int value = isShortened ? converter.Decode(whole, 3) : converter.Decode(whole + 1, 2);
+  return static_cast<WCHAR>(value > 0 ? value : 0);
+}
+
 template <class Action>
 void ForEachPatch(const CodePageInfo& page, Action action) {
   for (const Patch& patch : kPatches) {
@@ -124,18 +133,15 @@ std::unique_ptr<DecodeTable> MakeDecodeTable(const CodePageInfo& page) {
   table->defaultChar = page.defaultChar;
   if (page.maxBytes == 2) table->doubles = std::make_unique<WCHAR[]>(65536);
   for (unsigned byte = 0; byte < 256; ++byte) {
-    char bytes[2] = {static_cast<char>(byte), 0};
+    const char single = static_cast<char>(byte);
     table->single[byte] = page.defaultChar;
     if (page.IsLead(static_cast<std::uint8_t>(byte))) {
       table->kind[byte] = DecodeTable::kLead;
-      for (unsigned trail = 0; trail < 256; ++trail) {
-        bytes[1] = static_cast<char>(trail);
-        const int value = converter.Decode(bytes, 2);
-        table->doubles[byte * 256 + trail] = static_cast<WCHAR>(value > 0 ? value : 0);
-      }
+      for (unsigned trail = 0; trail < 256; ++trail)
+        table->doubles[byte * 256 + trail] = DecodePair(page, converter, byte, trail);
       continue;
     }
-    const int value = converter.Decode(bytes, 1);
+    const int value = converter.Decode(&single, 1);
     table->kind[byte] = value >= 0 ? 0 : DecodeTable::kInvalid;
     if (value >= 0) table->single[byte] = static_cast<WCHAR>(value);
   }

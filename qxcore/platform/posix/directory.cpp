@@ -5,6 +5,7 @@
 #include <sys/statvfs.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdlib>
 #include <ctime>
@@ -29,6 +30,7 @@ DWORD Deliver(std::u16string_view text, DWORD size, LPWSTR buffer) {
 DWORD GetCurrentDirectoryW(DWORD size, LPWSTR buffer) { return GetFullPathNameW(u".", size, buffer, nullptr); }
 
 BOOL SetCurrentDirectoryW(LPCWSTR path) {
+  if (path == nullptr || *path == 0) return FailWith(ERROR_INVALID_NAME);
   return Succeeds([&]() -> DWORD {
     const Resolved entry = ResolvePath(path);
     if (entry.error != ERROR_SUCCESS) return entry.error;
@@ -58,6 +60,7 @@ DWORD GetTempPathW(DWORD size, LPWSTR buffer) {
     const char* folder = std::getenv("TMPDIR");
     std::u16string path = ToWindowsPath(folder != nullptr && folder[0] == '/' ? folder : "/tmp");
     if (path.back() != '\\') path += u'\\';
+    if (path.size() >= size && buffer != nullptr) std::fill_n(buffer, size, u'\0');
     return Deliver(path, size, buffer);
   });
 }
@@ -92,18 +95,56 @@ UINT GetTempFileNameW(LPCWSTR directory, LPCWSTR prefix, UINT unique, LPWSTR nam
   return fails(ERROR_FILE_EXISTS);
 }
 
-DWORD GetLongPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size) {
-  return Guarded(DWORD{0}, [&]() -> DWORD {
-    const Resolved entry = ResolvePath(path);
-    if (entry.error != ERROR_SUCCESS || !entry.exists) {
-      SetLastError(entry.error != ERROR_SUCCESS ? entry.error : ERROR_FILE_NOT_FOUND);
-      return 0;
+namespace {
+
+// The path as it was given, each part in it as it is spelled on disk. ERROR_SUCCESS, or why there is no such path.
+DWORD SpellAsOnDisk(std::u16string_view path, std::u16string& spelled) {
+  const Resolved whole = ResolvePath(std::u16string(path).c_str());
+  if (whole.error != ERROR_SUCCESS) return whole.error;
+  struct stat info;
+  const bool isFile =
+      whole.exists && whole.wantsFolder && stat(whole.path.c_str(), &info) == 0 && !S_ISDIR(info.st_mode);
+  if (!whole.exists || isFile) return ERROR_FILE_NOT_FOUND;
+  // A drive, or the prefix for long paths and a drive, has no other spelling.
+  std::size_t at = path.starts_with(u"\\\\?\\") ? 4 : 0;
+  if (path.size() >= at + 2 && path[at + 1] == ':') at += 2;
+  spelled = path.substr(0, at);
+  while (at < path.size()) {
+    std::size_t end = at;
+    while (end < path.size() && !IsSeparator(path[end])) ++end;
+    const std::u16string_view part = path.substr(at, end - at);
+    if (part.empty() || part == u"." || part == u"..") {
+      spelled += part;
+    } else {
+      const std::string there = ResolvePath(std::u16string(path.substr(0, end)).c_str()).path;
+      spelled += ToWindowsName(std::string_view(there).substr(there.rfind('/') + 1));
     }
-    return Deliver(ToWindowsPath(entry.path), size, buffer);
+    if (end < path.size()) spelled += path[end];
+    at = end + 1;
+  }
+  return ERROR_SUCCESS;
+}
+
+DWORD DeliverSpelled(LPCWSTR path, LPWSTR buffer, DWORD size) {
+  return Guarded(DWORD{0}, [&] {
+    std::u16string spelled;
+    const DWORD error = SpellAsOnDisk(path, spelled);
+    return error == ERROR_SUCCESS ? Deliver(spelled, size, buffer) : FailWith(error, DWORD{0});
   });
 }
 
-DWORD GetShortPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size) { return GetLongPathNameW(path, buffer, size); }
+}  // namespace
+
+DWORD GetLongPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size) {
+  if (path == nullptr) return FailWith(ERROR_INVALID_PARAMETER, DWORD{0});
+  return DeliverSpelled(path, buffer, size);
+}
+
+DWORD GetShortPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size) {
+  if (path == nullptr) return FailWith(ERROR_INVALID_PARAMETER, DWORD{0});
+  if (*path == 0) return FailWith(ERROR_BAD_PATHNAME, DWORD{0});
+  return DeliverSpelled(path, buffer, size);
+}
 
 UINT GetSystemDirectoryW(LPWSTR buffer, UINT size) { return Deliver(u"C:\\usr\\lib", size, buffer); }
 
@@ -115,6 +156,7 @@ BOOL GetDiskFreeSpaceExW(LPCWSTR directory, ULARGE_INTEGER* available, ULARGE_IN
     if (entry.error != ERROR_SUCCESS) return entry.error;
     struct statvfs info;
     if (!entry.exists) return ERROR_PATH_NOT_FOUND;
+    if ((entry.info.st_mode & S_IFMT) == S_IFREG) return ERROR_DIRECTORY;
     if (statvfs(entry.path.c_str(), &info) != 0) return ErrorFromErrno(errno);
     const ULONGLONG block = info.f_frsize;
     if (available != nullptr) available->QuadPart = info.f_bavail * block;

@@ -7,7 +7,7 @@
 #include <cstring>
 #include <string>
 
-#include "qxcore/platform/win32.h"
+#include "qxcore/platform/posix/failure.h"
 
 namespace {
 
@@ -61,13 +61,13 @@ std::u16string Expand(std::u16string_view text) {
 }  // namespace
 
 DWORD ExpandEnvironmentStringsW(LPCWSTR text, LPWSTR expanded, DWORD capacity) {
-  try {
+  using namespace platform;
+  if (text == nullptr) return FailWith(ERROR_INVALID_PARAMETER, DWORD{0});
+  return Guarded(DWORD{0}, [&] {
     const std::u16string result = Expand(text);
     const DWORD needed = static_cast<DWORD>(result.size()) + 1;
-    if (needed <= capacity) std::memcpy(expanded, result.c_str(), needed * sizeof(WCHAR));
+    if (needed > capacity || expanded == nullptr) return FailWith(ERROR_INSUFFICIENT_BUFFER, needed);
+    std::memcpy(expanded, result.c_str(), needed * sizeof(WCHAR));
     return needed;
-  } catch (const std::bad_alloc&) {
-    SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-    return 0;
-  }
+  });
 }

@@ -45,7 +45,7 @@ BOOL WriteFile(HANDLE handle, LPCVOID buffer, DWORD count, LPDWORD done, OVERLAP
     const ssize_t put = write(file.descriptor, static_cast<const char*>(buffer) + *done, count - *done);
     if (put < 0) {
       if (errno == EINTR) continue;
-      return FailWith(ErrorFromErrno(errno));
+      return FailWith(errno == EFAULT ? ERROR_INVALID_USER_BUFFER : ErrorFromErrno(errno));
     }
     *done += static_cast<DWORD>(put);
   }
@@ -61,32 +61,6 @@ BOOL SetFilePointerEx(HANDLE handle, LARGE_INTEGER distance, LARGE_INTEGER* posi
   if (at < 0) return FailWith(errno == EINVAL ? ERROR_NEGATIVE_SEEK : ErrorFromErrno(errno));
   if (position != nullptr) position->QuadPart = at;
   return TRUE;
-}
-
-DWORD SetFilePointer(HANDLE handle, LONG distance, LONG* distanceHigh, DWORD method) {
-  LARGE_INTEGER wanted, position;
-  wanted.QuadPart = distance;
-  if (distanceHigh != nullptr)
-    wanted.QuadPart = static_cast<LONGLONG>(static_cast<ULONGLONG>(static_cast<DWORD>(*distanceHigh)) << 32 |
-                                            static_cast<DWORD>(distance));
-  if (distanceHigh == nullptr) {
-    // A result that the caller cannot be told must not come about.
-    LARGE_INTEGER none, current;
-    none.QuadPart = 0;
-    if (!SetFilePointerEx(handle, none, &current, FILE_CURRENT)) return INVALID_SET_FILE_POINTER;
-    if (!SetFilePointerEx(handle, wanted, &position, method)) return INVALID_SET_FILE_POINTER;
-    if (position.QuadPart > 0xFFFFFFFF) {
-      SetFilePointerEx(handle, current, nullptr, FILE_BEGIN);
-      SetLastError(ERROR_INVALID_PARAMETER);
-      return INVALID_SET_FILE_POINTER;
-    }
-  } else {
-    if (!SetFilePointerEx(handle, wanted, &position, method)) return INVALID_SET_FILE_POINTER;
-    *distanceHigh = static_cast<LONG>(position.QuadPart >> 32);
-  }
-  const DWORD low = static_cast<DWORD>(position.QuadPart);
-  if (low == INVALID_SET_FILE_POINTER) SetLastError(NO_ERROR);
-  return low;
 }
 
 BOOL SetEndOfFile(HANDLE handle) {

@@ -69,23 +69,21 @@ bool GetEntryInfo(int folder, const char* name, EntryInfo& info) {
 BOOL GetFileAttributesExW(LPCWSTR path, GET_FILEEX_INFO_LEVELS level, LPVOID data) {
   using namespace platform;
   if (level != GetFileExInfoStandard || data == nullptr) return FailWith(ERROR_INVALID_PARAMETER);
-  try {
+  return Succeeds([&]() -> DWORD {
     const Resolved entry = ResolvePath(path);
-    if (entry.error != ERROR_SUCCESS) return FailWith(entry.error);
-    if (!entry.exists) return FailWith(ERROR_FILE_NOT_FOUND);
+    if (entry.error != ERROR_SUCCESS) return entry.error;
+    if (!entry.exists) return ERROR_FILE_NOT_FOUND;
     EntryInfo info;
-    if (!GetEntryInfo(AT_FDCWD, entry.path.c_str(), info)) return FailWith(ErrorFromErrno(errno));
-    if (entry.wantsFolder && (info.attributes & FILE_ATTRIBUTE_DIRECTORY) == 0) return FailWith(ERROR_INVALID_NAME);
+    if (!GetEntryInfo(AT_FDCWD, entry.path.c_str(), info)) return ErrorFromErrno(errno);
+    if (entry.wantsFolder && (info.attributes & FILE_ATTRIBUTE_DIRECTORY) == 0) return ERROR_INVALID_NAME;
     *static_cast<WIN32_FILE_ATTRIBUTE_DATA*>(data) = {info.attributes,
                                                       info.times.creation,
                                                       info.times.access,
                                                       info.times.write,
                                                       static_cast<DWORD>(info.size >> 32),
                                                       static_cast<DWORD>(info.size)};
-    return TRUE;
-  } catch (const std::bad_alloc&) {
-    return FailWith(ERROR_NOT_ENOUGH_MEMORY);
-  }
+    return ERROR_SUCCESS;
+  });
 }
 
 DWORD GetFileAttributesW(LPCWSTR path) {
@@ -97,17 +95,16 @@ DWORD GetFileAttributesW(LPCWSTR path) {
 // are: there the attribute means nothing on Windows either.
 BOOL SetFileAttributesW(LPCWSTR path, DWORD attributes) {
   using namespace platform;
-  try {
+  return Succeeds([&]() -> DWORD {
     const Resolved entry = ResolvePath(path);
-    if (entry.error != ERROR_SUCCESS) return FailWith(entry.error);
+    if (entry.error != ERROR_SUCCESS) return entry.error;
     struct stat info;
-    if (!entry.exists || stat(entry.path.c_str(), &info) != 0) return FailWith(ERROR_FILE_NOT_FOUND);
-    if (!S_ISREG(info.st_mode)) return TRUE;
+    if (!entry.exists || stat(entry.path.c_str(), &info) != 0) return ERROR_FILE_NOT_FOUND;
+    if (entry.wantsFolder && !S_ISDIR(info.st_mode)) return ERROR_INVALID_NAME;
+    if (!S_ISREG(info.st_mode)) return ERROR_SUCCESS;
     const bool readOnly = (info.st_mode & 0222) == 0, wanted = (attributes & FILE_ATTRIBUTE_READONLY) != 0;
-    if (readOnly == wanted) return TRUE;
+    if (readOnly == wanted) return ERROR_SUCCESS;
     const mode_t mode = wanted ? info.st_mode & 07555 : (info.st_mode & 07777) | 0200;
-    return chmod(entry.path.c_str(), mode) == 0 ? TRUE : FailWith(ErrorFromErrno(errno));
-  } catch (const std::bad_alloc&) {
-    return FailWith(ERROR_NOT_ENOUGH_MEMORY);
-  }
+    return chmod(entry.path.c_str(), mode) == 0 ? ERROR_SUCCESS : ErrorFromErrno(errno);
+  });
 }

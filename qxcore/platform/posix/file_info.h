@@ -1,4 +1,4 @@
-// Attributes and times of an entry, as Windows tells them.
+// Attributes and times of an entry, in the terms of Windows.
 #pragma once
 
 #include <sys/stat.h>
@@ -21,7 +21,7 @@ struct EntryInfo {
   FileTimes times;
 };
 
-// Of the entry itself; attributes and size of a link are joined with those of what it leads to. False
+// For the entry itself; attributes and size of a link are joined with those of what it leads to. False
 // with errno.
 bool GetEntryInfo(int folder, const char* name, EntryInfo& info);
 

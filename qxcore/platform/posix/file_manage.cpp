@@ -22,9 +22,13 @@ bool SameEntry(const Resolved& a, const Resolved& b) {
 
 DWORD LastErrno() { return ErrorFromErrno(errno); }
 
-// Of an entry that must be there.
+// Of an entry that must be there; a file has no backslash at the end of its name.
 DWORD Missing(const Resolved& entry) {
-  return entry.error != ERROR_SUCCESS ? entry.error : entry.exists ? ERROR_SUCCESS : ERROR_FILE_NOT_FOUND;
+  if (entry.error != ERROR_SUCCESS) return entry.error;
+  if (!entry.exists) return ERROR_FILE_NOT_FOUND;
+  struct stat info;
+  const bool isFile = entry.wantsFolder && stat(entry.path.c_str(), &info) == 0 && !S_ISDIR(info.st_mode);
+  return isFile ? ERROR_INVALID_NAME : ERROR_SUCCESS;
 }
 
 // What stands in the way of another file's taking the place of this one.
@@ -33,7 +37,7 @@ DWORD CheckReplace(const Resolved& target) {
   return IsHeldOpen(target.path.c_str()) ? ERROR_ACCESS_DENIED : ERROR_SUCCESS;
 }
 
-// Gives the entry its new name in one step, without replacing another one unless it may. ERROR_NOT_SAME_DEVICE when
+// Sets the entry's new name in one step, without replacing another one unless it may. ERROR_NOT_SAME_DEVICE when
 // the two are on different file systems.
 DWORD Rename(const Resolved& source, const std::string& target, bool replaces) {
   if (renameat2(AT_FDCWD, source.path.c_str(), AT_FDCWD, target.c_str(), replaces ? 0 : RENAME_NOREPLACE) == 0)
@@ -81,6 +85,7 @@ DWORD Copy(LPCWSTR from, LPCWSTR to, bool failIfExists) {
 }  // namespace
 
 BOOL CopyFileW(LPCWSTR from, LPCWSTR to, BOOL failIfExists) {
+  if (from == nullptr || to == nullptr) return FailWith(ERROR_INVALID_PARAMETER);
   return Succeeds([&] { return Copy(from, to, failIfExists != FALSE); });
 }
 
@@ -126,6 +131,7 @@ BOOL RemoveDirectoryW(LPCWSTR path) {
     struct stat current;
     if (stat(".", &current) == 0 && current.st_dev == info.st_dev && current.st_ino == info.st_ino)
       return ERROR_SHARING_VIOLATION;
+    if (entry.path == "/") return ERROR_DIR_NOT_EMPTY;
     return rmdir(entry.path.c_str()) == 0 ? ERROR_SUCCESS : LastErrno();
   });
 }

@@ -23,7 +23,7 @@ namespace {
 
 using namespace platform;
 
-constexpr std::uint64_t kGranularity = 65536;  // of offsets, as GetSystemInfo tells
+constexpr std::uint64_t kGranularity = 65536;  // of offsets, as GetSystemInfo says
 
 class Mapping final : public HandleObject {
  public:
@@ -167,7 +167,7 @@ int ProtectionFor(DWORD access, DWORD mapping, bool& isPrivate) {
   isPrivate = (access & FILE_MAP_WRITE) == 0 && (access & FILE_MAP_COPY) != 0;
   if ((access & FILE_MAP_WRITE) != 0) return mapping == PAGE_READWRITE ? PROT_READ | PROT_WRITE : -1;
   if (isPrivate) return PROT_READ | PROT_WRITE;
-  return (access & FILE_MAP_READ) != 0 ? PROT_READ : -1;
+  return PROT_READ;
 }
 
 std::map<std::uintptr_t, View>::iterator FindView(Tables& tables, const void* address) {
@@ -218,8 +218,12 @@ HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES*, DWORD protection, D
 }
 
 LPVOID MapViewOfFile(HANDLE handle, DWORD access, DWORD offsetHigh, DWORD offsetLow, SIZE_T size) {
-  const auto mapping = std::dynamic_pointer_cast<Mapping>(UseHandle(handle).object);
+  const HandleUse use = UseHandle(handle);
+  const auto mapping = std::dynamic_pointer_cast<Mapping>(use.object);
   if (mapping == nullptr) return Fails(ERROR_INVALID_HANDLE);
+  // A copy of one's own needs no more than reading, and no access at all means that.
+  const DWORD needed = (access & FILE_MAP_WRITE) != 0 ? FILE_MAP_WRITE : access != 0 ? FILE_MAP_READ : 0;
+  if ((use.access & needed) != needed) return Fails(ERROR_ACCESS_DENIED);
   const std::uint64_t offset = static_cast<std::uint64_t>(offsetHigh) << 32 | offsetLow;
   if (offset % kGranularity != 0) return Fails(ERROR_MAPPED_ALIGNMENT);
   bool isPrivate = false;

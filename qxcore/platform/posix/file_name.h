@@ -16,7 +16,7 @@ namespace platform {
 // One name, without separators.
 std::string ToFileSystemName(std::u16string_view name);
 std::u16string ToWindowsName(std::string_view name);
-// The same into a buffer with room for as many characters as the name has bytes. Gives the length.
+// The same into a buffer with room for as many characters as the name has bytes. Returns the length.
 std::size_t ToWindowsName(std::string_view name, WCHAR* buffer);
 // Appends a name in the file system's bytes.
 void AppendName(std::string& bytes, std::u16string_view name);

@@ -7,7 +7,6 @@
 #include <cerrno>
 #include <climits>
 #include <cstring>
-#include <new>
 
 #include "qxcore/platform/posix/file_info.h"
 #include "qxcore/platform/posix/handle.h"
@@ -97,10 +96,7 @@ class Search final : public HandleObject {
   bool m_isRoot;
 };
 
-HANDLE FindFails(DWORD error) {
-  SetLastError(error);
-  return INVALID_HANDLE_VALUE;
-}
+HANDLE FailsWith(DWORD error) { return FailWith(error, INVALID_HANDLE_VALUE); }
 
 struct Pattern {
   std::u16string_view folder, mask;
@@ -134,12 +130,15 @@ int OpenFolder(std::u16string_view folder, bool& isRoot, DWORD& error) {
 }
 
 HANDLE StartSearch(LPCWSTR path, WIN32_FIND_DATAW* data) {
-  const Pattern pattern = SplitPattern(path);
-  if (pattern.mask.empty()) return FindFails(ERROR_FILE_NOT_FOUND);
+  Pattern pattern = SplitPattern(path);
+  // "folder\." is the entry of the folder itself.
+  const FullPath full(path);
+  if (pattern.mask == u"." || pattern.mask == u"..") pattern = SplitPattern(full.View());
+  if (pattern.mask.empty()) return FailsWith(ERROR_FILE_NOT_FOUND);
   bool isRoot = false;
   DWORD error = ERROR_SUCCESS;
   const int folder = OpenFolder(pattern.folder, isRoot, error);
-  if (folder < 0) return FindFails(error);
+  if (folder < 0) return FailsWith(error);
   std::shared_ptr<Search> search;
   try {
     search = std::make_shared<Search>(folder, CompileWildcard(pattern.mask), isRoot);
@@ -148,31 +147,22 @@ HANDLE StartSearch(LPCWSTR path, WIN32_FIND_DATAW* data) {
     throw;
   }
   error = search->Next(*data);
-  if (error != ERROR_SUCCESS) return FindFails(error == ERROR_NO_MORE_FILES ? ERROR_FILE_NOT_FOUND : error);
+  if (error != ERROR_SUCCESS) return FailsWith(error == ERROR_NO_MORE_FILES ? ERROR_FILE_NOT_FOUND : error);
   return AddHandle(search, 0);
 }
 
 }  // namespace
 
 HANDLE FindFirstFileW(LPCWSTR pattern, WIN32_FIND_DATAW* data) {
-  if (pattern == nullptr || *pattern == 0) return FindFails(ERROR_PATH_NOT_FOUND);
-  try {
-    return StartSearch(pattern, data);
-  } catch (const std::bad_alloc&) {
-    return FindFails(ERROR_NOT_ENOUGH_MEMORY);
-  }
+  if (pattern == nullptr || *pattern == 0) return FailsWith(ERROR_PATH_NOT_FOUND);
+  return Guarded(INVALID_HANDLE_VALUE, [&] { return StartSearch(pattern, data); });
 }
 
 BOOL FindNextFileW(HANDLE handle, WIN32_FIND_DATAW* data) {
   const HandleUse use = UseHandle(handle);
   auto* search = dynamic_cast<Search*>(use.object.get());
   if (search == nullptr) return FailWith(ERROR_INVALID_HANDLE);
-  try {
-    const DWORD error = search->Next(*data);
-    return error == ERROR_SUCCESS ? TRUE : FailWith(error);
-  } catch (const std::bad_alloc&) {
-    return FailWith(ERROR_NOT_ENOUGH_MEMORY);
-  }
+  return Succeeds([&] { return search->Next(*data); });
 }
 
 BOOL FindClose(HANDLE handle) {

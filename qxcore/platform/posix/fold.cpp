@@ -1,19 +1,15 @@
-// FoldStringW, and the OEM conversions of whole texts.
+// FoldStringW.
 
 #include <unicode/unorm2.h>
 
-#include <cstring>
-#include <new>
-#include <string>
-
+#include "qxcore/platform/posix/failure.h"
 #include "qxcore/platform/wide.h"
 
 namespace {
 
-int Fail(DWORD error) {
-  SetLastError(error);
-  return 0;
-}
+using platform::FailWith;
+
+int Fail(DWORD error) { return FailWith(error, 0); }
 
 int FoldWith(const UNormalizer2* normalizer, const WCHAR* text, int count, WCHAR* folded, int capacity) {
   UErrorCode error = U_ZERO_ERROR;
@@ -38,32 +34,4 @@ int FoldStringW(DWORD flags, LPCWSTR text, int count, LPWSTR folded, int capacit
       flags == MAP_COMPOSITE ? unorm2_getNFDInstance(&error) : unorm2_getNFCInstance(&error);
   if (U_FAILURE(error)) return Fail(ERROR_NOT_ENOUGH_MEMORY);
   return FoldWith(normalizer, text, count, folded, capacity);
-}
-
-BOOL CharToOemBuffW(LPCWSTR text, LPSTR bytes, DWORD count) {
-  if (text == nullptr || bytes == nullptr) return FALSE;
-  if (count > 0 && static_cast<const void*>(text) == bytes) {
-    std::u16string copy(text, count);
-    WideCharToMultiByte(CP_OEMCP, 0, copy.data(), static_cast<int>(count), bytes, static_cast<int>(count * 2), nullptr,
-                        nullptr);
-  } else if (count > 0) {
-    WideCharToMultiByte(CP_OEMCP, 0, text, static_cast<int>(count), bytes, static_cast<int>(count * 2), nullptr,
-                        nullptr);
-  }
-  return TRUE;
-}
-
-BOOL OemToCharBuffW(LPCSTR bytes, LPWSTR text, DWORD count) {
-  if (bytes == nullptr || text == nullptr || static_cast<const void*>(bytes) == text) return FALSE;
-  if (count > 0)
-    MultiByteToWideChar(CP_OEMCP, MB_PRECOMPOSED, bytes, static_cast<int>(count), text, static_cast<int>(count));
-  return TRUE;
-}
-
-BOOL CharToOemW(LPCWSTR text, LPSTR bytes) {
-  return text != nullptr && CharToOemBuffW(text, bytes, static_cast<DWORD>(platform::WideLength(text) + 1));
-}
-
-BOOL OemToCharW(LPCSTR bytes, LPWSTR text) {
-  return bytes != nullptr && OemToCharBuffW(bytes, text, static_cast<DWORD>(std::strlen(bytes) + 1));
 }

@@ -14,6 +14,7 @@ namespace {
 struct Block {
   void* data;  // null while discarded, that is, of size 0
   SIZE_T size;
+  SIZE_T capacity;  // what was allocated
   unsigned locks;
   bool movable;
 };
@@ -30,13 +31,15 @@ class Blocks {
 
   HGLOBAL Add(SIZE_T size, bool movable, bool zero) {
     void* data = nullptr;
-    if (size > 0 || !movable) {
-      data = zero ? std::calloc(size > 0 ? size : 1, 1) : std::malloc(size > 0 ? size : 1);
+    // A fixed block has an address, and so at least one byte.
+    if (size == 0 && !movable) size = 1;
+    if (size > 0) {
+      data = zero ? std::calloc(size, 1) : std::malloc(size);
       if (data == nullptr) return nullptr;
     }
     const std::lock_guard lock(m_mutex);
     try {
-      Block* block = new Block{data, size, 0, movable};
+      Block* block = new Block{data, size, size, 0, movable};
       const std::uintptr_t handle =
           movable ? reinterpret_cast<std::uintptr_t>(block) + kMovableMark : reinterpret_cast<std::uintptr_t>(data);
       try {
@@ -52,7 +55,7 @@ class Blocks {
     }
   }
 
-  // Calls `action` with the block of a handle; gives `invalid`, with the last error set, for none.
+  // Calls `action` with the block of a handle; returns `invalid`, with the last error set, for an unknown one.
   template <class Result, class Action>
   Result With(HGLOBAL handle, Result invalid, Action action) {
     const std::lock_guard lock(m_mutex);
@@ -93,7 +96,7 @@ bool Resize(Block& block, SIZE_T size, bool zero) {
     if (zero && size > block.size) std::memset(static_cast<char*>(data) + block.size, 0, size - block.size);
     block.data = data;
   }
-  block.size = size;
+  block.size = block.capacity = size;
   return true;
 }
 
@@ -114,9 +117,11 @@ HGLOBAL GlobalReAlloc(HGLOBAL handle, SIZE_T size, UINT flags) {
     return nullptr;
   }
   return Blocks::Instance().With<HGLOBAL>(handle, nullptr, [&](Block& block) -> HGLOBAL {
-    const bool mayMove = (block.movable && block.locks == 0) || (block.movable && (flags & GMEM_MOVEABLE) != 0);
+    // Who holds the address of a locked block would be left with nothing.
+    if (block.movable && block.locks > 0 && size == 0) return nullptr;
+    const bool mayMove = block.movable && (block.locks == 0 || (flags & GMEM_MOVEABLE) != 0);
     if (!mayMove) {
-      if (size > block.size) {
+      if (size > block.capacity) {
         SetLastError(ERROR_NOT_ENOUGH_MEMORY);
         return nullptr;
       }

@@ -10,7 +10,7 @@ namespace platform {
 class HandleObject {
  public:
   virtual ~HandleObject() = default;
-  // Gives back what the object holds; an error that is told only now is the result.
+  // Lets go of what the object holds. Returns the error that the system reports only now.
   virtual DWORD Close() { return ERROR_SUCCESS; }
 };
 

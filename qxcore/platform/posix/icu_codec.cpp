@@ -3,8 +3,10 @@
 
 #include <unicode/ucnv.h>
 
+#include <algorithm>
 #include <map>
 #include <mutex>
+#include <utility>
 
 #include "qxcore/platform/posix/code_page.h"
 
@@ -36,7 +38,7 @@ class SharedConverter {
     if (slot == nullptr) {
       UErrorCode error = U_ZERO_ERROR;
       slot = ucnv_open(page.converter, &error);
-      if (U_SUCCESS(error) && page.number != 65000) ucnv_setSubstChars(slot, "?", 1, &error);
+      if (U_SUCCESS(error)) ucnv_setSubstChars(slot, "?", 1, &error);
     }
     m_converter = slot;
     if (m_converter == nullptr) return;
@@ -49,7 +51,8 @@ class SharedConverter {
   }
 
   UConverter* Get() const { return m_converter; }
-  bool Replaced() const { return m_counter.replaced != 0; }
+  // Whether something was replaced since the last question.
+  bool TakeReplaced() { return std::exchange(m_counter.replaced, 0) != 0; }
 
  private:
   static inline std::mutex s_mutex;
@@ -75,34 +78,57 @@ std::size_t Collect(Unit* target, std::size_t capacity, Step step) {
   }
 }
 
+// Converts the pieces between NULs one by one, each from the converter's first state to its last: what is cut by
+// a NUL does not swallow it. `convert` writes a piece and returns its length; false for what is invalid.
+template <class From, class To, class Convert>
+Decoded ConvertPieces(const From* from, std::size_t count, To* to, std::size_t capacity, Convert convert) {
+  Decoded whole{0, true};
+  const From* const end = from + count;
+  for (;;) {
+    const From* const nul = std::find(from, end, From{0});
+    const std::size_t room = whole.length < capacity ? capacity - whole.length : 0;
+    const Decoded piece = convert(from, nul, to + (capacity - room), room);
+    whole.length += piece.length;
+    whole.valid = whole.valid && piece.valid;
+    if (nul == end) return whole;
+    if (whole.length < capacity) to[whole.length] = 0;
+    ++whole.length;
+    from = nul + 1;
+  }
+}
+
+// One piece; `step` is the converter's function for a direction.
+template <class From, class To, class Step>
+Decoded ConvertPiece(SharedConverter& converter, const From* from, const From* end, To* to, std::size_t room,
+                     Step step) {
+  bool failed = false;
+  const std::size_t length = Collect(to, room, [&](To*& at, To* limit) {
+    UErrorCode error = U_ZERO_ERROR;
+    step(converter.Get(), &at, limit, &from, end, nullptr, true, &error);
+    failed = U_FAILURE(error) && error != U_BUFFER_OVERFLOW_ERROR;
+    return error == U_BUFFER_OVERFLOW_ERROR;
+  });
+  return {length, !failed && !converter.TakeReplaced()};
+}
+
 }  // namespace
 
 Decoded DecodeIcu(const CodePageInfo& page, const char* bytes, std::size_t count, WCHAR* text, std::size_t capacity) {
   SharedConverter converter(page);
   if (converter.Get() == nullptr) return {0, false};
-  const char* from = bytes;
-  bool failed = false;
-  const std::size_t length = Collect(text, capacity, [&](WCHAR*& at, WCHAR* limit) {
-    UErrorCode error = U_ZERO_ERROR;
-    ucnv_toUnicode(converter.Get(), &at, limit, &from, bytes + count, nullptr, true, &error);
-    failed = U_FAILURE(error) && error != U_BUFFER_OVERFLOW_ERROR;
-    return error == U_BUFFER_OVERFLOW_ERROR;
-  });
-  return {length, !failed && !converter.Replaced()};
+  return ConvertPieces(bytes, count, text, capacity,
+                       [&](const char* from, const char* end, WCHAR* to, std::size_t room) {
+                         return ConvertPiece(converter, from, end, to, room, ucnv_toUnicode);
+                       });
 }
 
 Decoded EncodeIcu(const CodePageInfo& page, const WCHAR* text, std::size_t count, char* bytes, std::size_t capacity) {
   SharedConverter converter(page);
   if (converter.Get() == nullptr) return {0, false};
-  const WCHAR* from = text;
-  bool failed = false;
-  const std::size_t length = Collect(bytes, capacity, [&](char*& at, char* limit) {
-    UErrorCode error = U_ZERO_ERROR;
-    ucnv_fromUnicode(converter.Get(), &at, limit, &from, text + count, nullptr, true, &error);
-    failed = U_FAILURE(error) && error != U_BUFFER_OVERFLOW_ERROR;
-    return error == U_BUFFER_OVERFLOW_ERROR;
-  });
-  return {length, !failed && !converter.Replaced()};
+  return ConvertPieces(text, count, bytes, capacity,
+                       [&](const WCHAR* from, const WCHAR* end, char* to, std::size_t room) {
+                         return ConvertPiece(converter, from, end, to, room, ucnv_fromUnicode);
+                       });
 }
 
 }  // namespace platform

@@ -92,6 +92,9 @@ int Decode(const CodePageInfo& page, DWORD flags, const char* bytes, std::size_t
       }
       break;
     }
+    case CodePageKind::kUtf7:
+      result = DecodeUtf7(bytes, count, text, capacity);
+      break;
     case CodePageKind::kUtf8:
       result = DecodeUtf8(bytes, count, text, capacity, strict);
       break;
@@ -145,6 +148,9 @@ int Encode(const CodePageInfo& page, DWORD flags, const WCHAR* text, std::size_t
       if (usedDefault != nullptr) *usedDefault = !result.valid;
       break;
     }
+    case CodePageKind::kUtf7:
+      result = EncodeUtf7(text, count, bytes, capacity);
+      break;
     case CodePageKind::kUtf8:
       result = EncodeUtf8(text, count, bytes, capacity);
       if ((flags & WC_ERR_INVALID_CHARS) != 0 && !result.valid) return Fail(ERROR_NO_UNICODE_TRANSLATION);

@@ -29,7 +29,7 @@ bool Creates(DWORD disposition) { return disposition != OPEN_EXISTING && disposi
 // What is wrong with opening an entry that is there.
 DWORD CheckExisting(const Resolved& entry, const OpenRequest& request) {
   const bool isFolder = IsFolder(entry.path.c_str());
-  if (entry.wantsFolder && !isFolder) return ERROR_PATH_NOT_FOUND;
+  if (entry.wantsFolder && !isFolder) return ERROR_INVALID_NAME;
   if (request.disposition == CREATE_NEW) return ERROR_FILE_EXISTS;
   const bool writes = (request.access & GENERIC_WRITE) != 0;
   if (isFolder && ((request.flags & FILE_FLAG_BACKUP_SEMANTICS) == 0 || writes)) return ERROR_ACCESS_DENIED;
@@ -44,8 +44,8 @@ DWORD CheckOpen(const Resolved& entry, const OpenRequest& request) {
   if (request.disposition == TRUNCATE_EXISTING && (request.access & GENERIC_WRITE) == 0) return ERROR_INVALID_PARAMETER;
   if (entry.error != ERROR_SUCCESS) return entry.error;
   if (entry.exists) return CheckExisting(entry, request);
-  if (entry.wantsFolder) return ERROR_INVALID_NAME;
   if (!Creates(request.disposition)) return ERROR_FILE_NOT_FOUND;
+  if (entry.wantsFolder) return ERROR_INVALID_NAME;
   // What can never be deleted cannot be deleted at the end, either.
   const bool isDoomed = (request.flags & FILE_FLAG_DELETE_ON_CLOSE) != 0;
   return isDoomed && (request.flags & FILE_ATTRIBUTE_READONLY) != 0 ? ERROR_ACCESS_DENIED : ERROR_SUCCESS;

@@ -66,18 +66,21 @@ DWORD GetPrivateProfileStringW(LPCWSTR section, LPCWSTR key, LPCWSTR standard, L
     if (section == nullptr) {
       length = CopyOut(profile.Sections(), text, capacity);
     } else if (key == nullptr) {
-      length = CopyOut(profile.Keys(section), text, capacity);
+      // A section without keys is like a key without a value.
+      const std::vector<std::u16string> keys = profile.Keys(section);
+      length = keys.empty() ? CopyOut(fallback, text, capacity) : CopyOut(keys, text, capacity);
     } else {
       length = CopyOut(profile.Find(section, key, value) ? std::u16string_view(value) : fallback, text, capacity);
     }
-    if (error != ERROR_SUCCESS) SetLastError(error);
+    SetLastError(error);
     return length;
   });
 }
 
 BOOL WritePrivateProfileStringW(LPCWSTR section, LPCWSTR key, LPCWSTR text, LPCWSTR file) {
   if (file == nullptr || *file == 0) return FailWith(ERROR_ACCESS_DENIED);
-  if (section == nullptr) return FailWith(ERROR_SUCCESS);  // nothing is held back that could be written now
+  // Nothing is held back that could be written now.
+  if (section == nullptr) return FailWith(key == nullptr && text == nullptr ? ERROR_SUCCESS : ERROR_FILE_NOT_FOUND);
   return Succeeds([&] {
     return ChangeProfile(file, [&](ProfileFile& profile) {
       if (key == nullptr) return profile.DeleteSection(section);

@@ -125,8 +125,9 @@ std::string ProfileFile::Encode(std::u16string_view text) const {
 
 // --- what the lines say ---
 
-// The first of the name; others stay unseen.
+// The first of the name; others stay unseen. What stands before all sections is the one without a name.
 std::size_t ProfileFile::FindSection(View section) const {
+  if (section.empty()) return kTop;
   std::size_t header = 0;
   while (header < m_lines.size() && !(m_lines[header].kind == Kind::kSection && IsSame(m_lines[header].name, section)))
     ++header;
@@ -156,7 +157,7 @@ bool ProfileFile::Find(View section, View key, std::u16string& value) const {
 std::vector<std::u16string> ProfileFile::Sections() const {
   std::vector<std::u16string> names;
   for (const Line& line : m_lines)
-    if (line.kind == Kind::kSection) names.push_back(line.name);
+    if (line.kind == Kind::kSection && !line.name.empty()) names.push_back(line.name);
   return names;
 }
 
@@ -203,7 +204,9 @@ bool ProfileFile::DeleteKey(View section, View key) {
 bool ProfileFile::DeleteSection(View section) {
   const std::size_t header = FindSection(Trim(section));
   if (header == m_lines.size()) return false;
-  m_lines.erase(m_lines.begin() + static_cast<std::ptrdiff_t>(header),
+  const std::size_t first = header == kTop ? 0 : header;
+  if (first == EndOfSection(header)) return false;
+  m_lines.erase(m_lines.begin() + static_cast<std::ptrdiff_t>(first),
                 m_lines.begin() + static_cast<std::ptrdiff_t>(EndOfSection(header)));
   return true;
 }

@@ -19,8 +19,8 @@ class ProfileFile {
 
   // The value of a key, blanks around it and one pair of quotation marks removed. False when there is none.
   bool Find(std::u16string_view section, std::u16string_view key, std::u16string& value) const;
-  // In the order of the file; a section that occurs twice is named twice, though
-  // only the first one counts.
+  // In the order of the file; a section that occurs twice is named twice, though only the first one counts. The
+  // section without a name, which is what stands before all others, is left out.
   std::vector<std::u16string> Sections() const;
   std::vector<std::u16string> Keys(std::u16string_view section) const;
 
@@ -47,8 +47,10 @@ class ProfileFile {
   Line MakeLine(const std::u16string& text) const;  // with this file's line end
   std::u16string Decode(std::string_view bytes) const;
   std::string Encode(std::u16string_view text) const;
+  static constexpr std::size_t kTop = static_cast<std::size_t>(-1);  // the line before the first one
   // Index of the key's line; the number of lines when there is none.
   std::size_t FindKey(std::u16string_view section, std::u16string_view key) const;
+  // Of its header; kTop for the section without a name.
   std::size_t FindSection(std::u16string_view section) const;
   std::size_t EndOfSection(std::size_t header) const;
   void EndLastLine();

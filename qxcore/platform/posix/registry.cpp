@@ -1,6 +1,10 @@
 // The registry's functions over the store.
 
+#include <sys/uio.h>
+#include <unistd.h>
+
 #include <algorithm>
+#include <cerrno>
 #include <cstring>
 
 #include "qxcore/platform/posix/registry_key.h"
@@ -34,6 +38,21 @@ void ClearClass(LPWSTR className, LPDWORD length) {
   Store<DWORD>(length, 0);
 }
 
+bool IsText(const RegistryValue& value) {
+  return value.type == REG_SZ || value.type == REG_EXPAND_SZ || value.type == REG_MULTI_SZ;
+}
+
+// The caller's data; false when it cannot be read. Where the system does not let itself be asked to copy, a bad pointer
+// is a crash, as with any other call.
+bool CopyIn(const BYTE* data, DWORD size, std::string& bytes) {
+  bytes.resize(size);
+  if (size == 0 || data == nullptr) return size == 0;
+  const iovec to{bytes.data(), size}, from{const_cast<BYTE*>(data), size};
+  const ssize_t done = process_vm_readv(getpid(), &to, 1, &from, 1, 0);
+  if (done < 0 && errno != EFAULT) std::memcpy(bytes.data(), data, size);
+  return done == static_cast<ssize_t>(size) || (done < 0 && errno != EFAULT);
+}
+
 // A value's type and data; without a buffer its size alone.
 DWORD CopyData(const RegistryValue& value, LPDWORD type, BYTE* data, LPDWORD size) {
   Store(type, value.type);
@@ -43,6 +62,9 @@ DWORD CopyData(const RegistryValue& value, LPDWORD type, BYTE* data, LPDWORD siz
   if (data == nullptr) return ERROR_SUCCESS;
   if (room < value.data.size()) return ERROR_MORE_DATA;
   std::memcpy(data, value.data.data(), value.data.size());
+  // A text without its terminator gets one where there is room; it is not counted.
+  if (IsText(value) && room - value.data.size() >= sizeof(WCHAR))
+    std::memset(data + value.data.size(), 0, sizeof(WCHAR));
   return ERROR_SUCCESS;
 }
 
@@ -147,10 +169,11 @@ LSTATUS RegEnumValueW(HKEY key, DWORD index, LPWSTR name, LPDWORD nameLength, LP
 
 LSTATUS RegSetValueExW(HKEY key, LPCWSTR name, DWORD, DWORD type, const BYTE* data, DWORD size) {
   constexpr std::size_t kLongestName = 16383;
-  if ((data == nullptr && size != 0) || ViewOf(name).size() > kLongestName) return ERROR_INVALID_PARAMETER;
+  if (ViewOf(name).size() > kLongestName) return ERROR_INVALID_PARAMETER;
   return RegistryResult([&]() -> DWORD {
+    std::string bytes;
+    if (!CopyIn(data, size, bytes)) return ERROR_NOACCESS;
     const RegistryKeyUse use(key, KEY_SET_VALUE);
-    const std::string_view bytes(reinterpret_cast<const char*>(data), size);
     return use->values.Set(use.Id(), ViewOf(name), type, bytes) ? ERROR_SUCCESS : ERROR_KEY_DELETED;
   });
 }
@@ -162,7 +185,7 @@ LSTATUS RegQueryValueExW(HKEY key, LPCWSTR name, LPDWORD, LPDWORD type, BYTE* da
     const RegistryValue* value = use->values.Find(use.Id(), ViewOf(name));
     if (value != nullptr) return CopyData(*value, type, data, size);
     use.MustExist();
-    Store<DWORD>(size, 0);
+    if (data == nullptr) Store<DWORD>(size, 0);
     return ERROR_FILE_NOT_FOUND;
   });
 }

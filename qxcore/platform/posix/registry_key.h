@@ -28,7 +28,7 @@ class RegistryKeyUse {
 // ERROR_INVALID_HANDLE for none; the roots stay open.
 LSTATUS CloseRegistryHandle(HKEY handle);
 
-// Runs the body of a registry function; gives its result or the error that it threw.
+// Runs the body of a registry function; returns its result or the error that it threw.
 template <class Body>
 LSTATUS RegistryResult(Body body) {
   try {

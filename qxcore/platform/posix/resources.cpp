@@ -41,7 +41,7 @@ constexpr char Escaped(char letter) {
   }
 }
 
-// Reads one spelling; gives each UTF-16 code unit to `put` and returns their number.
+// Reads one spelling; hands each UTF-16 code unit to `put` and returns their number.
 template <class Put>
 constexpr std::size_t ReadText(std::string_view spelling, Put put) {
   std::size_t count = 0;

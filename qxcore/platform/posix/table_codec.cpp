@@ -9,7 +9,7 @@
 namespace platform {
 namespace {
 
-// Widens leading ASCII; gives the number of bytes done.
+// Widens leading ASCII; returns the number of bytes done.
 std::size_t WidenAscii(const char* bytes, std::size_t count, WCHAR* text) {
   std::size_t done = 0;
 #if defined(__SSE2__)
@@ -46,6 +46,11 @@ Decoded MeasureSingle(const DecodeTable& table, const std::uint8_t* bytes, std::
   return {count, true};
 }
 
+// Whether something follows the lead byte that can belong to it: a terminator never does.
+bool HasTrail(const std::uint8_t* bytes, std::size_t at, std::size_t count) {
+  return at + 1 < count && bytes[at + 1] != 0;
+}
+
 Decoded MeasureDouble(const DecodeTable& table, const std::uint8_t* bytes, std::size_t count) {
   std::size_t at = 0, length = 0;
   bool valid = true;
@@ -59,7 +64,7 @@ Decoded MeasureDouble(const DecodeTable& table, const std::uint8_t* bytes, std::
     }
     const std::uint8_t kind = table.kind[byte];
     if (kind == DecodeTable::kLead) {
-      if (at + 1 < count) {
+      if (HasTrail(bytes, at, count)) {
         valid &= table.doubles[byte * 256u + bytes[at + 1]] != 0;
         at += 2;
       } else {
@@ -89,10 +94,11 @@ Decoded DecodeDouble(const DecodeTable& table, const std::uint8_t* bytes, std::s
       continue;
     }
     if (table.kind[byte] == DecodeTable::kLead) {
-      const WCHAR value = at + 1 < count ? table.doubles[byte * 256u + bytes[at + 1]] : u'\0';
+      const bool isPair = HasTrail(bytes, at, count);
+      const WCHAR value = isPair ? table.doubles[byte * 256u + bytes[at + 1]] : u'\0';
       valid &= value != 0;
       text[length++] = value != 0 ? value : table.defaultChar;
-      at += at + 1 < count ? 2 : 1;
+      at += isPair ? 2 : 1;
     } else {
       valid &= table.kind[byte] == 0;
       text[length++] = table.single[byte];
@@ -153,22 +159,23 @@ Decoded DecodeTableText(const DecodeTable& table, const char* bytes, std::size_t
 Decoded EncodeTableText(const EncodeTable& table, const EncodeOptions& options, const WCHAR* text, std::size_t count,
                         char* bytes, std::size_t capacity) {
   const std::uint16_t* codes = options.bestFit ? table.fit : table.exact;
+  const bool onlyMeasures = capacity == 0;
   std::size_t length = 0;
   bool valid = true;
   for (std::size_t i = 0; i < count; ++i) {
     const std::uint16_t c = static_cast<std::uint16_t>(text[i]);
     std::uint16_t code = codes[c];
-    if (code == 0 && c != 0) {
-      code = options.defaultCode;
-      valid = false;
-    }
+    const bool isDefault = code == 0 && c != 0;
+    if (isDefault) code = options.defaultCode;
     const std::size_t size = code > 0xFF ? 2 : 1;
-    if (length + size <= capacity) {
+    const bool fits = length + size <= capacity;
+    if (fits) {
       if (size == 2) bytes[length] = static_cast<char>(code >> 8);
       bytes[length + size - 1] = static_cast<char>(code);
     } else {
       capacity = 0;  // what does not fit ends the writing
     }
+    if (isDefault && (fits || onlyMeasures)) valid = false;
     length += size;
   }
   return {length, valid};

@@ -5,7 +5,7 @@
 
 namespace platform {
 
-// True when every byte (pair) is one of the page's; also gives the number of characters.
+// True when every byte (pair) is one of the page's; also returns the number of characters.
 Decoded MeasureTable(const DecodeTable& table, const char* bytes, std::size_t count);
 // Converts; invalid bytes become the page's replacement.
 Decoded DecodeTableText(const DecodeTable& table, const char* bytes, std::size_t count, WCHAR* text,

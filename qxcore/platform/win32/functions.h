@@ -1,6 +1,6 @@
-// The Win32 calls that the library uses, as declared on Linux; implemented in qxcore/platform/posix/. They
-// do what is published for them, last-error values included; where a call does less, a line says so. Include
-// qxcore/platform/win32.h, not this header; on Windows it is empty.
+// The Win32 calls that the library uses, as declared on Linux; implemented in qxcore/platform/posix/. They do what is
+// published for them, last-error values included. What each does otherwise, or not at all, is said in one place, by
+// function: docs/portable-layer.md. Include qxcore/platform/win32.h, not this header; on Windows it is empty.
 #pragma once
 
 #include "qxcore/platform/win32.h"
@@ -107,7 +107,6 @@ QXCORE_API void SetLastError(DWORD code) noexcept;
 
 QXCORE_API void GetSystemInfo(SYSTEM_INFO* info);
 QXCORE_API int MulDiv(int number, int numerator, int denominator);
-// 1252 unless the environment's QXCORE_ACP names another valid page; OEM: 437, QXCORE_OEMCP.
 QXCORE_API UINT GetACP();
 QXCORE_API UINT GetOEMCP();
 
@@ -126,65 +125,45 @@ QXCORE_API DWORD GetModuleFileNameW(HMODULE module, LPWSTR path, DWORD capacity)
 QXCORE_API void GetSystemTime(SYSTEMTIME* time);
 QXCORE_API void GetLocalTime(SYSTEMTIME* time);
 QXCORE_API void GetSystemTimeAsFileTime(FILETIME* time);
-// Milliseconds since the system started; begins anew after 49.7 days.
 QXCORE_API DWORD GetTickCount();
-// ERROR_INVALID_PARAMETER for file times from 0x8000000000000000 on, and for records that are no date
-// of the years 1601 to 30827; the day of the week is not looked at.
 QXCORE_API BOOL FileTimeToSystemTime(const FILETIME* fileTime, SYSTEMTIME* time);
 QXCORE_API BOOL SystemTimeToFileTime(const SYSTEMTIME* time, FILETIME* fileTime);
-// With the bias from UTC that is in force now, whatever the date that is converted.
 QXCORE_API BOOL FileTimeToLocalFileTime(const FILETIME* fileTime, FILETIME* localTime);
 QXCORE_API BOOL LocalFileTimeToFileTime(const FILETIME* localTime, FILETIME* fileTime);
-// The packed date and time of the FAT file system, without regard to zones; odd seconds are cut to even.
 QXCORE_API BOOL DosDateTimeToFileTime(WORD date, WORD time, FILETIME* fileTime);
 QXCORE_API BOOL FileTimeToDosDateTime(const FILETIME* fileTime, WORD* date, WORD* time);
 QXCORE_API LONG CompareFileTime(const FILETIME* a, const FILETIME* b);
 
-// Dates and times in the style of the user's locale (the environment's LC_ALL, LC_TIME or LANG), with
-// LOCALE_USER_DEFAULT only. Dates: DATE_SHORTDATE (or no flag), with all four digits of the year, or
-// DATE_LONGDATE. No pictures of the caller's own: `format` must be null.
 QXCORE_API int GetDateFormatW(LCID locale, DWORD flags, const SYSTEMTIME* date, LPCWSTR format, LPWSTR text,
                               int capacity);
 QXCORE_API int GetTimeFormatW(LCID locale, DWORD flags, const SYSTEMTIME* time, LPCWSTR format, LPWSTR text,
                               int capacity);
 
-// --- code pages; which are there and how they map: docs/portable-layer.md ---
+// --- code pages ---
 
 QXCORE_API int MultiByteToWideChar(UINT page, DWORD flags, LPCSTR bytes, int count, LPWSTR text, int capacity);
 QXCORE_API int WideCharToMultiByte(UINT page, DWORD flags, LPCWSTR text, int count, LPSTR bytes, int capacity,
                                    LPCSTR defaultChar, LPBOOL usedDefault);
 QXCORE_API BOOL GetCPInfo(UINT page, CPINFO* info);
 QXCORE_API BOOL GetCPInfoExW(UINT page, DWORD flags, CPINFOEXW* info);
-QXCORE_API BOOL IsDBCSLeadByte(BYTE byte);
 QXCORE_API BOOL IsDBCSLeadByteEx(UINT page, BYTE byte);
 QXCORE_API BOOL IsValidCodePage(UINT page);
 QXCORE_API BOOL EnumSystemCodePagesW(CODEPAGE_ENUMPROCW callback, DWORD flags);
 QXCORE_API BOOL IsTextUnicode(const void* data, int size, LPINT tests);
-// MAP_COMPOSITE and MAP_PRECOMPOSED only; other flags fail with ERROR_INVALID_FLAGS.
 QXCORE_API int FoldStringW(DWORD flags, LPCWSTR text, int count, LPWSTR folded, int capacity);
-QXCORE_API BOOL CharToOemW(LPCWSTR text, LPSTR bytes);
-QXCORE_API BOOL OemToCharW(LPCSTR bytes, LPWSTR text);
-QXCORE_API BOOL CharToOemBuffW(LPCWSTR text, LPSTR bytes, DWORD count);
-QXCORE_API BOOL OemToCharBuffW(LPCSTR bytes, LPWSTR text, DWORD count);
 
 // --- resources and messages ---
 
-// A null instance is the program, which has no texts.
 QXCORE_API int LoadStringW(HINSTANCE instance, UINT id, LPWSTR buffer, int size);
-// Knows RT_STRING only; the result can be tested for null and nothing else.
 QXCORE_API HRSRC FindResourceW(HMODULE module, LPCWSTR name, LPCWSTR type);
-// Null for any name but the null one.
 QXCORE_API HMODULE GetModuleHandleW(LPCWSTR name);
-// FORMAT_MESSAGE_FROM_SYSTEM only, in English, inserts left as they are.
 QXCORE_API DWORD FormatMessageW(DWORD flags, LPCVOID source, DWORD messageId, DWORD language, LPWSTR buffer, DWORD size,
                                 std::va_list* arguments);
-// For what FormatMessageW allocated.
 QXCORE_API HLOCAL LocalFree(HLOCAL block);
 
 // --- global memory ---
 
 QXCORE_API HGLOBAL GlobalAlloc(UINT flags, SIZE_T size);
-// Without GMEM_MODIFY only.
 QXCORE_API HGLOBAL GlobalReAlloc(HGLOBAL block, SIZE_T size, UINT flags);
 QXCORE_API LPVOID GlobalLock(HGLOBAL block);
 QXCORE_API BOOL GlobalUnlock(HGLOBAL block);
@@ -194,9 +173,6 @@ QXCORE_API HGLOBAL GlobalFree(HGLOBAL block);
 
 // --- the registry: one database under the user's data folder (docs/settings.md) ---
 
-// The roots are trees of their own. Sub-keys come in the order of their upper-case names, values in the
-// order in which they were made. Names: up to 255 characters a key, 16383 a value. Times of the last
-// write are not kept; they are 0. Security, options and class texts are ignored.
 QXCORE_API LSTATUS RegOpenKeyExW(HKEY key, LPCWSTR path, DWORD options, REGSAM access, HKEY* result);
 QXCORE_API LSTATUS RegCreateKeyExW(HKEY key, LPCWSTR path, DWORD reserved, LPWSTR className, DWORD options,
                                    REGSAM access, const SECURITY_ATTRIBUTES* security, HKEY* result,
@@ -214,54 +190,39 @@ QXCORE_API LSTATUS RegEnumValueW(HKEY key, DWORD index, LPWSTR name, LPDWORD nam
 QXCORE_API LSTATUS RegSetValueExW(HKEY key, LPCWSTR name, DWORD reserved, DWORD type, const BYTE* data, DWORD size);
 QXCORE_API LSTATUS RegQueryValueExW(HKEY key, LPCWSTR name, LPDWORD reserved, LPDWORD type, BYTE* data, LPDWORD size);
 QXCORE_API LSTATUS RegDeleteValueW(HKEY key, LPCWSTR name);
-// Names of variables are looked up as written, then without regard to case.
 QXCORE_API DWORD ExpandEnvironmentStringsW(LPCWSTR text, LPWSTR expanded, DWORD capacity);
 
 // --- initialisation files ---
 
-// A name without a folder is one in the system directory's place on Windows; here in the folder
-// "qxcore" of the user's configuration.
 QXCORE_API DWORD GetPrivateProfileStringW(LPCWSTR section, LPCWSTR key, LPCWSTR standard, LPWSTR text, DWORD capacity,
                                           LPCWSTR file);
 QXCORE_API BOOL WritePrivateProfileStringW(LPCWSTR section, LPCWSTR key, LPCWSTR text, LPCWSTR file);
 
-// --- files; how paths are read: docs/portable-layer.md ---
+// --- files ---
 
-// No overlapped access. Sharing modes hold against everybody who opens through this layer, in other
-// processes, too, but not against programs that open files without it, nor on file systems without
-// advisory locks; the library's own runtime streams (WideFileOpen) ignore them, too. The write-through
-// flag makes every write synchronous; the other flags but FILE_FLAG_DELETE_ON_CLOSE are hints that
-// are ignored. A handle that may be inherited survives exec with its descriptor only.
 QXCORE_API HANDLE CreateFileW(LPCWSTR path, DWORD access, DWORD share, SECURITY_ATTRIBUTES* security, DWORD disposition,
                               DWORD flags, HANDLE templateFile);
 QXCORE_API BOOL ReadFile(HANDLE file, LPVOID buffer, DWORD count, LPDWORD done, OVERLAPPED* overlapped);
 QXCORE_API BOOL WriteFile(HANDLE file, LPCVOID buffer, DWORD count, LPDWORD done, OVERLAPPED* overlapped);
-// Reports errors that the system tells only when the last descriptor is closed.
 QXCORE_API BOOL CloseHandle(HANDLE handle);
-QXCORE_API DWORD SetFilePointer(HANDLE file, LONG distance, LONG* distanceHigh, DWORD method);
 QXCORE_API BOOL SetFilePointerEx(HANDLE file, LARGE_INTEGER distance, LARGE_INTEGER* position, DWORD method);
 QXCORE_API BOOL SetEndOfFile(HANDLE file);
 QXCORE_API BOOL FlushFileBuffers(HANDLE file);
 QXCORE_API DWORD GetFileSize(HANDLE file, LPDWORD high);
 QXCORE_API BOOL GetFileSizeEx(HANDLE file, LARGE_INTEGER* size);
 QXCORE_API BOOL GetFileTime(HANDLE file, FILETIME* creation, FILETIME* access, FILETIME* write);
-// The process only duplicates its own handles.
 QXCORE_API BOOL DuplicateHandle(HANDLE sourceProcess, HANDLE source, HANDLE targetProcess, HANDLE* target, DWORD access,
                                 BOOL inherit, DWORD options);
 QXCORE_API HANDLE GetCurrentProcess();
 
-// --- file mappings; named ones: docs/mapped-files.md ---
+// --- file mappings ---
 
-// Of a file, or, for INVALID_HANDLE_VALUE, of memory. PAGE_READONLY, PAGE_READWRITE and PAGE_WRITECOPY only.
 QXCORE_API HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES* security, DWORD protection, DWORD sizeHigh,
                                      DWORD sizeLow, LPCWSTR name);
 QXCORE_API LPVOID MapViewOfFile(HANDLE mapping, DWORD access, DWORD offsetHigh, DWORD offsetLow, SIZE_T size);
 QXCORE_API BOOL UnmapViewOfFile(LPCVOID view);
-// Waits until the data is on the device.
 QXCORE_API BOOL FlushViewOfFile(LPCVOID view, SIZE_T size);
 
-// Attributes: folder, link (of the entry itself; joined with those of what it leads to), read-only (no
-// one may write), archive (every other file). Only read-only can be set; the others are ignored.
 QXCORE_API DWORD GetFileAttributesW(LPCWSTR path);
 QXCORE_API BOOL GetFileAttributesExW(LPCWSTR path, GET_FILEEX_INFO_LEVELS level, LPVOID data);
 QXCORE_API BOOL SetFileAttributesW(LPCWSTR path, DWORD attributes);
@@ -274,19 +235,15 @@ QXCORE_API BOOL RemoveDirectoryW(LPCWSTR path);
 QXCORE_API DWORD GetCurrentDirectoryW(DWORD size, LPWSTR buffer);
 QXCORE_API BOOL SetCurrentDirectoryW(LPCWSTR path);
 QXCORE_API DWORD GetFullPathNameW(LPCWSTR path, DWORD size, LPWSTR buffer, LPWSTR* filePart);
-// Long: each part as it is spelled on disk. Short: the same, as there are no short names.
 QXCORE_API DWORD GetLongPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size);
 QXCORE_API DWORD GetShortPathNameW(LPCWSTR path, LPWSTR buffer, DWORD size);
-// "C:\usr\lib" and "C:\usr".
 QXCORE_API UINT GetSystemDirectoryW(LPWSTR buffer, UINT size);
 QXCORE_API UINT GetWindowsDirectoryW(LPWSTR buffer, UINT size);
 QXCORE_API BOOL GetDiskFreeSpaceExW(LPCWSTR directory, ULARGE_INTEGER* available, ULARGE_INTEGER* total,
                                     ULARGE_INTEGER* free);
-// The folder of TMPDIR, else /tmp.
 QXCORE_API DWORD GetTempPathW(DWORD size, LPWSTR buffer);
 QXCORE_API UINT GetTempFileNameW(LPCWSTR directory, LPCWSTR prefix, UINT unique, LPWSTR name);
 
-// Entries come in the order of the file system; short names are empty.
 QXCORE_API HANDLE FindFirstFileW(LPCWSTR pattern, WIN32_FIND_DATAW* data);
 QXCORE_API BOOL FindNextFileW(HANDLE search, WIN32_FIND_DATAW* data);
 QXCORE_API BOOL FindClose(HANDLE search);
