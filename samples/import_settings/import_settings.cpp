@@ -25,7 +25,8 @@ static int Import(const SString& path, SRegistry& key) {
     value.Trim();
     if (key.WriteProfile(name, value) == SRegistry::kOk) ++count;
   }
-  if (SString warning = reader.GetDetectionWarning(); !warning.IsEmpty()) PrintLine(path + WTEXT(": ") + warning, stderr);
+  if (SString warning = reader.GetDetectionWarning(); !warning.IsEmpty())
+    PrintLine(path + WTEXT(": ") + warning, stderr);
   SString report;
   report.Format(WTEXT("%s: %d settings, read as %s"), path.GetSafePointer(), count,
                 Encodings::GetEncodingName(reader.GetFormat()).GetSafePointer());
