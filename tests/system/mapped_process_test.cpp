@@ -94,7 +94,7 @@ TEST(MappedMemoryBetweenProcesses, CopiesInASandbox) {
     EXPECT_EQ(count, 100'000u);
     ASSERT_EQ(truncate(SFile::ToNative(SString(path.c_str())).c_str(), 4096), 0);
     EXPECT_EQ(file.Seek(&start, 0), 0);
-    EXPECT_EQ(file.Read(bytes.data(), &count), static_cast<HRESULT>(SFile::kReadFailed));
+    EXPECT_EQ(file.Read(bytes.data(), &count), 0);
     EXPECT_EQ(count, 4096u) << isForbidden;
     start = 0;
     EXPECT_EQ(file.Seek(&start, 0), 0);
