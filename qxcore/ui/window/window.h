@@ -252,10 +252,10 @@ class QXCORE_API SWnd : public SCmdTarget {
   void OnSetFocus(SWnd* oldFocus);
   void OnShowWindow(int show, UINT why);
   void OnSysCommand(UINT id, LPARAM lParam);
-  LRESULT OnDpiChanged(WPARAM wParam, LPARAM lParam);
   void OnDisplayChange(UINT depth, int width, int height);
   // A top-level window reads the interface's metrics again and passes the change to its descendants.
   void OnSysColorChange();
+  LRESULT OnDpiChanged(WPARAM wParam, LPARAM lParam);
   void OnSettingChange(UINT what, LPCWSTR area);
   void OnFontChange();
   void OnThemeChanged();

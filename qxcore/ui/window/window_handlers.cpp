@@ -192,8 +192,10 @@ void SWnd::OnFontChange() {
 }
 
 LRESULT SWnd::OnDpiChanged(WPARAM, LPARAM) {
-  if (IsTopLevel(m_hWnd)) SUpdateUISysData();
-  return Default();
+  const HWND window = m_hWnd;
+  const LRESULT result = Default();
+  if (FromHandlePermanent(window) == this) PassOnAppearance();
+  return result;
 }
 
 // --- the state of menu items ---
