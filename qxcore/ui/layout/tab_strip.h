@@ -5,6 +5,7 @@
 // left one of the next tab. Its right edge is thus its offset, its width and twice the spacing.
 #pragma once
 
+#include "qxcore/core/memory.h"
 #include "qxcore/graphics/rect.h"
 #include "qxcore/string/string.h"
 
@@ -18,6 +19,10 @@ struct STab {
   int m_width = 60;      // without the spacing to the next tab
   SRect m_drawn;         // where it was painted last; empty when it was not visible
   SRect m_textArea;      // the same of its text
+
+  // The library's memory; throws SEOutOfMemory.
+  static void* operator new(std::size_t size) { return SMemAlloc(size); }
+  static void operator delete(void* block) noexcept { SMemFree(block); }
 };
 
 // The tabs, and what their places depend on.
@@ -48,11 +53,11 @@ struct QXCORE_API STabStrip {
 
 // What a scroll button does.
 enum STabButton : int {
-  kSTabNoButton = -1,
-  kSTabToFirst = 0,
-  kSTabToPrevious = 1,
-  kSTabToNext = 2,
-  kSTabToLast = 3,
+  kSTabNoButton = -1,   // no button
+  kSTabToFirst = 0,     // to the first tab
+  kSTabToPrevious = 1,  // one tab back
+  kSTabToNext = 2,      // one tab on
+  kSTabToLast = 3,      // until the last tab is visible
 };
 
 // The scroll buttons at the left end of the beam.
