@@ -18,7 +18,6 @@ class PaneView : public SView {
   PaneView() { ++s_living; }
   ~PaneView() override { --s_living; }
   void OnDraw(SDC* dc) override { dc->FillSolidRect(GetClientRect(), ::GetSysColor(COLOR_WINDOW)); }
-  SScrollBar* GetScrollBarCtrl(int bar) const override { return SSharedScrollBar(this, bar); }
   int OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* result) override {
     if (message == WM_CREATE && s_refuses) return *result = -1, 1;
     if (message == WM_HSCROLL || message == WM_VSCROLL) {

@@ -2,6 +2,7 @@
 
 #include "qxcore/graphics/window_dc.h"
 #include "qxcore/ui/frame/frame.h"
+#include "qxcore/ui/layout/shared_scroll_bar.h"
 #include "qxcore/ui/window/message_entries.h"
 
 QXCORE_IMPLEMENT_CLASS(SView, SWnd, 2)
@@ -22,6 +23,8 @@ int SView::PreCreateWindow(CREATESTRUCTW* create) {
   }
   return SWnd::PreCreateWindow(create);
 }
+
+SScrollBar* SView::GetScrollBarCtrl(int bar) const { return SSharedScrollBar(this, bar); }
 
 void SView::OnPaint() {
   SPaintDC dc(m_hWnd);

@@ -15,6 +15,8 @@ class QXCORE_API SView : public SWnd {
   ~SView() override;
 
   int PreCreateWindow(CREATESTRUCTW* create) override;
+  // The scroll bar that a splitter or tab window around the view shares with it; null for none.
+  SScrollBar* GetScrollBarCtrl(int bar) const override;
 
   // Draws the view. The context's clip region is what must be drawn.
   virtual void OnDraw(SDC* dc) = 0;
