@@ -82,4 +82,12 @@ ResourceBytes FindRegisteredResource(HINSTANCE given, LPCWSTR type, LPCWSTR name
   }
 }
 
+std::size_t RegisteredResourceSize(const void* data) noexcept {
+  Table& table = TheTable();
+  const std::lock_guard lock(table.mutex);
+  for (const Entry& entry : table.entries)
+    if (entry.bytes.data == data) return entry.bytes.size;
+  return 0;
+}
+
 }  // namespace platform

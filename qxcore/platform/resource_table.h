@@ -23,4 +23,7 @@ QXCORE_API bool RegisterResource(HINSTANCE module, LPCWSTR type, LPCWSTR name, c
 // What was registered; null data otherwise. Safe from every thread.
 QXCORE_API ResourceBytes FindRegisteredResource(HINSTANCE module, LPCWSTR type, LPCWSTR name) noexcept;
 
+// The size in bytes of what was registered with this address; 0 for an unknown one. Safe from every thread.
+QXCORE_API std::size_t RegisteredResourceSize(const void* data) noexcept;
+
 }  // namespace platform

@@ -154,10 +154,9 @@ int LoadStringW(HINSTANCE instance, UINT id, LPWSTR buffer, int size) {
 
 HRSRC FindResourceW(HMODULE module, LPCWSTR name, LPCWSTR type) {
   if (reinterpret_cast<std::uintptr_t>(type) != reinterpret_cast<std::uintptr_t>(RT_STRING)) {
-    const void* registered = platform::FindRegisteredResource(module, type, name).data;
-    if (registered != nullptr) return reinterpret_cast<HRSRC>(const_cast<void*>(registered));
-    SetLastError(ERROR_RESOURCE_TYPE_NOT_FOUND);
-    return nullptr;
+    const platform::ResourceBytes found = platform::FindRegisteredResource(module, type, name);
+    if (found.data == nullptr) SetLastError(ERROR_RESOURCE_TYPE_NOT_FOUND);
+    return reinterpret_cast<HRSRC>(const_cast<void*>(found.data));
   }
   // A block holds the sixteen texts whose ids divided by sixteen, plus one, give its name.
   const auto block = reinterpret_cast<std::uintptr_t>(name);
@@ -171,7 +170,7 @@ HRSRC FindResourceW(HMODULE module, LPCWSTR name, LPCWSTR type) {
   return nullptr;
 }
 
-// What FindResourceW returns for a registered resource are its bytes.
+// What was registered is in memory already: a resource, what it is loaded as and its bytes are one address.
+DWORD SizeofResource(HMODULE, HRSRC resource) { return static_cast<DWORD>(platform::RegisteredResourceSize(resource)); }
 HGLOBAL LoadResource(HMODULE, HRSRC resource) { return resource; }
-
 LPVOID LockResource(HGLOBAL resource) { return resource; }

@@ -21,6 +21,8 @@ struct Painter {
   void (*nonClient)(HWND window) = nullptr;
   // Moves pixels of a window's client area.
   void (*copyPixels)(HWND window, const RECT& from, int dx, int dy) = nullptr;
+  // Moves pixels of a window by (dx, dy) to `to`, which is relative to the window; children move with it.
+  void (*movePixels)(HWND window, const RECT& to, int dx, int dy) = nullptr;
   // A menu's popup window; the caret, drawn by inverting; the frame that is dragged.
   void (*popupMenu)(HWND window, HMENU menu) = nullptr;
   void (*caret)(HWND window, const RECT& rect) = nullptr;

@@ -28,7 +28,7 @@ bool IsOverlapped(DWORD style) { return !(style & (WS_CHILD | WS_POPUP)); }
 
 // Default places cascade over three quarters of the work area.
 void ChooseDefaults(CREATESTRUCTW& create) {
-  static int cascade = 0;
+  static std::atomic<int> cascade{0};
   if (create.x == CW_USEDEFAULT || create.cx == CW_USEDEFAULT) {
     if (!IsOverlapped(static_cast<DWORD>(create.style))) {
       if (create.x == CW_USEDEFAULT) create.x = create.y = 0;

@@ -24,7 +24,7 @@ HICON Load(HINSTANCE instance, LPCWSTR name, const WORD (&known)[Count], ULONG_P
   return Fail<HICON>(ERROR_RESOURCE_NAME_NOT_FOUND);
 }
 
-int g_shown = 0;  // the count of ShowCursor
+std::atomic<int> g_shown{0};  // the count of ShowCursor
 
 void ShowOnDisplay(HCURSOR cursor) {
   const auto value = reinterpret_cast<ULONG_PTR>(cursor);

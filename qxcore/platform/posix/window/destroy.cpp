@@ -114,8 +114,9 @@ void FreeWindow(HWND handle) {
     window = FindWindowObject(handle);
     if (window == nullptr) return;
     ForgetWindow(window);
-    for (Window* other = Desktop()->firstChild; other != nullptr; other = other->next)
-      if (other->owner == window) other->owner = nullptr;
+    if (!window->IsChild())
+      for (Window* other = Desktop()->firstChild; other != nullptr; other = other->next)
+        if (other->owner == window) other->owner = nullptr;
     if (window->parent != nullptr) Unlink(window);
     --window->windowClass->windows;
     RemoveObject(Kind::Window, handle);

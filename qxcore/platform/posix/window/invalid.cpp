@@ -30,15 +30,24 @@ RECT ChildInWindow(const Window* parent, const Window* child) {
   return Moved(child->window, client.left, client.top);
 }
 
+// Whether nothing can be added to what is to be painted. Many siblings at one place are asked this often.
+bool IsAllInvalid(const Window* window) {
+  if (!window->wantsPaint || !window->eraseUpdate || !window->frameUpdate || window->firstChild != nullptr)
+    return false;
+  pixman_region32_t* update = const_cast<pixman_region32_t*>(window->update.Pixman());
+  return pixman_region32_n_rects(update) == 1 && Same(window->update.Bounds(), AtOrigin(window->window));
+}
+
 void InvalidateChildren(Window* window, const Region& region, Erase erase, Children children) {
   for (Window* child = window->firstChild; child != nullptr; child = child->next) {
-    if (!child->IsVisible()) continue;
+    if (!child->IsVisible() || IsAllInvalid(child)) continue;
     const RECT place = ChildInWindow(window, child);
     Region part = region;
     part.Intersect(place);
     if (part.IsEmpty()) continue;
     part.Move(-place.left, -place.top);
     Invalidate(child, part, erase, children);
+    if (child->wantsPaint) child->frameUpdate = true;
   }
 }
 
@@ -54,7 +63,7 @@ void MarkInvalid(Window* window, const Region& region, Erase erase) {
   SetWantsPaint(window, true);
 }
 
-Region SiblingsBelow(const Window* window) {
+Region SiblingsAbove(const Window* window) {
   Region region;
   for (const Window* other = window->previous; other != nullptr; other = other->previous)
     if (other->IsVisible()) region.Add(Moved(other->window, -window->window.left, -window->window.top));
@@ -81,7 +90,7 @@ void VisibleRegion(const Window* window, bool withoutChildren, Region* region) {
   int dx = 0, dy = 0;
   for (const Window* each = window; !IsRoot(each) && !IsRoot(each->parent); each = each->parent) {
     if (each->style & WS_CLIPSIBLINGS) {
-      Region covered = SiblingsBelow(each);
+      Region covered = SiblingsAbove(each);
       covered.Move(dx, dy);
       region->Subtract(covered);
     }
@@ -138,12 +147,13 @@ void DropPaint(Window* window) {
   for (Window* child = window->firstChild; child != nullptr; child = child->next) DropPaint(child);
 }
 
-void InvalidateCovered(Window* parent, const RECT& covered) {
-  if (IsRoot(parent)) return;
-  const RECT client = ClientInWindow(parent);
-  Region region(Moved(covered, client.left, client.top));
-  region.Intersect(client);
-  Invalidate(parent, region, Erase::Yes, Children::All);
+void SpoilByOrder(Window* window) {
+  for (Window* other = window->parent->firstChild; other != nullptr; other = other->next) {
+    if (other == window || !other->IsVisible()) continue;
+    const RECT both = Common(window->window, other->window);
+    for (Window* each : {window, other})
+      Invalidate(each, Region(Moved(both, -each->window.left, -each->window.top)), Erase::Yes, Children::All);
+  }
 }
 
 void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
@@ -160,6 +170,7 @@ void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, b
   const RECT whole = AtOrigin(window->window);
   if (!wasShown) {
     Invalidate(window, Region(whole), Erase::Yes, Children::All);
+    if (window->wantsPaint) window->frameUpdate = true;
     return;
   }
   const bool sameSize = Width(oldWindow) == Width(whole) && Height(oldWindow) == Height(whole);
@@ -178,6 +189,13 @@ void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, b
   const RECT oldPlace = Moved(oldClient, -oldWindow.left, -oldWindow.top);
   if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return;
   Invalidate(window, spoiled, Erase::Yes, Children::Unclipped);
+}
+
+// A parent that does not leave its children out paints first; they would be painted over.
+bool WaitsForParent(const Window* window) {
+  for (const Window* above = window->parent; above != nullptr && !IsRoot(above); above = above->parent)
+    if (above->wantsPaint && !(above->style & WS_CLIPCHILDREN)) return true;
+  return false;
 }
 
 bool TakePaint(Thread* thread, MSG* message, const Filter& filter, bool remove) {

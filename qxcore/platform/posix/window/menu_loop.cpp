@@ -287,7 +287,6 @@ class MenuLoop {
       case VK_ESCAPE:
         if (m_levels.size() > 1) {
           Close();
-          TellSelection();
         } else {
           m_isOver = true;
         }

@@ -53,6 +53,7 @@ void EraseNow(HWND handle) {
     const Guard guard;
     const Window* window = FindWindowObject(handle);
     if (window == nullptr || !window->wantsPaint || !(window->frameUpdate || window->eraseUpdate)) return;
+    if (WaitsForParent(window)) return;
   }
   const Due due = TakeDue(handle);
   if (due.frame) Send(handle, WM_NCPAINT, 1);

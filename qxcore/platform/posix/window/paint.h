@@ -20,8 +20,10 @@ void DropPaint(Window* window);
 void SetWantsPaint(Window* window, bool wants);
 // After a change of place: what comes to light of the parent, and what of the window itself.
 void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags);
-// After a change in the Z order of the children at a place of the parent's client area.
-void InvalidateCovered(Window* parent, const RECT& covered);
+// After a change in the Z order: where the window and its siblings overlap.
+void SpoilByOrder(Window* window);
+// Whether erasing must wait until a parent has been painted.
+bool WaitsForParent(const Window* window);
 // The part of the window that shows: without what parents cut off and what siblings above and children cover
 // where the styles say so. Relative to the window.
 void VisibleRegion(const Window* window, bool withoutChildren, Region* region);

@@ -4,6 +4,7 @@
 
 #include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/activate.h"
+#include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/default_proc.h"
 #include "qxcore/platform/posix/window/paint.h"
 #include "qxcore/platform/posix/window/send.h"
@@ -95,12 +96,9 @@ void Reorder(Window* window, HWND after) {
   Window* above = PlaceInOrder(window, after);
   if (above != window->previous) {
     if (above == window) return;
-    const RECT covered = window->window;
     Unlink(window);
     Link(window, parent, above);
-    if (window->IsChild() && window->IsVisible()) {
-      InvalidateCovered(parent, covered);
-    }
+    if (window->IsChild() && window->IsVisible()) SpoilByOrder(window);
   }
   if (parent == Desktop() && after == HWND_TOP) RaiseTopLevel(window);
 }
@@ -142,6 +140,29 @@ void ShowOnDisplay(HWND handle) {
   TheDisplay().Show(handle, isShown, rect);
 }
 
+// What of the window's pixels stays valid moves along: all of it when it only moved, else the part of the client
+// area that was and is there. The surface is the top-level window's and moves with it.
+void KeepPixels(HWND handle, const NewPlace& from, const NewPlace& to, UINT flags) {
+  if (g_painter.movePixels == nullptr || flags & (SWP_NOCOPYBITS | SWP_SHOWWINDOW | SWP_HIDEWINDOW)) return;
+  if (!IsWindowVisible(handle)) return;
+  const bool isChild = !IsTopLevel(handle);
+  const int movedX = isChild ? to.window.left - from.window.left : 0;
+  const int movedY = isChild ? to.window.top - from.window.top : 0;
+  const RECT oldClient = Moved(from.client, -from.window.left, -from.window.top);
+  RECT newClient = Moved(to.client, -to.window.left, -to.window.top);
+  const bool isSame =
+      Same(oldClient, newClient) && Width(from.window) == Width(to.window) && Height(from.window) == Height(to.window);
+  if (isSame) {
+    if (movedX != 0 || movedY != 0) g_painter.movePixels(handle, AtOrigin(to.window), movedX, movedY);
+    return;
+  }
+  const int dx = movedX + newClient.left - oldClient.left, dy = movedY + newClient.top - oldClient.top;
+  if (dx == 0 && dy == 0) return;
+  newClient.right = std::min(newClient.right, newClient.left + Width(oldClient));
+  newClient.bottom = std::min(newClient.bottom, newClient.top + Height(oldClient));
+  g_painter.movePixels(handle, newClient, dx, dy);
+}
+
 BOOL Place(WINDOWPOS& place) {
   const HWND handle = place.hwnd;
   if (!(place.flags & SWP_NOSENDCHANGING)) Send(handle, WM_WINDOWPOSCHANGING, 0, reinterpret_cast<LPARAM>(&place));
@@ -152,12 +173,15 @@ BOOL Place(WINDOWPOS& place) {
     Settle(window, place);
   }
   const NewPlace to = Measure(handle, place);
+  NewPlace from{};
   {
     const Guard guard;
     Window* window = Expect(handle);
     if (window == nullptr) return FALSE;
+    from = {window->window, window->client};
     Apply(window, place, to);
   }
+  KeepPixels(handle, from, to, place.flags);
   ShowOnDisplay(handle);
   if (!(place.flags & (SWP_NOACTIVATE | SWP_HIDEWINDOW))) {
     if (ParentHandle(handle) != nullptr) {

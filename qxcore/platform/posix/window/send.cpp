@@ -95,8 +95,10 @@ using namespace platform::model;
 
 LRESULT SendMessageW(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
   if (window == HWND_BROADCAST) {
-    Broadcast([&](HWND each) { Send(each, message, wParam, lParam); });
-    return TRUE;
+    return OrNoMemory<LRESULT>(FALSE, [&] {
+      Broadcast([&](HWND each) { Send(each, message, wParam, lParam); });
+      return TRUE;
+    });
   }
   return Send(window, message, wParam, lParam);
 }

@@ -27,8 +27,13 @@ HWND SetParent(HWND handle, HWND newParent) {
     if (window == nullptr || parent == nullptr) return nullptr;
     oldParent = HandleOf(window->parent);
     place = {window->window.left, window->window.top};
+    // It stays where it is on the screen, until it is moved to the same place in the new parent.
+    const POINT before = ParentOrigin(window);
     Unlink(window);
     Link(window, parent, nullptr);
+    const POINT after = ParentOrigin(window);
+    window->window = Moved(window->window, before.x - after.x, before.y - after.y);
+    window->client = Moved(window->client, before.x - after.x, before.y - after.y);
   }
   SetWindowPos(handle, HWND_TOP, place.x, place.y, 0, 0, SWP_NOSIZE | (wasVisible ? 0u : SWP_NOACTIVATE));
   if (wasVisible) ShowWindow(handle, SW_SHOW);

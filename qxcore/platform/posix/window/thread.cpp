@@ -12,11 +12,7 @@
 namespace platform::model {
 namespace {
 
-// All threads that have a queue.
-List<Thread*>& Threads() {
-  static auto* threads = new List<Thread*>;
-  return *threads;
-}
+Thread* g_threads = nullptr;  // all that have a queue
 
 [[gnu::tls_model("initial-exec")]] thread_local Thread* t_thread = nullptr;
 
@@ -29,7 +25,8 @@ Thread* MakeThread() {
 
 Thread::Thread() : id(static_cast<DWORD>(syscall(SYS_gettid))) {
   const Guard guard;
-  Threads().push_back(this);
+  next = g_threads;
+  g_threads = this;
   t_thread = this;
 }
 
@@ -44,14 +41,16 @@ Thread::~Thread() {
       delete hook;
     }
   }
-  std::erase(Threads(), this);
+  Thread** link = &g_threads;
+  while (*link != this) link = &(*link)->next;
+  *link = next;
   t_thread = nullptr;
 }
 
 Thread* CurrentThread() { return t_thread != nullptr ? t_thread : MakeThread(); }
 
 Thread* FindThread(DWORD id) {
-  for (Thread* thread : Threads())
+  for (Thread* thread = g_threads; thread != nullptr; thread = thread->next)
     if (thread->id == id) return thread;
   return nullptr;
 }

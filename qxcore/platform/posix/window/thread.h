@@ -79,6 +79,7 @@ struct Thread {
   ~Thread();
 
   DWORD id;
+  Thread* next = nullptr;  // in the list of all
   std::condition_variable wake;
   bool isWoken = false;
 

@@ -1,0 +1,51 @@
+// What the painting of frames and of the control classes shares.
+#pragma once
+
+#include "qxcore/platform/posix/window/scroll.h"
+
+namespace platform::controls {
+
+// Adds the frames and menus to the table of painting functions that the window model asks.
+void InstallPainter();
+
+// The font of menus, captions and controls that were given none. It is the layer's own and stays.
+HFONT InterfaceFont();
+
+// A text by DrawTextW's rules, in a COLOR_ colour; a null font is the interface font.
+void PaintText(HDC dc, RECT rect, LPCWSTR text, int color, HFONT font, UINT format);
+
+void PaintScrollBar(HDC dc, const RECT& rect, const model::ScrollBar& bar, bool isVertical);
+
+// The procedures of the control classes.
+LRESULT CALLBACK ButtonProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
+LRESULT CALLBACK StaticProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
+LRESULT CALLBACK EditProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
+LRESULT CALLBACK ScrollBarProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
+LRESULT CALLBACK ProgressProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
+LRESULT CALLBACK StatusBarProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
+
+// The state of a control: an object of its class behind the first extra bytes of the window, made with
+// WM_NCCREATE and freed with WM_NCDESTROY. Null before and after.
+template <class State>
+State* StateOf(HWND window) {
+  return reinterpret_cast<State*>(GetWindowLongPtrW(window, 0));
+}
+
+template <class State>
+bool MakeState(HWND window) {
+  return model::OrNoMemory<bool>(false, [&] {
+    SetWindowLongPtrW(window, 0, reinterpret_cast<LONG_PTR>(new State));
+    return true;
+  });
+}
+
+template <class State>
+void FreeState(HWND window) {
+  delete StateOf<State>(window);
+  SetWindowLongPtrW(window, 0, 0);
+}
+
+// Sends WM_COMMAND with a notification to the control's parent.
+void NotifyCommand(HWND control, UINT code);
+
+}  // namespace platform::controls
