@@ -5,7 +5,7 @@
 #include <new>
 
 #include "qxcore/container/internal/table_storage.h"
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 #include "qxcore/string/string_buffer.h"
 
 const SStringTable SStringTable::null;

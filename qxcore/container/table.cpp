@@ -10,6 +10,22 @@
 using table_storage::BytesFor;
 using table_storage::TransitSlot;
 
+// A copy of an element, out of the table for a while.
+class __STable::Transit {
+ public:
+  Transit(__STable& table, int i) : m_table(table), m_slot(table.m_elementSize) {
+    m_table.CopyTo(m_slot.Address(), m_table.GetAt(i));
+  }
+  Transit(const Transit&) = delete;
+  Transit& operator=(const Transit&) = delete;
+  ~Transit() { m_table.Destroy(m_slot.Address()); }
+  void* Address() { return m_slot.Address(); }
+
+ private:
+  __STable& m_table;
+  TransitSlot m_slot;
+};
+
 void SThrowIndexOutOfRange(int index, int count) {
   constexpr HRESULT kOutOfBounds = static_cast<HRESULT>(0x8000000B);  // E_BOUNDS
   SString text;
@@ -75,9 +91,8 @@ void* __STable::NewAt(int i) {
   try {
     for (; from > i; --from) MoveElement(GetAt(from), GetAt(from - 1));
   } catch (...) {
-    // Slot `from` is a hole: what lies behind it cannot stay.
-    for (int behind = m_count; behind > from; --behind) Destroy(GetAt(behind));
-    m_count = from;
+    ++m_count;  // the last one stands one slot further
+    GiveUpFrom(from);
     throw;
   }
   ++m_count;
@@ -90,8 +105,8 @@ void __STable::CloseSlot(int i) {
   try {
     for (; hole < m_count; ++hole) MoveElement(GetAt(hole), GetAt(hole + 1));
   } catch (...) {
-    for (int behind = m_count; behind > hole; --behind) Destroy(GetAt(behind));
-    m_count = hole;
+    ++m_count;  // the last one is still there
+    GiveUpFrom(hole);
     throw;
   }
 }
@@ -116,32 +131,55 @@ void __STable::Remove(int i) {
   CloseSlot(i);
 }
 
-void __STable::MoveTo(int from, int to) {
-  if (from == to) return;
-  TransitSlot slot(m_elementSize);
-  CopyTo(slot.Address(), GetAt(from));
+// Slot `hole` is dead, and its element cannot be made again: what lies behind it cannot stay.
+void __STable::GiveUpFrom(int hole) {
+  for (int behind = m_count - 1; behind > hole; --behind) Destroy(GetAt(behind));
+  m_count = hole;
+}
+
+// Makes the element of a dead slot anew; if that fails, too, the slot is given up.
+void __STable::Refill(int hole, const void* element) {
   try {
-    Remove(from);
-    void* place = NewAt(to);
-    try {
-      CopyTo(place, slot.Address());
-    } catch (...) {
-      CloseSlot(to);
-      throw;
-    }
+    CopyTo(GetAt(hole), element);
   } catch (...) {
-    Destroy(slot.Address());
+    GiveUpFrom(hole);
     throw;
   }
-  Destroy(slot.Address());
+}
+
+// The slot that is free wanders from one index to the other.
+void __STable::MoveTo(int from, int to) {
+  if (from == to) return;
+  Transit moved(*this, from);
+  Destroy(GetAt(from));
+  const int step = from < to ? 1 : -1;
+  int hole = from;
+  try {
+    for (; hole != to; hole += step) MoveElement(GetAt(hole), GetAt(hole + step));
+    CopyTo(GetAt(to), moved.Address());
+  } catch (...) {
+    Refill(hole, moved.Address());
+    throw;
+  }
 }
 
 void __STable::Swap(int i, int j) {
   if (i == j) return;
-  TransitSlot slot(m_elementSize);
-  MoveElement(slot.Address(), GetAt(i));
-  MoveElement(GetAt(i), GetAt(j));
-  MoveElement(GetAt(j), slot.Address());
+  Transit first(*this, i), second(*this, j);
+  Destroy(GetAt(i));
+  try {
+    CopyTo(GetAt(i), second.Address());
+  } catch (...) {
+    Refill(i, first.Address());
+    throw;
+  }
+  Destroy(GetAt(j));
+  try {
+    CopyTo(GetAt(j), first.Address());
+  } catch (...) {
+    Refill(j, second.Address());  // element j stands twice then, and none is missing but i
+    throw;
+  }
 }
 
 void __STable::Reverse() {

@@ -49,6 +49,10 @@ class QXCORE_API __STable {
   void CloseSlot(int i);  // undoes NewAt when the element could not be constructed
   // Inserts a copy of the element, which may lie in this table.
   void Insert(int i, const void* element);
+  // When copying an element fails on the way: Remove has removed its element, and gives up those that cannot be moved
+  // up; MoveTo keeps all elements, the moved one somewhere between the two places; Swap keeps both in their places, or
+  // has the second one twice; Reverse stops. Only when the copy that mends this fails, too, are the elements from that
+  // place on given up. Every element that is gone was destroyed once.
   void Remove(int i);
   void MoveTo(int from, int to);  // `to` is the element's index afterwards
   void Swap(int i, int j);
@@ -67,7 +71,10 @@ class QXCORE_API __STable {
   std::int32_t m_elementSize;   // bytes
 
  private:
+  class Transit;
   void MoveElement(void* destination, void* source);
+  void GiveUpFrom(int hole);
+  void Refill(int hole, const void* element);
 };
 
 static_assert(sizeof(void*) != 4 || sizeof(__STable) == 20, "the layout is public");

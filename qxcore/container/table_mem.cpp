@@ -56,7 +56,15 @@ void __STableMem::GrowTo(int n) {
   if (old == nullptr) {
     m_table.Attach(Allocate(n));
   } else if (old->Refs() == 1) {
-    m_table.GrowTo(n);
+    if (n == old->Capacity() || n < old->Count()) return;
+    // Not by the library's own realloc: a derived class may have memory of its own.
+    auto* data = static_cast<__STableData*>(Allocate(n));
+    std::memcpy(data->Elements(), old->Elements(),
+                static_cast<std::size_t>(old->Count()) * static_cast<std::size_t>(old->ElemSize()));
+    data->SetCount(old->Count());
+    m_table.Detach();
+    m_table.Attach(data);
+    Free(old);
   } else if (n >= old->Count()) {
     __STableData* data = CopyBlock(old->Elements(), old->Count(), n);
     m_table.Attach(data);  // lets go of the shared block

@@ -4,6 +4,7 @@
 #include <cstdlib>
 
 #include "qxcore/core/exception.h"
+#include "qxcore/core/internal/memory_failures.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-// The one place where the library takes memory, and where tests make it fail.
+// The one place where the library takes memory.
 //
 // Every block that the library allocates for itself comes from here, so that a failure always
 // becomes SEOutOfMemory and every path behind a failure can be tested. Safe for several threads.
@@ -21,14 +21,3 @@ QXCORE_API void* SMemRealloc(void* block, std::size_t size);
 
 // Gives a block back; null is ignored.
 QXCORE_API void SMemFree(void* block) noexcept;
-
-// For memory that must come from elsewhere (the platform's global memory): true when that allocation is
-// to fail by an order of SMemFailAt; counts like an allocation.
-QXCORE_API bool SMemMustFail() noexcept;
-
-// Fault injection for tests: the n-th allocation from now on (n = 1 is the next one) fails; with
-// forever set, all later ones fail, too. n = 0 switches failing off. Process-wide.
-QXCORE_API void SMemFailAt(long n, bool forever = false) noexcept;
-
-// True when a failure ordered by SMemFailAt has happened since the order.
-QXCORE_API bool SMemHasFailed() noexcept;

@@ -26,6 +26,9 @@ class QXCORE_API SModuleState {
   SString LoadStringW(unsigned int id);
   // The same text, formatted with the arguments like SString::Format.
   SString Format(unsigned int id, ...);
+  // Objects are no arguments, as there.
+  template <class... Arguments, class = SIfNoFormatArguments<Arguments...>>
+  SString Format(unsigned int id, const Arguments&... arguments) = delete;
 
  protected:
   // Redirects the resource handle and gives back the former one. A null handle changes nothing and

@@ -42,19 +42,29 @@ int STargetedException::Match(const SThrowTarget& target) const {
   return 0;
 }
 
+// Adds to the counts of the names, as often as each stands in the list. Takes no memory.
+static void Count(SStringView names, int step) noexcept {
+  for (auto& [known, count] : TheRegistry()) {
+    SStringView rest = names;
+    for (bool isLast = false; !isLast;) {
+      const std::size_t end = rest.find(WTEXT(','));
+      isLast = end == SStringView::npos;
+      if (rest.substr(0, end) == known.View()) count += step;
+      if (!isLast) rest.remove_prefix(end + 1);
+    }
+  }
+}
+
 void SThrowTarget::Activate() {
   if (m_active != 0) return;
   // All names are made known before one is counted, so that a failure counts none.
   for (parts_iterator name(m_names, WTEXT(',')); name; ++name) TheRegistry()[*name];
   m_active = 1;
-  for (parts_iterator name(m_names, WTEXT(',')); name; ++name) ++TheRegistry()[*name];
+  Count(m_names.View(), 1);
 }
 
 void SThrowTarget::Done() noexcept {
   if (m_active == 0) return;
   m_active = 0;
-  for (parts_iterator name(m_names, WTEXT(',')); name; ++name) {
-    std::int32_t* count = TheRegistry().Retrieve(*name);
-    if (count != nullptr) --*count;
-  }
+  Count(m_names.View(), -1);
 }

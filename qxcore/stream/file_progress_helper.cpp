@@ -4,12 +4,13 @@
 #include <cerrno>
 #include <limits>
 
+#include "qxcore/core/error_cause.h"
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/platform/wide.h"
+#include "qxcore/stream/internal/file_buffer.h"
 
 namespace {
 
-constexpr std::size_t kRuntimeBuffer = 65536;
 constexpr unsigned long kMost = std::numeric_limits<unsigned long>::max();
 
 unsigned long Clip(std::uint64_t value) { return static_cast<unsigned long>(std::min<std::uint64_t>(value, kMost)); }
@@ -18,8 +19,8 @@ unsigned long Clip(std::uint64_t value) { return static_cast<unsigned long>(std:
 
 SFileProgressHelper::SFileProgressHelper(const SString& path, SProgressIndicatorEx* progress)
     : m_file(platform::WideFileOpen(path, WTEXT("rb"))), m_progress(progress) {
-  if (m_file == nullptr) throw SEIOCantOpenForReading();
-  std::setvbuf(m_file, nullptr, _IOFBF, kRuntimeBuffer);
+  if (m_file == nullptr) throw SEWithError<SEIOCantOpenForReading>(errno);
+  m_buffer = SGiveBuffer(m_file);
   if (platform::FileSeek(m_file, 0, SEEK_END) == 0)
     m_size = static_cast<std::uint64_t>(std::max<std::int64_t>(platform::FileTell(m_file), 0));
   if (m_size == 0) {
@@ -57,9 +58,11 @@ bool SFileProgressHelper::IsCancelled() {
   return m_progress->IsCancelled();
 }
 
-int SFileProgressHelper::ReadByte() {
+int SFileProgressHelper::ReadByte() { return ReadByteOf(m_position); }
+
+int SFileProgressHelper::ReadByteOf(std::uint64_t start) {
   if (m_file == nullptr) return -1;
-  if (IsCancelled()) throw SEIOAbortedException();
+  if (IsCancelled() && GoBackTo(start)) throw SEIOAbortedException();
   int byte = std::getc(m_file);
   if (byte == EOF) {
     if (std::ferror(m_file)) m_error = errno;
@@ -72,7 +75,7 @@ int SFileProgressHelper::ReadByte() {
 unsigned long SFileProgressHelper::ReadBlock(void* buffer, unsigned long count) {
   if (m_file == nullptr || count == 0) return 0;
   // With an indicator, no more at a time than one step, so that it moves and can stop a long read.
-  const unsigned long most = m_progress != nullptr ? Clip(std::max<std::uint64_t>(m_step, kRuntimeBuffer)) : kMost;
+  const unsigned long most = m_progress != nullptr ? Clip(std::max<std::uint64_t>(m_step, kSFileBuffer)) : kMost;
   const std::uint64_t start = m_position;
   unsigned char* out = static_cast<unsigned char*>(buffer);
   unsigned long done = 0;
@@ -152,4 +155,6 @@ bool SFileProgressHelper::GoToFilePlace(std::uint64_t place) {
 void SFileProgressHelper::CloseFile() noexcept {
   if (m_file != nullptr) std::fclose(m_file);
   m_file = nullptr;
+  SMemFree(m_buffer);
+  m_buffer = nullptr;
 }

@@ -35,6 +35,10 @@ class QXCORE_API SFileProgressHelper {
   unsigned long SkipBytes(unsigned long count);
   unsigned long CountAvailable();
   bool IsAtEnd() const;
+  // The next byte of a block that began at `start`: a cancelled read goes back there.
+  int ReadByteOf(std::uint64_t start);
+  std::uint64_t Position() const { return m_position; }
+  bool GoBackTo(std::uint64_t position);
   bool GetFilePlace(std::uint64_t* place);
   bool GoToFilePlace(std::uint64_t place);
   void CloseFile() noexcept;
@@ -44,7 +48,6 @@ class QXCORE_API SFileProgressHelper {
 
  private:
   bool IsCancelled();
-  bool GoBackTo(std::uint64_t position);
   bool LookAhead();
 
   SProgressIndicatorEx* m_progress;  // not owned
@@ -52,4 +55,5 @@ class QXCORE_API SFileProgressHelper {
   std::uint64_t m_position = 0;
   std::uint64_t m_step = 0;
   std::uint64_t m_nextReport = 0;
+  char* m_buffer = nullptr;  // the file's
 };

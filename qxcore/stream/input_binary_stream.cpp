@@ -1,8 +1,8 @@
 #include "qxcore/stream/input_binary_stream.h"
 
+#include "qxcore/core/internal/working_buffer.h"
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/stream/internal/read_fully.h"
-#include "qxcore/stream/internal/working_buffer.h"
 #include "qxcore/string/text_conversion.h"
 
 QXCORE_IMPLEMENT_CLASS(SInputBinaryStream, SObject, 0)

@@ -3,8 +3,8 @@
 #include <cstring>
 #include <limits>
 
+#include "qxcore/core/internal/working_buffer.h"
 #include "qxcore/core/io_exceptions.h"
-#include "qxcore/stream/internal/working_buffer.h"
 #include "qxcore/string/text_conversion.h"
 
 QXCORE_IMPLEMENT_CLASS(SOutputBinaryStream, SObject, 0)

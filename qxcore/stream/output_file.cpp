@@ -3,31 +3,39 @@
 #include <cerrno>
 #include <limits>
 
+#include "qxcore/core/error_cause.h"
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/platform/wide.h"
+#include "qxcore/stream/internal/file_buffer.h"
 
-QXCORE_IMPLEMENT_CLASS(SOutputFile, SOutputStream, 0)
+QXCORE_IMPLEMENT_CREATABLE_CLASS(SOutputFile, SOutputStream, 0)
 
 SOutputFile::SOutputFile() = default;
 SOutputFile::SOutputFile(const SString& path, int flags) { Init(path, flags); }
 
-SOutputFile::~SOutputFile() {
-  if (m_file != nullptr) std::fclose(m_file);
+SOutputFile::~SOutputFile() { CloseFile(); }
+
+// What fclose returns.
+int SOutputFile::CloseFile() noexcept {
+  const int result = m_file != nullptr ? std::fclose(m_file) : 0;
+  m_file = nullptr;
+  SMemFree(m_buffer);
+  m_buffer = nullptr;
+  return result;
 }
 
 void SOutputFile::Init(const SString& path, int flags) {
   Close();
   m_file = platform::WideFileOpen(path, (flags & kAppend) != 0 ? WTEXT("ab") : WTEXT("wb"));
-  if (m_file == nullptr) throw SEIOCantOpenForWriting();
-  constexpr std::size_t kRuntimeBuffer = 65536;
-  std::setvbuf(m_file, nullptr, _IOFBF, kRuntimeBuffer);
+  if (m_file == nullptr) throw SEWithError<SEIOCantOpenForWriting>(errno);
+  m_buffer = SGiveBuffer(m_file);
   // Some runtimes go to the end with the first write only; what cannot seek has no position anyway.
   if ((flags & kAppend) != 0) platform::FileSeek(m_file, 0, SEEK_END);
 }
 
 void SOutputFile::ThrowFailure() const {
-  if (errno == ENOSPC) throw SEIODiskFullException();
-  throw SEIOWriteFailed();
+  if (errno == ENOSPC) throw SEWithError<SEIODiskFullException>(errno);
+  throw SEWithError<SEIOWriteFailed>(errno);
 }
 
 void SOutputFile::Write(int byte) {
@@ -53,8 +61,7 @@ void SOutputFile::Close() {
   // Flushed by itself first: closing alone hides the failure on some runtimes.
   bool failed = std::fflush(m_file) != 0 || std::ferror(m_file) != 0;
   int reason = errno;
-  failed = std::fclose(m_file) != 0 || failed;
-  m_file = nullptr;
+  failed = CloseFile() != 0 || failed;
   if (reason != 0) errno = reason;
   if (failed) ThrowFailure();
 }

@@ -11,7 +11,7 @@
 #include "qxcore/string/string.h"
 
 class QXCORE_API SOutputFile : public SOutputStream {
-  QXCORE_DECLARE_CLASS(SOutputFile)
+  QXCORE_DECLARE_CREATABLE_CLASS(SOutputFile)
 
   // Flags of the constructor and Init.
   enum Flags : int { kCreate = 0, kAppend = 2 };
@@ -37,6 +37,8 @@ class QXCORE_API SOutputFile : public SOutputStream {
 
  private:
   [[noreturn]] void ThrowFailure() const;
+  int CloseFile() noexcept;
 
   std::FILE* m_file = nullptr;
+  char* m_buffer = nullptr;  // the file's
 };

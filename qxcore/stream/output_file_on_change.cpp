@@ -28,8 +28,9 @@ SOutputStream* SOutputFileOnChange::OpenTarget() {
 
 SOutputFileOnChange::~SOutputFileOnChange() {
   try {
-    Close(nullptr);
+    if (!m_hasFailed) Close(nullptr);
   } catch (...) {
+    // A destructor has nobody to tell; Close does.
   }
   delete m_target;
 }
@@ -50,6 +51,7 @@ void SOutputFileOnChange::Flush() {
 
 void SOutputFileOnChange::Close(int* changed) {
   if (m_target != nullptr) {
+    m_hasFailed = true;
     if (m_content == nullptr) {
       m_target->Close();
     } else if (HasChanged()) {
@@ -60,6 +62,7 @@ void SOutputFileOnChange::Close(int* changed) {
     delete m_target;
     m_target = nullptr;
     m_content = nullptr;
+    m_hasFailed = false;
   }
   if (changed != nullptr) *changed = m_changed;
 }

@@ -16,7 +16,7 @@ class QXCORE_API SOutputFileOnChange : public SOutputStream {
   explicit SOutputFileOnChange(const SString& path);
   SOutputFileOnChange(const SOutputFileOnChange&) = delete;
   SOutputFileOnChange& operator=(const SOutputFileOnChange&) = delete;
-  // Closes; a failure is lost here: call Close before.
+  // Closes, unless Close was called and failed; a failure is lost here: call Close before.
   ~SOutputFileOnChange() override;
 
   // Throw what SOutputFile and SOutputGlobal throw; SEIOWriteFailed when the stream is closed.
@@ -40,4 +40,5 @@ class QXCORE_API SOutputFileOnChange : public SOutputStream {
   SOutputStream* m_target;   // owned; null when closed
   SOutputGlobal* m_content;  // the target, when it is memory; else null
   int m_changed = 1;
+  bool m_hasFailed = false;  // Close threw: only the caller tries again
 };

@@ -6,7 +6,7 @@
 
 #include "qxcore/core/exception.h"
 
-QXCORE_IMPLEMENT_CLASS(SOutputGlobal, SOutputStream, 0)
+QXCORE_IMPLEMENT_CREATABLE_CLASS(SOutputGlobal, SOutputStream, 0)
 
 SOutputGlobal::SOutputGlobal() = default;
 SOutputGlobal::~SOutputGlobal() { SOutputGlobal::Close(); }

@@ -6,7 +6,7 @@
 #include "qxcore/system/hglobal.h"
 
 class QXCORE_API SOutputGlobal : public SOutputStream {
-  QXCORE_DECLARE_CLASS(SOutputGlobal)
+  QXCORE_DECLARE_CREATABLE_CLASS(SOutputGlobal)
 
   enum : unsigned long { kStep = 8192 };
 

@@ -5,7 +5,7 @@
 #include "qxcore/platform/internal/utf.h"
 #include "qxcore/stream/encoding/internal/text_encoder.h"
 
-QXCORE_IMPLEMENT_CLASS(SOutputStringStream, SOutputStream, 0)
+QXCORE_IMPLEMENT_CREATABLE_CLASS(SOutputStringStream, SOutputStream, 0)
 
 using Stream = SOutputStringStream;
 using Encoding = Stream::Encoding;

@@ -17,7 +17,7 @@
 class STextEncoder;
 
 class QXCORE_API SOutputStringStream : public SOutputStream {
-  QXCORE_DECLARE_CLASS(SOutputStringStream)
+  QXCORE_DECLARE_CREATABLE_CLASS(SOutputStringStream)
 
   using Support = SAbstractIO::SMultiFormatSupport;
   using Encoding = Support::Encoding;

@@ -1,5 +1,6 @@
 #include "qxcore/stream/seekable_input_ansi_file.h"
 
+#include "qxcore/core/exception.h"
 #include "qxcore/core/memory.h"
 #include "qxcore/string/text_conversion.h"
 
@@ -39,8 +40,13 @@ SString SSeekableInputANSIFile::ReadLn() {
       block[size++] = byte;
     }
   } line;
+  constexpr std::size_t kLongestLine = 0x3FFFFE00;  // what a string can hold
+  const std::uint64_t start = Position();
   int byte;
-  while ((byte = ReadByte()) >= 0 && byte != '\n') line.Add(static_cast<char>(byte));
+  while ((byte = ReadByteOf(start)) >= 0 && byte != '\n') {
+    if (line.size == kLongestLine && GoBackTo(start)) throw SEOutOfMemory();
+    line.Add(static_cast<char>(byte));
+  }
   if (byte == '\n' && line.size > 0 && line.block[line.size - 1] == '\r') --line.size;
   if (line.size == 0) return SString();
   int size = static_cast<int>(line.size);

@@ -4,13 +4,12 @@
 #include <cstring>
 
 #include "qxcore/core/memory.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/string.h"
 #include "qxcore/string/text_conversion.h"
 
 static int CountUpTo(const WCHAR* text, int limit) {
-  int count = 0;
-  while (count < limit && text[count] != 0) ++count;
-  return count;
+  return static_cast<int>(platform::WideLength(text, static_cast<std::size_t>(std::max(limit, 0))));
 }
 
 SAnsiString::SAnsiString(const WCHAR* text) {

@@ -3,7 +3,9 @@
 #include "qxcore/string/string.h"
 
 #include <algorithm>
+#include <climits>
 
+#include "qxcore/core/exception.h"
 #include "qxcore/platform/wide.h"
 #include "qxcore/string/string_buffer.h"
 #include "qxcore/string/text_conversion.h"
@@ -21,11 +23,21 @@ void CopyText(WCHAR* to, const WCHAR* from, int n) {
   std::memmove(to, from, static_cast<std::size_t>(n) * sizeof(WCHAR));
 }
 
-int LengthOf(const WCHAR* text) { return text != nullptr ? static_cast<int>(SStringView(text).size()) : 0; }
+// What no int can hold is more than any buffer takes.
+int LengthOf(SStringView text) {
+  if (text.size() > static_cast<std::size_t>(INT_MAX)) throw SEOutOfMemory();
+  return static_cast<int>(text.size());
+}
+int LengthOf(const WCHAR* text) { return LengthOf(SString::ViewOf(text)); }
 
 int LengthUpTo(const WCHAR* text, int limit) {
-  const WCHAR* end = std::char_traits<WCHAR>::find(text, static_cast<std::size_t>(limit), WCHAR(0));
-  return end != nullptr ? static_cast<int>(end - text) : limit;
+  return static_cast<int>(platform::WideLength(text, static_cast<std::size_t>(limit)));
+}
+
+int AnsiLength(const char* text) {
+  const std::size_t length = text != nullptr ? std::strlen(text) : 0;
+  if (length > static_cast<std::size_t>(INT_MAX)) throw SEOutOfMemory();
+  return static_cast<int>(length);
 }
 
 }  // namespace
@@ -40,8 +52,8 @@ constinit const SString SString::CrLf(g_crLf);
 
 SString::SString(const WCHAR* text) : SString(ViewOf(text)) {}
 
-SString::SString(SStringView text) : m_text(AllocBuffer(static_cast<int>(text.size()))) {
-  if (!text.empty()) CopyText(m_text, text.data(), static_cast<int>(text.size()));
+SString::SString(SStringView text) : m_text(AllocBuffer(LengthOf(text))) {
+  if (!text.empty()) CopyText(m_text, text.data(), Length());
 }
 
 SString::SString(const char* text) : SString() { *this = text; }
@@ -93,13 +105,11 @@ SString& SString::operator=(const WCHAR* text) {
 }
 
 SString& SString::operator=(SStringView text) {
-  AssignCopy(static_cast<int>(text.size()), text.data());
+  AssignCopy(LengthOf(text), text.data());
   return *this;
 }
 
-SString& SString::operator=(const char* text) {
-  return *this = SAnsiToString(text, text != nullptr ? static_cast<int>(std::strlen(text)) : 0);
-}
+SString& SString::operator=(const char* text) { return *this = SAnsiToString(text, AnsiLength(text)); }
 
 SString& SString::operator=(WCHAR character) {
   AssignCopy(character != 0 ? 1 : 0, &character);
@@ -123,13 +133,11 @@ SString& SString::operator+=(const WCHAR* text) {
 }
 
 SString& SString::operator+=(SStringView text) {
-  ConcatInPlace(static_cast<int>(text.size()), text.data());
+  ConcatInPlace(LengthOf(text), text.data());
   return *this;
 }
 
-SString& SString::operator+=(const char* text) {
-  return *this += SAnsiToString(text, text != nullptr ? static_cast<int>(std::strlen(text)) : 0);
-}
+SString& SString::operator+=(const char* text) { return *this += SAnsiToString(text, AnsiLength(text)); }
 
 SString& SString::operator+=(char character) { return *this += SAnsiToString(&character, character != 0 ? 1 : 0); }
 
@@ -151,13 +159,12 @@ SString SString::ConcatCopy(int n1, const WCHAR* text1, int n2, const WCHAR* tex
 }
 
 static SString Concat(SStringView a, SStringView b) {
-  return SString::ConcatCopy(static_cast<int>(a.size()), a.data(), static_cast<int>(b.size()), b.data());
+  return SString::ConcatCopy(LengthOf(a), a.data(), LengthOf(b), b.data());
 }
-static SStringView ViewOfText(const WCHAR* text) { return text != nullptr ? SStringView(text) : SStringView(); }
 
 SString operator+(const SString& a, const SString& b) { return Concat(a.View(), b.View()); }
-SString operator+(const SString& a, const WCHAR* b) { return Concat(a.View(), ViewOfText(b)); }
-SString operator+(const WCHAR* a, const SString& b) { return Concat(ViewOfText(a), b.View()); }
+SString operator+(const SString& a, const WCHAR* b) { return Concat(a.View(), SString::ViewOf(b)); }
+SString operator+(const WCHAR* a, const SString& b) { return Concat(SString::ViewOf(a), b.View()); }
 SString operator+(const SString& a, const char* b) { return a + SString(b); }
 SString operator+(const char* a, const SString& b) { return SString(a) + b; }
 SString operator+(const SString& a, WCHAR b) { return Concat(a.View(), SStringView(&b, 1)); }
@@ -169,7 +176,8 @@ SString operator+(char a, const SString& b) { return SString(&a, 1) + b; }
 
 void SString::CopyBeforeWrite() {
   SStringData* data = Data();
-  if (IsOwn(data) || data->m_length == 0) return;  // nothing is ever written to an empty static text
+  if (IsOwn(data)) return;
+  if (data->m_length == 0) return Release();  // nothing is ever written to the constant empty text
   SString copy(Adopt{}, AllocBuffer(data->m_length));
   CopyText(copy.m_text, m_text, data->m_length);
   Swap(copy);
@@ -195,6 +203,12 @@ void SString::AssignCopy(int n, const WCHAR* text) {
   if (n <= 0 && data->m_refs == SStringData::kLocked) return;  // keeps its length: see operator=
   data->m_length = std::max(n, 0);
   if (n <= 0) Release();
+}
+
+// The same, but an empty text empties a locked string, too.
+void SString::AssignActual(int n, const WCHAR* text) {
+  AssignCopy(n, text);
+  if (n <= 0 && Data()->m_refs == SStringData::kLocked) Data()->m_length = 0;
 }
 
 // --- writable buffers ---
@@ -238,24 +252,20 @@ void SString::UnlockBuffer(bool recalc) {
 
 void SString::Unlock(int n) {
   SStringData* data = Data();
+  if (!IsOwn(data)) {  // what was written there belongs to others; the text is cut in a buffer of its own
+    *this = SString(n < 0 ? ViewOf(m_text) : View().substr(0, static_cast<std::size_t>(n)));
+    return;
+  }
   n = n < 0 ? LengthUpTo(m_text, data->m_allocLength) : std::min(n, data->m_allocLength);
   if (n == 0) {
     Release();
     return;
   }
-  if (!IsOwn(data)) {
-    CopyBeforeWrite();
-    data = Data();
-    n = std::min(n, data->m_allocLength);
-  }
   m_text[n] = 0;
   data->m_length = n;
 }
 
-WCHAR* SString::GetBufferSetLength(int n) {
-  n = std::max(n, 1);
-  return GetBufferSetTcharLength(n);
-}
+WCHAR* SString::GetBufferSetLength(int n) { return GetBufferSetTcharLength(n); }
 
 WCHAR* SString::GetBufferSetTcharLength(int n) {
   WCHAR* text = LockTchar(n);

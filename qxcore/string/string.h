@@ -20,6 +20,7 @@
 #include <functional>
 #include <string>
 #include <string_view>
+#include <type_traits>
 #include <utility>
 
 #include "qxcore/platform/export.h"
@@ -27,6 +28,19 @@
 #include "qxcore/string/string_data.h"
 
 class SStringBuffer;
+
+// What may be passed in place of "..." to the functions that format: numbers, characters, enumerations and pointers.
+template <class T>
+inline constexpr bool SIsFormatArgument = std::is_arithmetic_v<std::decay_t<T>> || std::is_enum_v<std::decay_t<T>> ||
+                                          std::is_pointer_v<std::decay_t<T>> || std::is_null_pointer_v<std::decay_t<T>>;
+
+// Is there when one of the types may not be passed.
+template <class... Arguments>
+using SIfNoFormatArguments = std::enable_if_t<!(SIsFormatArgument<Arguments> && ...)>;
+
+// What a pointer that is no text points to.
+template <class T>
+concept SOtherThanText = !std::same_as<T, WCHAR> && !std::same_as<T, char>;
 
 // The shared buffer of all empty strings.
 extern QXCORE_API const SStaticString<0> g_emptyString;
@@ -58,7 +72,8 @@ class QXCORE_API SString {
   SString(const char* text, int count);           // at most `count` bytes of it, stopping at a NUL
   explicit SString(const SStringBuffer& buffer);  // explicit, for the builder converts by itself, too
   explicit SString(int truth);                    // SString::Yes when not 0, else SString::No; not a number's digits
-  explicit SString(bool truth) : SString(static_cast<int>(truth)) {}
+  template <std::same_as<bool> Truth>
+  explicit SString(Truth truth) : SString(static_cast<int>(truth)) {}
   explicit SString(long number);                 // "%ld"; do not pass a LONG, which is an int on some targets
   explicit SString(double number);               // "%g"
   SString(HINSTANCE instance, unsigned int id);  // LoadString(id, instance)
@@ -77,18 +92,21 @@ class QXCORE_API SString {
   SString(unsigned long) = delete;
   SString(long long) = delete;
   SString(unsigned long long) = delete;
+  // No other pointer is a text: neither one to characters of another kind nor one that would be a truth.
+  template <SOtherThanText T>
+  explicit SString(T*) = delete;
 
   ~SString() { ReleaseData(); }
 
   // Makes the object anew, as the matching constructor does; the former text is given up.
-  void Init(const char* text) { *this = text; }
-  void Init(const WCHAR* text) { *this = text; }
-  void Init(const SString& text) { *this = text; }
+  void Init(const char* text) { InitFrom(SString(text)); }
+  void Init(const WCHAR* text) { InitFrom(SString(text)); }
+  void Init(const SString& text) { InitFrom(SString(text)); }
 
   // --- assignment ---
   // Shares the buffer where neither side is locked. A locked target keeps its buffer when the text
   // fits; given an empty text it keeps its length, too, and only its first character becomes NUL,
-  // which is meant: UnlockBuffer(true) measures anew.
+  // which is on purpose: UnlockBuffer(true) measures anew.
   SString& operator=(const SString& other);
   SString& operator=(SString&& other);
   SString& operator=(const WCHAR* text);
@@ -130,6 +148,8 @@ class QXCORE_API SString {
   const WCHAR* GetSafePointer() const { return m_text; }  // never null
   operator const WCHAR*() const { return m_text; }
   operator SStringView() const { return View(); }
+  // A terminated text; none for a null pointer.
+  static SStringView ViewOf(const WCHAR* text) { return text != nullptr ? SStringView(text) : SStringView(); }
   SStringView View() const { return SStringView(m_text, static_cast<std::size_t>(Length())); }
   const WCHAR* begin() const { return m_text; }
   const WCHAR* end() const { return m_text + Length(); }
@@ -185,7 +205,7 @@ class QXCORE_API SString {
   friend std::strong_ordering operator<=>(const SString& a, SStringView b) { return a.View() <=> b; }
 
   // --- search: pointers into this string, or null where nothing is found ---
-  // `from` is a pointer into this string at which the search begins. ReverseFind gives the last
+  // `from` is a pointer into this string at which the search begins. ReverseFind returns the last
   // occurrence that begins at or before `from`. An empty text is found at once, where the search begins.
   const WCHAR* Find(WCHAR character) const;
   const WCHAR* Find(const WCHAR* text) const;
@@ -224,10 +244,10 @@ class QXCORE_API SString {
   int Split(SString* left, SString* right, WCHAR separator) const;
 
   // --- modification ---
-  // Inserts before `index`, clipped to 0...Length(). Gives the new length.
+  // Inserts before `index`, clipped to 0...Length(). Returns the new length.
   int Insert(const WCHAR* text, int index);
   int Insert(WCHAR character, int index);
-  // Deletes up to `count` characters from `index` on; out-of-range parts are ignored. Gives the new length.
+  // Deletes up to `count` characters from `index` on; out-of-range parts are ignored. Returns the new length.
   int Delete(int index, int count = 1);
   void MakeReverse();  // by code unit
   void ToUpper();      // one-to-one, without regard to a locale
@@ -247,23 +267,23 @@ class QXCORE_API SString {
   int Replace(const WCHAR* oldText, const WCHAR* newText);
   int Replace(WCHAR oldCharacter, WCHAR newCharacter);
   int ReplaceNoCase(const WCHAR* oldText, const WCHAR* newText);
-  // Replaces every occurrence from left to right, not looking into what was put in. Gives the number
+  // Replaces every occurrence from left to right, not looking into what was put in. Returns the number
   // of replacements; 0, and nothing changed, when `oldText` is empty or does not occur.
   int ReplaceAll(const WCHAR* oldText, const WCHAR* newText);
   int ReplaceAll(WCHAR oldCharacter, WCHAR newCharacter);
   int ReplaceAllNoCase(const WCHAR* oldText, const WCHAR* newText);
   // Replaces each character that stands in `from` by the one at the same place in `to`, up to the end
-  // of the shorter set. Gives the number of characters replaced.
+  // of the shorter set. Returns the number of characters replaced.
   int Translate(const WCHAR* from, const WCHAR* to);
   // Replaces accented letters by their base letters, where the platform knows a composition. With
-  // arguments: only `count` characters from `first` on (negative count: to the end). Gives the number
+  // arguments: only `count` characters from `first` on (negative count: to the end). Returns the number
   // of characters changed.
   int NoAccent(int first = 0, int count = -1);
   // Each character through the OEM code page, one byte a character, as the platform's functions do.
   void CharToOemW();
   void OemToCharW();
   // Copies the text out, terminated: 2 * Length() + 1 bytes of the ANSI code page at most, or
-  // Length() + 1 characters. Gives dst.
+  // Length() + 1 characters. Returns dst.
   char* ToAnsi(char* dst) const;
   WCHAR* ToUnicode(WCHAR* dst) const;
   // UTF-8 by the standard (RFC 3629), for program arguments, std::string and native interfaces: sequences of four
@@ -302,6 +322,11 @@ class QXCORE_API SString {
   void Format(const WCHAR* format, ...);
   void Format(unsigned int id, ...);  // the format is a text of the library's string table
   void FormatV(const WCHAR* format, std::va_list arguments);
+  // Objects are no arguments: of a string, pass GetSafePointer().
+  template <class... Arguments, class = SIfNoFormatArguments<Arguments...>>
+  void Format(const WCHAR* format, const Arguments&... arguments) = delete;
+  template <class... Arguments, class = SIfNoFormatArguments<Arguments...>>
+  void Format(unsigned int id, const Arguments&... arguments) = delete;
 
   // Loads text `id` of the module's string table, whatever its length; with a null instance of the
   // module that SGetResInstance names. Non-zero when at least one character was loaded; else the
@@ -319,10 +344,11 @@ class QXCORE_API SString {
   // Ends LockBuffer. With `recalc` the length becomes the position of the first NUL.
   void UnlockBuffer(bool recalc = true);
   // Ends Lock: the length becomes n, or the position of the first NUL for n = -1. Unlike UnlockBuffer it
-  // leaves the mark of a lent-out buffer as it is; that is meant.
+  // leaves the mark of a lent-out buffer as it is; that is on purpose.
   void Unlock(int n = -1);
   void UnlockTchar(int n = -1) { Unlock(n); }
-  // A buffer of exactly n characters, which the caller fills; not marked as lent out.
+  // A buffer of exactly n characters, which the caller fills; not marked as lent out. n < 1 gives an empty string, with
+  // room for one character.
   WCHAR* GetBufferSetLength(int n);
   WCHAR* GetBufferSetTcharLength(int n);
 
@@ -341,7 +367,7 @@ class QXCORE_API SString {
   static SString ConcatCopy(int n1, const WCHAR* text1, int n2, const WCHAR* text2);
 
   // --- memory ---
-  // Gives the unused blocks of all string pools back to the heap; takes no memory. Gives what was released.
+  // Returns the unused blocks of all string pools back to the heap; takes no memory. Returns what was released.
   static long FreeUnused();
   static long GetLargeBufferBytes();  // bytes held by buffers above 2048 characters
   static long GetLargeBufferCount();  // and their number
@@ -354,7 +380,6 @@ class QXCORE_API SString {
   constexpr explicit SString(const SStaticString<kLength>& text) noexcept : m_text(const_cast<WCHAR*>(text.m_text)) {}
 
   static WCHAR* EmptyText() { return const_cast<WCHAR*>(g_emptyString.m_text); }
-  static SStringView ViewOf(const WCHAR* text) { return text != nullptr ? SStringView(text) : SStringView(); }
   SStringData* Data() { return SStringData::Of(m_text); }
   const SStringData* Data() const { return SStringData::Of(const_cast<const WCHAR*>(m_text)); }
   // Not shared and not static: this string alone may write.
@@ -369,6 +394,8 @@ class QXCORE_API SString {
     data->m_length += n;
   }
   void ConcatByCopy(int n, const WCHAR* text);
+  void InitFrom(SString fresh) { Swap(fresh); }
+  void AssignActual(int n, const WCHAR* text);
   void ReleaseData() noexcept {
     SStringData* data = Data();
     std::int32_t refs = data->Refs();

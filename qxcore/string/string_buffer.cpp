@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "qxcore/core/exception.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/text_conversion.h"
 
 SStringBuffer::SStringBuffer(unsigned capacity, unsigned numerator, unsigned denominator) {
@@ -39,8 +40,7 @@ void SStringBuffer::Clear() {
 
 void SStringBuffer::Concat(const WCHAR* text, int n) {
   if (text == nullptr || n <= 0) return;
-  const WCHAR* end = std::char_traits<WCHAR>::find(text, static_cast<std::size_t>(n), WCHAR(0));
-  Append(text, end != nullptr ? static_cast<int>(end - text) : n);
+  Append(text, static_cast<std::ptrdiff_t>(platform::WideLength(text, static_cast<std::size_t>(n))));
 }
 
 // At least one character more each round, so that the capacity also grows where the ratio rounds to nothing.
@@ -49,9 +49,10 @@ static int Grown(int capacity, unsigned numerator, unsigned denominator) {
   return grown > capacity ? grown : grown < 0 ? 0x7FFFFFFF : capacity + 1;
 }
 
-void SStringBuffer::AppendGrown(const WCHAR* text, int n) {
+void SStringBuffer::AppendGrown(const WCHAR* text, std::ptrdiff_t count) {
   int length = m_text.Length();
-  if (n > 0x7FFFFFFF - length) throw SEOutOfMemory();
+  if (count > 0x7FFFFFFF - length) throw SEOutOfMemory();
+  const int n = static_cast<int>(count);
   bool isFirst = m_text.IsEmpty() && m_text.GetAllocLength() <= 1;
   int capacity = isFirst ? static_cast<int>(std::min(m_capacity, 0x7FFFFFFFu)) : m_text.GetAllocLength();
   while (capacity < length + n) capacity = Grown(capacity, m_numerator, m_denominator);

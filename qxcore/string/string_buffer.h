@@ -5,6 +5,7 @@
 // An append may come from the buffer's own content. Failure throws SEOutOfMemory and changes nothing.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 
 #include "qxcore/platform/export.h"
@@ -32,14 +33,14 @@ class QXCORE_API SStringBuffer {
   // Appends at most n characters, stopping at a NUL.
   void Concat(const WCHAR* text, int n);
   // Appends what lies between two pointers, NULs included.
-  void Concat(const WCHAR* begin, const WCHAR* end) { Append(begin, static_cast<int>(end - begin)); }
+  void Concat(const WCHAR* begin, const WCHAR* end) { Append(begin, end - begin); }
   SStringBuffer& operator+=(const SString& text) {
     Append(text.GetSafePointer(), text.Length());
     return *this;
   }
-  SStringBuffer& operator+=(const WCHAR* text) { return *this += text != nullptr ? SStringView(text) : SStringView(); }
+  SStringBuffer& operator+=(const WCHAR* text) { return *this += SString::ViewOf(text); }
   SStringBuffer& operator+=(SStringView text) {
-    Append(text.data(), static_cast<int>(text.size()));
+    Append(text.data(), static_cast<std::ptrdiff_t>(text.size()));
     return *this;
   }
   SStringBuffer& operator+=(WCHAR character) {
@@ -65,15 +66,15 @@ class QXCORE_API SStringBuffer {
   unsigned GetDenominator() const { return m_denominator; }
 
  private:
-  void Append(const WCHAR* text, int n) {
+  void Append(const WCHAR* text, std::ptrdiff_t n) {
     SStringData* data = m_text.Data();
     if (n > 0 && n <= data->m_allocLength - data->m_length && data->m_refs == 1) [[likely]] {
-      SString::AppendInPlace(data, n, text);
+      SString::AppendInPlace(data, static_cast<int>(n), text);
     } else if (n > 0) {
       AppendGrown(text, n);
     }
   }
-  void AppendGrown(const WCHAR* text, int n);
+  void AppendGrown(const WCHAR* text, std::ptrdiff_t n);
 
   SString m_text;  // its allocated length is the capacity
   std::uint32_t m_capacity;

@@ -2,35 +2,33 @@
 
 #include <cstdlib>
 
+#include "qxcore/core/internal/working_buffer.h"
 #include "qxcore/platform/wide.h"
 #include "qxcore/string/string.h"
 #include "qxcore/string/text_conversion.h"
 
 // --- code pages ---
 
+// Each byte of the OEM page is kept as a character of that value; a character that takes two bytes there becomes two.
 void SString::CharToOemW() {
-  // Each character becomes one byte of the OEM page, kept as a character of that value; a character
-  // that takes two bytes there becomes two characters.
+  if (IsEmpty()) return;
+  const int size = WideCharToMultiByte(CP_OEMCP, 0, m_text, Length(), nullptr, 0, nullptr, nullptr);
+  SWorkingBuffer<char> bytes(static_cast<std::size_t>(size));
+  WideCharToMultiByte(CP_OEMCP, 0, m_text, Length(), bytes.Get(), size, nullptr, nullptr);
   SString converted;
-  for (WCHAR c : *this) {
-    char bytes[8];
-    int count = WideCharToMultiByte(CP_OEMCP, 0, &c, 1, bytes, sizeof bytes, nullptr, nullptr);
-    for (int i = 0; i < count; ++i) converted += static_cast<WCHAR>(static_cast<unsigned char>(bytes[i]));
-  }
+  WCHAR* out = converted.GetBufferSetLength(size);
+  for (int i = 0; i < size; ++i) out[i] = static_cast<unsigned char>(bytes.Get()[i]);
   *this = converted;
 }
 
 void SString::OemToCharW() {
-  SString bytes = *this;
+  if (IsEmpty()) return;
+  const int size = Length();
+  SWorkingBuffer<char> bytes(static_cast<std::size_t>(size));
+  for (int i = 0; i < size; ++i) bytes.Get()[i] = static_cast<char>(m_text[i]);
+  const int length = MultiByteToWideChar(CP_OEMCP, 0, bytes.Get(), size, nullptr, 0);
   SString converted;
-  for (int i = 0; i < Length(); ++i) {
-    char pair[2] = {static_cast<char>(m_text[i]), static_cast<char>(i + 1 < Length() ? m_text[i + 1] : 0)};
-    bool isLead = IsDBCSLeadByteEx(CP_OEMCP, static_cast<BYTE>(pair[0])) && pair[1] != 0;
-    WCHAR characters[4];
-    int count = MultiByteToWideChar(CP_OEMCP, 0, pair, isLead ? 2 : 1, characters, 4);
-    converted += SStringView(characters, static_cast<std::size_t>(count));
-    if (isLead) ++i;
-  }
+  MultiByteToWideChar(CP_OEMCP, 0, bytes.Get(), size, converted.GetBufferSetLength(length), length);
   *this = converted;
 }
 

@@ -205,7 +205,7 @@ int FormatInto(WCHAR* buffer, int capacity, const WCHAR* format, std::va_list ar
 
 void SString::FormatV(const WCHAR* format, std::va_list arguments) {
   if (format == nullptr || *format == 0) {
-    AssignCopy(0, nullptr);
+    AssignActual(0, nullptr);
     return;
   }
   constexpr long long kOnStack = 512;
@@ -217,7 +217,7 @@ void SString::FormatV(const WCHAR* format, std::va_list arguments) {
     WCHAR text[kOnStack];
     int written = FormatInto(text, kOnStack, format, arguments);
     if (written >= 0 && written < kOnStack) {
-      AssignCopy(written, text);
+      AssignActual(written, text);
       return;
     }
     bound = kOnStack * 2;
@@ -228,13 +228,13 @@ void SString::FormatV(const WCHAR* format, std::va_list arguments) {
     int written = FormatInto(formatted.LockTchar(capacity), capacity, format, arguments);
     if (written >= 0 && written < capacity) {
       formatted.Unlock(written);
-      *this = formatted;
+      Data()->Refs() == SStringData::kLocked ? AssignActual(written, formatted) : Swap(formatted);
       return;
     }
     constexpr long long kHopeless = 1 << 20;  // beyond what a conversion can exceed its allowance by
     if (bound > kHopeless && bound > 4 * static_cast<long long>(SStringView(format).size())) break;
   }
-  AssignCopy(0, nullptr);
+  AssignActual(0, nullptr);
 }
 
 void SString::Format(const WCHAR* format, ...) {

@@ -6,12 +6,6 @@
 #include "qxcore/string/internal/text_search.h"
 #include "qxcore/string/string.h"
 
-namespace {
-
-SStringView ViewOf(const WCHAR* text) { return text != nullptr ? SStringView(text) : SStringView(); }
-
-}  // namespace
-
 // --- extraction ---
 
 SString SString::Left(int count) const { return Mid(0, count); }
@@ -121,7 +115,7 @@ void SString::TrimBy(bool left, bool right, IsStripped isStripped) {
 
 static bool IsWhite(WCHAR c) { return platform::IsSpace(c); }
 static auto IsOneOf(const WCHAR* set) {
-  return [view = ViewOf(set)](WCHAR c) { return view.find(c) != SStringView::npos; };
+  return [view = SString::ViewOf(set)](WCHAR c) { return view.find(c) != SStringView::npos; };
 }
 static auto IsSame(WCHAR wanted) {
   return [wanted](WCHAR c) { return c == wanted; };

@@ -15,7 +15,7 @@ int SString::LoadStringW(unsigned int id, HINSTANCE instance) {
   WCHAR text[kOnStack];
   int length = ::LoadStringW(instance, id, text, kOnStack);
   if (kOnStack - length >= 2) {
-    *this = SStringView(text, static_cast<std::size_t>(length));
+    AssignActual(length, text);
     return length > 0;
   }
   // The text may have been cut: load it again with more room until some stays unused.
@@ -25,7 +25,7 @@ int SString::LoadStringW(unsigned int id, HINSTANCE instance) {
     loaded.Unlock(length);
     if (size - length >= 2) break;
   }
-  *this = loaded;
+  AssignActual(loaded.Length(), loaded);
   return Length() > 0;
 }
 

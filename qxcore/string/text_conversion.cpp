@@ -3,19 +3,13 @@
 #include <algorithm>
 #include <cstring>
 
+#include "qxcore/platform/internal/utf.h"
 #include "qxcore/platform/internal/widen.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/string/string.h"
 
-// A text that ends at its NUL is at most as long as `max`.
-template <class Character>
-static std::basic_string_view<Character> UpToNUL(const Character* text, int max) {
-  std::size_t length = 0;
-  while (length < static_cast<std::size_t>((std::max)(max, 0)) && text[length] != 0) ++length;
-  return {text, length};
-}
-
 char* ST2UTF8Helper(char* dst, const WCHAR* src, int max) {
-  SEncodeUTF8(dst, UpToNUL(src, max));
+  SEncodeUTF8(dst, SStringView(src, platform::WideLength(src, static_cast<std::size_t>(std::max(max, 0)))));
   return dst;
 }
 
@@ -28,14 +22,7 @@ char* SEncodeUTF8(char* dst, SStringView src) {
     out += plain;
     at += plain;
     if (at == end || *at == 0) break;
-    const unsigned c = *at++;
-    if (c < 0x800) {
-      *out++ = static_cast<char>(0xC0 | c >> 6);
-    } else {
-      *out++ = static_cast<char>(0xE0 | c >> 12);
-      *out++ = static_cast<char>(0x80 | (c >> 6 & 0x3F));
-    }
-    *out++ = static_cast<char>(0x80 | (c & 0x3F));
+    out = platform::PutUtf8(static_cast<std::uint16_t>(*at++), out);
   }
   *out = 0;
   return out;

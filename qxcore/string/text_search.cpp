@@ -6,6 +6,7 @@
 #include <bit>
 #include <cstring>
 
+#include "qxcore/platform/internal/case_classes.h"
 #include "qxcore/platform/wide.h"
 
 #ifdef __SSE2__
@@ -69,13 +70,7 @@ struct Variants {
   explicit Variants(WCHAR c) {
     WCHAR lower = platform::ToLowerBmp(c);
     Add(lower);
-    if (lower < 0x80 && lower != WTEXT('k') && lower != WTEXT('i')) {
-      if (lower >= WTEXT('a') && lower <= WTEXT('z')) Add(static_cast<WCHAR>(lower - 32));
-      return;
-    }
-    for (unsigned other = 0; other < 0x10000; ++other) {
-      if (other != lower && platform::ToLowerBmp(static_cast<WCHAR>(other)) == lower) Add(static_cast<WCHAR>(other));
-    }
+    for (const platform::CaseVariant& variant : platform::CaseVariantsOf(lower)) Add(variant.other);
   }
   void Add(WCHAR c) {
     if (count < kMost) spread[count] = Spread(c);

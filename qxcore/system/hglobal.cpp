@@ -1,7 +1,7 @@
 #include "qxcore/system/hglobal.h"
 
 #include "qxcore/core/exception.h"
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 
 void SHGlobal::Alloc(unsigned int flags, unsigned long size) {
   HGLOBAL made = SMemMustFail() ? nullptr : GlobalAlloc(flags | GMEM_MOVEABLE, size);

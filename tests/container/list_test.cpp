@@ -12,7 +12,7 @@
 #include "counted.h"
 #include "qxcore/container/dlist.h"
 #include "qxcore/core/exception.h"
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 
 namespace {
 

@@ -11,7 +11,7 @@
 
 #include "counted.h"
 #include "qxcore/core/exception.h"
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 
 namespace {
 

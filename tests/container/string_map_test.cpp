@@ -9,7 +9,7 @@
 #include <string>
 
 #include "qxcore/core/exception.h"
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 
 namespace {
 

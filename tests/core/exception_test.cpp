@@ -5,8 +5,13 @@
 #include <cerrno>
 #include <memory>
 
+#include "qxcore/core/error_cause.h"
+#include "qxcore/core/internal/memory_failures.h"
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/core/throw_target.h"
+#include "qxcore/stream/input_file.h"
+#include "qxcore/stream/output_file.h"
+#include "tests/support/failing_allocations.h"
 #include "tests/support/text.h"
 
 namespace {
@@ -89,6 +94,46 @@ TEST(ThrowTargets, NestedCatchersAreCounted) {
   EXPECT_EQ(abort.HasTarget(), 0);
   EXPECT_EQ(abort.GetMessageText(), WTEXT("text"));
   EXPECT_EQ(abort.GetValue(), 0);
+}
+
+// Done must not need memory: it is called while unwinding.
+TEST(ThrowTargets, WithoutMemory_CountsStayRight) {
+  // Longer than what lies ready in pools.
+  const SString longName{SStringView(WideString(5000, WTEXT('n')))};
+  const SString names = longName + WTEXT(",Second,Second");
+  STargetedException abort(names, WTEXT(""));
+  const int failures = WithEachAllocationFailing(
+      [] {
+        Catcher catcher(names);
+        catcher.Activate();
+        catcher.Done();
+        catcher.Activate();
+      },
+      [&] { EXPECT_EQ(abort.HasTarget(), 0); });
+  EXPECT_GT(failures, 0);
+  Catcher catcher(WTEXT("Second,Second"));
+  catcher.Activate();
+  SMemFailAt(1, true);
+  catcher.Done();
+  SMemFailAt(0);
+  EXPECT_EQ(abort.HasTarget(), 0);
+  catcher.Activate();
+  EXPECT_EQ(abort.HasTarget(), 1);
+}
+
+TEST(Exceptions, CarryTheErrorBehindThem) {
+  const auto causeOf = [](auto&& operation) {
+    try {
+      operation();
+    } catch (const SEIOException& failure) {
+      return SGetErrorCause(failure);
+    }
+    return -1;
+  };
+  EXPECT_EQ(causeOf([] { SInputFile file(SString(WTEXT("C:\\no\\such\\file"))); }), ENOENT);
+  EXPECT_EQ(causeOf([] { SInputFile file(SString(WTEXT("C:\\"))); }), EACCES);
+  EXPECT_EQ(causeOf([] { SOutputFile file(SString(WTEXT("C:\\no\\such\\file"))); }), ENOENT);
+  EXPECT_EQ(causeOf([] { throw SEIOCantOpenForReading(); }), 0);
 }
 
 TEST(ThrowTargets, Match_LooksAtTheEndOfNamesOnly) {

@@ -15,7 +15,7 @@
 
 #include "qxcore/core/debug_counter.h"
 #include "qxcore/core/exception.h"
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 
 namespace {
 

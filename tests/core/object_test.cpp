@@ -8,7 +8,7 @@
 
 #include "qxcore/core/assert_valid.h"
 #include "qxcore/core/exception.h"
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 #include "qxcore/core/module_state.h"
 #include "tests/support/text.h"
 

@@ -16,6 +16,10 @@ EXPECTED = {
     "list": "of 2 = {7, 8}",
     "map": 'SMap of 2 = {[1] = "a", [2] = "b"}',
     "order": "SUnsortedMap of 2 = {[2] = 20, [1] = 10}",
+    "byReference": 'SMap of 2 = {[1] = "a", [2] = "b"}',
+    "place": "}",
+    "texts": 'SStringTable of 2 = {"first", "second"}',
+    "time": "STime 1970-01-02 00:00:00 UTC",
     "names": 'SStringMap of 1 = {["key"] = "value"}',
 }
 
@@ -28,10 +32,10 @@ def main():
     command = ["gdb", "-nx", "-batch", "-ex", "set charset UTF-8", "-ex", "set debuginfod enabled off", "-ex", f"source {printers}",
                "-ex", "break StopHere", "-ex", "run", "-ex", "up"]
     for name in EXPECTED:
-        command += ["-ex", f'printf "@{name} "', "-ex", f"print {name}"]
+        command += ["-ex", f'printf "@{name}: "', "-ex", f"print {name}"]
     result = subprocess.run(command + [program], capture_output=True, timeout=120, env={"LC_ALL": "C.UTF-8", "PATH": "/usr/bin:/bin"})
     text = result.stdout.decode("utf-8", "replace")
-    shown = {part.split(" ", 1)[0]: part.split(" ", 1)[1].split("\n")[0] for part in text.split("@")[1:] if " " in part}
+    shown = {part.split(": ", 1)[0]: part.split(": ", 1)[1].split("\n")[0] for part in text.split("@")[1:] if ": " in part}
     wrong = [f"{name}: expected {wanted}, shown {shown.get(name)}" for name, wanted in EXPECTED.items() if not shown.get(name, "").endswith(wanted)]
     if wrong:
         print(text + result.stderr.decode("utf-8", "replace"))

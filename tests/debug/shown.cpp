@@ -3,10 +3,12 @@
 #include "qxcore/container/list.h"
 #include "qxcore/container/map.h"
 #include "qxcore/container/string_map.h"
+#include "qxcore/container/string_table.h"
 #include "qxcore/container/table.h"
 #include "qxcore/container/table_dumb.h"
 #include "qxcore/container/table_mem.h"
 #include "qxcore/string/string_buffer.h"
+#include "qxcore/system/time/time.h"
 
 __attribute__((noinline)) void StopHere() { asm volatile(""); }
 
@@ -23,6 +25,14 @@ int main() {
   SUnsortedMap<int, int> order{{2, 20}, {1, 10}};
   SStringMap names;
   names.Add(SString(WTEXT("key")), SString(WTEXT("value")));
+  const SMap<int, SString>& byReference = map;
+  SMap<int, SString>::iterator place = map.begin();
+  SStringTable texts;
+  texts.Add(SString(WTEXT("first")));
+  texts.Add(SString(WTEXT("second")));
+  STime time(86400);
   StopHere();
-  return empty.Length() + text.Length() + none.GetCount() + list.GetCount() + map.GetCount() == 0;
+  return empty.Length() + text.Length() + none.GetCount() + list.GetCount() + byReference.GetCount() + place->m_key +
+             texts.GetCount() + (time == STime()) ==
+         0;
 }

@@ -109,4 +109,17 @@ TEST(EncodingNames, Listing_IsSortedAndKeepsToWhatIsInstalled) {
     EXPECT_TRUE(Support::MachineSupports(value)) << testing::PrintToString(name);
 }
 
+TEST(PolicyLabels, SayWhatUsersRead) {
+  EXPECT_EQ(Support::GetLevelLabel(0), WTEXT("<No Detection>"));
+  EXPECT_EQ(Support::GetLevelLabel(0xC00000), WTEXT("<No Detection>"));
+  EXPECT_EQ(Support::GetLevelLabel(Support::kANSI | Support::kQuickDetect), WTEXT("Quick detection"));
+  EXPECT_EQ(Support::GetLevelLabel(Support::kDetect), WTEXT("Fair detection"));
+  EXPECT_EQ(Support::GetLevelLabel(Support::kFullDetect), WTEXT("Full detection"));
+  EXPECT_EQ(Support::GetLevelLabel(Support::kWholeInOnce), WTEXT("Read whole in once"));
+  EXPECT_EQ(Support::GetFavorLabel(0), WTEXT("Use encoding hint and display warning"));
+  EXPECT_EQ(Support::GetFavorLabel(Support::kFavorHint), WTEXT("Use encoding hint"));
+  EXPECT_EQ(Support::GetFavorLabel(Support::kFavorGuess), WTEXT("Use detected encoding"));
+  EXPECT_EQ(Support::GetFlagLabels(Support::kLossless | Support::kXML), WTEXT("Abort on loss, (XML)"));
+}
+
 }  // namespace

@@ -233,6 +233,25 @@ TEST(RealFiles, ProgressAndCancelling) {
   EXPECT_EQ(file.GetPos(), 11u);
 }
 
+TEST(RealFiles, CancelledLinesLoseNothing) {
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("lines"));
+  std::string bytes, got;
+  for (int i = 0; i < 40; ++i) bytes += std::string(5000, static_cast<char>('a' + i % 26)) + "\n";
+  WriteAll(path, bytes);
+  Indicator indicator;
+  SSeekableInputANSIFile file(Path(path), &indicator);
+  for (int steps = 0; got.size() < bytes.size() && steps < 1000; ++steps) {
+    indicator.cancelAt = steps % 3 != 0 ? indicator.questions + 1 : -1;
+    try {
+      const SString line = file.ReadLn();
+      got += line.ToUtf8() + "\n";
+    } catch (const SEIOAbortedException&) {
+    }
+  }
+  EXPECT_TRUE(got == bytes);
+}
+
 TEST(RealFiles, AllocationFailures) {
   TempFolder folder;
   const test::Text path = folder.File(WTEXT("data"));

@@ -130,4 +130,27 @@ TEST(OutputFileOnChange, Failures) {
 #endif
 }
 
+// A Close that failed is the caller's to repeat: the destructor must not write over what was mended meanwhile.
+TEST(OutputFileOnChangeFaults, ADestructorBehindAFailedCloseWritesNothing) {
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("file"));
+  WriteAll(path, "old");
+  {
+    SOutputFileOnChange out{Str(path)};
+    out.Write("new content", 11);
+    SetFileAttributesW(path.c_str(), FILE_ATTRIBUTE_READONLY);
+    EXPECT_THROW(out.Close(), SEIOCantOpenForWriting);
+    SetFileAttributesW(path.c_str(), FILE_ATTRIBUTE_NORMAL);
+    WriteAll(path, "mended");
+  }
+  EXPECT_EQ(ReadAll(path), "mended");
+  SOutputFileOnChange out{Str(path)};
+  out.Write("again", 5);
+  SetFileAttributesW(path.c_str(), FILE_ATTRIBUTE_READONLY);
+  EXPECT_THROW(out.Close(), SEIOCantOpenForWriting);
+  SetFileAttributesW(path.c_str(), FILE_ATTRIBUTE_NORMAL);
+  out.Close();
+  EXPECT_EQ(ReadAll(path), "again");
+}
+
 }  // namespace

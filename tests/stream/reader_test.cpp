@@ -4,8 +4,8 @@
 
 #include <vector>
 
+#include "qxcore/core/internal/memory_failures.h"
 #include "qxcore/core/io_exceptions.h"
-#include "qxcore/core/memory.h"
 #include "tests/stream/reader_fixture.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/wine.h"

@@ -1,6 +1,7 @@
 // Files, memory, buffers and push-back.
 
 #include <deque>
+#include <memory>
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/stream/input_buffer.h"
@@ -11,6 +12,7 @@
 #include "qxcore/stream/output_buffer_stream.h"
 #include "qxcore/stream/output_file.h"
 #include "qxcore/stream/output_global.h"
+#include "qxcore/stream/output_string_stream.h"
 #include "qxcore/stream/seekable_input_ansi_file.h"
 #include "qxcore/stream/seekable_string_input_stream.h"
 #include "tests/stream/reader_fixture.h"
@@ -21,6 +23,15 @@
 using namespace std::string_literals;
 
 namespace {
+
+TEST(ClassRecords, StreamsThatNeedNothingCanBeCreated) {
+  for (SClassInfo* info : {&SOutputFile::classSOutputFile, &SOutputGlobal::classSOutputGlobal,
+                           &SOutputStringStream::classSOutputStringStream}) {
+    const std::unique_ptr<SObject> made(info->CreateObject());
+    ASSERT_NE(made, nullptr);
+    EXPECT_EQ(made->GetClassInfoW(), info);
+  }
+}
 
 TEST(InputBuffer, TakesSizesOfEveryIntegerType) {
   const char bytes[] = "0123456789";

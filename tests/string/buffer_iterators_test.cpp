@@ -3,7 +3,7 @@
 #include <vector>
 
 #include "qxcore/core/exception.h"
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 #include "qxcore/string/string_buffer.h"
 #include "qxcore/string/string_iterators.h"
 #include "tests/support/text.h"

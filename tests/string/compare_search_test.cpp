@@ -11,6 +11,20 @@
 
 namespace {
 
+// Each character is found by each other one that has the same lower-case form, and by no further one.
+TEST(SearchWithoutCase, EveryCharacterFindsItsWholeClass) {
+  WideString haystack;
+  for (unsigned c = 1; c < 0x10000; ++c) haystack += static_cast<WCHAR>(c);
+  const SString all{SStringView(haystack)};
+  for (unsigned c = 1; c < 0x10000; c += c < 0x600 ? 1 : 13) {
+    const WCHAR wanted[] = {static_cast<WCHAR>(c), 0};
+    const WCHAR lower = platform::ToLowerBmp(wanted[0]);
+    unsigned expected = 1;
+    while (platform::ToLowerBmp(static_cast<WCHAR>(expected)) != lower) ++expected;
+    ASSERT_EQ(all.FindNoCase(wanted) - all.begin() + 1, static_cast<std::ptrdiff_t>(expected)) << c;
+  }
+}
+
 int Sign(int value) { return (value > 0) - (value < 0); }
 
 TEST(Compare, NullText_IsBelowEverythingButTheEmptyString) {

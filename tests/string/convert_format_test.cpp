@@ -8,6 +8,7 @@
 #include "qxcore/string/ansi_string.h"
 #include "qxcore/string/md5.h"
 #include "qxcore/string/string.h"
+#include "qxcore/string/string_buffer.h"
 #include "qxcore/string/text_conversion.h"
 #include "tests/support/text.h"
 #include "tests/support/wine.h"
@@ -65,6 +66,30 @@ TEST(Utf8Pair, WhatIsNoText_BecomesTheReplacementCharacter) {
   EXPECT_EQ(SString(SStringView(halves, 4)).ToUtf8(),
             "\xEF\xBF\xBD"
             "a\xEF\xBF\xBD\xEF\xBF\xBD");
+}
+
+// As the platform's conversion has it, in time of the length.
+TEST(OemConversion, LongTexts_EqualThePlatforms) {
+  SStringBuffer buffer;
+  for (int i = 0; i < 800000; ++i)
+    buffer += static_cast<WCHAR>(i % 90 == 0 ? 0xE9 : i % 91 == 0 ? 0x4E2D : 'a' + i % 26);
+  const SString text = buffer.Detach();
+  std::string bytes(static_cast<std::size_t>(text.Length()) * 2, 0);
+  bytes.resize(static_cast<std::size_t>(WideCharToMultiByte(CP_OEMCP, 0, text, text.Length(), bytes.data(),
+                                                            static_cast<int>(bytes.size()), nullptr, nullptr)));
+  SString converted = text;
+  converted.CharToOemW();
+  ASSERT_EQ(static_cast<std::size_t>(converted.Length()), bytes.size());
+  for (std::size_t i = 0; i < bytes.size(); ++i) ASSERT_EQ(converted[i], static_cast<unsigned char>(bytes[i]));
+  WideString back(bytes.size(), 0);
+  MultiByteToWideChar(CP_OEMCP, 0, bytes.data(), static_cast<int>(bytes.size()), back.data(),
+                      static_cast<int>(back.size()));
+  converted.OemToCharW();
+  EXPECT_TRUE(converted.View() == SStringView(back));
+  SString empty;
+  empty.CharToOemW();
+  empty.OemToCharW();
+  EXPECT_TRUE(empty.IsEmpty());
 }
 
 TEST(AnsiConversion, Loss_IsRecordedAndBuffersAreKeptTo) {

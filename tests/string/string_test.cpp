@@ -2,11 +2,12 @@
 
 #include "qxcore/string/string.h"
 
+#include <functional>
 #include <thread>
 #include <unordered_map>
 #include <vector>
 
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 #include "qxcore/string/string_buffer.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/text.h"
@@ -35,6 +36,43 @@ TEST(StringConstruction, NumbersAndTruth_HaveTheirStatedForms) {
   EXPECT_FALSE((std::is_constructible_v<SString, WCHAR>));
   EXPECT_FALSE((std::is_constructible_v<SString, unsigned>));
   EXPECT_FALSE((std::is_convertible_v<int, SString>));
+}
+
+// Pointers that are no texts were "Yes" once.
+struct SomeClass {};
+template <class... Arguments>
+concept CanFormat = requires(SString text, const WCHAR* format, Arguments... arguments) {
+  text.Format(format, arguments...);
+  text.Format(218u, arguments...);
+};
+using OtherWide = std::conditional_t<std::is_same_v<WCHAR, wchar_t>, char16_t, wchar_t>;
+static_assert(!std::is_constructible_v<SString, void*> && !std::is_constructible_v<SString, const int*>);
+static_assert(!std::is_constructible_v<SString, const OtherWide*> && !std::is_constructible_v<SString, const char8_t*>);
+static_assert(!std::is_constructible_v<SString, SomeClass*> && !std::is_constructible_v<SString, int (*)()>);
+static_assert(!std::is_convertible_v<bool, SString> && std::is_constructible_v<SString, bool>);
+static_assert(std::is_constructible_v<SString, WCHAR*> && std::is_constructible_v<SString, char*>);
+static_assert(CanFormat<int, const WCHAR*, double, char> && CanFormat<>);
+static_assert(!CanFormat<SString> && !CanFormat<int, SStringView> && !CanFormat<SomeClass>);
+
+TEST(StringConstruction, Truth_IsOnlyATruth) {
+  bool isSo = true;
+  EXPECT_TRUE(Shares(SString(isSo), SString::Yes));
+  EXPECT_TRUE(Shares(SString(!isSo), SString::No));
+}
+
+TEST(StringBuffers, TextsBeyondAnInt_AreRefused) {
+  const SString text = WTEXT("text");
+  const SStringView tooLong(text.GetSafePointer(), std::size_t{0x80000000});  // never looked at
+  SString target = text;
+  EXPECT_THROW(SString{tooLong}, SEOutOfMemory);
+  EXPECT_THROW(target = tooLong, SEOutOfMemory);
+  EXPECT_THROW(target += tooLong, SEOutOfMemory);
+  SStringBuffer buffer(16u);
+  if (sizeof(void*) > 4) {  // else no such text can be
+    EXPECT_THROW(buffer += tooLong, SEOutOfMemory);
+  }
+  EXPECT_EQ(target, text);
+  EXPECT_TRUE(buffer.IsEmpty());
 }
 
 TEST(StringBuffers, Length_DecidesTheSizeClass) {
@@ -182,6 +220,54 @@ TEST(StringLocking, Unlock_MeasuresOrCuts) {
 
 // Every operation that changes a text, its argument anywhere, also in the text itself, and the text
 // owned, shared or static; the model is a plain string.
+// What others hold is never written, however the length came to be 0.
+TEST(StringLocking, UnlockWithoutABufferOfItsOwn_WritesNothing) {
+  SString constant;
+  constant.Unlock(1);
+  EXPECT_EQ(constant, WTEXT(""));
+  EXPECT_EQ(*SString::null.GetSafePointer(), 0);
+  SString lent;
+  WCHAR* buffer = lent.Lock(10);
+  buffer[0] = WTEXT('#');
+  EXPECT_EQ(lent.Length(), 0);
+  SString holder = lent;
+  lent.Unlock(3);
+  EXPECT_EQ(lent, WTEXT(""));
+  EXPECT_EQ(holder.GetSafePointer()[0], WTEXT('#'));
+  EXPECT_EQ(holder.Length(), 0);
+  SString shared = WTEXT("abcdef");
+  holder = shared;
+  shared.Unlock(2);
+  EXPECT_EQ(shared, WTEXT("ab"));
+  EXPECT_EQ(holder, WTEXT("abcdef"));
+
+  SString sized = WTEXT("abc");
+  EXPECT_EQ(*sized.GetBufferSetLength(0), 0);
+  EXPECT_EQ(sized.Length(), 0);
+  EXPECT_EQ(SString().GetBufferSetLength(0)[0], 0);
+}
+
+TEST(StringLocking, NewTextsInALockedString_HaveTheirOwnLength) {
+  const std::function<void(SString&)> kEmptying[] = {[](SString& text) { text.Init(WTEXT("")); },
+                                                     [](SString& text) { text.Init(""); },
+                                                     [](SString& text) { text.Init(SString()); },
+                                                     [](SString& text) { text.Format(WTEXT("")); },
+                                                     [](SString& text) { text.Format(WTEXT("%s"), WTEXT("")); },
+                                                     [](SString& text) { text.LoadStringW(65000); }};
+  for (std::size_t i = 0; i < std::size(kEmptying); ++i) {
+    SString text = WTEXT("abcdef");
+    text.LockBuffer(6);
+    kEmptying[i](text);
+    EXPECT_EQ(text.Length(), 0) << i;
+    EXPECT_EQ(*text.GetSafePointer(), 0) << i;
+  }
+  SString text = WTEXT("abcdef");
+  text.LockBuffer(6);
+  text.Init(WTEXT("xy"));
+  EXPECT_EQ(text, WTEXT("xy"));
+  EXPECT_EQ(RefsOf(text), 1);
+}
+
 TEST(StringModel, RandomOperations_AgreeWithPlainString) {
   RandomText random(20261121);
   const SStringView kAlphabet = WTEXT("aAbB,");

@@ -4,7 +4,7 @@
 #include <gtest/gtest.h>
 
 #include "qxcore/core/exception.h"
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 
 // `operation` is run anew each time; `check` is called after each failure, with allocation working
 // again. Both ways: only the n-th fails, and all from the n-th on. Gives how many runs failed.

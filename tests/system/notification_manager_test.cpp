@@ -2,6 +2,8 @@
 
 #include "qxcore/system/notification_manager.h"
 
+#include "qxcore/system/notification_sink.h"
+
 #include <gtest/gtest.h>
 
 #include <functional>
@@ -246,6 +248,44 @@ TEST(NotificationManager, FailedAllocation_LeavesTheRegistrations) {
         EXPECT_EQ(b.refs, expected == "A" ? 0u : 1u);
       });
   EXPECT_GT(failures, 5);
+}
+
+class DerivedSink : public SNotificationSink {
+ public:
+  DerivedSink(Lifetime lifetime, int& calls, int& living)
+      : SNotificationSink(lifetime), m_calls(calls), m_living(living) {
+    ++m_living;
+  }
+  ~DerivedSink() override { --m_living; }
+  int WINAPI OnNotification(int, void*, unsigned long) override { return ++m_calls; }
+
+ private:
+  int& m_calls;
+  int& m_living;
+};
+
+TEST(NotificationSink, CountsAndUnregistersByItself) {
+  const int kind = SNotificationManager::NotificationKind(WTEXT("DerivedSink"));
+  int calls = 0, living = 0;
+  {
+    DerivedSink owned(SNotificationSink::Lifetime::kOwned, calls, living);
+    SNotificationManager::Advise(&owned, kind);
+    SNotificationManager::Notify(kind, nullptr, 0);
+    EXPECT_EQ(calls, 1);
+  }
+  EXPECT_EQ(SNotificationManager::Notify(kind, nullptr, 0), 0) << "its registrations ended with it";
+  auto* counted = new DerivedSink(SNotificationSink::Lifetime::kCounted, calls, living);
+  SNotificationManager::Advise(counted, kind);
+  counted->Release();
+  EXPECT_EQ(living, 1) << "the manager holds it";
+  SNotificationManager::Notify(kind, nullptr, 0);
+  EXPECT_EQ(calls, 2);
+  SNotificationManager::UnadviseAll(counted);
+  EXPECT_EQ(living, 0);
+  void* object = &calls;
+  DerivedSink last(SNotificationSink::Lifetime::kOwned, calls, living);
+  EXPECT_EQ(last.QueryInterface(GUID(), &object), E_NOINTERFACE);
+  EXPECT_EQ(object, nullptr);
 }
 
 }  // namespace

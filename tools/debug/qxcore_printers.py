@@ -4,6 +4,8 @@ Beside the installed library lies this file under the name that gdb loads by its
 among those that it trusts (add-auto-load-safe-path); else: source qxcore_printers.py
 """
 
+import datetime
+
 import gdb
 
 HEADER_BYTES = 12  # count, length, capacity: the header in front of a string's text
@@ -11,6 +13,11 @@ HEADER_BYTES = 12  # count, length, capacity: the header in front of a string's 
 
 def pointer(value):
     return int(value.cast(gdb.lookup_type("unsigned long")))
+
+
+def plain(value):
+    """The object itself, where a reference to it is shown."""
+    return value.referenced_value() if value.type.code in (gdb.TYPE_CODE_REF, gdb.TYPE_CODE_RVALUE_REF) else value
 
 
 def text_of(string):
@@ -26,7 +33,7 @@ def text_of(string):
 
 class StringPrinter:
     def __init__(self, value):
-        self.value = value
+        self.value = plain(value)
 
     def to_string(self):
         text = text_of(self.value)
@@ -38,7 +45,7 @@ class StringPrinter:
 
 class StringBufferPrinter(StringPrinter):
     def __init__(self, value):
-        super().__init__(value["m_text"])
+        super().__init__(plain(value)["m_text"])
 
 
 def elements(address, count, element_type):
@@ -51,8 +58,11 @@ class SequencePrinter:
     """What the tables and lists have in common; `parts` gives the count and the elements."""
 
     def __init__(self, value):
-        self.value = value
-        self.element_type = value.type.strip_typedefs().template_argument(0)
+        self.value = plain(value)
+        self.element_type = self.find_element_type()
+
+    def find_element_type(self):
+        return self.value.type.strip_typedefs().template_argument(0)
 
     def to_string(self):
         return f"{self.value.type.strip_typedefs()} of {self.parts()[0]}"
@@ -68,6 +78,11 @@ class TablePrinter(SequencePrinter):
     def parts(self):
         count = int(self.value["m_count"])
         return count, elements(pointer(self.value["m_data"]), count, self.element_type)
+
+
+class StringTablePrinter(TablePrinter):
+    def find_element_type(self):
+        return gdb.lookup_type("SString")
 
 
 class SharedTablePrinter(SequencePrinter):
@@ -104,7 +119,7 @@ class ListPrinter(SequencePrinter):
 
 class MapPrinter:
     def __init__(self, value):
-        self.value = value
+        self.value = value = plain(value)
         base = value.type.strip_typedefs()
         while not base.name.startswith(("SMap<", "SUnsortedMap<")):
             base = base.fields()[0].type.strip_typedefs()
@@ -140,17 +155,36 @@ class MapPrinter:
         return "map"
 
 
+class TimePrinter:
+    """Seconds since 1970, in UTC: the debugger does not know the zone of the program."""
+
+    def __init__(self, value):
+        self.seconds = int(plain(value)["m_time"])
+
+    def to_string(self):
+        if self.seconds == -1:
+            return "STime <invalid>"
+        at = datetime.datetime(1970, 1, 1) + datetime.timedelta(seconds=self.seconds)
+        return f"STime {at:%Y-%m-%d %H:%M:%S} UTC"
+
+
+# A container's own name, not that of something declared in it, such as its iterator.
+ARGUMENTS = "<((?!>::).)*>$"
+
+
 def register(objfile):
     from gdb.printing import RegexpCollectionPrettyPrinter, register_pretty_printer
 
     printers = RegexpCollectionPrettyPrinter("qxcore11e")
     printers.add_printer("SString", "^SString$", StringPrinter)
     printers.add_printer("SStringBuffer", "^SStringBuffer$", StringBufferPrinter)
-    printers.add_printer("STable", "^STable<.*>$", TablePrinter)
-    printers.add_printer("STableDumb", "^STableDumb<.*>$", SharedTablePrinter)
-    printers.add_printer("STableMem", "^STableMem<.*>$", TableMemPrinter)
-    printers.add_printer("SList", "^SList<.*>$", ListPrinter)
-    printers.add_printer("SMap", "^(SMap|SUnsortedMap)<.*>$|^SString(Unsorted)?Map(NoCase)?$", MapPrinter)
+    printers.add_printer("STable", "^STable" + ARGUMENTS, TablePrinter)
+    printers.add_printer("STableDumb", "^STableDumb" + ARGUMENTS, SharedTablePrinter)
+    printers.add_printer("STableMem", "^STableMem" + ARGUMENTS, TableMemPrinter)
+    printers.add_printer("SList", "^SList" + ARGUMENTS, ListPrinter)
+    printers.add_printer("SMap", "^(SMap|SUnsortedMap)" + ARGUMENTS + "|^SString(Unsorted)?Map(NoCase)?$", MapPrinter)
+    printers.add_printer("SStringTable", "^SStringTable$", StringTablePrinter)
+    printers.add_printer("STime", "^STime$", TimePrinter)
     register_pretty_printer(objfile, printers, replace=True)
 
 

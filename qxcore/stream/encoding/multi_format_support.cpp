@@ -263,6 +263,39 @@ int Support::MachineSupports(Encoding encoding) {
 
 SString Support::GetAppEncodingName() { return GetEncodingName(kUTF16LE); }
 
+SString Support::GetLevelLabel(Encoding encoding) {
+  constexpr unsigned kNone = 248, kQuick = 249, kFair = 250, kFull = 251, kWhole = 255;
+  switch (encoding & kLevelMask) {
+    case kQuickDetect:
+      return LibraryText(kQuick);
+    case kDetect:
+      return LibraryText(kFair);
+    case kFullDetect:
+      return LibraryText(kFull);
+    default:
+      return LibraryText((encoding & kWholeInOnce) != 0 ? kWhole : kNone);
+  }
+}
+
+SString Support::GetFavorLabel(Encoding encoding) {
+  constexpr unsigned kWarn = 252, kHint = 253, kGuess = 254;
+  return LibraryText((encoding & kFavorGuess) != 0 ? kGuess : (encoding & kFavorHint) != 0 ? kHint : kWarn);
+}
+
+SString Support::GetFlagLabels(Encoding encoding) {
+  constexpr struct {
+    Encoding flag;
+    unsigned label;
+  } kLabels[] = {{kLossless, 256}, {kXML, 257}};
+  SString labels;
+  for (const auto& one : kLabels) {
+    if ((encoding & one.flag) == 0) continue;
+    if (!labels.IsEmpty()) labels += WTEXT(", ");
+    labels += LibraryText(one.label);
+  }
+  return labels;
+}
+
 SString Support::MakeUserFriendly(const SString& name) {
   SString friendly = name;
   friendly.Replace(WTEXT("with signature"), LibraryText(278));

@@ -95,6 +95,13 @@ class SAbstractIO::SMultiFormatSupport {
   // The name of the application's own character set: that of little-endian UTF-16.
   QXCORE_API static SString GetAppEncodingName();
 
+  // What users read of a policy: the label of its level ("Quick detection", "<No Detection>") and that of its favour
+  // ("Use detected encoding", "Use encoding hint and display warning" when it has none).
+  QXCORE_API static SString GetLevelLabel(Encoding encoding);
+  QXCORE_API static SString GetFavorLabel(Encoding encoding);
+  // And those of its other flags that are set, "Abort on loss" and "(XML)", separated by a comma and a blank.
+  QXCORE_API static SString GetFlagLabels(Encoding encoding);
+
   // Replaces the words of a table name that are translatable by their translation.
   QXCORE_API static SString MakeUserFriendly(const SString& name);
 

@@ -7,30 +7,30 @@
 namespace platform::rich {
 
 enum class Action : std::uint8_t {
-  kNothing,        // known; the group that it begins is read
-  kSkipGroup,      // a destination without text of the body
-  kCharacter,      // value: the character
-  kParagraphEnd,   // and of lines
+  kNothing,       // known; the group that it begins is read
+  kSkipGroup,     // a destination without text of the body
+  kCharacter,     // value: the character
+  kParagraphEnd,  // and of lines
   kCellEnd,
   kRowEnd,
   kBinary,
   kUnicode,
-  kFallback,       // \uc
-  kUnicodeGroup,   // \upr: the group behind it is a substitute of the next
+  kFallback,      // \uc
+  kUnicodeGroup,  // \upr: the group behind it is a substitute of the next
   kFontTable,
   kColorTable,
-  kCharset,        // of the document; value: code page
-  kCodePage,       // \ansicpg
+  kCharset,   // of the document; value: code page
+  kCodePage,  // \ansicpg
   kDefaultFont,
   kFont,
   kSize,
-  kFlag,           // value: CharFormat::Flag, cleared by the number 0
-  kNoFlag,         // value: the flags that are cleared
+  kFlag,    // value: CharFormat::Flag, cleared by the number 0
+  kNoFlag,  // value: the flags that are cleared
   kColor,
   kBackColor,
   kPlain,
-  kParagraph,      // \pard
-  kAlignment,      // value: ParagraphFormat::Alignment
+  kParagraph,  // \pard
+  kAlignment,  // value: ParagraphFormat::Alignment
   kLeftIndent,
   kFirstIndent,
   kRightIndent,

@@ -65,7 +65,8 @@ bool IsPlain(Char c) {
 template <class Char>
 class Reader {
  public:
-  Reader(const Char* at, const Char* end, Document& document) : m_start(at), m_at(at), m_end(end), m_document(document) {}
+  Reader(const Char* at, const Char* end, Document& document)
+      : m_start(at), m_at(at), m_end(end), m_document(document) {}
 
   void Run() {
     m_document.text.Reserve(static_cast<std::size_t>(m_end - m_at) * (sizeof(Char) > 1 ? 1 : 2));
@@ -360,11 +361,11 @@ class Reader {
   const Charset* m_documentCharset = nullptr;
   std::unordered_map<std::int32_t, FontPlace> m_places;  // by their numbers
   std::int32_t m_defaultFont = 0;
-  bool m_isFontDue = false;       // the fonts have been read, and the default one is not chosen yet
-  bool m_isOptional = false;      // behind "\*"
-  bool m_isStateChanged = true;   // since the last group opened
-  bool m_isFormatNew = true;      // the formats changed behind the last text
-  bool m_isAfterCell = false;     // the text ends with the tab of a cell
+  bool m_isFontDue = false;      // the fonts have been read, and the default one is not chosen yet
+  bool m_isOptional = false;     // behind "\*"
+  bool m_isStateChanged = true;  // since the last group opened
+  bool m_isFormatNew = true;     // the formats changed behind the last text
+  bool m_isAfterCell = false;    // the text ends with the tab of a cell
 };
 
 }  // namespace

@@ -113,9 +113,10 @@ class Writer {
     constexpr struct {
       std::uint16_t flag;
       const char* word;
-    } kFlags[] = {{CharFormat::kBold, "\\b"},         {CharFormat::kItalic, "\\i"},     {CharFormat::kUnderline, "\\ul"},
-                  {CharFormat::kStrike, "\\strike"},  {CharFormat::kSuper, "\\super"},  {CharFormat::kSub, "\\sub"},
-                  {CharFormat::kHidden, "\\v"},       {CharFormat::kCaps, "\\caps"},    {CharFormat::kSmallCaps, "\\scaps"}};
+    } kFlags[] = {
+        {CharFormat::kBold, "\\b"},        {CharFormat::kItalic, "\\i"},    {CharFormat::kUnderline, "\\ul"},
+        {CharFormat::kStrike, "\\strike"}, {CharFormat::kSuper, "\\super"}, {CharFormat::kSub, "\\sub"},
+        {CharFormat::kHidden, "\\v"},      {CharFormat::kCaps, "\\caps"},   {CharFormat::kSmallCaps, "\\scaps"}};
     for (const auto& [flag, word] : kFlags) {
       if ((format.flags & flag) != 0) m_rtf += word;
     }
