@@ -103,7 +103,7 @@ TEST(ThrowTargets, WithoutMemory_CountsStayRight) {
   const SString names = longName + WTEXT(",Second,Second");
   STargetedException abort(names, WTEXT(""));
   const int failures = WithEachAllocationFailing(
-      [] {
+      [&] {
         Catcher catcher(names);
         catcher.Activate();
         catcher.Done();
