@@ -52,6 +52,11 @@ def by_convention(code):
     return []
 
 
+def literal(comment):
+    """The comment with its backslashes as characters, which doxygen would take for commands."""
+    return comment.replace("\\", "\\\\")
+
+
 def strip_code(line):
     """The line without strings and comments, for counting braces."""
     line = re.sub(r'"(\\.|[^"\\])*"', '""', line)
@@ -113,7 +118,7 @@ class Filter:
         i = 0
         while i < len(lines) and (lines[i].startswith("//") or not lines[i].strip()):
             if lines[i].startswith("//"):
-                self.header.append(lines[i][2:].strip())
+                self.header.append(literal(lines[i][2:].strip()))
             i += 1
         if self.header:
             self.out.append("/** @file\n * " + "\n * ".join(self.header) + " */")
@@ -146,9 +151,9 @@ class Filter:
                 continue
             if stripped.startswith("//"):
                 section = SECTION.match(line)
-                text = stripped[2:].strip()
+                text = literal(stripped[2:].strip())
                 if section:
-                    self.section, self.block, self.fresh = [section[1]], [], False
+                    self.section, self.block, self.fresh = [literal(section[1])], [], False
                 elif self.fresh:
                     self.block.append(text)
                 else:
@@ -168,7 +173,7 @@ class Filter:
                 if doc:
                     self.emit_doc(indent, doc)
             if own:
-                line = trailing["code"] + ("  ///< " if not self.fresh else "  // ") + trailing["text"]
+                line = trailing["code"] + ("  ///< " if not self.fresh else "  // ") + literal(trailing["text"])
         self.fresh = False
         self.out.append(line)
         self.track(strip_code(line))

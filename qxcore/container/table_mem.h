@@ -101,6 +101,7 @@ class STableMem : public STableShell<T, __STableMem> {
   void Attach(void* block) { __STableMem::Attach(block); }
 
  protected:
+  // What the base asks of an element: its end, and a copy.
   void Destroy(void* element) override { static_cast<T*>(element)->~T(); }
   void CopyTo(void* destination, const void* source) override { new (destination) T(*static_cast<const T*>(source)); }
 };
