@@ -31,16 +31,19 @@ class EntryGrouper {
       m_text += static_cast<WCHAR>('{');
       m_isInEntry = true;
     }
+    if (m_isOpenWord && tag[0] != '\\' && tag[0] != '{') m_text += SString::Space;
+    m_isOpenWord = rtf::IsOpenWord(tag);
     const std::size_t last = tag[0] == '{' ? SStringView::npos : tag.find(static_cast<WCHAR>(';'));
     m_text += tag.substr(0, last == SStringView::npos ? last : last + 1);
     if (last == SStringView::npos) return;
     m_text += static_cast<WCHAR>('}');
-    m_isInEntry = false;
+    m_isInEntry = m_isOpenWord = false;
   }
 
   SStringBuffer m_text;
   rtf::TagReader m_tags;
   bool m_isInEntry = false;
+  bool m_isOpenWord = false;  // the last tag was a control word without its blank
 };
 
 bool HasEntriesWithoutBraces(SStringView table) {

@@ -25,21 +25,25 @@ bool IsName(SStringView tag) {
          rtf::IsEscape(tag.data(), tag.data() + tag.size()) || IsCharacterWord(tag);
 }
 
-// Pieces of a text in their order; copied only when something stands between them.
+// Tags put together in their order; copied only when something stood between them.
 class Pieces {
  public:
   void Clear() {
     m_joined.Clear();
     m_view = SStringView();
+    m_isOpenWord = false;
   }
-  void Add(SStringView piece) {
+  void Add(SStringView tag) {
+    const bool needsBlank = m_isOpenWord && tag[0] != '\\';
+    m_isOpenWord = rtf::IsOpenWord(tag);
     if (m_view.empty()) {
-      m_view = piece;
-    } else if (m_view.data() + m_view.size() == piece.data()) {
-      m_view = SStringView(m_view.data(), m_view.size() + piece.size());
+      m_view = tag;
+    } else if (m_view.data() + m_view.size() == tag.data()) {
+      m_view = SStringView(m_view.data(), m_view.size() + tag.size());
     } else {
       if (m_joined.IsEmpty()) m_joined += m_view;
-      m_joined += piece;
+      if (needsBlank) m_joined += SString::Space;
+      m_joined += tag;
       m_view = m_joined.View();
     }
   }
@@ -48,6 +52,7 @@ class Pieces {
  private:
   SStringView m_view;
   SStringBuffer m_joined{kEntryRoom};
+  bool m_isOpenWord = false;
 };
 
 // One entry, as views into its text where that is possible.
@@ -86,7 +91,7 @@ class EntryReader {
       while (!tag.empty() && (rtf::IsSpace(tag.back()) || tag.back() == ';')) tag.remove_suffix(1);
       if (!m_hasNumber && IsNumberWord(tag, m_number)) {
         m_hasNumber = true;
-      } else {
+      } else if (!IsBinary(tag)) {
         m_words.Add(tag);
       }
     }
@@ -94,8 +99,13 @@ class EntryReader {
   }
   void ReadName(rtf::TagReader& tags, SStringView tag) {
     for (; !IsEnd(tag); tag = tags.Next(true)) {
-      if (!IsGroup(tag)) m_name.Add(tag);
+      if (!IsGroup(tag) && !IsBinary(tag)) m_name.Add(tag);
     }
+  }
+  // Binary data has no place in an entry, and its word would swallow what is written behind it.
+  static bool IsBinary(SStringView tag) {
+    return tag[0] == '\\' &&
+           platform::ReadRtfWord(tag.data() + 1, tag.data() + tag.size()).key == platform::RtfKey("bin");
   }
 
   int m_number = 0;

@@ -64,15 +64,26 @@ const WCHAR* SkipTag(const WCHAR* at, End end, bool wholeGroup) {
   return IsEscape(at, end) ? at + 2 : SkipControlWord(at, end);
 }
 
-// Walks over the tags of a text that ends at an address.
+// Whether a tag is a control word that a line end closed, so that text behind it needs a blank when the two are
+// put together.
+inline bool IsOpenWord(SStringView tag) {
+  const WCHAR* end = tag.data() + tag.size();
+  return tag.size() > 1 && tag[0] == '\\' && !IsEscape(tag.data(), end) && !IsHexEscape(tag.data(), end) &&
+         !IsSpace(tag.back());
+}
+
+// Walks over the tags of a text that ends at an address. A backslash alone, in front of a line end, is left out.
 class TagReader {
  public:
   explicit TagReader(SStringView text) : m_at(text.data()), m_end(text.data() + text.size()) {}
 
   // The next tag; empty at the end.
   SStringView Next(bool wholeGroup) {
-    const WCHAR* start = SkipSpace(m_at, m_end);
-    m_at = SkipTag(start, m_end, wholeGroup);
+    const WCHAR* start;
+    do {
+      start = SkipSpace(m_at, m_end);
+      m_at = SkipTag(start, m_end, wholeGroup);
+    } while (m_at - start == 1 && *start == '\\');
     return SStringView(start, static_cast<std::size_t>(m_at - start));
   }
 

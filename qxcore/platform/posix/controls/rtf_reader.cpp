@@ -160,11 +160,22 @@ class Reader {
       m_at = word.end;
       TakeWord(word);
     } else if (m_at[1] == '\'') {
-      BeginText();
-      DecodeByte(m_at, m_end, *m_state.charset, m_document.text);
+      TakeHexByte();
     } else {
       m_at += 2;
       TakeSymbol(m_at[-1]);
+    }
+  }
+  // Control characters mean what they mean behind a backslash.
+  void TakeHexByte() {
+    const Char* behind = m_at;
+    const int byte = ReadHexByte(behind, m_end);
+    if (byte < ' ') {
+      m_at = behind;
+      if (byte > 0) TakeSymbol(static_cast<Char>(byte));
+    } else {
+      BeginText();
+      DecodeByte(m_at, m_end, *m_state.charset, m_document.text);
     }
   }
   void TakeSymbol(Char symbol) {
@@ -255,7 +266,11 @@ class Reader {
 
   void AddUnicode(std::int32_t number) {
     const auto unit = static_cast<char16_t>(number);  // negative ones are those above 0x7FFF
-    if (unit != 0) Add(unit);
+    if (unit == '\r' || unit == '\n') {
+      AddLineEnd();
+    } else if (unit != 0) {
+      Add(unit);
+    }
     m_at = SkipFallback(m_at, m_end, m_state.fallback);
   }
   // The group behind \upr is for readers without Unicode.
