@@ -102,7 +102,8 @@ std::vector<Text> Colors(const Text& table) {
       while (!definition.empty() && definition.back() == ' ') definition.pop_back();
       colors.push_back(definition);
       definition.clear();
-    } else if (table[at] != '\r' && table[at] != '\n' && table[at] != '}' && (table[at] != ' ' || !definition.empty())) {
+    } else if (table[at] != '\r' && table[at] != '\n' && table[at] != '}' &&
+               (table[at] != ' ' || !definition.empty())) {
       definition += table[at];
     }
   }
@@ -207,7 +208,8 @@ TEST(Corpus, MergedReferencesLeadWhereTheyLedBefore) {
       EXPECT_EQ(changed[n], SStringView(walk::Renumber(Text(bodies[n].View()), fontMap, colorMap)));
     }
     for (int n = 0; n < 2; ++n) {
-      after[n] = Resolve(Text(changed[n].View()), Text(fonts.GetFontTable().View()), Text(colors.GetColorTable().View()));
+      after[n] =
+          Resolve(Text(changed[n].View()), Text(fonts.GetFontTable().View()), Text(colors.GetColorTable().View()));
       ASSERT_EQ(before[n].size(), after[n].size());
       for (std::size_t k = 0; k < before[n].size(); ++k) {
         ++references;

@@ -29,8 +29,8 @@ inline std::vector<Reference> References(const Text& text) {
   static const std::set<std::string> kFonts = {"f",         "af",        "deff",      "adeff",  "pnf",
                                                "stshfdbch", "stshfloch", "stshfhich", "stshfbi"};
   static const std::set<std::string> kColors = {
-      "cf",      "cb",      "highlight",  "chcfpat",    "chcbpat", "ulc",     "cfpat",       "cbpat",       "brdrcf", "pncf",
-      "clcfpat", "clcbpat", "clcfpatraw", "clcbpatraw", "trcfpat", "trcbpat", "tscellcfpat", "tscellcbpat"};
+      "cf",   "cb",      "highlight", "chcfpat",    "chcbpat",    "ulc",     "cfpat",   "cbpat",       "brdrcf",
+      "pncf", "clcfpat", "clcbpat",   "clcfpatraw", "clcbpatraw", "trcfpat", "trcbpat", "tscellcfpat", "tscellcbpat"};
   std::vector<Reference> found;
   long long depth = 0, tableDepth = -1;  // the depth of the table that is open
   for (std::size_t at = 0; at < text.size();) {
@@ -53,7 +53,8 @@ inline std::vector<Reference> References(const Text& text) {
     long long number = std::strtoll(digits.c_str(), nullptr, 10);
     if (number > INT32_MAX) number = INT32_MAX;
     if (number < INT32_MIN) number = INT32_MIN;
-    if (name == "bin" && number > 0) at = number < static_cast<long long>(text.size() - at) ? at + static_cast<std::size_t>(number) : text.size();
+    if (name == "bin" && number > 0)
+      at = number < static_cast<long long>(text.size() - at) ? at + static_cast<std::size_t>(number) : text.size();
     if (tableDepth >= 0) continue;
     if (name == "fonttbl" || name == "colortbl") tableDepth = depth;
     const bool isFont = kFonts.count(name) != 0;

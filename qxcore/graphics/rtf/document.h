@@ -85,13 +85,14 @@ class QXCORE_API SRtfDocument {
   // CR LF. Return 1 when what was read back is not empty, or when the input is empty; 0 without a control,
   // with a null output, or when memory runs out. The output may be the input.
   //
-  // RtfToText returns the text that a reader sees: cells end with a tab, table rows and paragraphs with a line
-  // end; of a field its result; without headers, footers, pictures and objects. Plain text comes back as it is.
+  // RtfToText returns the text that a reader sees. Plain text comes back as it is. On Linux: tabs between cells,
+  // a line for each table row, a form feed for a page end; of a field its result; footnotes where they are
+  // anchored; no headers, footers, pictures and comments. On Windows: what the system's control makes of it.
   int RtfToText(SString* text, const SString& rtf);
   // TextToRtf returns the text as a document; a text that begins with "{\rtf" is read as RTF and written anew.
   int TextToRtf(SString* rtf, const SString& text);
 
-  // Makes the control, a child of the current owner window, if there is none. Returns 1; 0 when that fails.
+  // Makes the control, if there is none. Returns 1; 0 when that fails.
   int CreateEditCtrl();
   // Destroys the control, if there is one.
   void DeleteEditCtrl();
