@@ -148,7 +148,6 @@ using REGSAM = DWORD;
 #include "qxcore/platform/win32/input.h"
 #include "qxcore/platform/win32/menu.h"
 #include "qxcore/platform/win32/message.h"
-#include "qxcore/platform/win32/rich_edit.h"
 #include "qxcore/platform/win32/scroll.h"
 #include "qxcore/platform/win32/window.h"
 

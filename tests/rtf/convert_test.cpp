@@ -80,10 +80,12 @@ TEST(PortableReader, ReadsWhatTheFormatSays) {
       {"{\\upr{ansi}{\\*\\ud{uni}}}", WTEXT("uni")},
       // Binary data, destinations, stars that begin nothing.
       {"a{\\pict\\bin3 }}{}b{\\bin9999 c", WTEXT("ab")},
-      {"{\\header h}{\\*\\bkmkstart b}{\\info{\\title t}}{\\object{\\*\\objdata 00}{\\result r}}\\*\\cs1 s", WTEXT("rs")},
+      {"{\\header h}{\\*\\bkmkstart b}{\\info{\\title t}}{\\object{\\*\\objdata 00}{\\result r}}\\*\\cs1 s",
+       WTEXT("rs")},
       {"{\\field{\\*\\fldinst HYPERLINK \"x\"}{\\fldrslt \\*\\cs2 link}}", WTEXT("link")},
       // Tables and ends.
-      {"\\trowd a\\cell b\\cell\\row\\trowd\\cell\\cell\\row\\pard c\\line d\\page e\\sect\\\nf", WTEXT("a\tb\r\n\t\r\nc\r\nd\fe\r\n\r\nf")},
+      {"\\trowd a\\cell b\\cell\\row\\trowd\\cell\\cell\\row\\pard c\\line d\\page e\\sect\\\nf",
+       WTEXT("a\tb\r\n\t\r\nc\r\nd\fe\r\n\r\nf")},
       {"a\\nestcell b\\nestcell{\\*\\nesttableprops\\nestrow}{\\nonesttables\\par}\\cell\\row", WTEXT("a\tb\r\n")},
       {"{\\pntext\\f0\\'b7\\tab}one\\par{\\listtext 2.\\tab}two", WTEXT("\x00B7\tone\r\n2.\ttwo")},
       {"\\emdash\\lquote\\bullet\\-\\_\\zwj", WTEXT("\x2014\x2018\x2022\x00AD\x2011\x200D")},
@@ -98,12 +100,14 @@ TEST(PortableReader, ReadsWhatTheFormatSays) {
 }
 
 TEST(PortableReader, KeepsFormatsWhenItWritesAnew) {
-  const SString rtf = ToRtf(
-      WTEXT("{\\rtf1\\deff7{\\fonttbl{\\f7\\froman\\fcharset204 Times;}{\\f9\\fswiss\\fcharset0 Arial;}}"
-            "{\\colortbl;\\red1\\green2\\blue3;}\\pard\\qc\\li360 x{\\f9\\b\\cf1\\fs30 y}\\i z\\par}"));
-  EXPECT_EQ(rtf, WTEXT("{\\rtf1\\ansi\\ansicpg1252\\deff0{\\fonttbl{\\f0\\froman\\fcharset204 Times;}"
-                       "{\\f1\\fswiss\\fcharset0 Arial;}}\r\n{\\colortbl ;\\red1\\green2\\blue3;}\r\n\\uc1"
-                       "\\pard\\qc\\li360 \\plain\\f0\\fs24 x\\plain\\f1\\fs30\\cf1\\b y\\plain\\f0\\fs24\\i z\\par\r\n}\r\n"));
+  const SString rtf =
+      ToRtf(WTEXT("{\\rtf1\\deff7{\\fonttbl{\\f7\\froman\\fcharset204 Times;}{\\f9\\fswiss\\fcharset0 Arial;}}"
+                  "{\\colortbl;\\red1\\green2\\blue3;}\\pard\\qc\\li360 x{\\f9\\b\\cf1\\fs30 y}\\i z\\par}"));
+  EXPECT_EQ(
+      rtf,
+      WTEXT("{\\rtf1\\ansi\\ansicpg1252\\deff0{\\fonttbl{\\f0\\froman\\fcharset204 Times;}"
+            "{\\f1\\fswiss\\fcharset0 Arial;}}\r\n{\\colortbl ;\\red1\\green2\\blue3;}\r\n\\uc1"
+            "\\pard\\qc\\li360 \\plain\\f0\\fs24 x\\plain\\f1\\fs30\\cf1\\b y\\plain\\f0\\fs24\\i z\\par\r\n}\r\n"));
   EXPECT_EQ(ToRtf(rtf), rtf);
 }
 

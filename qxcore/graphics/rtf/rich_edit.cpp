@@ -5,6 +5,7 @@
 
 #include "qxcore/core/exception.h"
 #include "qxcore/platform/internal/rich_edit_class.h"
+#include "qxcore/platform/win32/rich_edit.h"
 #include "qxcore/string/string_buffer.h"
 
 namespace {
@@ -65,8 +66,8 @@ SRichEditCtrl::~SRichEditCtrl() {
 int SRichEditCtrl::Create() {
   const WCHAR* name = platform::LoadRichEditClass();
   if (name == nullptr) return 0;
-  m_hWnd = CreateWindowExW(0, name, WTEXT(""), WS_CHILD | ES_MULTILINE, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr,
-                           nullptr);
+  m_hWnd =
+      CreateWindowExW(0, name, WTEXT(""), WS_CHILD | ES_MULTILINE, 0, 0, 0, 0, HWND_MESSAGE, nullptr, nullptr, nullptr);
   if (m_hWnd == nullptr) return 0;
   SendMessageW(m_hWnd, EM_SETTEXTMODE, TM_RICHTEXT, 0);
   SendMessageW(m_hWnd, EM_EXLIMITTEXT, 0, kNoLimit);

@@ -1,10 +1,14 @@
-// The messages of the rich-edit control that the library sends, as declared on Linux.
-// Include qxcore/platform/win32.h, not this header; on Windows it is empty.
+// The messages of the rich-edit control that the library sends. On Windows this is <richedit.h>, which brings
+// names of its own and is therefore no part of win32.h.
 #pragma once
 
 #include "qxcore/platform/win32.h"
 
-#ifndef _WIN32
+#ifdef _WIN32
+
+#include <richedit.h>
+
+#else
 
 #define MSFTEDIT_CLASS WTEXT("RICHEDIT50W")
 #define RICHEDIT_CLASSW WTEXT("RichEdit20W")

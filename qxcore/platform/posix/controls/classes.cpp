@@ -3,16 +3,7 @@
 #include "qxcore/platform/posix/controls/rich_edit.h"
 #include "qxcore/platform/posix/window/class.h"
 #include "qxcore/platform/posix/window/controls.h"
-#include "qxcore/platform/posix/window/send.h"
-
-namespace platform::controls {
-
-void NotifyCommand(HWND control, UINT code) {
-  model::Send(GetParent(control), WM_COMMAND, MAKEWPARAM(GetDlgCtrlID(control), code),
-              reinterpret_cast<LPARAM>(control));
-}
-
-}  // namespace platform::controls
+#include "qxcore/platform/win32/rich_edit.h"
 
 namespace platform::model {
 

@@ -9,6 +9,7 @@
 #include "qxcore/platform/internal/rich_edit_class.h"
 #include "qxcore/platform/posix/controls/rtf_reader.h"
 #include "qxcore/platform/posix/controls/rtf_writer.h"
+#include "qxcore/platform/win32/rich_edit.h"
 
 namespace platform {
 
@@ -62,7 +63,7 @@ LRESULT GetTextEx(const Control& control, const GETTEXTEX& how, WCHAR* buffer) {
   if (how.codepage != kUtf16 || buffer == nullptr) return 0;
   const std::size_t room = how.cb / sizeof(WCHAR);
   return static_cast<LRESULT>((how.flags & GT_USECRLF) != 0 ? CopyOut(control.Text(), buffer, room)
-                                                           : CopyOut(WithoutLineFeeds(control.Text()), buffer, room));
+                                                            : CopyOut(WithoutLineFeeds(control.Text()), buffer, room));
 }
 
 LRESULT GetTextLengthEx(const Control& control, const GETTEXTLENGTHEX& how) {
@@ -82,7 +83,8 @@ std::string Collect(EDITSTREAM& stream) {
     const std::size_t length = bytes.size();
     bytes.resize(length + kPiece);
     LONG moved = 0;
-    stream.dwError = stream.pfnCallback(stream.dwCookie, reinterpret_cast<BYTE*>(bytes.data() + length), kPiece, &moved);
+    stream.dwError =
+        stream.pfnCallback(stream.dwCookie, reinterpret_cast<BYTE*>(bytes.data() + length), kPiece, &moved);
     bytes.resize(length + static_cast<std::size_t>(std::clamp<LONG>(moved, 0, kPiece)));
     if (stream.dwError != 0 || moved <= 0) return bytes;
   }
@@ -92,8 +94,8 @@ void GiveAll(EDITSTREAM& stream, std::string_view bytes) {
   while (!bytes.empty()) {
     const LONG size = static_cast<LONG>(std::min<std::size_t>(bytes.size(), kPiece));
     LONG moved = 0;
-    stream.dwError = stream.pfnCallback(
-        stream.dwCookie, reinterpret_cast<BYTE*>(const_cast<char*>(bytes.data())), size, &moved);
+    stream.dwError =
+        stream.pfnCallback(stream.dwCookie, reinterpret_cast<BYTE*>(const_cast<char*>(bytes.data())), size, &moved);
     if (stream.dwError != 0 || moved <= 0) return;
     bytes.remove_prefix(static_cast<std::size_t>(std::min(moved, size)));
   }
