@@ -22,8 +22,6 @@
 #include <windows.h>
 
 #include <commctrl.h>
-#include <commdlg.h>
-#include <richedit.h>
 
 // From a header whose other macros are named like members of the library.
 #ifndef GET_X_LPARAM

@@ -155,6 +155,8 @@ QXCORE_API int FoldStringW(DWORD flags, LPCWSTR text, int count, LPWSTR folded, 
 // --- resources and messages ---
 
 QXCORE_API int LoadStringW(HINSTANCE instance, UINT id, LPWSTR buffer, int size);
+// Strings, whose result can be tested for null and nothing else, and what was registered
+// (qxcore/platform/resource_table.h).
 QXCORE_API HRSRC FindResourceW(HMODULE module, LPCWSTR name, LPCWSTR type);
 QXCORE_API HMODULE GetModuleHandleW(LPCWSTR name);
 QXCORE_API DWORD FormatMessageW(DWORD flags, LPCVOID source, DWORD messageId, DWORD language, LPWSTR buffer, DWORD size,
