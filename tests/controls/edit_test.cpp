@@ -1,0 +1,139 @@
+// The class "Edit", one line: typing, selecting, limits, undoing.
+
+#include <gtest/gtest.h>
+
+#include <random>
+
+#include "tests/controls/control_host.h"
+
+namespace {
+
+void Select(HWND edit, int start, int end) { SendMessageW(edit, EM_SETSEL, static_cast<WPARAM>(start), end); }
+
+std::string SelectionOf(HWND edit) {
+  DWORD start = 0, end = 0;
+  SendMessageW(edit, EM_GETSEL, reinterpret_cast<WPARAM>(&start), reinterpret_cast<LPARAM>(&end));
+  return std::to_string(start) + "-" + std::to_string(end);
+}
+
+TEST(Edit, Typing_ReplacesTheSelectionAndTellsTheParent) {
+  ControlHost host;
+  HWND edit = host.Make(WTEXT("Edit"), WTEXT("abcdef"), ES_AUTOHSCROLL);
+  Select(edit, 1, 4);
+  EXPECT_EQ(SelectionOf(edit), "1-4");
+  Type(edit, WTEXT("X"));
+  EXPECT_EQ(TextOf(edit), "aXef");
+  EXPECT_EQ(host.Told(), "command 42 1024, command 42 768");
+  EXPECT_TRUE(SendMessageW(edit, EM_GETMODIFY, 0, 0));
+  Type(edit, WTEXT("\b\b"));
+  EXPECT_EQ(TextOf(edit), "ef");
+  SendMessageW(edit, WM_KEYDOWN, VK_DELETE, 1);
+  EXPECT_EQ(TextOf(edit), "f");
+  SetWindowTextW(edit, WTEXT("new"));
+  EXPECT_FALSE(SendMessageW(edit, EM_GETMODIFY, 0, 0));
+  EXPECT_EQ(SelectionOf(edit), "0-0");
+}
+
+TEST(Edit, StylesAndLimits_DecideWhatIsTaken) {
+  ControlHost host;
+  HWND upper = host.Make(WTEXT("Edit"), nullptr, ES_AUTOHSCROLL | ES_UPPERCASE);
+  Type(upper, WTEXT("aBc"));
+  EXPECT_EQ(TextOf(upper), "ABC");
+  HWND digits = host.Make(WTEXT("Edit"), nullptr, ES_AUTOHSCROLL | ES_NUMBER);
+  Type(digits, WTEXT("1a2"));
+  EXPECT_EQ(TextOf(digits), "12");
+  HWND shortOne = host.Make(WTEXT("Edit"), nullptr, ES_AUTOHSCROLL);
+  SendMessageW(shortOne, EM_LIMITTEXT, 3, 0);
+  EXPECT_EQ(SendMessageW(shortOne, EM_GETLIMITTEXT, 0, 0), 3);
+  host.Told();
+  Type(shortOne, WTEXT("abcd"));
+  EXPECT_EQ(TextOf(shortOne), "abc");
+  EXPECT_NE(host.Told().find("command 42 1281"), std::string::npos);
+  // A program may set more than a person may type.
+  SetWindowTextW(shortOne, WTEXT("abcdef"));
+  EXPECT_EQ(TextOf(shortOne), "abcdef");
+  HWND fixed = host.Make(WTEXT("Edit"), WTEXT("as it is"), ES_AUTOHSCROLL | ES_READONLY);
+  Type(fixed, WTEXT("x\b"));
+  SendMessageW(fixed, WM_KEYDOWN, VK_DELETE, 1);
+  EXPECT_EQ(TextOf(fixed), "as it is");
+  SendMessageW(fixed, EM_SETREADONLY, FALSE, 0);
+  Type(fixed, WTEXT("x"));
+  EXPECT_EQ(TextOf(fixed), "xas it is");
+}
+
+TEST(Edit, Undo_ComesBackAndForth) {
+  ControlHost host;
+  HWND edit = host.Make(WTEXT("Edit"), WTEXT("one"), ES_AUTOHSCROLL);
+  Select(edit, 3, 3);
+  EXPECT_FALSE(SendMessageW(edit, EM_CANUNDO, 0, 0));
+  SendMessageW(edit, EM_REPLACESEL, TRUE, reinterpret_cast<LPARAM>(WTEXT(" two")));
+  EXPECT_EQ(TextOf(edit), "one two");
+  EXPECT_TRUE(SendMessageW(edit, EM_CANUNDO, 0, 0));
+  SendMessageW(edit, EM_UNDO, 0, 0);
+  EXPECT_EQ(TextOf(edit), "one");
+  SendMessageW(edit, EM_UNDO, 0, 0);
+  EXPECT_EQ(TextOf(edit), "one two");
+}
+
+// Keys and characters at random against a plain model of a line with a caret.
+TEST(Edit, RandomKeys_AgreeWithAModel) {
+  ControlHost host;
+  HWND edit = host.Make(WTEXT("Edit"), nullptr, ES_AUTOHSCROLL);
+  std::mt19937 random(7);
+  std::string text;
+  std::size_t caret = 0;
+  for (int step = 0; step < 2000; ++step) {
+    switch (random() % 8) {
+      case 0:
+        SendMessageW(edit, WM_KEYDOWN, VK_LEFT, 1);
+        caret -= caret > 0;
+        break;
+      case 1:
+        SendMessageW(edit, WM_KEYDOWN, VK_RIGHT, 1);
+        caret += caret < text.size();
+        break;
+      case 2:
+        SendMessageW(edit, WM_KEYDOWN, VK_HOME, 1);
+        caret = 0;
+        break;
+      case 3:
+        SendMessageW(edit, WM_KEYDOWN, VK_END, 1);
+        caret = text.size();
+        break;
+      case 4:
+        SendMessageW(edit, WM_KEYDOWN, VK_DELETE, 1);
+        if (caret < text.size()) text.erase(caret, 1);
+        break;
+      case 5:
+        Type(edit, WTEXT("\b"));
+        if (caret > 0) text.erase(--caret, 1);
+        break;
+      default: {
+        const char character = static_cast<char>('a' + random() % 26);
+        const WCHAR wide[] = {static_cast<WCHAR>(character), 0};
+        if (text.size() < 200) {
+          Type(edit, wide);
+          text.insert(caret++, 1, character);
+        }
+        break;
+      }
+    }
+    ASSERT_EQ(TextOf(edit), text) << step;
+    ASSERT_EQ(SelectionOf(edit), std::to_string(caret) + "-" + std::to_string(caret)) << step;
+  }
+}
+
+TEST(Edit, PlacesAndPoints_AreInverse) {
+  ControlHost host;
+  HWND edit = host.Make(WTEXT("Edit"), WTEXT("Wim"), ES_AUTOHSCROLL);
+  int former = -1;
+  for (int place = 0; place < 3; ++place) {
+    const LRESULT at = SendMessageW(edit, EM_POSFROMCHAR, static_cast<WPARAM>(place), 0);
+    const int x = static_cast<short>(LOWORD(at));
+    EXPECT_GT(x, former);
+    former = x;
+    EXPECT_EQ(LOWORD(SendMessageW(edit, EM_CHARFROMPOS, 0, MAKELPARAM(x, 5))), place);
+  }
+}
+
+}  // namespace
