@@ -7,6 +7,7 @@
 #ifndef _WIN32
 
 #include "qxcore/platform/export.h"
+#include "qxcore/platform/win32/message.h"
 
 // --- buttons ---
 
@@ -294,6 +295,7 @@ using LPCOMPAREITEMSTRUCT = COMPAREITEMSTRUCT*;
 #define NM_SETFOCUS (NM_FIRST - 7)
 #define NM_KILLFOCUS (NM_FIRST - 8)
 #define NM_CUSTOMDRAW (NM_FIRST - 12)
+#define NM_SETCURSOR (NM_FIRST - 17)
 #define NM_HOVER (NM_FIRST - 13)
 #define NM_TOOLTIPSCREATED (NM_FIRST - 19)
 #define PBS_SMOOTH 0x1
@@ -321,6 +323,15 @@ struct INITCOMMONCONTROLSEX {
   DWORD dwSize;
   DWORD dwICC;
 };
+
+struct NMMOUSE {
+  NMHDR hdr;
+  DWORD_PTR dwItemSpec;
+  DWORD_PTR dwItemData;
+  POINT pt;
+  LPARAM dwHitInfo;
+};
+using LPNMMOUSE = NMMOUSE*;
 
 struct PBRANGE {
   int iLow;

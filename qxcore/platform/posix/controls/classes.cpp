@@ -1,5 +1,6 @@
 // Which classes of controls the system has.
 
+#include "qxcore/platform/posix/controls/control.h"
 #include "qxcore/platform/posix/controls/painting.h"
 #include "qxcore/platform/posix/controls/rich_edit.h"
 #include "qxcore/platform/posix/window/class.h"
@@ -31,8 +32,10 @@ void AddControlClasses() {
   AddSystemClass(WTEXT("ScrollBar"), kRedraws | CS_PARENTDC, &ScrollBarProcedure, kState, arrow, nullptr);
   for (const LPCWSTR name : {MSFTEDIT_CLASS, RICHEDIT_CLASSW})
     AddSystemClass(name, CS_DBLCLKS, &rich::RichEditProcedure, sizeof(LONG_PTR), arrow, nullptr);
-  AddSystemClass(PROGRESS_CLASSW, CS_VREDRAW | CS_HREDRAW, &ProgressProcedure, kState, arrow, nullptr);
-  AddSystemClass(STATUSCLASSNAMEW, CS_DBLCLKS | CS_VREDRAW, &StatusBarProcedure, kState, arrow, face);
+  AddSystemClass(PROGRESS_CLASSW, CS_GLOBALCLASS | CS_HREDRAW | CS_VREDRAW, &ProgressProcedure, kRecordBytes, arrow,
+                 nullptr);
+  AddSystemClass(STATUSCLASSNAMEW, CS_GLOBALCLASS | CS_DBLCLKS | CS_VREDRAW, &StatusBarProcedure, kRecordBytes, arrow,
+                 face);
 }
 
 }  // namespace platform::model
@@ -40,5 +43,6 @@ void AddControlClasses() {
 // The classes are there from the start.
 void InitCommonControls() {}
 BOOL InitCommonControlsEx(const INITCOMMONCONTROLSEX* classes) {
-  return classes != nullptr && classes->dwSize == sizeof *classes;
+  if (classes != nullptr && classes->dwSize == sizeof *classes) return TRUE;
+  return platform::model::Fail(ERROR_INVALID_PARAMETER);
 }

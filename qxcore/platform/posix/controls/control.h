@@ -58,4 +58,8 @@ class Painting {
   HGDIOBJ m_formerFont = nullptr;
 };
 
+// The classes' procedures.
+LRESULT CALLBACK StatusBarProcedure(HWND control, UINT message, WPARAM wParam, LPARAM lParam);
+LRESULT CALLBACK ProgressProcedure(HWND control, UINT message, WPARAM wParam, LPARAM lParam);
+
 }  // namespace platform::controls

@@ -1,124 +1,135 @@
-// The class "msctls_progress32".
+// The class "msctls_progress32": how far some work is.
 
+#include <algorithm>
+#include <cstdint>
 #include <utility>
 
-#include "qxcore/platform/posix/controls/painting.h"
+#include "qxcore/platform/posix/controls/control.h"
 
 namespace platform::controls {
+
 namespace {
 
-struct Progress : model::OnModelHeap {
-  int lowest = 0, highest = 100, position = 0, step = 10;
+struct Progress {
+  int low = 0, high = 100, position = 0, step = 10;
   COLORREF bar = CLR_DEFAULT, background = CLR_DEFAULT;
 };
 
-int Move(HWND window, Progress* progress, int position) {
-  const int old = progress->position;
-  progress->position = std::clamp(position, progress->lowest, progress->highest);
-  if (progress->position != old) InvalidateRect(window, nullptr, FALSE);
-  return old;
-}
+// --- positions: each returns the former one ---
 
-LRESULT SetRange(HWND window, Progress* progress, int lowest, int highest) {
-  const LRESULT old = MAKELRESULT(progress->lowest, progress->highest);
-  progress->lowest = lowest;
-  progress->highest = std::max(lowest, highest);
-  progress->position = std::clamp(progress->position, progress->lowest, progress->highest);
+LRESULT Move(HWND window, Progress& progress, std::int64_t position) {
+  const auto inRange = std::max<std::int64_t>(progress.low, std::min<std::int64_t>(position, progress.high));
   InvalidateRect(window, nullptr, FALSE);
-  return old;
+  return std::exchange(progress.position, static_cast<int>(inRange));
 }
 
-COLORREF SetColor(HWND window, COLORREF* color, LPARAM wanted) {
+// Behind the end it begins anew.
+LRESULT StepIt(HWND window, Progress& progress) {
+  std::int64_t next = std::int64_t{progress.position} + progress.step;
+  if (next > progress.high) next = progress.low;
+  return Move(window, progress, next);
+}
+
+// Returns the former range, its ends cut to 16 bits.
+LRESULT SetRange(HWND window, Progress& progress, int low, int high) {
+  const LRESULT former = static_cast<LRESULT>(static_cast<DWORD>(MAKELONG(progress.low, progress.high)));
+  progress.low = low;
+  progress.high = high;
+  Move(window, progress, progress.position);
+  return former;
+}
+
+LRESULT GetRange(const Progress& progress, bool low, PBRANGE* range) {
+  if (range != nullptr) *range = {progress.low, progress.high};
+  return low ? progress.low : progress.high;
+}
+
+LRESULT SetColor(HWND window, COLORREF* color, LPARAM lParam) {
   InvalidateRect(window, nullptr, FALSE);
-  return std::exchange(*color, static_cast<COLORREF>(wanted));
+  return static_cast<LRESULT>(std::exchange(*color, static_cast<COLORREF>(lParam)));
 }
 
-void Fill(HDC dc, const RECT& rect, COLORREF color, int usual) {
-  if (color == CLR_DEFAULT) {
-    FillRect(dc, &rect, GetSysColorBrush(usual));
-    return;
-  }
-  const HBRUSH brush = CreateSolidBrush(color);
-  FillRect(dc, &rect, brush);
-  DeleteObject(brush);
+// --- painting ---
+
+void Fill(HDC dc, const RECT& rect, COLORREF color, int otherwise) {
+  SetBkColor(dc, color == CLR_DEFAULT ? GetSysColor(otherwise) : color);
+  ExtTextOutW(dc, 0, 0, ETO_OPAQUE, &rect, nullptr, 0, nullptr);
 }
 
-void Paint(HWND window, const Progress* progress, HDC dc) {
-  RECT rect;
-  GetClientRect(window, &rect);
-  DrawEdge(dc, &rect, BDR_SUNKENOUTER, BF_RECT | BF_ADJUST);
-  const bool isVertical = GetWindowLongW(window, GWL_STYLE) & PBS_VERTICAL;
-  const int length = isVertical ? model::Height(rect) : model::Width(rect);
-  const std::int64_t range = static_cast<std::int64_t>(progress->highest) - progress->lowest;
-  const std::int64_t reached = static_cast<std::int64_t>(progress->position) - progress->lowest;
-  const int done = range > 0 ? static_cast<int>(length * reached / range) : 0;
-  RECT full = rect, rest = rect;
+// The filled part grows to the right, or upward; the rest is painted beside it, nothing twice.
+void Draw(HWND window, HDC dc, const Progress& progress) {
+  RECT area = ClientOf(window);
+  DrawEdge(dc, &area, BDR_SUNKENOUTER, BF_RECT | BF_ADJUST);
+  const bool isVertical = (StyleOf(window) & PBS_VERTICAL) != 0;
+  const std::int64_t length = isVertical ? area.bottom - area.top : area.right - area.left;
+  const std::int64_t range = std::int64_t{progress.high} - progress.low;
+  const int filled =
+      range > 0 ? static_cast<int>(length * (std::int64_t{progress.position} - progress.low) / range) : 0;
+  RECT done = area, rest = area;
   if (isVertical) {
-    full.top = rest.bottom = rect.bottom - done;
+    done.top = rest.bottom = area.bottom - filled;
   } else {
-    full.right = rest.left = rect.left + done;
+    done.right = rest.left = area.left + filled;
   }
-  Fill(dc, rest, progress->background, COLOR_3DFACE);
-  Fill(dc, full, progress->bar, COLOR_HIGHLIGHT);
+  Fill(dc, done, progress.bar, COLOR_HIGHLIGHT);
+  Fill(dc, rest, progress.background, COLOR_WINDOW);
+}
+
+LRESULT OnPaint(HWND window, const Progress& progress, WPARAM wParam) {
+  const Painting dc(window, wParam, nullptr);
+  Draw(window, dc, progress);
+  return 0;
+}
+
+LRESULT Handle(HWND window, Progress& progress, UINT message, WPARAM wParam, LPARAM lParam) {
+  const int number = static_cast<int>(wParam);
+  switch (message) {
+    case PBM_SETRANGE:
+      return SetRange(window, progress, LOWORD(lParam), HIWORD(lParam));
+    case PBM_SETRANGE32:
+      return SetRange(window, progress, number, static_cast<int>(lParam));
+    case PBM_GETRANGE:
+      return GetRange(progress, wParam != 0, reinterpret_cast<PBRANGE*>(lParam));
+    case PBM_SETPOS:
+      return Move(window, progress, number);
+    case PBM_GETPOS:
+      return progress.position;
+    case PBM_DELTAPOS:
+      return Move(window, progress, std::int64_t{progress.position} + number);
+    case PBM_SETSTEP:
+      return std::exchange(progress.step, number);
+    case PBM_GETSTEP:
+      return progress.step;
+    case PBM_STEPIT:
+      return StepIt(window, progress);
+    case PBM_SETBARCOLOR:
+      return SetColor(window, &progress.bar, lParam);
+    case PBM_SETBKCOLOR:
+      return SetColor(window, &progress.background, lParam);
+    case PBM_GETBARCOLOR:
+      return static_cast<LRESULT>(progress.bar);
+    case PBM_GETBKCOLOR:
+      return static_cast<LRESULT>(progress.background);
+    case WM_PAINT:
+    case WM_PRINTCLIENT:
+      return OnPaint(window, progress, wParam);
+    case WM_ERASEBKGND:
+      return TRUE;
+    case WM_SYSCOLORCHANGE:
+      return InvalidateRect(window, nullptr, FALSE), 0;
+    default:
+      return DefWindowProcW(window, message, wParam, lParam);
+  }
 }
 
 }  // namespace
 
 LRESULT CALLBACK ProgressProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
-  Progress* progress = StateOf<Progress>(window);
-  if (progress == nullptr && message != WM_NCCREATE) return DefWindowProcW(window, message, wParam, lParam);
-  switch (message) {
-    case WM_NCCREATE:
-      if (!MakeState<Progress>(window)) return FALSE;
-      break;
-    case WM_NCDESTROY:
-      FreeState<Progress>(window);
-      break;
-    case WM_ERASEBKGND:
-      return TRUE;
-    case WM_PAINT: {
-      PAINTSTRUCT paint;
-      const HDC dc = BeginPaint(window, &paint);
-      if (dc != nullptr) Paint(window, progress, dc);
-      EndPaint(window, &paint);
-      return 0;
-    }
-    case WM_PRINTCLIENT:
-      Paint(window, progress, reinterpret_cast<HDC>(wParam));
-      return 0;
-    case PBM_SETRANGE:
-      return SetRange(window, progress, LOWORD(lParam), HIWORD(lParam));
-    case PBM_SETRANGE32:
-      return SetRange(window, progress, static_cast<int>(wParam), static_cast<int>(lParam));
-    case PBM_GETRANGE:
-      if (lParam) *reinterpret_cast<PBRANGE*>(lParam) = {progress->lowest, progress->highest};
-      return wParam ? progress->lowest : progress->highest;
-    case PBM_SETPOS:
-      return Move(window, progress, static_cast<int>(wParam));
-    case PBM_DELTAPOS:
-      return Move(window, progress, progress->position + static_cast<int>(wParam));
-    case PBM_SETSTEP:
-      return std::exchange(progress->step, static_cast<int>(wParam));
-    case PBM_STEPIT: {
-      // Behind the end it begins anew.
-      const int next = progress->position + progress->step;
-      return Move(window, progress, next > progress->highest ? progress->lowest : next);
-    }
-    case PBM_GETPOS:
-      return progress->position;
-    case PBM_GETSTEP:
-      return progress->step;
-    case PBM_SETBARCOLOR:
-      return SetColor(window, &progress->bar, lParam);
-    case PBM_SETBKCOLOR:
-      return SetColor(window, &progress->background, lParam);
-    case PBM_GETBARCOLOR:
-      return progress->bar;
-    case PBM_GETBKCOLOR:
-      return progress->background;
-    default:
-      break;
-  }
+  if (message == WM_CREATE) return MakeRecord<Progress>(window) ? 0 : -1;
+  Progress* progress = RecordOf<Progress>(window);
+  if (progress == nullptr) return DefWindowProcW(window, message, wParam, lParam);
+  if (message != WM_NCDESTROY) return Handle(window, *progress, message, wParam, lParam);
+  EndRecord<Progress>(window);
   return DefWindowProcW(window, message, wParam, lParam);
 }
 

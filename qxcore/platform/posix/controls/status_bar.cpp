@@ -1,334 +1,256 @@
-// The class "msctls_statusbar32".
+// The class "msctls_statusbar32": parts with texts at the bottom of a window.
 
-#include <utility>
+#include <algorithm>
 
-#include "qxcore/platform/posix/controls/painting.h"
-#include "qxcore/platform/posix/window/send.h"
+#include "qxcore/platform/posix/controls/control.h"
+#include "qxcore/platform/posix/controls/status_bar_paint.h"
+#include "qxcore/platform/posix/controls/status_bar_parts.h"
 
 namespace platform::controls {
+
 namespace {
 
-using model::Send;
-using model::Text;
+void Repaint(HWND window) { InvalidateRect(window, nullptr, FALSE); }
 
-constexpr int kHorizontalBorder = 0, kVerticalBorder = 2, kGap = 2;  // pixels
-constexpr int kMostParts = 256;
+// --- size and place ---
 
-struct Part {
-  int right = -1;  // -1: up to the end of the bar
-  WORD style = 0;
-  Text text;
-  LPARAM ownerData = 0;  // of SBT_OWNERDRAW
-};
-
-struct StatusBar : model::OnModelHeap {
-  model::List<Part> parts = model::List<Part>(1);
-  Part simple;
-  bool isSimple = false;
-  int minHeight = 0;
-  HFONT font = nullptr;
-  COLORREF background = CLR_DEFAULT;
-};
-
-DWORD StyleOf(HWND window) { return static_cast<DWORD>(GetWindowLongW(window, GWL_STYLE)); }
-
-// The grip shows where the parent can be sized.
-bool HasGrip(HWND window) { return (StyleOf(window) & SBARS_SIZEGRIP) && !IsZoomed(GetParent(window)); }
-
-int FontHeight(const StatusBar* bar) {
-  const HDC dc = GetDC(nullptr);
-  const HGDIOBJ old = SelectObject(dc, bar->font != nullptr ? bar->font : InterfaceFont());
+int FontHeight(HWND window, HFONT font) {
+  const HDC dc = GetDC(window);
+  const HGDIOBJ former = SelectObject(dc, font);
   TEXTMETRICW metrics{};
   GetTextMetricsW(dc, &metrics);
-  SelectObject(dc, old);
-  ReleaseDC(nullptr, dc);
+  SelectObject(dc, former);
+  ReleaseDC(window, dc);
   return metrics.tmHeight;
 }
 
-RECT PartRect(HWND window, const StatusBar* bar, int index) {
-  RECT client;
-  GetClientRect(window, &client);
-  RECT rect{kHorizontalBorder, client.top + kVerticalBorder, 0, client.bottom};
-  if (bar->isSimple || index < 0) {
-    rect.right = client.right;
-    return rect;
-  }
-  const auto at = static_cast<std::size_t>(index);
-  if (at > 0) rect.left = bar->parts[at - 1].right + kGap;
-  rect.right = bar->parts[at].right == -1 ? client.right : bar->parts[at].right;
-  rect.right = std::max(rect.right, rect.left);
-  return rect;
+// The font's height with room around it, at least the minimum of the drawing area and twice the border.
+int WantedHeight(HWND window, const StatusBar& bar) {
+  return std::max(FontHeight(window, bar.font) + 8, bar.minHeight + 2 * kBarTopBorder);
 }
 
-Part* FindPart(StatusBar* bar, UINT index) {
-  if (index == SB_SIMPLEID) return &bar->simple;
-  return index < bar->parts.size() ? &bar->parts[index] : nullptr;
-}
-
-bool SetParts(HWND window, StatusBar* bar, int count, const int* edges) {
-  if (count < 1 || count > kMostParts || edges == nullptr) return false;
-  return model::OrNoMemory<bool>(false, [&] {
-    bar->parts.resize(static_cast<std::size_t>(count));
-    for (int i = 0; i < count; ++i) bar->parts[static_cast<std::size_t>(i)].right = edges[i];
-    InvalidateRect(window, nullptr, FALSE);
-    return true;
-  });
-}
-
-bool SetPartText(HWND window, StatusBar* bar, WPARAM wParam, LPARAM lParam) {
-  const UINT index = LOWORD(wParam) & 0xFF;
-  Part* part = FindPart(bar, index);
-  if (part == nullptr) return false;
-  return model::OrNoMemory<bool>(false, [&] {
-    const WORD style = LOWORD(wParam) & 0xFF00;
-    if (style & SBT_OWNERDRAW) {
-      part->text.clear();
-      part->ownerData = lParam;
-    } else {
-      Text text = lParam != 0 ? Text(reinterpret_cast<LPCWSTR>(lParam)) : Text();
-      if (text == part->text && style == part->style) return true;
-      part->text = std::move(text);
-    }
-    part->style = style;
-    const RECT rect = PartRect(window, bar, index == SB_SIMPLEID ? -1 : static_cast<int>(index));
-    InvalidateRect(window, &rect, FALSE);
-    return true;
-  });
-}
-
-LRESULT PartText(StatusBar* bar, WPARAM wParam, LPWSTR buffer) {
-  const Part* part = FindPart(bar, LOWORD(wParam) & 0xFF);
-  if (part == nullptr) return 0;
-  if (buffer != nullptr) {
-    std::copy(part->text.begin(), part->text.end(), buffer);
-    buffer[part->text.size()] = 0;
-  }
-  return MAKELRESULT(part->text.size(), part->style);
-}
-
-void DrawByOwner(HWND window, HDC dc, const Part& part, const RECT& rect, int index) {
-  DRAWITEMSTRUCT item{};
-  item.CtlID = static_cast<UINT>(GetDlgCtrlID(window));
-  item.itemID = static_cast<UINT>(index);
-  item.hwndItem = window;
-  item.hDC = dc;
-  item.rcItem = rect;
-  item.itemData = static_cast<ULONG_PTR>(part.ownerData);
-  Send(GetParent(window), WM_DRAWITEM, item.CtlID, reinterpret_cast<LPARAM>(&item));
-}
-
-// A tab centres what follows, a second one sets it at the right.
-void PaintTexts(HDC dc, const StatusBar* bar, const Part& part, RECT rect) {
-  const UINT kAligned[] = {DT_LEFT, DT_CENTER, DT_RIGHT};
-  std::size_t start = 0;
-  for (const UINT align : kAligned) {
-    const std::size_t tab = part.text.find(u'\t', start);
-    const Text piece = part.text.substr(start, tab == Text::npos ? tab : tab - start);
-    PaintText(dc, rect, piece.c_str(), COLOR_BTNTEXT, bar->font, align | DT_SINGLELINE | DT_VCENTER | DT_NOPREFIX);
-    if (tab == Text::npos) return;
-    start = tab + 1;
-  }
-}
-
-void PaintPart(HWND window, const StatusBar* bar, HDC dc, const Part& part, RECT rect, int index) {
-  if (!(part.style & SBT_NOBORDERS))
-    DrawEdge(dc, &rect, part.style & SBT_POPOUT ? BDR_RAISEDOUTER : BDR_SUNKENOUTER, BF_RECT);
-  rect = model::Inflated(rect, -1, -1);
-  if (part.style & SBT_OWNERDRAW) {
-    DrawByOwner(window, dc, part, rect, index);
-    return;
-  }
-  rect.left += 2;
-  rect.right -= 2;
-  PaintTexts(dc, bar, part, rect);
-}
-
-void Paint(HWND window, const StatusBar* bar, HDC dc) {
-  RECT rect;
-  GetClientRect(window, &rect);
-  const HBRUSH brush = bar->background != CLR_DEFAULT ? CreateSolidBrush(bar->background) : nullptr;
-  FillRect(dc, &rect, brush != nullptr ? brush : GetSysColorBrush(COLOR_3DFACE));
-  if (brush != nullptr) DeleteObject(brush);
-  if (bar->isSimple) {
-    PaintPart(window, bar, dc, bar->simple, PartRect(window, bar, -1), SB_SIMPLEID);
-  } else {
-    for (std::size_t i = 0; i < bar->parts.size(); ++i)
-      PaintPart(window, bar, dc, bar->parts[i], PartRect(window, bar, static_cast<int>(i)), static_cast<int>(i));
-  }
-  if (!HasGrip(window)) return;
-  rect.left = rect.right - GetSystemMetrics(SM_CXVSCROLL);
-  rect.top = rect.bottom - GetSystemMetrics(SM_CYHSCROLL);
-  DrawFrameControl(dc, &rect, DFC_SCROLL, DFCS_SCROLLSIZEGRIP);
-}
-
-// At the parent's lower edge, unless the styles leave the place to the parent.
-void Place(HWND window, const StatusBar* bar) {
+// At the bottom of the parent, as wide as it; the CCS_ styles of the common controls leave its place or its size alone.
+void PlaceAtBottom(HWND window, const StatusBar& bar) {
   const DWORD style = StyleOf(window);
   if (style & CCS_NORESIZE) return;
-  RECT parent;
-  GetClientRect(GetParent(window), &parent);
-  const int height = std::max(FontHeight(bar) + 4, bar->minHeight) + kVerticalBorder;
-  const int top = style & CCS_NOPARENTALIGN ? 0 : parent.bottom - height;
-  SetWindowPos(window, nullptr, 0, top, parent.right, height, SWP_NOZORDER | SWP_NOACTIVATE);
+  const int height = WantedHeight(window, bar);
+  if (style & CCS_NOPARENTALIGN) {
+    RECT rect;
+    GetWindowRect(window, &rect);
+    SetWindowPos(window, nullptr, 0, 0, rect.right - rect.left, height, SWP_NOMOVE | SWP_NOZORDER | SWP_NOACTIVATE);
+    return;
+  }
+  const RECT area = ClientOf(GetParent(window));
+  SetWindowPos(window, nullptr, 0, area.bottom - height, area.right, height, SWP_NOZORDER | SWP_NOACTIVATE);
 }
 
-LRESULT HitTest(HWND window, WPARAM wParam, LPARAM lParam) {
-  const LRESULT hit = DefWindowProcW(window, WM_NCHITTEST, wParam, lParam);
-  if (hit != HTCLIENT || !HasGrip(window)) return hit;
-  RECT rect;
-  GetClientRect(window, &rect);
-  POINT point = model::PointOf(lParam);
-  ScreenToClient(window, &point);
-  const bool isGrip =
-      point.x >= rect.right - GetSystemMetrics(SM_CXVSCROLL) && point.y >= rect.bottom - GetSystemMetrics(SM_CYHSCROLL);
-  return isGrip ? HTBOTTOMRIGHT : hit;
+// --- life ---
+
+LRESULT OnCreate(HWND window, const CREATESTRUCTW& create) {
+  StatusBar* bar = new StatusBar;
+  SetWindowLongPtrW(window, 0, reinterpret_cast<LONG_PTR>(bar));
+  bar->ownFont = bar->font = static_cast<HFONT>(GetStockObject(DEFAULT_GUI_FONT));
+  bar->parts[0].Set(0, reinterpret_cast<LPARAM>(create.lpszName));
+  PlaceAtBottom(window, *bar);
+  return 0;
 }
 
-LRESULT Notify(HWND window, UINT code) {
-  NMHDR header{window, static_cast<UINT_PTR>(GetDlgCtrlID(window)), code};
-  return Send(GetParent(window), WM_NOTIFY, header.idFrom, reinterpret_cast<LPARAM>(&header));
+LRESULT OnSetFont(HWND window, StatusBar& bar, HFONT font, bool redraw) {
+  bar.font = font != nullptr ? font : bar.ownFont;
+  PlaceAtBottom(window, bar);
+  if (redraw) Repaint(window);
+  return 0;
 }
 
-void SetSimple(HWND window, StatusBar* bar, bool isSimple) {
-  if (bar->isSimple == isSimple) return;
-  bar->isSimple = isSimple;
-  InvalidateRect(window, nullptr, FALSE);
-  Notify(window, SBN_SIMPLEMODECHANGE);
+// --- parts and texts ---
+
+LRESULT OnSetParts(HWND window, StatusBar& bar, int count, const int* edges) {
+  if (!bar.SetParts(count, edges)) return FALSE;
+  Repaint(window);
+  return TRUE;
 }
 
-void ReadEdges(const StatusBar* bar, WPARAM count, int* edges) {
-  for (std::size_t i = 0; i < bar->parts.size() && i < count; ++i) edges[i] = bar->parts[i].right;
+LRESULT OnGetParts(const StatusBar& bar, int capacity, int* edges) {
+  const int count = static_cast<int>(bar.PartCount());
+  if (edges == nullptr) return count;
+  for (int i = 0; i < std::min(capacity, count); ++i) edges[i] = bar.parts[static_cast<std::size_t>(i)].rightEdge;
+  return count;
 }
 
-LRESULT SetFirstText(HWND window, StatusBar* bar, LPARAM lParam) {
-  return SetPartText(window, bar, bar->parts.front().style & ~static_cast<WORD>(SBT_OWNERDRAW), lParam);
+// The low byte names the part, the rest is the type.
+LRESULT OnSetText(HWND window, StatusBar& bar, WPARAM wParam, LPARAM shown) {
+  const UINT index = LOBYTE(wParam);
+  BarPart* part = bar.PartToSet(index);
+  if (part == nullptr) return FALSE;
+  part->Set(static_cast<UINT>(wParam & 0xFF00), shown);
+  if ((part == &bar.simple) != bar.isSimple) return TRUE;
+  const RECT rect = bar.PartRect(index, ClientOf(window));
+  InvalidateRect(window, &rect, FALSE);
+  return TRUE;
 }
 
-LRESULT FirstText(const StatusBar* bar, WPARAM capacity, LPWSTR buffer) {
+// The length in the low word, the type in the high one.
+LRESULT LengthAndType(const BarPart& part) { return MAKELONG(part.text.size(), part.type); }
+
+LRESULT OnGetTextLength(const StatusBar& bar, UINT index) {
+  const BarPart* part = bar.ShownPart(index);
+  return part != nullptr ? LengthAndType(*part) : 0;
+}
+
+LRESULT OnGetText(const StatusBar& bar, UINT index, LPWSTR buffer) {
+  const BarPart* part = bar.ShownPart(index);
+  if (part == nullptr) return 0;
+  if (part->type & SBT_OWNERDRAW) return part->ownerData;
+  if (buffer != nullptr) buffer[part->text.copy(buffer, Text::npos)] = 0;
+  return LengthAndType(*part);
+}
+
+// The window's text, cut to the buffer.
+LRESULT OnGetWindowText(const StatusBar& bar, WPARAM capacity, LPWSTR buffer) {
   if (capacity == 0 || buffer == nullptr) return 0;
-  const Text& text = bar->parts.front().text;
-  const std::size_t count = std::min<std::size_t>(text.size(), capacity - 1);
-  std::copy_n(text.data(), count, buffer);
+  const std::size_t count = bar.parts[0].text.copy(buffer, capacity - 1);
   buffer[count] = 0;
   return static_cast<LRESULT>(count);
 }
 
-LRESULT OwnMessage(HWND window, StatusBar* bar, UINT message, WPARAM wParam, LPARAM lParam, bool* isOwn) {
-  *isOwn = true;
+LRESULT OnGetRect(HWND window, const StatusBar& bar, UINT index, RECT* rect) {
+  if (rect == nullptr || bar.ShownPart(index) == nullptr) return FALSE;
+  *rect = bar.PartRect(index, ClientOf(window));
+  return TRUE;
+}
+
+LRESULT OnGetBorders(int* borders) {
+  if (borders == nullptr) return FALSE;
+  borders[0] = 0;
+  borders[1] = kBarTopBorder;
+  borders[2] = kBarGap;
+  return TRUE;
+}
+
+// --- modes ---
+
+LRESULT SendNotify(HWND window, NMHDR* header, UINT code) {
+  *header = {window, static_cast<UINT_PTR>(GetWindowLongPtrW(window, GWLP_ID)), code};
+  return SendMessageW(GetParent(window), WM_NOTIFY, header->idFrom, reinterpret_cast<LPARAM>(header));
+}
+
+LRESULT OnSimple(HWND window, StatusBar& bar, bool isSimple) {
+  if (bar.isSimple == isSimple) return TRUE;
+  bar.isSimple = isSimple;
+  Repaint(window);
+  NMHDR header;
+  SendNotify(window, &header, SBN_SIMPLEMODECHANGE);
+  return TRUE;
+}
+
+LRESULT OnSetBackground(HWND window, StatusBar& bar, COLORREF color) {
+  const COLORREF former = bar.background;
+  bar.background = color;
+  Repaint(window);
+  return static_cast<LRESULT>(former);
+}
+
+// --- mouse ---
+
+LRESULT OnMouse(HWND window, const StatusBar& bar, UINT code, LPARAM lParam) {
+  NMMOUSE mouse{};
+  mouse.pt = PointOf(lParam);
+  const int part = bar.isSimple ? SB_SIMPLEID : bar.PartAt(mouse.pt, ClientOf(window));
+  mouse.dwItemSpec = static_cast<DWORD_PTR>(part);
+  return SendNotify(window, &mouse.hdr, code);
+}
+
+LRESULT OnHitTest(HWND window, LPARAM lParam) {
+  POINT point = PointOf(lParam);
+  const RECT client = ClientOf(window);
+  ScreenToClient(window, &point);
+  const bool isOnGrip = PtInRect(&client, point) && point.x >= client.right - GetSystemMetrics(SM_CXVSCROLL);
+  if (isOnGrip && HasGrip(window)) return HTBOTTOMRIGHT;
+  return DefWindowProcW(window, WM_NCHITTEST, 0, lParam);
+}
+
+// --- painting ---
+
+LRESULT OnPaint(HWND window, const StatusBar& bar, WPARAM wParam) {
+  const Painting dc(window, wParam, bar.font);
+  PaintStatusBar(window, dc, bar);
+  return 0;
+}
+
+LRESULT Handle(HWND window, StatusBar& bar, UINT message, WPARAM wParam, LPARAM lParam) {
   switch (message) {
     case SB_SETPARTS:
-      return SetParts(window, bar, static_cast<int>(wParam), reinterpret_cast<const int*>(lParam));
+      return OnSetParts(window, bar, static_cast<int>(wParam), reinterpret_cast<const int*>(lParam));
     case SB_GETPARTS:
-      if (lParam) ReadEdges(bar, wParam, reinterpret_cast<int*>(lParam));
-      return static_cast<LRESULT>(bar->parts.size());
+      return OnGetParts(bar, static_cast<int>(wParam), reinterpret_cast<int*>(lParam));
     case SB_SETTEXTW:
-      return SetPartText(window, bar, wParam, lParam);
+      return OnSetText(window, bar, wParam, lParam);
     case SB_GETTEXTW:
-      return PartText(bar, wParam, reinterpret_cast<LPWSTR>(lParam));
+      return OnGetText(bar, static_cast<UINT>(wParam), reinterpret_cast<LPWSTR>(lParam));
     case SB_GETTEXTLENGTHW:
-      return PartText(bar, wParam, nullptr);
+      return OnGetTextLength(bar, static_cast<UINT>(wParam));
     case SB_GETRECT:
-      if (wParam >= bar->parts.size()) return FALSE;
-      *reinterpret_cast<RECT*>(lParam) = PartRect(window, bar, static_cast<int>(wParam));
-      return TRUE;
-    case SB_GETBORDERS: {
-      int* borders = reinterpret_cast<int*>(lParam);
-      borders[0] = kHorizontalBorder;
-      borders[1] = kVerticalBorder;
-      borders[2] = kGap;
-      return TRUE;
-    }
+      return OnGetRect(window, bar, static_cast<UINT>(wParam), reinterpret_cast<RECT*>(lParam));
+    case SB_GETBORDERS:
+      return OnGetBorders(reinterpret_cast<int*>(lParam));
     case SB_SETMINHEIGHT:
-      bar->minHeight = static_cast<int>(wParam);
-      return TRUE;
+      return bar.minHeight = static_cast<int>(wParam), TRUE;
     case SB_SIMPLE:
-      SetSimple(window, bar, wParam != 0);
-      return TRUE;
+      return OnSimple(window, bar, wParam != 0);
     case SB_ISSIMPLE:
-      return bar->isSimple;
+      return bar.isSimple;
     case SB_SETBKCOLOR:
-      InvalidateRect(window, nullptr, FALSE);
-      return static_cast<LRESULT>(std::exchange(bar->background, static_cast<COLORREF>(lParam)));
-    case SB_SETUNICODEFORMAT:
+      return OnSetBackground(window, bar, static_cast<COLORREF>(lParam));
     case SB_GETUNICODEFORMAT:
       return TRUE;
+    case WM_SETTEXT:
+      return OnSetText(window, bar, 0, lParam);
+    case WM_GETTEXT:
+      return OnGetWindowText(bar, wParam, reinterpret_cast<LPWSTR>(lParam));
+    case WM_GETTEXTLENGTH:
+      return static_cast<LRESULT>(bar.parts[0].text.size());
+    case WM_SETFONT:
+      return OnSetFont(window, bar, reinterpret_cast<HFONT>(wParam), LOWORD(lParam) != 0);
+    case WM_GETFONT:
+      return reinterpret_cast<LRESULT>(bar.font);
+    case WM_SIZE:
+      return PlaceAtBottom(window, bar), Repaint(window), 0;
+    case WM_PAINT:
+    case WM_PRINTCLIENT:
+      return OnPaint(window, bar, wParam);
+    case WM_ERASEBKGND:
+      return TRUE;
+    case WM_SYSCOLORCHANGE:
+      return Repaint(window), 0;
+    case WM_NCHITTEST:
+      return OnHitTest(window, lParam);
+    case WM_LBUTTONUP:
+      return OnMouse(window, bar, NM_CLICK, lParam);
+    case WM_LBUTTONDBLCLK:
+      return OnMouse(window, bar, NM_DBLCLK, lParam);
+    case WM_RBUTTONUP:
+      return OnMouse(window, bar, NM_RCLICK, lParam);
+    case WM_RBUTTONDBLCLK:
+      return OnMouse(window, bar, NM_RDBLCLK, lParam);
     default:
-      *isOwn = false;
-      return 0;
+      return DefWindowProcW(window, message, wParam, lParam);
   }
 }
 
 }  // namespace
 
 LRESULT CALLBACK StatusBarProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
-  StatusBar* bar = StateOf<StatusBar>(window);
-  if (bar == nullptr && message != WM_NCCREATE) return DefWindowProcW(window, message, wParam, lParam);
-  bool isOwn = false;
-  if (bar != nullptr) {
-    const LRESULT result = OwnMessage(window, bar, message, wParam, lParam, &isOwn);
-    if (isOwn) return result;
+  constexpr LRESULT kRefused = -1;
+  if (message == WM_CREATE) {
+    return model::OrNoMemory(kRefused, [=] { return OnCreate(window, *reinterpret_cast<CREATESTRUCTW*>(lParam)); });
   }
-  switch (message) {
-    case WM_NCCREATE:
-      if (!MakeState<StatusBar>(window)) return FALSE;
-      break;
-    case WM_NCDESTROY:
-      FreeState<StatusBar>(window);
-      break;
-    case WM_CREATE: {
-      const auto* create = reinterpret_cast<const CREATESTRUCTW*>(lParam);
-      if (create->lpszName != nullptr && !IS_INTRESOURCE(create->lpszName))
-        SetFirstText(window, bar, reinterpret_cast<LPARAM>(create->lpszName));
-      Place(window, bar);
-      return 0;
-    }
-    case WM_SIZE:
-      Place(window, bar);
-      InvalidateRect(window, nullptr, FALSE);
-      return 0;
-    case WM_NCHITTEST:
-      return HitTest(window, wParam, lParam);
-    case WM_NCLBUTTONDOWN:
-      // The grip sizes the parent.
-      if (wParam == HTBOTTOMRIGHT) return Send(GetParent(window), message, wParam, lParam);
-      break;
-    case WM_ERASEBKGND:
-      return TRUE;
-    case WM_PAINT: {
-      PAINTSTRUCT paint;
-      const HDC dc = BeginPaint(window, &paint);
-      if (dc != nullptr) Paint(window, bar, dc);
-      EndPaint(window, &paint);
-      return 0;
-    }
-    case WM_PRINTCLIENT:
-      Paint(window, bar, reinterpret_cast<HDC>(wParam));
-      return 0;
-    case WM_SETFONT:
-      bar->font = reinterpret_cast<HFONT>(wParam);
-      if (LOWORD(lParam)) InvalidateRect(window, nullptr, FALSE);
-      return 0;
-    case WM_GETFONT:
-      return reinterpret_cast<LRESULT>(bar->font != nullptr ? bar->font : InterfaceFont());
-    case WM_SETTEXT:
-      return SetFirstText(window, bar, lParam);
-    case WM_GETTEXT:
-      return FirstText(bar, wParam, reinterpret_cast<LPWSTR>(lParam));
-    case WM_GETTEXTLENGTH:
-      return static_cast<LRESULT>(bar->parts.front().text.size());
-    case WM_LBUTTONUP:
-      Notify(window, NM_CLICK);
-      break;
-    case WM_LBUTTONDBLCLK:
-      Notify(window, NM_DBLCLK);
-      break;
-    case WM_RBUTTONUP:
-      Notify(window, NM_RCLICK);
-      break;
-    default:
-      break;
+  StatusBar* bar = RecordOf<StatusBar>(window);
+  if (bar == nullptr) return DefWindowProcW(window, message, wParam, lParam);
+  if (message == WM_NCDESTROY) {
+    EndRecord<StatusBar>(window);
+    return DefWindowProcW(window, message, wParam, lParam);
   }
-  return DefWindowProcW(window, message, wParam, lParam);
+  return model::OrNoMemory(LRESULT{0}, [=] { return Handle(window, *bar, message, wParam, lParam); });
 }
 
 }  // namespace platform::controls
