@@ -37,6 +37,8 @@ void GetSystemInfo(SYSTEM_INFO* info) {
   info->dwNumberOfProcessors = static_cast<DWORD>(sysconf(_SC_NPROCESSORS_ONLN));
 }
 
+DWORD GetVersion() { return 10; }
+
 int MulDiv(int number, int numerator, int denominator) {
   if (denominator == 0) return -1;
   // Rounded half away from zero, on magnitudes, so that both signs round alike.

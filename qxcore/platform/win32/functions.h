@@ -106,6 +106,8 @@ QXCORE_API void SetLastError(DWORD code) noexcept;
 // --- the system ---
 
 QXCORE_API void GetSystemInfo(SYSTEM_INFO* info);
+// The low byte is the major version of the system whose behaviour the functions here have: 10.
+QXCORE_API DWORD GetVersion();
 QXCORE_API int MulDiv(int number, int numerator, int denominator);
 QXCORE_API UINT GetACP();
 QXCORE_API UINT GetOEMCP();
