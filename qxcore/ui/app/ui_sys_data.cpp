@@ -1,6 +1,6 @@
 #include "qxcore/ui/app/ui_sys_data.h"
 
-#include "qxcore/graphics/font.h"
+#include "qxcore/ui/app/ui_font.h"
 
 static int ScreenDpi() {
   const HDC screen = ::GetDC(nullptr);
@@ -36,4 +36,8 @@ static SUISysData& Measures() {
 
 const SUISysData* SGetUISysData() { return &Measures(); }
 
-void SUpdateUISysData() { Measures() = ReadMeasures(); }
+void SUpdateUISysData(int dpi) {
+  Measures() = ReadMeasures();
+  if (dpi > 0) Measures().m_dpi = dpi;
+  SUpdateDefaultUIFont();
+}

@@ -25,5 +25,6 @@ struct SUISysData {
 
 // The measures as they are now; the record changes in place. For the user-interface thread.
 QXCORE_API const SUISysData* SGetUISysData();
-// Reads them anew.
-QXCORE_API void SUpdateUISysData();
+// Reads them anew, and the default interface font with them. `dpi`: the dots an inch if they are known better than the
+// screen says, else 0.
+QXCORE_API void SUpdateUISysData(int dpi = 0);

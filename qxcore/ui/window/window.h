@@ -283,7 +283,7 @@ class QXCORE_API SWnd : public SCmdTarget {
   int CallMapped(const SMsgEntry& entry, WPARAM wParam, LPARAM lParam, LRESULT* result);
   void LeaveHandleMap();
   int DestroyUnowned(HWND window);
-  void PassOnAppearance();
+  void PassOnAppearance(int dpi = 0);
 };
 
 static_assert(sizeof(void*) != 4 || sizeof(SWnd) == 12, "the layout is public");

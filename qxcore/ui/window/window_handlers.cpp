@@ -166,9 +166,9 @@ void SWnd::OnVScroll(UINT, UINT, SScrollBar*) {
 // The system tells top-level windows only.
 static bool IsTopLevel(HWND window) { return (::GetWindowLongW(window, GWL_STYLE) & WS_CHILD) == 0; }
 
-void SWnd::PassOnAppearance() {
+void SWnd::PassOnAppearance(int dpi) {
   if (!IsTopLevel(m_hWnd)) return;
-  SUpdateUISysData();
+  SUpdateUISysData(dpi);
   const SCurrentMessage current = SWndThreadState::Get().m_current;
   SendMessageToDescendants(current.m_message, current.m_wParam, current.m_lParam, 1, 1);
 }
@@ -191,11 +191,11 @@ void SWnd::OnFontChange() {
   if (FromHandlePermanent(window) == this) PassOnAppearance();
 }
 
-LRESULT SWnd::OnDpiChanged(WPARAM, LPARAM) {
+// The children first: the window is laid out again with the place that the message suggests.
+LRESULT SWnd::OnDpiChanged(WPARAM wParam, LPARAM) {
   const HWND window = m_hWnd;
-  const LRESULT result = Default();
-  if (FromHandlePermanent(window) == this) PassOnAppearance();
-  return result;
+  PassOnAppearance(LOWORD(wParam));
+  return FromHandlePermanent(window) == this ? Default() : 0;
 }
 
 // --- the state of menu items ---
