@@ -78,3 +78,7 @@ int SStatusBarPanes::GetPaneWidth(int index) const {
   const int at = Find(index);
   return at >= 0 ? GetConst(at).m_width : 0;
 }
+
+void SStatusBarPanes::ScaleWidths(int fromDpi, int toDpi) {
+  for (SStatusBarPane& pane : *this) pane.m_width = ::MulDiv(pane.m_width, toDpi, fromDpi);
+}

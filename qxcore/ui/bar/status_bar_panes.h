@@ -62,6 +62,8 @@ class QXCORE_API SStatusBarPanes : public STableMem<SStatusBarPane> {
   SString GetPaneText(int index) const;  // the empty string when there is no such pane
   DWORD GetPaneStyle(int index) const;   // 0 when there is no such pane
   int GetPaneWidth(int index) const;     // 0 when there is no such pane
+  // Scales all widths from one number of dots an inch to another.
+  void ScaleWidths(int fromDpi, int toDpi);
 };
 
 static_assert(sizeof(void*) != 4 || sizeof(SStatusBarPanes) == 8, "the layout is public");

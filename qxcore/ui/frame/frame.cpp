@@ -160,7 +160,10 @@ LRESULT SFrameWnd::OnRegMouseWheel(WPARAM wParam, LPARAM lParam) {
 int SFrameWnd::OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* result) {
   const HWND window = m_hWnd;
   const int handled = SWnd::OnWndMsg(message, wParam, lParam, result);
-  if (message == WM_SIZE && wParam != SIZE_MINIMIZED && FromHandlePermanent(window) == this) RecalcLayout();
+  if (FromHandlePermanent(window) != this) return handled;
+  if (message == WM_DPICHANGED && lParam != 0) MoveWindow(*reinterpret_cast<const RECT*>(lParam));
+  const bool isSized = message == WM_SIZE && wParam != SIZE_MINIMIZED;
+  if (isSized || message == WM_DPICHANGED || message == WM_SETTINGCHANGE) RecalcLayout();
   return handled;
 }
 

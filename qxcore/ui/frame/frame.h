@@ -5,6 +5,7 @@
 // RecalcLayout.
 #pragma once
 
+#include "qxcore/ui/bar/size_parent.h"
 #include "qxcore/ui/frame/create_context.h"
 #include "qxcore/ui/window/window.h"
 
@@ -12,17 +13,6 @@ class SView;
 
 // The identifier of the child that fills the client area.
 inline constexpr UINT kSFirstPane = 0xE900;
-// Sent by a frame to its children when it lays them out; lParam is the address of an SSizeParent. A bar takes its
-// strip off m_rect, and moves itself in the batch, if there is one.
-inline constexpr UINT kSMsgSizeParent = 0x0361;
-
-// What a frame and its bars share while they are laid out.
-struct SSizeParent {
-  HDWP m_batch;   // the moves so far, to be replaced by DeferWindowPos; null when only the space is asked for
-  SRect m_rect;   // what is left of the client area
-  SSize m_used;   // what bars have taken so far
-  int m_stretch;  // nonzero: bars are as long as the area
-};
 
 // A frame window; see above.
 class QXCORE_API SFrameWnd : public SWnd {

@@ -1,0 +1,403 @@
+// A status bar in its frame: what it makes of its panes, and what its control then shows.
+
+#include <random>
+
+#include "tests/bar/bar_fixture.h"
+#include "tests/bar/pane_peer.h"
+
+namespace {
+
+using test::Frame;
+using test::PartRect;
+using test::PartsOf;
+using test::PartText;
+using test::PartType;
+
+// Counts the texts that the control is given.
+class Bar : public SStatusBar {
+ public:
+  int OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* result) override {
+    if (message == SB_SETTEXTW) m_sent.push_back(LOBYTE(wParam));
+    return SStatusBar::OnWndMsg(message, wParam, lParam, result);
+  }
+  void Paint() {
+    Invalidate();
+    UpdateWindow();
+  }
+  std::vector<int> m_sent;
+};
+
+class StatusBars : public test::UiTest {
+ protected:
+  void SetUp() override {
+    UiTest::SetUp();
+    m_frame = Frame::Make();
+    ASSERT_NE(m_frame, nullptr);
+    ASSERT_TRUE(m_bar.Create(m_frame));
+    m_frame->RecalcLayout();
+  }
+  void TearDown() override {
+    m_frame->DestroyWindow();
+    UiTest::TearDown();
+  }
+  int SetText(int index, LPCWSTR text, int update = 1) {
+    const SString stored(text);
+    return m_bar.SetPaneText(index, &stored, update);
+  }
+  // What panes are laid out in, read from the bar's own window.
+  SPaneSpace Space() const {
+    const bool hasGrip = (m_bar.GetStyle() & SBARS_SIZEGRIP) && !m_frame->IsZoomed();
+    const int grip = hasGrip ? 2 * ::GetSystemMetrics(SM_CXBORDER) + ::GetSystemMetrics(SM_CXVSCROLL) : 0;
+    return {m_bar.GetWindowRect().Width() - grip, 0, 2, 6};
+  }
+
+  Bar m_bar;
+  Frame* m_frame = nullptr;
+};
+
+TEST_F(StatusBars, Create_StandsAtTheBottomWithItsOwnHeight) {
+  EXPECT_EQ(m_bar.GetStyle() & 0x1FF, 0x14Eu) << "the parent has a sizing border";
+  SClientDC dc(m_bar.m_hWnd);
+  const SSelectObject font(dc, SGetDefaultUIFont());
+  TEXTMETRICW metrics = {};
+  dc.GetTextMetricsW(&metrics);
+  // The borders of an empty rectangle add to the height: -(bottom - top) of a rectangle with 2 above is 2.
+  const int height = 2 * (::GetSystemMetrics(SM_CYBORDER) + 2) + 2 - metrics.tmInternalLeading + metrics.tmHeight - 1;
+  EXPECT_EQ(m_bar.GetBarLayout(1, 1), SSize(32767, height));
+  EXPECT_EQ(test::PlaceOf(m_bar), SRect(0, 300 - height, 400, 300));
+  EXPECT_EQ(m_bar.GetClientRect().Size(), SSize(400, height)) << "the upper border is the control's own";
+  EXPECT_EQ(m_bar.GetFont(), SGetDefaultUIFont());
+
+  EXPECT_EQ(m_bar.SendMessageW(SB_SETMINHEIGHT, 50), 1);
+  m_frame->SetClientSize(500, 250);
+  EXPECT_EQ(test::PlaceOf(m_bar), SRect(0, 200, 500, 250));
+
+  Frame* fixed = Frame::Make(WS_POPUP | WS_CAPTION | WS_VISIBLE);
+  SStatusBar plain;
+  ASSERT_TRUE(plain.Create(fixed, 0x88000000));
+  EXPECT_EQ(plain.GetStyle() & SBARS_SIZEGRIP, 0u);
+  EXPECT_EQ(plain.GetBarStyle(), 0x80000000u) << "the kinds of border are taken away";
+  fixed->DestroyWindow();
+}
+
+TEST_F(StatusBars, RandomChanges_ShowWhatASecondReadingSays) {
+  std::mt19937 random(4);
+  const auto number = [&](int below) { return static_cast<int>(random() % static_cast<unsigned>(below)); };
+  SStatusBarLayout layout;
+  layout.Attach(&m_bar);
+  test::Peer own, extra;
+  static constexpr DWORD bits[] = {0x00100000, 0x00200000, 0x01000000, 0x04000000, 0x08000000, 0x100, 0};
+  for (int step = 0; step < 1500; ++step) {
+    const bool isExtra = number(3) == 0;
+    test::Peer& peer = isExtra ? extra : own;
+    const auto call = [&](auto change) { return isExtra ? change(layout) : change(m_bar); };
+    const int index = number(static_cast<int>(peer.size()) + 2) - 1;
+    const int at = test::Resolve(peer, index);
+    const auto place = static_cast<std::size_t>(at);
+    switch (number(peer.size() > 9 ? 6 : 8)) {
+      case 0:
+        EXPECT_EQ(call([&](auto& panes) { return panes.DeletePane(index); }), at >= 0);
+        if (at >= 0) peer.erase(peer.begin() + at);
+        break;
+      case 1: {
+        const SString text(
+            WideString(static_cast<std::size_t>(number(8)), static_cast<WCHAR>('a' + number(3))).c_str());
+        EXPECT_EQ(call([&](auto& panes) { return panes.SetPaneText(index, &text, number(2)); }), at >= 0);
+        if (at < 0) break;
+        if (peer[place].style & 0x08000000) peer[place].width = test::WidthOf(m_bar, text.View());
+        peer[place].text = text.View();
+        break;
+      }
+      case 2: {
+        const int width = number(90);
+        EXPECT_EQ(call([&](auto& panes) { return panes.SetPaneWidth(index, width); }), at >= 0);
+        if (at >= 0) peer[place].width = width;
+        break;
+      }
+      case 3: {
+        const DWORD style = bits[number(7)] | bits[number(7)];
+        EXPECT_EQ(call([&](auto& panes) { return panes.SetPaneStyle(index, style); }), at >= 0);
+        if (at < 0) break;
+        peer[place].style = style;
+        if (style & 0x08000000) peer[place].width = test::WidthOf(m_bar, peer[place].text);
+        break;
+      }
+      case 4:
+        EXPECT_EQ(layout.Activate(number(2)), 1);
+        break;
+      case 5:
+        m_frame->SetClientSize(200 + number(600), 200);
+        break;
+      default: {
+        const DWORD style = bits[number(7)] | bits[number(7)];
+        const int width = number(90);
+        const int before = index >= 0 ? index : std::max(test::MainOf(peer), 0);
+        EXPECT_EQ(call([&](auto& panes) { return panes.InsertPane(index, width, style); }), 1);
+        peer.insert(peer.begin() + std::min<int>(before, static_cast<int>(peer.size())),
+                    {style & 0x08000000 ? 0 : width, style, {}});
+      }
+    }
+    const test::Peer none;
+    const test::Peer& active = layout.IsActive() ? extra : none;
+    const test::Peer shown = test::Displayed(own, active);
+    if (shown.empty()) continue;
+    ASSERT_EQ(PartsOf(m_bar), test::EdgesOf(own, active, Space())) << "step " << step;
+    if (step % 10 != 0) continue;
+    m_bar.UpdatePaneStrings();
+    for (std::size_t i = 0; i < shown.size(); ++i) {
+      const bool isKept = (shown[i].style & 0x01000000) != 0;
+      ASSERT_EQ(PartText(m_bar, static_cast<int>(i)), isKept ? WideString() : shown[i].text) << "step " << step;
+      ASSERT_EQ(PartType(m_bar, static_cast<int>(i)), static_cast<int>(shown[i].style & 0xFF00));
+    }
+  }
+}
+
+TEST_F(StatusBars, MainPane_MissingMeansNothing) {
+  SString text(WTEXT("kept"));
+  EXPECT_EQ(m_bar.GetPaneText(kSMainPane, &text), 0);
+  EXPECT_EQ(text, WTEXT("kept"));
+  EXPECT_EQ(m_bar.GetPaneText(kSMainPane), WTEXT(""));
+  EXPECT_EQ(m_bar.SetMainPaneText(&text), 0);
+  EXPECT_EQ(m_bar.GetPaneStyle(kSMainPane), 0u);
+  EXPECT_EQ(m_bar.GetPaneWidth(kSMainPane), 0);
+  EXPECT_EQ(m_bar.SetPaneStyle(kSMainPane, 1), 0);
+  EXPECT_EQ(m_bar.SetPaneWidth(kSMainPane, 1), 0);
+  EXPECT_EQ(m_bar.DeletePane(kSMainPane), 0);
+  SRect rect;
+  EXPECT_EQ(m_bar.GetPaneRect(kSMainPane, &rect), 0);
+  EXPECT_EQ(m_bar.GetExtraLayoutItemRect(0, &rect), 0);
+}
+
+TEST_F(StatusBars, Texts_AreSentOnceAndWhenTheyAreDue) {
+  m_bar.InsertPane(0, 50, kSPaneMain);
+  m_bar.InsertPane(1, 50, 0);
+  m_bar.Paint();
+  m_bar.m_sent.clear();
+  EXPECT_EQ(SetText(1, WTEXT("now")), 1);
+  EXPECT_EQ(m_bar.m_sent, std::vector<int>{1});
+  EXPECT_EQ(SetText(1, WTEXT("now")), 1);
+  EXPECT_EQ(m_bar.m_sent.size(), 1u) << "it has not changed";
+  EXPECT_EQ(SetText(kSMainPane, WTEXT("later"), 0), 1);
+  EXPECT_EQ(m_bar.m_sent.size(), 1u);
+  EXPECT_EQ(m_bar.GetPaneText(0), WTEXT("later"));
+  m_bar.Paint();
+  EXPECT_EQ(m_bar.m_sent, (std::vector<int>{1, 0}));
+  EXPECT_EQ(PartText(m_bar, 0), WTEXT("later"));
+
+  m_bar.m_sent.clear();
+  EXPECT_EQ(m_bar.SetPaneWidth(0, 50), 1);
+  EXPECT_EQ(m_bar.SetPaneWidth(0, 60), 1);
+  m_bar.Paint();
+  EXPECT_TRUE(m_bar.m_sent.empty()) << "a width changes no text";
+  while (m_bar.DeletePane(0)) {
+  }
+  EXPECT_EQ(PartText(m_bar, 0), WTEXT("")) << "without panes nothing is left to see";
+}
+
+TEST_F(StatusBars, WindowText_IsThatOfThePaneAtTheFront) {
+  EXPECT_EQ(m_bar.SendMessageW(WM_SETTEXT, 0, reinterpret_cast<LPARAM>(WTEXT("lost"))), -1);
+  EXPECT_EQ(m_bar.SendMessageW(WM_GETTEXTLENGTH), 0);
+  WCHAR buffer[4] = {'?', '?', '?', '?'};
+  EXPECT_EQ(m_bar.SendMessageW(WM_GETTEXT, 4, reinterpret_cast<LPARAM>(buffer)), 0);
+  EXPECT_EQ(buffer[0], 0);
+  m_bar.InsertPane(0, 50, 0);
+  EXPECT_EQ(m_bar.SendMessageW(WM_SETTEXT, 0, reinterpret_cast<LPARAM>(WTEXT("title"))), 0);
+  EXPECT_EQ(m_bar.GetPaneText(0), WTEXT("title"));
+  EXPECT_EQ(m_bar.SendMessageW(WM_GETTEXTLENGTH), 5);
+  EXPECT_EQ(m_bar.SendMessageW(WM_GETTEXT, 4, reinterpret_cast<LPARAM>(buffer)), 3);
+  EXPECT_EQ(WideString(buffer), WTEXT("tit"));
+  buffer[0] = '?';
+  EXPECT_EQ(m_bar.SendMessageW(WM_GETTEXT, 0, reinterpret_cast<LPARAM>(buffer)), 0);
+  EXPECT_EQ(buffer[0], '?');
+}
+
+TEST_F(StatusBars, MaximisedParent_LeavesTheGripsRoomToThePanes) {
+  m_bar.InsertPane(0, 0, kSPaneStretch);
+  EXPECT_LT(PartsOf(m_bar).back(), 400 - ::GetSystemMetrics(SM_CXVSCROLL));
+  m_frame->ShowWindow(SW_MAXIMIZE);
+  EXPECT_EQ(PartsOf(m_bar).back(), m_bar.GetWindowRect().Width());
+  const SRect place = m_bar.GetWindowRect();
+  const LPARAM corner = MAKELPARAM(place.right - 2, place.bottom - 2);
+  EXPECT_EQ(m_bar.SendMessageW(WM_NCHITTEST, 0, corner), HTCLIENT);
+  m_frame->ShowWindow(SW_RESTORE);
+  const SRect restored = m_bar.GetWindowRect();
+  const auto hit = [&](int x, int y) { return m_bar.SendMessageW(WM_NCHITTEST, 0, MAKELPARAM(x, y)); };
+  EXPECT_EQ(hit(restored.right - 2, restored.bottom - 2), HTBOTTOMRIGHT);
+  EXPECT_EQ(hit(restored.left + 2, restored.top + 2), HTCLIENT);
+}
+
+TEST_F(StatusBars, OwnerDrawnPane_IsPaintedInGrey) {
+  m_bar.InsertPane(0, 100, kSPaneOwnerDraw);
+  SetText(0, WTEXT("IIIIIIII"));
+  m_bar.Paint();
+  EXPECT_EQ(PartType(m_bar, 0) & SBT_OWNERDRAW, SBT_OWNERDRAW);
+  const SRect rect = PartRect(m_bar, 0);
+  SClientDC dc(m_bar.m_hWnd);
+  int grey = 0;
+  for (int y = rect.top; y < rect.bottom; ++y) {
+    for (int x = rect.left; x < rect.right; ++x) grey += dc.GetPixel(SPoint(x, y)) == RGB(128, 128, 128);
+  }
+  EXPECT_GT(grey, 20);
+}
+
+// --- layouts ---
+
+TEST_F(StatusBars, ActiveLayout_ShiftsTheControlsIndices) {
+  for (int i = 0; i < 3; ++i) m_bar.InsertPane(i, 20, i == 1 ? DWORD{kSPaneSplice} : 0);
+  SetText(2, WTEXT("last"));
+  SStatusBarLayout layout;
+  layout.InsertPane(0, 30, 0);
+  layout.InsertPane(1, 40, kSPaneMain);
+  const SString text(WTEXT("extra"));
+  EXPECT_EQ(layout.SetMainPaneText(&text), 1);
+  EXPECT_EQ(layout.Activate(1), 0) << "it is detached";
+  layout.Attach(&m_bar);
+  EXPECT_EQ(PartsOf(m_bar).size(), 3u);
+  EXPECT_EQ(layout.Activate(1), 1);
+  m_bar.m_sent.clear();
+  m_bar.Paint();
+  EXPECT_EQ(m_bar.m_sent, (std::vector<int>{0, 3, 4, 1, 2})) << "all texts, own ones first";
+  EXPECT_EQ(PartText(m_bar, 2), WTEXT("extra"));
+  EXPECT_EQ(PartText(m_bar, 4), WTEXT("last"));
+  SRect rect;
+  EXPECT_EQ(m_bar.GetExtraLayoutItemRect(kSMainPane, &rect), 1);
+  EXPECT_EQ(rect, PartRect(m_bar, 2));
+  EXPECT_EQ(m_bar.GetPaneRect(2, &rect), 1);
+  EXPECT_EQ(rect, PartRect(m_bar, 4));
+  EXPECT_EQ(layout.Detach(), &m_bar);
+  EXPECT_EQ(layout.Detach(), nullptr);
+  EXPECT_EQ(m_bar.GetExtraLayout(), nullptr);
+  m_bar.Paint();
+  EXPECT_EQ(PartText(m_bar, 2), WTEXT("last"));
+}
+
+TEST_F(StatusBars, Layouts_EndBeforeAndAfterTheirBar) {
+  m_bar.InsertPane(0, 20, 0);
+  SStatusBarLayout idle, active;
+  active.InsertPane(0, 20, 0);
+  {
+    SStatusBarLayout first;
+    first.InsertPane(0, 30, 0);
+    first.Attach(&m_bar);
+    first.Activate(1);
+    EXPECT_EQ(PartsOf(m_bar).size(), 2u);
+  }
+  EXPECT_EQ(PartsOf(m_bar).size(), 1u);
+  EXPECT_EQ(m_bar.GetExtraLayout(), nullptr);
+  {
+    Bar other;
+    ASSERT_TRUE(other.Create(m_frame, 0, WS_CHILD, 9));
+    idle.Attach(&other);
+    active.Attach(&m_bar);
+    other.SetExtraLayout(&active);
+    EXPECT_EQ(active.GetBar(), &other) << "it moves to the bar that shows it";
+    EXPECT_TRUE(active.IsActive());
+    idle.Activate(0);
+    EXPECT_TRUE(active.IsActive()) << "another layout takes out only itself";
+  }
+  EXPECT_EQ(idle.GetBar(), nullptr);
+  EXPECT_EQ(active.GetBar(), nullptr);
+  EXPECT_EQ(active.Activate(1), 0);
+}
+
+// --- the DPI ---
+
+TEST_F(StatusBars, AnotherDpi_ScalesEverythingAndComesBack) {
+  m_bar.InsertPane(0, 50, 0);
+  m_bar.InsertPane(1, 0, kSPaneAutoSize);
+  SetText(1, WTEXT("measured"));
+  const std::vector<int> before = PartsOf(m_bar);
+  const SRect place = test::PlaceOf(m_bar);
+  m_frame->SendMessageW(WM_DPICHANGED, MAKEWPARAM(192, 192));
+  EXPECT_EQ(m_bar.GetPaneWidth(0), 100);
+  EXPECT_EQ(PartsOf(m_bar)[0], 2 * before[0]) << "the padding, too";
+  EXPECT_EQ(m_bar.GetPaneWidth(1), test::WidthOf(m_bar, WTEXT("measured")));
+  EXPECT_EQ(m_bar.GetFont(), SGetDefaultUIFont(192));
+  EXPECT_GT(test::PlaceOf(m_bar).Height(), place.Height() * 3 / 2);
+  EXPECT_EQ(test::PlaceOf(m_bar).bottom, place.bottom);
+  m_frame->SendMessageW(WM_DPICHANGED, MAKEWPARAM(96, 96));
+  EXPECT_EQ(PartsOf(m_bar), before);
+  EXPECT_EQ(test::PlaceOf(m_bar), place);
+}
+
+// --- bars in general ---
+
+class PlainBar : public SCtrlBar {
+ public:
+  SSize GetBarLayout(int, int horizontal) override { return horizontal ? SSize(100, 20) : SSize(30, 50); }
+  void OnBarStyleChange(DWORD oldStyle, DWORD newStyle) override { m_changes.push_back({oldStyle, newStyle}); }
+  void SetBorders(int left, int top, int right, int bottom) {
+    m_leftBorder = left, m_topBorder = top, m_rightBorder = right, m_bottomBorder = bottom;
+  }
+  std::vector<std::pair<DWORD, DWORD>> m_changes;
+};
+
+TEST_F(StatusBars, Bars_TakeTheirStripsInTurn) {
+  PlainBar bars[3];
+  const DWORD sides[] = {kSBarAtTop, kSBarAtLeft, kSBarAtRight};
+  for (int i = 0; i < 3; ++i) {
+    bars[i].SetBarStyle(sides[i]);
+    ASSERT_TRUE(bars[i].Create(nullptr, nullptr, WS_VISIBLE, SRect(), m_frame, 100u + static_cast<UINT>(i)));
+    bars[i].SetWindowPos(HWND_BOTTOM, 0, 0, 0, 0, SWP_NOMOVE | SWP_NOSIZE);
+  }
+  test::Window client;
+  ASSERT_TRUE(client.Create(nullptr, nullptr, WS_VISIBLE, SRect(), m_frame, kSFirstPane));
+  m_frame->RecalcLayout();
+  const int below = test::PlaceOf(m_bar).top;
+  EXPECT_EQ(test::PlaceOf(bars[0]), SRect(0, 0, 400, 20));
+  EXPECT_EQ(test::PlaceOf(bars[1]), SRect(0, 20, 30, below));
+  EXPECT_EQ(test::PlaceOf(bars[2]), SRect(370, 20, 400, below));
+  EXPECT_EQ(test::PlaceOf(client), SRect(30, 20, 370, below));
+  bars[0].ShowWindow(SW_HIDE);
+  m_frame->SetClientSize(401, 10);
+  EXPECT_EQ(test::PlaceOf(m_bar).bottom, 10) << "a bar keeps its height";
+  EXPECT_EQ(test::PlaceOf(client).Height(), 0);
+  client.DestroyWindow();
+}
+
+TEST(CtrlBar, Offsets_AreThoseOfTheStyleAndTheFields) {
+  PlainBar bar;
+  const SUISysData& measures = *SGetUISysData();
+  EXPECT_EQ(bar.SetBarStyle(kSBarBorderLeft | kSBarBorderBottom), 0u);
+  EXPECT_EQ(bar.SetBarStyle(kSBarBorderLeft | kSBarBorderBottom | kSBarBorder3d), kSBarBorderLeft | kSBarBorderBottom);
+  EXPECT_EQ(bar.m_changes.size(), 2u);
+  bar.SetBorders(1, 2, 3, 4);
+  SRect rect(0, 0, 100, 100);
+  bar.CalcNCOffsets(&rect, 1);
+  EXPECT_EQ(rect, SRect(measures.m_edgeWidth + 1, 2, 97, 96 - measures.m_edgeHeight));
+  rect = SRect(0, 0, 100, 100);
+  bar.SetBarStyle(kSBarBorderTop | kSBarBorderRight);
+  bar.CalcNCOffsets(&rect, 0);
+  EXPECT_EQ(rect, SRect(2, measures.m_borderHeight + 1, 96 - measures.m_borderWidth, 97)) << "vertical: in pairs";
+}
+
+// The order of fields and virtual functions is part of the binary interface.
+struct Order : SStatusBar {
+  static int SlotOf(auto member) {
+    std::uintptr_t first = 0;
+    std::memcpy(&first, &member, sizeof first);
+    return static_cast<int>((first - 1) / sizeof(void*));
+  }
+  void Check() {
+    const int last = SlotOf(&Order::SafeOnKillFocus);
+    EXPECT_EQ(SlotOf(&Order::OnBarStyleChange), last + 1);
+    EXPECT_EQ(SlotOf(&Order::GetBarLayout), last + 2);
+    EXPECT_EQ(SlotOf(&Order::GetCustomLayout), last + 3);
+    const auto offset = [this](const auto& field) {
+      return static_cast<int>(reinterpret_cast<const char*>(&field) - reinterpret_cast<const char*>(this));
+    };
+    const int borders = static_cast<int>(sizeof(SWnd));
+    EXPECT_EQ(offset(m_leftBorder), borders);
+    EXPECT_EQ(offset(m_topBorder), borders + 4);
+    EXPECT_EQ(offset(m_rightBorder), borders + 8);
+    EXPECT_EQ(offset(m_bottomBorder), borders + 12);
+    EXPECT_EQ(offset(m_minHeight), static_cast<int>(sizeof(SCtrlBar)));
+    EXPECT_EQ(offset(m_splice), offset(m_minHeight) + 4);
+    EXPECT_EQ(offset(m_panes), offset(m_minHeight) + 8);
+    EXPECT_EQ(offset(m_layout), offset(m_panes) + static_cast<int>(sizeof m_panes));
+  }
+};
+
+TEST(CtrlBar, Order_OfFieldsAndSlots) { Order().Check(); }
+
+}  // namespace
