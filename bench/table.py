@@ -94,6 +94,7 @@ ROWS = [
     ("an unhandled message", "virtual call", "time", 2.0),
     ("SendMessage to a handler", "Qt sendEvent", "time", 1.0),
     ("a command through view, frame and application", "wxWidgets", "time", 1.0),
+    ("lay out a status bar of 20 panes", "QStatusBar", "time", 0.3),
 ]
 
 TO_NANOSECONDS = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}
