@@ -95,6 +95,9 @@ ROWS = [
     ("SendMessage to a handler", "Qt sendEvent", "time", 1.0),
     ("a command through view, frame and application", "wxWidgets", "time", 1.0),
     ("lay out a status bar of 20 panes", "QStatusBar", "time", 0.3),
+    ("resize a splitter of 16 x 16 panes", "QSplitter", "time", 0.3),
+    ("insert 1,000 tabs", "text extents", "time", 2.0),
+    ("make the last of 1,000 tabs visible", "QTabBar", "time", 0.3),
 ]
 
 TO_NANOSECONDS = {"ns": 1, "us": 1e3, "ms": 1e6, "s": 1e9}
