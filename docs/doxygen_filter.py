@@ -149,6 +149,9 @@ class Filter:
                     self.block, self.fresh = [], False
                 self.out.append(line)
                 continue
+            if stripped.startswith("//!"):
+                self.out.append(line)  # a command of doxygen itself
+                continue
             if stripped.startswith("//"):
                 section = SECTION.match(line)
                 text = literal(stripped[2:].strip())

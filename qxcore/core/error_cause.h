@@ -13,7 +13,7 @@
 // An error number of the C runtime, as errno has it: ENOENT, EISDIR, EACCES, ENOSPC ...
 class QXCORE_API SErrorCause {
  public:
-  explicit SErrorCause(int error) : m_error(error) {}
+  explicit SErrorCause(int error) : m_error(error) {}  // keeps the number
   SErrorCause(const SErrorCause&) = default;
   SErrorCause& operator=(const SErrorCause&) = default;
   virtual ~SErrorCause();
@@ -27,7 +27,7 @@ class QXCORE_API SErrorCause {
 template <class Exception>
 class SEWithError : public Exception, public SErrorCause {
  public:
-  explicit SEWithError(int error) : SErrorCause(error) {}
+  explicit SEWithError(int error) : SErrorCause(error) {}  // as the exception alone, with its cause
 };
 
 // The cause of an exception, as errno has it; 0 where it carries none.

@@ -17,7 +17,6 @@ struct OLEMENUGROUPWIDTHS;
 // The frame window of an application that shows embedded documents in place; the order of its functions is the
 // published one. The library calls EnableModeless alone.
 struct IOleInPlaceFrame {
-  //! @cond
   virtual HRESULT WINAPI QueryInterface(const GUID& id, void** object) = 0;
   virtual ULONG WINAPI AddRef() = 0;
   virtual ULONG WINAPI Release() = 0;
@@ -31,12 +30,9 @@ struct IOleInPlaceFrame {
   virtual HRESULT WINAPI SetMenu(HMENU menu, HGLOBAL descriptor, HWND active) = 0;
   virtual HRESULT WINAPI RemoveMenus(HMENU menu) = 0;
   virtual HRESULT WINAPI SetStatusText(LPCWSTR text) = 0;
-  //! @endcond
   // FALSE disables the frame's modeless dialogs, TRUE enables them.
   virtual HRESULT WINAPI EnableModeless(BOOL enable) = 0;
-  //! @cond
   virtual HRESULT WINAPI TranslateAccelerator(MSG* message, WORD id) = 0;
-  //! @endcond
 
  protected:
   ~IOleInPlaceFrame() = default;

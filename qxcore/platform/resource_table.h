@@ -11,7 +11,7 @@ namespace platform {
 
 // The content of a resource; null data for none.
 struct ResourceBytes {
-  const void* data = nullptr;
+  const void* data = nullptr;  // stays the owner's
   std::size_t size = 0;  // in bytes
 };
 

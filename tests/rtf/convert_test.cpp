@@ -69,8 +69,8 @@ struct ReaderCase {
 TEST(PortableReader, ReadsWhatTheFormatSays) {
   const ReaderCase cases[] = {
       // Bytes: lead and trail in every form, a code page of long sequences, control characters.
-      {"{\\f2\\'82\\'a0\\'82o\\'82\r\n\\'a2}", WTEXT("\x3042\xFF4F\x3044")},
-      {"{\\f2\\'83\\\\\\'83\\{}", WTEXT("\x30BD\x30BF")},
+      {"{\\f2\\'82\\'a0\\'82o\\'82\r\n\\'a2}", WTEXT("\x3042\xFF30\x3044")},
+      {"{\\f2\\'83\\\\\\'83\\{}", WTEXT("\x30BD\x30DC")},
       {"\\'a\\'4x\\'0d\\'09y", WTEXT("x\r\n\ty")},
       // Unicode with its substitutes.
       {"\\u1078?\\uc2\\u1078ab{\\uc0\\u1078}c\\u1078\\'41\\'42d", WTEXT("\x0436\x0436\x0436"

@@ -98,12 +98,12 @@ std::vector<Text> Colors(const Text& table) {
   Text definition;
   const std::size_t start = table.find(WTEXT("colortbl"));
   for (std::size_t at = start == Text::npos ? table.size() : start + 8; at < table.size(); ++at) {
+    const bool isBlank = table[at] == ' ' || table[at] == '\r' || table[at] == '\n';
     if (table[at] == ';') {
-      while (!definition.empty() && definition.back() == ' ') definition.pop_back();
+      while (!definition.empty() && definition.back() <= ' ') definition.pop_back();
       colors.push_back(definition);
       definition.clear();
-    } else if (table[at] != '\r' && table[at] != '\n' && table[at] != '}' &&
-               (table[at] != ' ' || !definition.empty())) {
+    } else if (table[at] != '}' && !(isBlank && definition.empty())) {
       definition += table[at];
     }
   }

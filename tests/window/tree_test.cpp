@@ -7,7 +7,7 @@
 #include <set>
 #include <vector>
 
-#include "qxcore/core/memory.h"
+#include "qxcore/core/internal/memory_failures.h"
 #include "tests/window/recorder.h"
 
 namespace {

@@ -13,7 +13,10 @@ void SWindowCreation::Install(SWndThreadState& state, SWnd* object) {
     state.ThrowException();
     if (state.m_creationHook == nullptr) {
       state.m_creationHook = ::SetWindowsHookExW(WH_CBT, &Hook, nullptr, ::GetCurrentThreadId());
-      if (state.m_creationHook == nullptr) throw SECOMException(HResult(::GetLastError()));
+      if (state.m_creationHook == nullptr) {
+        if (::GetLastError() == ERROR_NOT_ENOUGH_MEMORY) throw SEOutOfMemory();
+        throw SECOMException(HResult(::GetLastError()));
+      }
     }
   } catch (...) {
     object->PostNcDestroy();

@@ -135,6 +135,7 @@ LRESULT CALLBACK StaticProcedure(HWND window, UINT message, WPARAM wParam, LPARA
       return 0;
     case WM_ENABLE:
       InvalidateRect(window, nullptr, FALSE);
+      if (GetWindowLongPtrW(window, GWL_STYLE) & SS_NOTIFY) NotifyCommand(window, wParam ? STN_ENABLE : STN_DISABLE);
       return 0;
     case WM_SETTEXT:
       DefWindowProcW(window, message, wParam, lParam);
