@@ -13,7 +13,9 @@ void SWindowCreation::Install(SWndThreadState& state, SWnd* object) {
     state.ThrowException();
     if (state.m_creationHook == nullptr) {
       state.m_creationHook = ::SetWindowsHookExW(WH_CBT, &Hook, nullptr, ::GetCurrentThreadId());
-      if (state.m_creationHook == nullptr) throw SECOMException(HResult(::GetLastError()));
+      const DWORD error = ::GetLastError();
+      if (state.m_creationHook == nullptr && error == ERROR_NOT_ENOUGH_MEMORY) throw SEOutOfMemory();
+      if (state.m_creationHook == nullptr) throw SECOMException(HResult(error));
     }
   } catch (...) {
     object->PostNcDestroy();
