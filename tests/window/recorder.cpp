@@ -58,8 +58,11 @@ std::string Who(HWND window) {
 }
 
 // Messages about icons, input methods and palettes, questions of painting for the caption, and the private ones
-// are left out; so are hit tests and idle notifications, whose number depends on the display.
-bool IsListed(UINT message) {
+// are left out; so are hit tests, idle notifications and what comes of the mouse's resting place, which depend on the
+// display.
+bool IsListed(UINT message, LPARAM lParam) {
+  if (message == WM_MOUSEMOVE || message == WM_NCMOUSEMOVE) return false;
+  if (message == WM_SETCURSOR && (HIWORD(lParam) == WM_MOUSEMOVE || HIWORD(lParam) == WM_NCMOUSEMOVE)) return false;
   for (const MessageName& each : kNames)
     if (each.message == message) return message != WM_NCHITTEST && message != WM_CTLCOLORDLG && message != WM_ENTERIDLE;
   return false;
@@ -144,7 +147,7 @@ void Note(const std::string& text) {
 }
 
 LRESULT CALLBACK Procedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
-  if (IsListed(message)) Note(Who(window) + " " + NameOf(message) + Details(message, wParam, lParam));
+  if (IsListed(message, lParam)) Note(Who(window) + " " + NameOf(message) + Details(message, wParam, lParam));
   ++g_depth;
   const LRESULT result = DefWindowProcW(window, message, wParam, lParam);
   --g_depth;
@@ -214,7 +217,7 @@ void Record::Name(HWND window, const std::string& name) { g_windows[window] = na
 const std::string& Record::Text() const { return g_text; }
 
 void NoteDialog(HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) {
-  if (IsListed(message)) Note(Who(dialog) + " " + NameOf(message) + Details(message, wParam, lParam));
+  if (IsListed(message, lParam)) Note(Who(dialog) + " " + NameOf(message) + Details(message, wParam, lParam));
 }
 
 void Pump() {
