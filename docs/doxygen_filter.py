@@ -18,6 +18,8 @@ A public name that none of these reaches stays undocumented, and doxygen reports
 import re
 import sys
 
+# What these stand for ends itself, without a semicolon.
+DECLARING_MACRO = re.compile(r"\s*QXCORE_DECLARE_\w+\(.*\)\s*")
 SECTION = re.compile(r"^\s*// --- (.*?)(?: ---)?$")
 TRAILING = re.compile(r"^(?P<code>.*?\S)\s+//\s?(?P<text>.*)$")
 
@@ -161,6 +163,9 @@ class Filter:
                     self.block.append(text)
                 else:
                     self.block, self.fresh = [text], True
+                continue
+            if DECLARING_MACRO.fullmatch(line):
+                self.out.append(line)
                 continue
             self.code_line(line)
         return "\n".join(self.out) + "\n"

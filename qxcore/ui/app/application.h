@@ -23,6 +23,7 @@ inline constexpr int kSIdleStep = 1;     // a step with the count 0 begins
 inline constexpr int kSIdleStarted = 2;  // it is the first one since there was input
 inline constexpr int kSIdleEnded = 3;    // the loop goes to sleep
 
+// The application object; see above. A program has one.
 class QXCORE_API SWinApp : public SCmdTarget {
   QXCORE_DECLARE_CLASS(SWinApp)
 

@@ -37,6 +37,7 @@ class QXCORE_API SCustomProgressCtrl : public SWnd {
   void SetStatus(const Status& status);  // the position is moved into the range
 
  protected:
+  // Handlers of the control's messages.
   void OnPaint();
   int OnEraseBkgnd(SDC* dc);
   void OnSize(UINT type, int width, int height);

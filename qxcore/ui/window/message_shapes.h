@@ -32,6 +32,7 @@ struct QXCORE_API SMsgObjects {
 // A pointer in a message argument, which becomes what the handler wants.
 struct SMsgPointer {
   std::intptr_t m_value;  // the argument
+  // The argument as a pointer to any type of object.
   template <class T>
   operator T*() const {
     return reinterpret_cast<T*>(m_value);
@@ -40,8 +41,8 @@ struct SMsgPointer {
 
 // The arguments of a message, read as the shapes need them.
 struct SMsgArguments {
-  WPARAM m_wParam;
-  LPARAM m_lParam;
+  WPARAM m_wParam;  // as they
+  LPARAM m_lParam;  // were sent
 
   UINT WLow() const { return static_cast<UINT>(m_wParam & 0xFFFF); }               // words of wParam
   UINT WHigh() const { return static_cast<UINT>(m_wParam >> 16 & 0xFFFF); }        // without a sign

@@ -21,12 +21,14 @@ struct SCurrentMessage {
 
 class QXCORE_API SWndThreadState {
  public:
-  // One window that is being created, or one modal loop that runs; a list on the stack, innermost first.
+  // One window that is being created; a list on the stack, innermost first.
   struct Creation {
     SWnd* m_object;     // whose window it is
     bool m_hasEnded;    // PostNcDestroy was called: the object may be gone
     Creation* m_outer;  // the one around it, or null
   };
+
+  // One modal loop that runs; a list on the stack, innermost first.
   struct ModalLoop {
     SWnd* m_window;      // whose loop it is; null once the object is gone
     int m_result;        // what EndModalLoop was given
