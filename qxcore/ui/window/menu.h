@@ -29,8 +29,8 @@ class QXCORE_API SMenu : public SObject {
   int LoadMenuIndirectW(const void* menuTemplate);
   int DestroyMenu();
 
-  int Attach(HMENU menu);  // owns the menu from now on; 0 for a null handle. Throws SEOutOfMemory
-  HMENU Detach();          // gives the menu up; returns its handle
+  int Attach(HMENU menu);       // owns the menu from now on; 0 for a null handle. Throws SEOutOfMemory
+  HMENU Detach();               // gives the menu up; returns its handle
   HMENU GetSafeHandle() const;  // the handle; null for a null object pointer, too
 
   // The object of a menu: the permanent one, else a temporary one; null for a null handle.
