@@ -12,7 +12,6 @@
 #include <string_view>
 
 #ifdef _WIN32
-
 #ifndef NOMINMAX
 #define NOMINMAX
 #endif
@@ -22,6 +21,7 @@
 #include <windows.h>
 
 #include <commctrl.h>
+#include <commdlg.h>
 
 // From a header whose other macros are named like members of the library.
 #ifndef GET_X_LPARAM

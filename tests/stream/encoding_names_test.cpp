@@ -42,6 +42,21 @@ TEST(EncodingNames, EveryRow_NamesItsValueInAnyCase) {
   }
 }
 
+// The fixed table: its groups one after the other, pages ascending; names of our own stand behind it.
+TEST(EncodingNames, FixedTable_ComesFirstInItsOrder) {
+  constexpr std::size_t kFixedRows = 259, kPages = 210, kFirstPage = 14;
+  ASSERT_GT(std::size(kRows), kFixedRows);
+  EXPECT_EQ(SString(kRows[0].name), WTEXT("ASCII"));
+  EXPECT_EQ(SString(kRows[kFirstPage - 4].name), WTEXT("ANSI+Detect"));
+  for (std::size_t i = kFirstPage; i < kFirstPage + kPages; ++i) {
+    EXPECT_TRUE(Support::IsANSI(kRows[i].value) && (kRows[i].value & 0xFFFF) != 0) << i;
+    EXPECT_LE(i == kFirstPage ? 0 : kRows[i - 1].value, kRows[i].value) << i;
+  }
+  EXPECT_EQ(SString(kRows[kFirstPage + kPages].name), WTEXT("Cp%d"));
+  EXPECT_EQ(SString(kRows[kFirstPage + kPages + 1].name), WTEXT("OEM"));
+  EXPECT_EQ(SString(kRows[kFixedRows - 1].name), WTEXT("Unicode(0x%0.4X)"));
+}
+
 TEST(EncodingNames, DisplayNames_ReadBackWithEveryPolicy) {
   for (const Row& row : kRows) {
     for (Encoding level : {0u, 0x200000u, 0x400000u, 0x600000u, 0x800000u, 0xA00000u, 0xC00000u, 0xE00000u}) {

@@ -218,8 +218,6 @@ TEST(StringLocking, Unlock_MeasuresOrCuts) {
   EXPECT_EQ(text.Length(), 3);
 }
 
-// Every operation that changes a text, its argument anywhere, also in the text itself, and the text
-// owned, shared or static; the model is a plain string.
 // What others hold is never written, however the length came to be 0.
 TEST(StringLocking, UnlockWithoutABufferOfItsOwn_WritesNothing) {
   SString constant;
@@ -266,85 +264,6 @@ TEST(StringLocking, NewTextsInALockedString_HaveTheirOwnLength) {
   text.Init(WTEXT("xy"));
   EXPECT_EQ(text, WTEXT("xy"));
   EXPECT_EQ(RefsOf(text), 1);
-}
-
-TEST(StringModel, RandomOperations_AgreeWithPlainString) {
-  RandomText random(20261121);
-  const SStringView kAlphabet = WTEXT("aAbB,");
-  for (int round = 0; round < 20000; ++round) {
-    WideString model = random.Make(40, kAlphabet);
-    SString text(model.c_str());
-    SString sharer;
-    if (random.Number(2) == 0) sharer = text;
-    WideString argument = random.Make(3, kAlphabet);
-    int from = random.Number(static_cast<int>(model.size()) + 1);
-    const bool isOwn = random.Number(3) == 0;
-    if (isOwn) argument = model.substr(static_cast<std::size_t>(from));
-    const WCHAR* arg = isOwn ? text.GetPointerAt(from) : argument.c_str();
-    int index = random.Number(50) - 5;
-    std::size_t place = static_cast<std::size_t>(std::clamp(index, 0, static_cast<int>(model.size())));
-    switch (random.Number(8)) {
-      case 0:
-        text += arg;
-        model += argument;
-        break;
-      case 1:
-        text = arg;
-        model = argument;
-        break;
-      case 2:
-        text.Insert(arg, index);
-        model.insert(place, argument);
-        break;
-      case 3: {
-        int count = random.Number(9);
-        int end = std::clamp(index + count, static_cast<int>(place), static_cast<int>(model.size()));
-        text.Delete(index, count);
-        model.erase(place, static_cast<std::size_t>(end) - place);
-        break;
-      }
-      case 4: {
-        int replaced = 0;
-        std::size_t at = 0;
-        while (!argument.empty() && (at = model.find(argument, at)) != WideString::npos) {
-          model.replace(at, argument.size(), WTEXT("<>"));
-          at += 2;
-          ++replaced;
-        }
-        EXPECT_EQ(text.ReplaceAll(arg, WTEXT("<>")), replaced);
-        break;
-      }
-      case 5: {
-        WCHAR c = kAlphabet[static_cast<std::size_t>(random.Number(5))];
-        text.Trim(c);
-        std::size_t first = model.find_first_not_of(c);
-        model = first == WideString::npos ? WideString() : model.substr(first, model.find_last_not_of(c) - first + 1);
-        break;
-      }
-      case 6: {
-        std::size_t at = model.find(WTEXT(','));
-        SString right;
-        int found = text.Split(&text, &right, WTEXT(','));
-        EXPECT_EQ(found != 0, at != WideString::npos);
-        if (found) {
-          EXPECT_EQ(right, model.substr(at + 1).c_str());
-        }
-        model = model.substr(0, at);
-        break;
-      }
-      case 7: {
-        int count = random.Number(60) - 5;
-        text = text.Mid(index, count);
-        model = model.substr(place, static_cast<std::size_t>(std::max(count, 0)));
-        break;
-      }
-    }
-    ASSERT_EQ(text.View(), SStringView(model)) << "round " << round;
-    ASSERT_EQ(text.GetAt(text.Length()), 0);
-    if (model.empty()) {
-      ASSERT_TRUE(Shares(text, SString::null));
-    }
-  }
 }
 
 TEST(StringModel, EqualLengthReplacement_HappensInPlace) {

@@ -15,12 +15,13 @@ SPECIAL = re.compile(r"^(vtable|typeinfo|VTT|guard variable|non-virtual thunk|vi
 
 
 def exported(library):
-    """Qualified names of functions, without arguments."""
+    """Qualified names of functions, without arguments. The platform's own have C linkage and are left out: they are
+    called through the library."""
     listed = subprocess.run(["nm", "-DC", "--defined-only", library], capture_output=True, text=True, check=True).stdout
     names = set()
     for line in listed.splitlines():
         _, kind, name = line.split(" ", 2)
-        if kind not in "TW" or SPECIAL.match(name) or name.startswith("std::"):
+        if kind not in "TW" or "(" not in name or SPECIAL.match(name) or name.startswith("std::"):
             continue
         name = re.sub(r"\[abi:\w+\]|<[^<>]*(<[^<>]*>[^<>]*)*>", "", name).split("(")[0].split(" ")[-1]
         if not re.search(r"operator|~", name):
@@ -28,18 +29,30 @@ def exported(library):
     return names
 
 
-def hidden(headers):
-    """Class and name of the members that the headers declare below "private" or "protected" only."""
-    seen = {True: set(), False: set()}
+def published(headers):
+    """The functions that the installed headers offer: (class or "", name), those of private and protected parts left out."""
+    offered = set()
     for path in pathlib.Path(headers).rglob("*.h"):
-        name, is_public = "", True
+        if "internal" in path.parts or "posix" in path.parts or "win32" in path.parts:
+            continue
+        scopes = []  # (class, its part is public) by depth of braces
+        waiting = None
         for line in path.read_text(encoding="utf-8").splitlines():
-            if begin := re.match(r"\s*(class|struct) (?:QXCORE_API )?(\w+)[^;]*\{", line):
-                name, is_public = begin[2], begin[1] == "struct"
-            elif access := re.match(r"\s*(public|protected|private):", line):
-                is_public = access[1] == "public"
-            seen[is_public].update((name, member) for member in re.findall(r"(\w+)\(", line))
-    return seen[False] - seen[True]
+            line = re.sub(r'"(\\.|[^"\\])*"|//.*', "", line)
+            if begin := re.match(r"\s*(class|struct) (?:QXCORE_API )?(\w+)[^;(]*$", line):
+                waiting = (begin[2], begin[1] == "struct")
+            elif scopes and (access := re.match(r"\s*(public|protected|private):", line)):
+                scopes[-1] = (scopes[-1][0], access[1] == "public")
+            if all(is_public for _, is_public in scopes):
+                name = next((name for name, _ in reversed(scopes) if name), "")
+                offered.update((name, member) for member in re.findall(r"(\w+)\(", line))
+            for brace in re.findall(r"[{}]", line):
+                if brace == "{":
+                    scopes.append(waiting or ("", True))
+                    waiting = None
+                elif scopes:
+                    scopes.pop()
+    return offered
 
 
 def called(tests):
@@ -52,11 +65,11 @@ def called(tests):
 
 def main():
     library, tests = sys.argv[1:]
-    words, private = called(tests), hidden(pathlib.Path(__file__).resolve().parents[2] / "qxcore")
+    words, offered = called(tests), published(pathlib.Path(__file__).resolve().parents[2] / "qxcore")
     missing = []
     for name in sorted(exported(library)):
         last = name.split("::")[-1]
-        if tuple(name.split("::")[-2:]) in private:
+        if (name.split("::")[-2] if "::" in name and not name.startswith("platform::") else "", last) not in offered:
             continue
         # A client may write the name of a member that the Windows headers change without its W.
         if last not in words and (not last.endswith("W") or last[:-1] not in words):

@@ -9,11 +9,6 @@
 #include <string>
 #include <vector>
 
-#if __has_include(<commdlg.h>)
-#include <windows.h>
-
-#include <commdlg.h>
-#endif
 #include "qxcore/system/file/file.h"
 #include "qxcore/system/file/internal/links.h"
 #include "qxcore/system/file/ordered_recurse_find_files.h"

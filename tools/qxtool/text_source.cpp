@@ -4,8 +4,8 @@
 #include <cerrno>
 #include <cstring>
 #include <filesystem>
-#include <fstream>
 
+#include "qxcore/core/error_cause.h"
 #include "qxcore/core/io_exceptions.h"
 #include "tools/qxtool/console.h"
 #include "tools/qxtool/failure.h"
@@ -32,15 +32,12 @@ bool CountingInput::StartsWith(std::string_view bytes) const {
 
 namespace {
 
-// What the system has against opening the file; the library's exception only says that it could not.
-std::string WhyNotOpened(const std::string& name) {
-  std::error_code error;
-  const std::filesystem::path path = console::PathOf(console::NativeOf(name));
-  std::filesystem::file_status status = std::filesystem::status(path, error);
-  if (std::filesystem::is_directory(status)) return "it is a folder";
-  if (!std::filesystem::exists(status)) return error ? error.message() : "there is no such file";
-  std::ifstream attempt(path, std::ios::binary);
-  return attempt ? "" : std::strerror(errno);
+// What the system has against opening the file, after the error that it refused with.
+std::string WhyNotOpened(const std::string& name, int error) {
+  if (error == ENOENT) return "there is no such file";
+  std::error_code ignored;
+  if (std::filesystem::is_directory(console::PathOf(console::NativeOf(name)), ignored)) return "it is a folder";
+  return error != 0 ? std::strerror(error) : "";
 }
 
 }  // namespace
@@ -49,7 +46,7 @@ std::unique_ptr<SInputFile> OpenInput(const std::string& name, ProgressBar& prog
   try {
     return std::make_unique<SInputFile>(console::NameOf(name), &progress);
   } catch (const SEIOCantOpenForReading& e) {
-    std::string why = WhyNotOpened(name);
+    const std::string why = WhyNotOpened(name, SGetErrorCause(e));
     throw Failure{ToUtf8(e.GetText()) + (why.empty() ? why : ": " + why)};
   }
 }

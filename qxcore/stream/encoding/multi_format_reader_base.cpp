@@ -299,6 +299,7 @@ void Reader::SetFormat(Encoding requested) {
   GoTo(current);
   m_requested = requested;
   m_state->choice = SFormatChoice();
+  m_state->loss = SReaderState::kNowhere;
 }
 
 // --- decoding ---
@@ -340,12 +341,16 @@ unsigned long Reader::DecodeWhole() {
   ReadWholeInput(kLongestInput);
   if (!state.raw.IsAtEnd() || m_raw.Size() > kLongestInput) throw SEOutOfMemory();  // more than the platform converts
   if (m_raw.Size() == 0) return 0;
+  if (state.raw.Position() == state.loss) state.decoder.ThrowLoss();
   AllocStrData(m_text, m_raw.Size() * static_cast<unsigned long>(sizeof(WCHAR)));
   m_run = PositionOfRaw();
   WCHAR* out = reinterpret_cast<WCHAR*>(m_text.block);
   const STextDecoder::Run run = state.decoder.Decode(m_raw.start, m_raw.end, true, out, m_raw.Size());
-  if (run.isLoss) state.decoder.ThrowLoss();
-  m_raw.start = m_raw.end;
+  if (run.isLoss) {
+    if (run.out == out) state.decoder.ThrowLoss();
+    state.loss = state.raw.PositionOf(run.in);
+  }
+  m_raw.start += run.in - m_raw.start;
   return static_cast<unsigned long>(run.out - out);
 }
 

@@ -1,6 +1,8 @@
 // What a reader keeps behind one pointer: its input, the choice of the format, and the decoder.
 #pragma once
 
+#include <cstdint>
+
 #include "qxcore/core/memory.h"
 #include "qxcore/stream/encoding/internal/format_check.h"
 #include "qxcore/stream/encoding/internal/raw_input.h"
@@ -18,4 +20,9 @@ struct SReaderState {
   STextDecoder decoder;     // of the selected encoding; counts the losses
   SEncodingGuess guess;     // what the library's own GuessEncoding made of the evidence last
   bool isComplete = false;  // the evidence is that of the whole input
+
+  // Where a lossless decoder that needs the whole input met what it cannot map: it keeps a state, and so cannot be
+  // asked again from there.
+  static constexpr std::uint64_t kNowhere = ~std::uint64_t{0};
+  std::uint64_t loss = kNowhere;
 };

@@ -221,7 +221,7 @@ Run STextDecoder::DecodeWhole(const unsigned char* in, const unsigned char* end,
       *written++ = out[i];
     } else if (m_isLossless) {
       m_isLossIllegal = true;
-      return {in, out, true};
+      return {LocateInWhole(in, end, static_cast<std::size_t>(i)), written, true};
     } else if (m_replacement != 0) {
       *written++ = m_replacement;
       ++m_losses.replaced;

@@ -34,8 +34,8 @@ class STextDecoder {
   void SetReplacement(WCHAR replacement) { m_replacement = replacement; }
   WCHAR GetReplacement() const { return m_replacement; }
 
-  // True for the few code pages that keep a state or have longer characters: they are decoded only when
-  // the whole rest of the input is there, and lossless ones not at all where anything of it cannot be mapped.
+  // True for the few code pages that keep a state or have longer characters: they are decoded only when the whole
+  // rest of the input is there, and cannot be decoded on from where a lossless one stopped.
   bool NeedsWholeInput() const { return m_kernel == Kernel::kWhole; }
 
   // Decodes [in, end) to `out`, but no more than `room` characters; a surrogate pair is not cut, so that there must be
