@@ -27,8 +27,8 @@ class QXCORE_API SProgressStatusBar : public SStatusBar {
 
   // What GetSetProgressStatus exchanges.
   struct Status {
-    SCustomProgressCtrl::Status m_progress;
-    std::uint32_t m_flags = 0;
+    SCustomProgressCtrl::Status m_progress;  // range and position of the progress
+    std::uint32_t m_flags = 0;               // a sum of kInProgress, kCancelAllowed and kCancelRequested
   };
 
   SProgressStatusBar() = default;
@@ -50,6 +50,8 @@ class QXCORE_API SProgressStatusBar : public SStatusBar {
   SCustomProgressCtrl& GetProgressCtrl() { return m_progress; }
 
  protected:
+  // --- handlers of the bar's messages and of the button's notifications; derived classes call them ---
+
   void OnSize(UINT type, int width, int height);
   void OnCancel();
   void OnCancelNotify(NMHDR* header, LRESULT* result);

@@ -24,18 +24,20 @@ enum : std::uint32_t {
 // The index of the main pane, wherever an index is taken.
 inline constexpr int kSMainPane = -1;
 
+// One pane.
 struct SStatusBarPane {
   enum : std::uint32_t { kTextDirty = 1 };  // the control must be given the text
 
   int m_width = 0;            // pixels, without the padding that each pane gets
   std::uint32_t m_style = 0;  // kSPane... and drawing types
   std::uint32_t m_flags = 0;  // kTextDirty
-  SString m_text;
+  SString m_text;             // what the pane shows
 };
 
 static_assert(sizeof(void*) != 4 || (sizeof(SStatusBarPane) == 16 && offsetof(SStatusBarPane, m_text) == 12),
               "the layout is public");
 
+// The table of panes; the index kSMainPane names the main pane in every function that takes an index.
 class QXCORE_API SStatusBarPanes : public STableMem<SStatusBarPane> {
  public:
   // Empty, with room for five panes.

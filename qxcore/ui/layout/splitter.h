@@ -46,16 +46,16 @@ class QXCORE_API SSplitterWnd : public SWnd {
   QXCORE_DECLARE_CREATABLE_CLASS(SSplitterWnd)
 
  public:
-  // What OnDrawSplitter draws.
-  enum SplitType {
+  SSplitterWnd();
+  ~SSplitterWnd() override;
+
+  // The parts that OnDrawSplitter draws.
+  enum SplitType : int {
     kSplitBox,           // a split box
     kSplitBar,           // a bar
     kSplitIntersection,  // where two bars cross
     kSplitBorder,        // the frame around all panes
   };
-
-  SSplitterWnd();
-  ~SSplitterWnd() override;
 
   // --- virtual functions; they continue the list of SWnd ---
 
@@ -212,16 +212,22 @@ class QXCORE_API SSplitterWnd : public SWnd {
 
   // --- the geometry, pixels of the window's DPI; a derived class may set it before the window is created ---
 
-  int m_barWidth = 7, m_barHeight = 7;         // of a split box and of a bar: width of upright ones, height of others
-  int m_borderShareX = 0, m_borderShareY = 0;  // how far a pane's own border reaches over the bars
-  int m_gapX = 7, m_gapY = 7;                  // between panes
-  int m_borderX = 2, m_borderY = 2;            // inside the edge of the client area
+  int m_barWidth = 7;      // the width of a split box and of an upright bar
+  int m_barHeight = 7;     // the height of a split box and of a level bar
+  int m_borderShareX = 0;  // how far a pane's own border reaches over the bars beside it
+  int m_borderShareY = 0;  // the same for the bars above and below it
+  int m_gapX = 7;          // between columns
+  int m_gapY = 7;          // between rows
+  int m_borderX = 2;       // inside the left and right edge of the client area
+  int m_borderY = 2;       // inside its upper and lower edge
 
-  int m_maxRows = 0, m_maxColumns = 0;
-  int m_rowCount = 0, m_columnCount = 0;
-  DWORD m_scrollStyle = 0;
-  STableDumb<SPaneInfo> m_columns;
-  STableDumb<SPaneInfo> m_rows;
+  int m_maxRows = 0;                  // the most rows; in a static splitter those of its grid
+  int m_maxColumns = 0;               // the same for columns
+  int m_rowCount = 0;                 // the present rows
+  int m_columnCount = 0;              // the present columns
+  DWORD m_scrollStyle = 0;            // WS_HSCROLL and WS_VSCROLL
+  STableDumb<SPaneInfo> m_columns;    // sizes of the columns
+  STableDumb<SPaneInfo> m_rows;       // sizes of the rows
   SClassInfo* m_paneClass = nullptr;  // of panes made on demand; null in a static splitter
   SCreateContext m_context;           // what they are made from
 

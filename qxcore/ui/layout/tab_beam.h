@@ -26,6 +26,7 @@ struct tagSTABBEAM {
   int m_former;    // the current tab before; -1 for none
   SWnd* m_window;  // the chosen tab's window
 };
+// The record under its usual name.
 using STabBeamNotify = tagSTABBEAM;
 
 class QXCORE_API STabBeam : public SWnd {

@@ -14,11 +14,11 @@ class SWnd;
 // One tab.
 struct STab {
   SWnd* m_window = nullptr;  // what it stands for; not owned
-  SString m_text;
-  int m_hasContent = 1;  // 0: the tab is empty, and is written in the font for empty tabs
-  int m_width = 60;      // without the spacing to the next tab
-  SRect m_drawn;         // where it was painted last; empty when it was not visible
-  SRect m_textArea;      // the same of its text
+  SString m_text;            // what is written on it
+  int m_hasContent = 1;      // 0: the tab is empty, and is written in the font for empty tabs
+  int m_width = 60;          // without the spacing to the next tab
+  SRect m_drawn;             // where it was painted last; empty when it was not visible
+  SRect m_textArea;          // the same of its text
 
   // The library's memory; throws SEOutOfMemory.
   static void* operator new(std::size_t size) { return SMemAlloc(size); }
