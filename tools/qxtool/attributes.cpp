@@ -3,7 +3,7 @@
 #include <charconv>
 
 #include "qxcore/platform/win32.h"
-#include "tools/qxtool/failure.h"
+#include "tools/common/failure.h"
 
 namespace {
 

@@ -8,9 +8,9 @@
 #include <functional>
 #include <sstream>
 
+#include "tools/common/failure.h"
+#include "tools/common/standard_streams.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/standard_streams.h"
 
 namespace {
 

@@ -3,12 +3,12 @@
 #include <map>
 #include <vector>
 
+#include "tools/common/encoding_option.h"
+#include "tools/common/failure.h"
+#include "tools/common/standard_streams.h"
+#include "tools/common/utf8.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/encoding_option.h"
-#include "tools/qxtool/failure.h"
 #include "tools/qxtool/json.h"
-#include "tools/qxtool/standard_streams.h"
-#include "tools/qxtool/utf8.h"
 
 namespace {
 

@@ -58,21 +58,23 @@ class Unescaper {
 }  // namespace
 
 int Escape(const TextPipeOptions& options) {
-  return PipeText(options, [](PipeSource& source, TextTarget& target) {
+  return PipeText(options, [](TextPass& pass) {
+    PipeSource& source = pass.Source();
     SJavaUnicodeEscapeFilterStream filter(source.text.Reader());
     std::vector<char> escaped(kPiece);
     std::vector<WCHAR> text(kPiece);
     auto read = [&filter](void* buffer, unsigned long size) { return filter.Read(buffer, size); };
     while (unsigned count = ReadPiece(source, escaped.data(), kPiece, read)) {
       text.assign(escaped.begin(), escaped.begin() + count);
-      target.Write(source.name, {text.data(), count});
+      pass.Target().Write(source.name, {text.data(), count});
     }
   });
 }
 
 int Unescape(const TextPipeOptions& options) {
-  return PipeText(options, [](PipeSource& source, TextTarget& target) {
-    Unescaper unescaper(source.name, target);
+  return PipeText(options, [](TextPass& pass) {
+    PipeSource& source = pass.Source();
+    Unescaper unescaper(source.name, pass.Target());
     std::vector<WCHAR> text(kPiece / sizeof(WCHAR));
     auto read = [&source](void* buffer, unsigned long size) { return source.text.Reader().Read(buffer, size); };
     while (unsigned bytes = ReadPiece(source, text.data(), kPiece, read)) {

@@ -6,15 +6,15 @@
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/system/file/file.h"
 #include "qxcore/system/file/recurse_find.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
+#include "tools/common/progress_bar.h"
+#include "tools/common/standard_streams.h"
+#include "tools/common/utf8.h"
 #include "tools/qxtool/attributes.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/failure.h"
 #include "tools/qxtool/file_time.h"
 #include "tools/qxtool/json.h"
-#include "tools/qxtool/progress_bar.h"
-#include "tools/qxtool/standard_streams.h"
-#include "tools/qxtool/utf8.h"
 
 namespace {
 

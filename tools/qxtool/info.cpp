@@ -3,14 +3,14 @@
 #include <vector>
 
 #include "qxcore/system/file/file.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
+#include "tools/common/standard_streams.h"
+#include "tools/common/utf8.h"
 #include "tools/qxtool/attributes.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/failure.h"
 #include "tools/qxtool/file_time.h"
 #include "tools/qxtool/json.h"
-#include "tools/qxtool/standard_streams.h"
-#include "tools/qxtool/utf8.h"
 
 namespace {
 

@@ -8,12 +8,12 @@
 #include "qxcore/stream/output_file.h"
 #include "qxcore/system/file/file.h"
 #include "qxcore/system/settings/profile.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
+#include "tools/common/standard_streams.h"
+#include "tools/common/utf8.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/failure.h"
 #include "tools/qxtool/json.h"
-#include "tools/qxtool/standard_streams.h"
-#include "tools/qxtool/utf8.h"
 
 namespace {
 

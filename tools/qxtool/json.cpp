@@ -2,7 +2,7 @@
 
 #include <cstdio>
 
-#include "tools/qxtool/utf8.h"
+#include "tools/common/utf8.h"
 
 namespace {
 

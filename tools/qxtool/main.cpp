@@ -3,10 +3,10 @@
 #include <cstdlib>
 
 #include "qxcore/core/io_exceptions.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
+#include "tools/common/standard_streams.h"
 #include "tools/qxtool/command_line.h"
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/standard_streams.h"
 
 int main(int argc, char** argv) {
   console::SetUp();

@@ -5,9 +5,9 @@
 
 #include "qxcore/system/file/file.h"
 #include "qxcore/system/file/recurse_find.h"
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/utf8.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
+#include "tools/common/utf8.h"
 
 namespace fs = std::filesystem;
 

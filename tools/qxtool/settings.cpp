@@ -5,11 +5,11 @@
 
 #include "qxcore/system/hglobal.h"
 #include "qxcore/system/settings/registry.h"
+#include "tools/common/failure.h"
+#include "tools/common/standard_streams.h"
+#include "tools/common/utf8.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/failure.h"
 #include "tools/qxtool/json.h"
-#include "tools/qxtool/standard_streams.h"
-#include "tools/qxtool/utf8.h"
 
 namespace {
 

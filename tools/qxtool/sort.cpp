@@ -2,13 +2,13 @@
 
 #include "qxcore/container/string_table.h"
 #include "qxcore/core/io_exceptions.h"
+#include "tools/common/console.h"
+#include "tools/common/encoding_option.h"
+#include "tools/common/failure.h"
+#include "tools/common/standard_streams.h"
+#include "tools/common/text_source.h"
+#include "tools/common/utf8.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/encoding_option.h"
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/standard_streams.h"
-#include "tools/qxtool/text_source.h"
-#include "tools/qxtool/utf8.h"
 
 namespace {
 

@@ -5,13 +5,13 @@
 #include <vector>
 
 #include "qxcore/core/io_exceptions.h"
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/encoding_option.h"
-#include "tools/qxtool/failure.h"
+#include "tools/common/console.h"
+#include "tools/common/encoding_option.h"
+#include "tools/common/failure.h"
+#include "tools/common/replacement_file.h"
+#include "tools/common/standard_streams.h"
+#include "tools/common/utf8.h"
 #include "tools/qxtool/pipe_plan.h"
-#include "tools/qxtool/replacement_file.h"
-#include "tools/qxtool/standard_streams.h"
-#include "tools/qxtool/utf8.h"
 
 namespace {
 
@@ -49,45 +49,18 @@ std::optional<WCHAR> ReplacementOf(const TextPipeOptions& options) {
   return text.GetAt(0);
 }
 
-// What is to be said of one file.
-struct Outcome {
-  SString detection, reading, writing;  // warnings
-  SString encoding;
-  bool IsLossy() const { return !reading.IsEmpty() || !writing.IsEmpty(); }
-};
-
 // Everything between two files.
-Outcome Pass(const TextPipeOptions& options, const std::string& name, TextSource& source, std::FILE* file,
-             const TextWork& work) {
+TextOutcome Pass(const TextPipeOptions& options, const std::string& name, TextSource& source, std::FILE* file,
+                 const TextWork& work) {
   FileOutput output(file);
-  SOutputStringStream stream(output, TargetFormat(options));
-  if (std::optional<WCHAR> replacement = ReplacementOf(options)) {
-    source.Reader().SetReplacement(*replacement);
-    stream.SetReplacement(*replacement);
-  }
-  TextTarget target(stream, TargetFormat(options));
-  PipeSource named{name, source};
-  work(named, target);
-  stream.Close();
+  TextPass pass(name, source, output, TargetFormat(options), ReplacementOf(options));
+  work(pass);
+  const TextOutcome outcome = pass.Finish();
   output.Flush();
-  return {source.Reader().GetDetectionWarning(), source.Reader().GetEncodingWarning(), stream.GetEncodingWarning(),
-          ShownName(source.Reader().GetFormat())};
+  return outcome;
 }
 
-// Where the text of a source cannot be read on: read once more, character by character.
-void FailAtUnreadable(const std::string& name, Encoding format) {
-  const std::string reason = ReasonOfCurrentException();
-  TextPosition position;
-  try {
-    TextSource again(name, format);
-    again.Select();
-    for (WCHAR c; again.Reader().Read(&c, sizeof c) == sizeof c;) position.Pass({&c, 1});
-  } catch (const SEEncodingException&) {
-    throw Failure{position.Text() + ": " + reason, kFailed, name};
-  }
-}
-
-Outcome PassBetween(const TextPipeOptions& options, const PipePair& pair, const TextWork& work) {
+TextOutcome PassBetween(const TextPipeOptions& options, const PipePair& pair, const TextWork& work) {
   std::optional<TextSource> source;
   try {
     source.emplace(pair.in, SourceFormat(options));
@@ -100,7 +73,7 @@ Outcome PassBetween(const TextPipeOptions& options, const PipePair& pair, const 
     const std::string native = console::NativeOf(pair.out);
     if (!options.outputDir.empty()) std::filesystem::create_directories(console::PathOf(native).parent_path());
     ReplacementFile target(native);
-    const Outcome outcome = Pass(options, pair.in, *source, target.File(), work);
+    const TextOutcome outcome = Pass(options, pair.in, *source, target.File(), work);
     source.reset();  // on some systems an open file cannot be replaced, and IN may be OUT
     target.Commit(options.ifChanged || options.inPlace);
     return outcome;
@@ -110,7 +83,7 @@ Outcome PassBetween(const TextPipeOptions& options, const PipePair& pair, const 
 }
 
 ExitCode PipeOne(const TextPipeOptions& options, const PipePair& pair, const TextWork& work) {
-  const Outcome outcome = PassBetween(options, pair, work);
+  const TextOutcome outcome = PassBetween(options, pair, work);
   if (options.verbose) Complain(pair.in + " -> " + pair.out + ": " + ToUtf8(outcome.encoding));
   for (const SString& warning : {outcome.detection, outcome.reading, outcome.writing})
     if (!warning.IsEmpty() && !options.quiet) Complain(pair.in + ": " + ToUtf8(warning));
@@ -118,21 +91,6 @@ ExitCode PipeOne(const TextPipeOptions& options, const PipePair& pair, const Tex
 }
 
 }  // namespace
-
-unsigned ReadPiece(PipeSource& source, void* buffer, unsigned size,
-                   const std::function<unsigned long(void*, unsigned long)>& read) {
-  try {
-    if (console::Interrupted()) throw SEIOAbortedException();
-    const unsigned long bytes = read(buffer, size);
-    if (bytes == 0) source.text.CheckRead();
-    return static_cast<unsigned>(bytes);
-  } catch (const SEEncodingException&) {
-    if (source.name != kStandard) FailAtUnreadable(source.name, source.text.Reader().GetRequestedFormat());
-    FailAt(source.name);
-  } catch (...) {
-    FailAt(source.name);
-  }
-}
 
 int PipeText(const TextPipeOptions& options, const TextWork& work) {
   SourceFormat(options);

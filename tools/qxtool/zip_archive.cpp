@@ -4,11 +4,11 @@
 #include <cstring>
 
 #include "qxcore/core/io_exceptions.h"
-#include "tools/qxtool/console.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
+#include "tools/common/text_source.h"
+#include "tools/common/utf8.h"
 #include "tools/qxtool/entry_path.h"
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/text_source.h"
-#include "tools/qxtool/utf8.h"
 
 namespace {
 

@@ -13,7 +13,7 @@
 #include "qxcore/stream/input_file.h"
 #include "qxcore/stream/zip/zip_file.h"
 #include "qxcore/stream/zip/zip_input_stream.h"
-#include "tools/qxtool/progress_bar.h"
+#include "tools/common/progress_bar.h"
 
 // Opens an archive's directory. Throws Failure, with a text for what the library leaves without one.
 std::unique_ptr<SZipFile> OpenDirectory(const std::string& path);

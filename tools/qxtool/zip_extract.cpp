@@ -1,13 +1,13 @@
 // qxtool zip extract: the data of one entry.
 
 #include "qxcore/core/io_exceptions.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
+#include "tools/common/progress_bar.h"
+#include "tools/common/replacement_file.h"
+#include "tools/common/standard_streams.h"
+#include "tools/common/utf8.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/progress_bar.h"
-#include "tools/qxtool/replacement_file.h"
-#include "tools/qxtool/standard_streams.h"
-#include "tools/qxtool/utf8.h"
 #include "tools/qxtool/zip_archive.h"
 
 namespace {

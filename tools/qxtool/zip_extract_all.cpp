@@ -5,12 +5,12 @@
 #include <vector>
 
 #include "qxcore/system/time/time.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
+#include "tools/common/replacement_file.h"
+#include "tools/common/standard_streams.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/console.h"
 #include "tools/qxtool/entry_path.h"
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/replacement_file.h"
-#include "tools/qxtool/standard_streams.h"
 #include "tools/qxtool/zip_archive.h"
 
 namespace {

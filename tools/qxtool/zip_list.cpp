@@ -3,13 +3,13 @@
 #include <cstdio>
 
 #include "qxcore/core/io_exceptions.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
+#include "tools/common/standard_streams.h"
+#include "tools/common/utf8.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/console.h"
 #include "tools/qxtool/entry_path.h"
-#include "tools/qxtool/failure.h"
 #include "tools/qxtool/json.h"
-#include "tools/qxtool/standard_streams.h"
-#include "tools/qxtool/utf8.h"
 #include "tools/qxtool/zip_archive.h"
 
 namespace {

@@ -2,9 +2,9 @@
 
 #include <vector>
 
+#include "tools/common/failure.h"
+#include "tools/common/standard_streams.h"
 #include "tools/qxtool/commands.h"
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/standard_streams.h"
 #include "tools/qxtool/zip_archive.h"
 
 namespace {

@@ -1,4 +1,4 @@
-#include "tools/qxtool/text_source.h"
+#include "tools/common/text_source.h"
 
 #include <algorithm>
 #include <cerrno>
@@ -7,9 +7,9 @@
 
 #include "qxcore/core/error_cause.h"
 #include "qxcore/core/io_exceptions.h"
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/utf8.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
+#include "tools/common/utf8.h"
 
 int CountingInput::Read() {
   unsigned char byte;
@@ -42,7 +42,7 @@ std::string WhyNotOpened(const std::string& name, int error) {
 
 }  // namespace
 
-std::unique_ptr<SInputFile> OpenInput(const std::string& name, ProgressBar& progress) {
+std::unique_ptr<SInputFile> OpenInput(const std::string& name, SProgressIndicatorEx& progress) {
   try {
     return std::make_unique<SInputFile>(console::NameOf(name), &progress);
   } catch (const SEIOCantOpenForReading& e) {
@@ -51,13 +51,17 @@ std::unique_ptr<SInputFile> OpenInput(const std::string& name, ProgressBar& prog
   }
 }
 
-TextSource::TextSource(const std::string& name, Encoding request) : m_progress(name) {
+TextSource::TextSource(const std::string& name, Encoding request, SProgressIndicatorEx* progress) {
+  if (progress == nullptr) {
+    m_bar = std::make_unique<ProgressBar>(name);
+    progress = m_bar.get();
+  }
   SInputStream* inner;
   if (name == "-") {
     m_standardInput = std::make_unique<StandardInput>();
     inner = m_standardInput.get();
   } else {
-    m_file = OpenInput(name, m_progress);
+    m_file = OpenInput(name, *progress);
     m_size = m_file->Available();
     inner = m_file.get();
   }

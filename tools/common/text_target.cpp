@@ -1,10 +1,10 @@
-#include "tools/qxtool/text_target.h"
+#include "tools/common/text_target.h"
 
 #include <cstdio>
 
 #include "qxcore/core/io_exceptions.h"
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/utf8.h"
+#include "tools/common/failure.h"
+#include "tools/common/utf8.h"
 
 namespace {
 

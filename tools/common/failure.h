@@ -17,7 +17,11 @@ struct Failure {
 // The reader of our standard output has gone; no error, there is just nobody left to write for.
 struct BrokenPipe {};
 
-// Writes "qxtool: ..." in one line to standard error.
+// The name of the program, which begins each complaint; "qxtool" until it is set. The text must live as long as the
+// process.
+void SetProgramName(const char* name);
+
+// Writes "NAME: ..." in one line to standard error.
 void Complain(std::string_view text);
 
 // The failure that is being handled, in words. Only within a catch block. Cancelling and a broken pipe

@@ -1,4 +1,4 @@
-#include "tools/qxtool/console.h"
+#include "tools/common/console.h"
 
 #include <cctype>
 #include <cerrno>
@@ -69,7 +69,7 @@ void RemoveWhenKilled(const std::filesystem::path* path) { g_removeWhenKilled = 
 
 #ifdef _WIN32
 
-void SetUp() {
+void SetUpStreams() {
   _setmode(_fileno(stdin), _O_BINARY);
   _setmode(_fileno(stdout), _O_BINARY);
   _setmode(_fileno(stderr), _O_BINARY);
@@ -77,6 +77,10 @@ void SetUp() {
     g_outputCodePage = GetConsoleOutputCP();
     if (g_outputCodePage && SetConsoleOutputCP(CP_UTF8)) std::atexit(RestoreConsole);
   }
+}
+
+void SetUp() {
+  SetUpStreams();
   SetConsoleCtrlHandler(OnConsoleEvent, TRUE);
 }
 
@@ -110,8 +114,10 @@ bool Synchronise(std::FILE* file) { return std::fflush(file) == 0 && _commit(_fi
 
 #else
 
+void SetUpStreams() { std::signal(SIGPIPE, SIG_IGN); }
+
 void SetUp() {
-  std::signal(SIGPIPE, SIG_IGN);
+  SetUpStreams();
   // Without SA_RESTART a read that waits for a person ends, too.
   struct sigaction action = {};
   action.sa_handler = OnSignal;

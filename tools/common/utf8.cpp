@@ -1,4 +1,4 @@
-#include "tools/qxtool/utf8.h"
+#include "tools/common/utf8.h"
 
 #include "qxcore/system/file/file.h"
 

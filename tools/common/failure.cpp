@@ -1,4 +1,4 @@
-#include "tools/qxtool/failure.h"
+#include "tools/common/failure.h"
 
 #include <cstdio>
 #include <exception>
@@ -6,10 +6,14 @@
 
 #include "qxcore/core/exception.h"
 #include "qxcore/core/io_exceptions.h"
-#include "tools/qxtool/utf8.h"
+#include "tools/common/utf8.h"
+
+static const char* g_programName = "qxtool";
+
+void SetProgramName(const char* name) { g_programName = name; }
 
 void Complain(std::string_view text) {
-  std::string line = "qxtool: ";
+  std::string line = std::string(g_programName) + ": ";
   // Names come from outside; control characters in them could steer the screen.
   for (char c : text) line += c == '\n' || c == '\r' ? ' ' : (c >= 0 && c < ' ') || c == '\x7F' ? '?' : c;
   line += '\n';

@@ -4,7 +4,7 @@
 #include <string>
 
 #include "qxcore/stream/output_string_stream.h"
-#include "tools/qxtool/encoding_option.h"
+#include "tools/common/encoding_option.h"
 
 // A place in a text, both counted from 1.
 struct TextPosition {

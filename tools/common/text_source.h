@@ -6,9 +6,9 @@
 
 #include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_file.h"
-#include "tools/qxtool/encoding_option.h"
-#include "tools/qxtool/progress_bar.h"
-#include "tools/qxtool/standard_streams.h"
+#include "tools/common/encoding_option.h"
+#include "tools/common/progress_bar.h"
+#include "tools/common/standard_streams.h"
 
 // Passes bytes on, counts them and remembers the first ones.
 class CountingInput : public SInputStream {
@@ -32,12 +32,13 @@ class CountingInput : public SInputStream {
 };
 
 // Opens a file for reading. Throws Failure that says what the system has against it.
-std::unique_ptr<SInputFile> OpenInput(const std::string& name, ProgressBar& progress);
+std::unique_ptr<SInputFile> OpenInput(const std::string& name, SProgressIndicatorEx& progress);
 
 class TextSource {
  public:
-  // Opens the file, or standard input for "-". Throws SEIOCantOpenForReading.
-  TextSource(const std::string& name, Encoding request);
+  // Opens the file, or standard input for "-". `progress` is told how far the file has been read, and outlives the
+  // source; null for a bar on the terminal. Throws Failure when the file cannot be opened.
+  TextSource(const std::string& name, Encoding request, SProgressIndicatorEx* progress = nullptr);
 
   SMultiFormatReaderUnicode& Reader() { return *m_reader; }
 
@@ -54,7 +55,7 @@ class TextSource {
   void CheckRead();
 
  private:
-  ProgressBar m_progress;
+  std::unique_ptr<ProgressBar> m_bar;  // null when somebody else is told
   std::unique_ptr<SInputFile> m_file;  // null for standard input
   std::unique_ptr<StandardInput> m_standardInput;
   std::unique_ptr<CountingInput> m_bytes;

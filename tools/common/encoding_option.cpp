@@ -1,9 +1,9 @@
-#include "tools/qxtool/encoding_option.h"
+#include "tools/common/encoding_option.h"
 
 #include <charconv>
 
-#include "tools/qxtool/failure.h"
-#include "tools/qxtool/utf8.h"
+#include "tools/common/failure.h"
+#include "tools/common/utf8.h"
 
 namespace {
 

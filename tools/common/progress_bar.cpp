@@ -1,9 +1,9 @@
-#include "tools/qxtool/progress_bar.h"
+#include "tools/common/progress_bar.h"
 
 #include <cstdio>
 #include <utility>
 
-#include "tools/qxtool/console.h"
+#include "tools/common/console.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "tools/qxtool/replacement_file.h"
+#include "tools/common/replacement_file.h"
 
 #include <array>
 #include <cerrno>
@@ -8,8 +8,8 @@
 #include <string>
 #include <system_error>
 
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/failure.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
 
 namespace fs = std::filesystem;
 

@@ -1,10 +1,10 @@
-#include "tools/qxtool/standard_streams.h"
+#include "tools/common/standard_streams.h"
 
 #include <cerrno>
 
 #include "qxcore/core/io_exceptions.h"
-#include "tools/qxtool/console.h"
-#include "tools/qxtool/failure.h"
+#include "tools/common/console.h"
+#include "tools/common/failure.h"
 
 int StandardInput::Read() {
   unsigned char byte;

@@ -1,5 +1,5 @@
-// What the tool needs of the system around a process and what the library does not offer: arguments
-// and paths, binary standard streams, terminals, interruption. The only part of the tool
+// What the tools need of the system around a process and what the library does not offer: arguments
+// and paths, binary standard streams, terminals, interruption. The only part of the tools
 // that knows which system it runs on.
 #pragma once
 
@@ -13,8 +13,9 @@
 
 namespace console {
 
-// Binary standard streams, UTF-8 on the screen, no death by a broken pipe, and an interruption
-// (Ctrl-C, termination, a terminal that is closed) that is remembered. Call it once, first.
+// Binary standard streams, UTF-8 on the screen, and no death by a broken pipe. Call it once, first.
+void SetUpStreams();
+// The same, and an interruption (Ctrl-C, termination, a terminal that is closed) that is remembered.
 void SetUp();
 
 // The arguments behind the program's name: UTF-8 on Windows, elsewhere the bytes as they are.
