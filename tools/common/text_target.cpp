@@ -8,13 +8,6 @@
 
 namespace {
 
-class Nowhere final : public SOutputStream {
- public:
-  using SOutputStream::Write;
-  void Write(int) override {}
-  unsigned long Write(const void*, unsigned long count) override { return count; }
-};
-
 bool IsPair(SStringView text, std::size_t at) {
   return (text[at] & 0xFC00) == 0xD800 && at + 1 < text.size() && (text[at + 1] & 0xFC00) == 0xDC00;
 }

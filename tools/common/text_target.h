@@ -18,6 +18,14 @@ struct TextPosition {
   WCHAR m_last = 0;
 };
 
+// A stream into which text is written only to see what would be lost.
+class Nowhere final : public SOutputStream {
+ public:
+  using SOutputStream::Write;
+  void Write(int) override {}
+  unsigned long Write(const void*, unsigned long count) override { return count; }
+};
+
 class TextTarget {
  public:
   TextTarget(SOutputStringStream& stream, Encoding format)

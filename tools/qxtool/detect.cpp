@@ -1,29 +1,16 @@
 // qxtool detect: how files are encoded, a line a file or as JSON.
 
 #include <algorithm>
-#include <optional>
 
-#include "qxcore/core/io_exceptions.h"
 #include "tools/common/encoding_option.h"
 #include "tools/common/failure.h"
+#include "tools/common/finding.h"
 #include "tools/common/standard_streams.h"
-#include "tools/common/text_source.h"
 #include "tools/common/utf8.h"
 #include "tools/qxtool/commands.h"
 #include "tools/qxtool/json.h"
 
 namespace {
-
-struct Finding {
-  SString file;
-  SString encoding;
-  Encoding value = 0;
-  bool bom = false;
-  bool xml = false;
-  unsigned long long bytes = 0;
-  SString warning;
-  std::string error;
-};
 
 Encoding RequestOf(const DetectOptions& options) {
   Encoding hint = EncodingOf(options.hint, "--hint");
@@ -38,24 +25,6 @@ Encoding RequestOf(const DetectOptions& options) {
   if (options.favor == "hint") favor = Encodings::kFavorHint;
   if (options.favor == "guess" || (options.favor.empty() && favor == 0)) favor = Encodings::kFavorGuess;
   return (hint & ~(Encodings::kLevelMask | kFavors)) | level | favor | UnicodePolicy(options.fullUnicode);
-}
-
-Finding Look(const std::string& name, Encoding request) {
-  Finding finding;
-  finding.file = ShownArgument(name);
-  try {
-    TextSource source(name, request);
-    source.Select();
-    finding.encoding = ShownName(source.Reader().GetFormat());
-    finding.value = ShownValue(source.Reader().GetFormat());
-    finding.bom = source.HasMark();
-    finding.xml = (finding.value & Encodings::kXML) != 0;
-    finding.warning = source.Reader().GetDetectionWarning();
-    finding.bytes = source.CountBytes();
-  } catch (...) {
-    finding.error = ReasonOfCurrentException();
-  }
-  return finding;
 }
 
 std::string AsJson(const Finding& finding) {
@@ -93,7 +62,7 @@ int Detect(const DetectOptions& options) {
   const char* separator = "";
   if (options.json) Print("{\"version\":1,\"files\":[");
   for (const std::string& name : options.files) {
-    Finding finding = Look(name, request);
+    const Finding finding = LookAt(name, request);
     if (!finding.error.empty()) {
       code = kFailed;
       Complain(name + ": " + finding.error);
