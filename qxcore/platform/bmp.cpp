@@ -2,24 +2,14 @@
 
 #include <array>
 
+#include "qxcore/platform/internal/bmp_runs.h"
+
 namespace platform {
 namespace {
 
-struct Run {
-  int first, last, step, delta;
-};
-
-constexpr Run kLowerRuns[] = {
-#define LOWER(first, last, step, delta) {first, last, step, delta},
-#define UPPER(first, last, step, delta)
-#define CLASS(first, last, bits)
-#include "qxcore/platform/bmp_data.inc"
-#undef LOWER
-#undef UPPER
-};
-
-constexpr Run kUpperRuns[] = {
+constexpr BmpRun kUpperRuns[] = {
 #define LOWER(first, last, step, delta)
+#define CLASS(first, last, bits)
 #define UPPER(first, last, step, delta) {first, last, step, delta},
 #include "qxcore/platform/bmp_data.inc"
 #undef LOWER
@@ -27,7 +17,7 @@ constexpr Run kUpperRuns[] = {
 #undef CLASS
 };
 
-constexpr Run kClassRuns[] = {
+constexpr BmpRun kClassRuns[] = {
 #define LOWER(first, last, step, delta)
 #define UPPER(first, last, step, delta)
 #define CLASS(first, last, bits) {first, last, 1, bits},
@@ -35,18 +25,18 @@ constexpr Run kClassRuns[] = {
 };
 
 template <std::size_t n>
-constexpr BmpTable<WCHAR> MakeCase(const Run (&runs)[n]) {
+constexpr BmpTable<WCHAR> MakeCase(const BmpRun (&runs)[n]) {
   BmpTable<WCHAR> table{};
   for (int c = 0; c < 65536; ++c) table.values[c] = static_cast<WCHAR>(c);
-  for (const Run& run : runs)
+  for (const BmpRun& run : runs)
     for (int c = run.first; c <= run.last; c += run.step) table.values[c] = static_cast<WCHAR>(c + run.delta);
   return table;
 }
 
 template <std::size_t n>
-constexpr BmpTable<std::uint8_t> MakeClasses(const Run (&runs)[n]) {
+constexpr BmpTable<std::uint8_t> MakeClasses(const BmpRun (&runs)[n]) {
   BmpTable<std::uint8_t> table{};
-  for (const Run& run : runs)
+  for (const BmpRun& run : runs)
     for (int c = run.first; c <= run.last; ++c) table.values[c] = static_cast<std::uint8_t>(run.delta);
   return table;
 }

@@ -3,6 +3,7 @@
 // The tables hold the simple one-to-one mappings and the general categories of Unicode 15.0; they are
 // the same on every target, so that what is ordered on one machine is in order on every other. A
 // character with no one-to-one mapping inside the plane, and a surrogate, maps to itself.
+// Threads: the functions may be called in any thread.
 #pragma once
 
 #include <cstdint>

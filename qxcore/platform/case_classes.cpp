@@ -3,26 +3,14 @@
 #include <algorithm>
 #include <array>
 
+#include "qxcore/platform/internal/bmp_runs.h"
+
 namespace platform {
 namespace {
 
-struct Run {
-  int first, last, step, delta;
-};
-
-constexpr Run kLowerRuns[] = {
-#define LOWER(first, last, step, delta) {first, last, step, delta},
-#define UPPER(first, last, step, delta)
-#define CLASS(first, last, bits)
-#include "qxcore/platform/bmp_data.inc"
-#undef LOWER
-#undef UPPER
-#undef CLASS
-};
-
 constexpr std::size_t kCount = [] {
   std::size_t count = 0;
-  for (const Run& run : kLowerRuns) count += static_cast<std::size_t>((run.last - run.first) / run.step) + 1;
+  for (const BmpRun& run : kLowerRuns) count += static_cast<std::size_t>((run.last - run.first) / run.step) + 1;
   return count;
 }();
 
@@ -32,7 +20,7 @@ constexpr bool ComesFirst(const CaseVariant& a, const CaseVariant& b) { return a
 constexpr std::array<CaseVariant, kCount> kVariants = [] {
   std::array<CaseVariant, kCount> variants{};
   auto out = variants.begin();
-  for (const Run& run : kLowerRuns) {
+  for (const BmpRun& run : kLowerRuns) {
     for (int c = run.first; c <= run.last; c += run.step) {
       *out++ = {static_cast<WCHAR>(c + run.delta), static_cast<WCHAR>(c)};
     }

@@ -1,4 +1,5 @@
 // Which module the running code belongs to, and on Linux what a module handle stands for.
+// Threads: the functions may be called in any thread.
 #pragma once
 
 #include <cstddef>

@@ -1,5 +1,6 @@
 // The published interfaces of embedded documents that the library calls. On Windows they come from <oleidl.h>;
 // elsewhere they are declared here, for programs that implement them.
+// Threads: the functions may be called in any thread.
 #pragma once
 
 #include "qxcore/platform/win32.h"

@@ -4,6 +4,7 @@
 // are written here and no wide function of the C library is called. Texts are terminated and never
 // null unless a function says otherwise. Differences between the targets are listed in
 // docs/portable-layer.md; case and classes of characters (bmp.h) are the same on both.
+// Threads: the functions may be called in any thread; two threads may not write one buffer.
 #pragma once
 
 #include <cstdarg>
@@ -59,7 +60,7 @@ QXCORE_API long WideToLong(const WCHAR* text, const WCHAR** end = nullptr, int b
 // A negative number is taken modulo 2^32.
 QXCORE_API unsigned long WideToULong(const WCHAR* text, const WCHAR** end = nullptr, int base = 10);
 // White space, a sign, decimal digits with at most one '.', an exponent. The point is '.' whatever
-// the locale; hexadecimal forms, infinity and NaN are not read. Too big gives infinity, with ERANGE.
+// the locale; hexadecimal forms, infinity and NaN are not read. Too big yields infinity, with ERANGE.
 QXCORE_API double WideToDouble(const WCHAR* text, const WCHAR** end = nullptr);
 
 // --- formatting ---

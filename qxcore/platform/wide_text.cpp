@@ -52,7 +52,7 @@ Integer ReadInteger(const WCHAR* text, int base) {
   return number;
 }
 
-// The power of ten of a number's first digit other than 0, clipped; tells too big from too small.
+// The power of ten of a number's first digit other than 0, clipped; distinguishes too big from too small.
 long DecimalMagnitude(const char* at, const char* end) {
   long beforePoint = 0, zerosBehind = 0, exponent = 0;
   bool point = false, significant = false;

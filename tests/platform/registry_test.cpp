@@ -162,15 +162,6 @@ TEST(Registry, EnumerationAndCounts) {
   std::vector<WideString> values = Values(key);
   if (!IsWindows()) std::reverse(values.begin(), values.end());  // the order in which they were made
   EXPECT_EQ(values, names);
-  DWORD subKeys, longestSubKey, count, longestName, longestValue;
-  EXPECT_EQ(RegQueryInfoKeyW(key, nullptr, nullptr, nullptr, &subKeys, &longestSubKey, nullptr, &count, &longestName,
-                             &longestValue, nullptr, nullptr),
-            0);
-  EXPECT_EQ(subKeys, 300u);
-  EXPECT_EQ(longestSubKey, 7u);
-  EXPECT_EQ(count, 300u);
-  EXPECT_EQ(longestName, 7u);
-  EXPECT_GE(longestValue, 4u);
   // Changes between two steps move what follows.
   WCHAR name[256];
   DWORD length = 256;

@@ -3,18 +3,19 @@
 #include <cstdio>
 
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/platform/internal/utf.h"
 #include "tools/common/failure.h"
 #include "tools/common/utf8.h"
 
 namespace {
 
 bool IsPair(SStringView text, std::size_t at) {
-  return (text[at] & 0xFC00) == 0xD800 && at + 1 < text.size() && (text[at + 1] & 0xFC00) == 0xDC00;
+  return platform::IsHighSurrogate(text[at]) && at + 1 < text.size() && platform::IsLowSurrogate(text[at + 1]);
 }
 
 std::string CodePoint(SStringView character) {
-  char32_t value = character[0];
-  if (character.size() == 2) value = 0x10000 + ((value & 0x3FF) << 10) + (character[1] & 0x3FF);
+  const WCHAR* at = character.data();
+  const char32_t value = platform::TakeUtf16(at, at + character.size());
   char text[16];
   std::snprintf(text, sizeof text, "U+%04X", static_cast<unsigned>(value));
   return text;
@@ -26,7 +27,7 @@ void TextPosition::Pass(SStringView text) {
   for (const WCHAR c : text) {
     const bool endsPair = c == '\n' && m_last == '\r';
     m_last = c;
-    if (endsPair || (c & 0xFC00) == 0xDC00) continue;  // counted with what was before
+    if (endsPair || platform::IsLowSurrogate(c)) continue;  // counted with what was before
     if (c == '\n' || c == '\r') {
       ++line;
       character = 1;

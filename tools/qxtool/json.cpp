@@ -2,12 +2,9 @@
 
 #include <cstdio>
 
-#include "tools/common/utf8.h"
+#include "qxcore/platform/internal/utf.h"
 
 namespace {
-
-bool IsSurrogate(WCHAR c) { return (c & 0xF800) == 0xD800; }
-bool IsPair(WCHAR first, WCHAR second) { return (first & 0xFC00) == 0xD800 && (second & 0xFC00) == 0xDC00; }
 
 void AppendEscape(std::string& json, WCHAR c) {
   char escape[8];
@@ -19,8 +16,9 @@ void AppendEscape(std::string& json, WCHAR c) {
 
 std::string JsonString(SStringView text) {
   std::string json = "\"";
-  for (std::size_t i = 0; i < text.size(); ++i) {
-    WCHAR c = text[i];
+  for (const WCHAR *at = text.data(), *end = at + text.size(); at != end;) {
+    const WCHAR* start = at;
+    const char32_t c = platform::TakeUtf16(at, end);
     if (c == '"' || c == '\\') {
       json += '\\';
       json += static_cast<char>(c);
@@ -30,14 +28,11 @@ std::string JsonString(SStringView text) {
       json += "\\r";
     } else if (c == '\t') {
       json += "\\t";
-    } else if (c < 0x20 || c == 0x7F) {
-      AppendEscape(json, c);
-    } else if (!IsSurrogate(c)) {
-      json += ToUtf8(text.substr(i, 1));
-    } else if (i + 1 < text.size() && IsPair(c, text[i + 1])) {
-      json += ToUtf8(text.substr(i++, 2));
+    } else if (c < 0x20 || c == 0x7F || platform::IsSurrogate(c)) {
+      AppendEscape(json, *start);
     } else {
-      AppendEscape(json, c);
+      char sequence[4];
+      json.append(sequence, platform::PutUtf8(c, sequence));
     }
   }
   return json + '"';

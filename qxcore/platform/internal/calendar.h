@@ -20,11 +20,11 @@ bool BreakDownLocal(std::int32_t time, std::tm& fields);
 bool BreakDownUtc(std::int32_t time, std::tm& fields);
 
 // The time of a record in local time (mktime): fields out of range carry over into the next, and the
-// record is normalised. tm_isdst says whether daylight saving is meant; negative: whatever is in force then.
+// record is normalised. tm_isdst says whether daylight saving applies; negative: whatever is in force then.
 // False, and a time of -1, when it is out of range.
 bool LocalToTime(std::tm& fields, std::int32_t& time);
 
-// strftime: at most capacity - 1 characters and the terminator. Gives their number; 0 when they do not
+// strftime: at most capacity - 1 characters and the terminator. Returns their number; 0 when they do not
 // fit, for an unknown code and for an empty result, and the buffer holds an empty text then.
 //
 // On both targets: %a %A %b %B %c %d %H %I %j %m %M %p %S %U %w %W %x %X %y %Y %Z %%, and the mark # behind

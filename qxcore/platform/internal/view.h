@@ -14,7 +14,7 @@ namespace platform {
 // 0 when no view begins there.
 std::size_t ViewLength(const void* view);
 
-// Copy from and to addresses within a view; give how many bytes were copied, all but where pages are missing or,
+// Copy from and to addresses within a view; return how many bytes were copied, all but where pages are missing or,
 // for the second, cannot be written (the last error is set then).
 std::size_t CopyFromView(void* target, const void* source, std::size_t count);
 std::size_t CopyToView(void* target, const void* source, std::size_t count);

@@ -37,7 +37,7 @@ struct SStopAtBackslashAndNUL {
 #endif
 };
 
-// Copies bytes to the characters of the same value, up to `size` of them, and stops where Stop says. Gives
+// Copies bytes to the characters of the same value, up to `size` of them, and stops where Stop says. Returns
 // their number. `out` has room for `size` characters, of which those behind the stop are undefined.
 template <class Stop>
 std::size_t SWidenUntil(const unsigned char* in, std::size_t size, WCHAR* out) {
@@ -80,7 +80,7 @@ inline std::size_t SWidenASCII(const unsigned char* in, std::size_t size, WCHAR*
   return SWidenUntil<SStopAtHigh>(in, size, out);
 }
 
-// The other way: copies characters below 0x80 to bytes, and stops at the first other one, and at kStop. Gives
+// The other way: copies characters below 0x80 to bytes, and stops at the first other one, and at kStop. Returns
 // their number. `out` has room for `size` bytes, of which those behind the stop are undefined.
 template <WCHAR kStop>
 std::size_t SNarrowASCII(const WCHAR* in, std::size_t size, char* out) {

@@ -71,7 +71,7 @@ CodePageRange AllCodePages();
 const DecodeTable& GetDecodeTable(const CodePageInfo& page);
 const EncodeTable& GetEncodeTable(const CodePageInfo& page);
 
-// Conversions: they give the number of units of the whole result, write at most `capacity` of them, and
+// Conversions: they return the number of units of the whole result, write at most `capacity` of them, and
 // clear `valid` when something was invalid (decode) or had no equal (encode).
 struct Decoded {
   std::size_t length;

@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "qxcore/platform/posix/code_page.h"
+#include "qxcore/platform/posix/failure.h"
 
 namespace {
 
@@ -11,8 +12,7 @@ using namespace platform;
 
 const CodePageInfo* FindOrFail(UINT number) {
   const CodePageInfo* page = FindCodePage(ResolveCodePage(number));
-  if (page == nullptr) SetLastError(ERROR_INVALID_PARAMETER);
-  return page;
+  return page != nullptr ? page : FailWith<const CodePageInfo*>(ERROR_INVALID_PARAMETER);
 }
 
 template <class Info>
@@ -29,10 +29,7 @@ void FillInfo(const CodePageInfo& page, Info* info) {
 BOOL GetCPInfo(UINT number, CPINFO* info) {
   const CodePageInfo* page = FindOrFail(number);
   if (page == nullptr) return FALSE;
-  if (info == nullptr) {
-    SetLastError(ERROR_INVALID_PARAMETER);
-    return FALSE;
-  }
+  if (info == nullptr) return FailWith(ERROR_INVALID_PARAMETER);
   FillInfo(*page, info);
   return TRUE;
 }
@@ -40,10 +37,7 @@ BOOL GetCPInfo(UINT number, CPINFO* info) {
 BOOL GetCPInfoExW(UINT number, DWORD flags, CPINFOEXW* info) {
   const CodePageInfo* page = FindOrFail(number);
   if (page == nullptr) return FALSE;
-  if (info == nullptr || flags != 0) {
-    SetLastError(ERROR_INVALID_PARAMETER);
-    return FALSE;
-  }
+  if (info == nullptr || flags != 0) return FailWith(ERROR_INVALID_PARAMETER);
   FillInfo(*page, info);
   info->UnicodeDefaultChar = page->defaultChar;
   info->CodePage = page->number;
@@ -64,10 +58,7 @@ BOOL IsValidCodePage(UINT number) {
 }
 
 BOOL EnumSystemCodePagesW(CODEPAGE_ENUMPROCW callback, DWORD flags) {
-  if (callback == nullptr || (flags != CP_INSTALLED && flags != CP_SUPPORTED)) {
-    SetLastError(ERROR_INVALID_PARAMETER);
-    return FALSE;
-  }
+  if (callback == nullptr || (flags != CP_INSTALLED && flags != CP_SUPPORTED)) return FailWith(ERROR_INVALID_PARAMETER);
   const CodePageRange all = AllCodePages();
   for (const CodePageInfo* page = all.first; page != all.last; ++page) {
     if (page->kind == CodePageKind::kSymbol || !IsInstalled(*page)) continue;

@@ -122,7 +122,7 @@ DWORD CopyFileTo(const Resolved& source, LPCWSTR to, bool failIfExists) {
   if (const DWORD error = PrepareTarget(to, reader, failIfExists, writer)) return error;
   const DWORD error = CopyInto(reader, writer);
   if (error == ERROR_SUCCESS) return error;
-  // Half a copy is none.
+  // Half a copy is no copy.
   writer.Close();
   DeleteFileW(to);
   return error;

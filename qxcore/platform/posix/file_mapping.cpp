@@ -12,7 +12,6 @@
 #include <limits>
 #include <map>
 #include <mutex>
-#include <new>
 #include <string>
 
 #include "qxcore/platform/internal/view.h"
@@ -69,11 +68,6 @@ Tables& TheTables() {
   return *tables;
 }
 
-HANDLE Fails(DWORD error) {
-  SetLastError(error);
-  return nullptr;
-}
-
 // The descriptor of the mapping, which lives on when the file's handle is closed; without the locks of
 // the handle's sharing mode, where the system can do that.
 int Reopen(int descriptor, bool writes) {
@@ -101,8 +95,7 @@ std::uint64_t FitFile(int descriptor, std::uint64_t wanted, bool writes) {
   } else {
     error = ERROR_DISK_FULL;
   }
-  SetLastError(error);
-  return 0;
+  return FailWith<std::uint64_t>(error);
 }
 
 std::shared_ptr<Mapping> MapFile(HANDLE handle, DWORD protection, std::uint64_t size) {
@@ -112,10 +105,7 @@ std::shared_ptr<Mapping> MapFile(HANDLE handle, DWORD protection, std::uint64_t 
   size = FitFile(file.descriptor, size, writes);
   if (size == 0) return nullptr;
   const int descriptor = Reopen(file.descriptor, writes);
-  if (descriptor < 0) {
-    SetLastError(ErrorFromErrno(errno));
-    return nullptr;
-  }
+  if (descriptor < 0) return FailWith<std::shared_ptr<Mapping>>(ErrorFromErrno(errno));
   return std::make_shared<Mapping>(descriptor, size, protection, std::string());
 }
 
@@ -137,15 +127,12 @@ std::shared_ptr<Mapping> MapMemory(DWORD protection, std::uint64_t size, LPCWSTR
   if (memory.error == ERROR_SUCCESS)
     return std::make_shared<Mapping>(memory.descriptor, memory.size, protection, std::move(object));
   if (memory.descriptor >= 0) close(memory.descriptor);
-  SetLastError(memory.error);
-  return nullptr;
+  return FailWith<std::shared_ptr<Mapping>>(memory.error);
 }
 
 std::shared_ptr<Mapping> MakeMapping(HANDLE file, DWORD protection, std::uint64_t size, LPCWSTR name, bool& existed) {
-  if (protection != PAGE_READONLY && protection != PAGE_READWRITE && protection != PAGE_WRITECOPY) {
-    SetLastError(ERROR_INVALID_PARAMETER);
-    return nullptr;
-  }
+  if (protection != PAGE_READONLY && protection != PAGE_READWRITE && protection != PAGE_WRITECOPY)
+    return FailWith<std::shared_ptr<Mapping>>(ERROR_INVALID_PARAMETER);
   if (name != nullptr && *name == 0) name = nullptr;
   std::shared_ptr<Mapping> mapping;
   Tables& tables = TheTables();
@@ -203,7 +190,7 @@ std::size_t RoundToPages(std::size_t length) {
 
 HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES*, DWORD protection, DWORD sizeHigh, DWORD sizeLow,
                           LPCWSTR name) {
-  try {
+  return Guarded<HANDLE>(nullptr, [&]() -> HANDLE {
     bool existed = false;
     const std::uint64_t size = static_cast<std::uint64_t>(sizeHigh) << 32 | sizeLow;
     std::shared_ptr<Mapping> mapping = MakeMapping(file, protection, size, name, existed);
@@ -212,38 +199,36 @@ HANDLE CreateFileMappingW(HANDLE file, SECURITY_ATTRIBUTES*, DWORD protection, D
     if (handle == INVALID_HANDLE_VALUE) return nullptr;
     SetLastError(existed ? ERROR_ALREADY_EXISTS : ERROR_SUCCESS);
     return handle;
-  } catch (const std::bad_alloc&) {
-    return Fails(ERROR_NOT_ENOUGH_MEMORY);
-  }
+  });
 }
 
 LPVOID MapViewOfFile(HANDLE handle, DWORD access, DWORD offsetHigh, DWORD offsetLow, SIZE_T size) {
   const HandleUse use = UseHandle(handle);
   const auto mapping = std::dynamic_pointer_cast<Mapping>(use.object);
-  if (mapping == nullptr) return Fails(ERROR_INVALID_HANDLE);
+  if (mapping == nullptr) return FailWith<HANDLE>(ERROR_INVALID_HANDLE);
   // A copy of one's own needs no more than reading, and no access at all means that.
   const DWORD needed = (access & FILE_MAP_WRITE) != 0 ? FILE_MAP_WRITE : access != 0 ? FILE_MAP_READ : 0;
-  if ((use.access & needed) != needed) return Fails(ERROR_ACCESS_DENIED);
+  if ((use.access & needed) != needed) return FailWith<HANDLE>(ERROR_ACCESS_DENIED);
   const std::uint64_t offset = static_cast<std::uint64_t>(offsetHigh) << 32 | offsetLow;
-  if (offset % kGranularity != 0) return Fails(ERROR_MAPPED_ALIGNMENT);
+  if (offset % kGranularity != 0) return FailWith<HANDLE>(ERROR_MAPPED_ALIGNMENT);
   bool isPrivate = false;
   const int protection = ProtectionFor(access, mapping->Protection(), isPrivate);
-  if (protection < 0 || offset >= mapping->Size() || size > mapping->Size() - offset) return Fails(ERROR_ACCESS_DENIED);
+  if (protection < 0 || offset >= mapping->Size() || size > mapping->Size() - offset)
+    return FailWith<HANDLE>(ERROR_ACCESS_DENIED);
   const std::uint64_t length = size != 0 ? size : mapping->Size() - offset;
-  if (length > std::numeric_limits<std::size_t>::max()) return Fails(ERROR_NOT_ENOUGH_MEMORY);
+  if (length > std::numeric_limits<std::size_t>::max()) return FailWith<HANDLE>(ERROR_NOT_ENOUGH_MEMORY);
   void* view = mmap(nullptr, static_cast<std::size_t>(length), protection, isPrivate ? MAP_PRIVATE : MAP_SHARED,
                     mapping->Descriptor(), static_cast<off_t>(offset));
-  if (view == MAP_FAILED) return Fails(errno == ENOMEM ? ERROR_NOT_ENOUGH_MEMORY : ErrorFromErrno(errno));
+  if (view == MAP_FAILED) return FailWith<HANDLE>(errno == ENOMEM ? ERROR_NOT_ENOUGH_MEMORY : ErrorFromErrno(errno));
   Tables& tables = TheTables();
   const std::lock_guard lock(tables.mutex);
-  try {
+  const bool isKept = Guarded(false, [&] {
     tables.views.emplace(reinterpret_cast<std::uintptr_t>(view),
                          View{static_cast<std::size_t>(length), offset, protection, !isPrivate, mapping});
-    return view;
-  } catch (const std::bad_alloc&) {
-    munmap(view, static_cast<std::size_t>(length));
-    return Fails(ERROR_NOT_ENOUGH_MEMORY);
-  }
+    return true;
+  });
+  if (!isKept) munmap(view, static_cast<std::size_t>(length));
+  return isKept ? view : nullptr;
 }
 
 BOOL UnmapViewOfFile(LPCVOID view) {

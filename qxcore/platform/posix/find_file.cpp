@@ -8,6 +8,7 @@
 #include <climits>
 #include <cstring>
 
+#include "qxcore/platform/internal/path_parts.h"
 #include "qxcore/platform/posix/file_info.h"
 #include "qxcore/platform/posix/handle.h"
 #include "qxcore/platform/posix/wildcard.h"
@@ -49,8 +50,6 @@ class FolderReader {
   alignas(dirent64) char m_buffer[32768];
 };
 
-bool IsDots(const char* name) { return name[0] == '.' && (name[1] == 0 || (name[1] == '.' && name[2] == 0)); }
-
 class Search final : public HandleObject {
  public:
   Search(int folder, std::u16string pattern, bool isRoot)
@@ -61,7 +60,7 @@ class Search final : public HandleObject {
     for (;;) {
       const char* entry = m_entries.Next();
       if (entry == nullptr) return errno == 0 ? ERROR_NO_MORE_FILES : ErrorFromErrno(errno);
-      if (m_isRoot && IsDots(entry)) continue;
+      if (m_isRoot && IsDotName(entry)) continue;
       const std::string_view native(entry);
       WCHAR name[NAME_MAX + 1];
       if (native.size() >= MAX_PATH || native.size() > NAME_MAX) continue;
@@ -104,10 +103,8 @@ struct Pattern {
 
 // The folder, and the last part of the path, which alone may hold wildcards.
 Pattern SplitPattern(std::u16string_view path) {
-  std::size_t last = path.find_last_of(u"\\/");
-  if (last == std::u16string_view::npos && path.size() >= 2 && path[1] == ':') last = 1;
-  if (last == std::u16string_view::npos) return {u".", path};
-  return {path.substr(0, last + 1), path.substr(last + 1)};
+  const std::size_t folder = FolderLength(path);
+  return {folder != 0 ? path.substr(0, folder) : u".", path.substr(folder)};
 }
 
 // Opens the folder: a descriptor, or -1 and the error.

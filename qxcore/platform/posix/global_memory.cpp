@@ -1,22 +1,30 @@
 // Global memory blocks. A movable block is a record that its handle points into, two bytes past the
-// start, so that it can be told from a fixed block, whose handle is its address.
+// start, so that it differs from a fixed block, whose handle is its address.
 
 #include <cstdlib>
 #include <cstring>
+#include <memory>
 #include <mutex>
 #include <new>
 #include <unordered_map>
 
-#include "qxcore/platform/win32.h"
+#include "qxcore/platform/posix/failure.h"
 
 namespace {
 
+using platform::FailWith;
+
 struct Block {
-  void* data;  // null while discarded, that is, of size 0
-  SIZE_T size;
-  SIZE_T capacity;  // what was allocated
-  unsigned locks;
-  bool movable;
+  Block() = default;
+  Block(const Block&) = delete;
+  Block& operator=(const Block&) = delete;
+  ~Block() { std::free(data); }
+
+  void* data = nullptr;  // null while discarded, that is, of size 0
+  SIZE_T size = 0;
+  SIZE_T capacity = 0;  // what was allocated
+  unsigned locks = 0;
+  bool movable = false;
 };
 
 constexpr std::uintptr_t kMovableMark = 2;
@@ -29,30 +37,20 @@ class Blocks {
     return *blocks;
   }
 
+  // Throws when memory is out.
   HGLOBAL Add(SIZE_T size, bool movable, bool zero) {
-    void* data = nullptr;
     // A fixed block has an address, and so at least one byte.
     if (size == 0 && !movable) size = 1;
-    if (size > 0) {
-      data = zero ? std::calloc(size, 1) : std::malloc(size);
-      if (data == nullptr) return nullptr;
-    }
+    auto block = std::make_unique<Block>();
+    if (size > 0) block->data = zero ? std::calloc(size, 1) : std::malloc(size);
+    if (size > 0 && block->data == nullptr) throw std::bad_alloc();
+    block->size = block->capacity = size;
+    block->movable = movable;
+    const std::uintptr_t handle = movable ? reinterpret_cast<std::uintptr_t>(block.get()) + kMovableMark
+                                          : reinterpret_cast<std::uintptr_t>(block->data);
     const std::lock_guard lock(m_mutex);
-    try {
-      Block* block = new Block{data, size, size, 0, movable};
-      const std::uintptr_t handle =
-          movable ? reinterpret_cast<std::uintptr_t>(block) + kMovableMark : reinterpret_cast<std::uintptr_t>(data);
-      try {
-        m_byHandle.emplace(handle, block);
-      } catch (...) {
-        delete block;
-        throw;
-      }
-      return reinterpret_cast<HGLOBAL>(handle);
-    } catch (const std::bad_alloc&) {
-      std::free(data);
-      return nullptr;
-    }
+    m_byHandle.emplace(handle, std::move(block));
+    return reinterpret_cast<HGLOBAL>(handle);
   }
 
   // Calls `action` with the block of a handle; returns `invalid`, with the last error set, for an unknown one.
@@ -60,29 +58,19 @@ class Blocks {
   Result With(HGLOBAL handle, Result invalid, Action action) {
     const std::lock_guard lock(m_mutex);
     const auto found = m_byHandle.find(reinterpret_cast<std::uintptr_t>(handle));
-    if (found == m_byHandle.end()) {
-      SetLastError(ERROR_INVALID_HANDLE);
-      return invalid;
-    }
+    if (found == m_byHandle.end()) return FailWith(ERROR_INVALID_HANDLE, invalid);
     return action(*found->second);
   }
 
   bool Remove(HGLOBAL handle) {
     const std::lock_guard lock(m_mutex);
-    const auto found = m_byHandle.find(reinterpret_cast<std::uintptr_t>(handle));
-    if (found == m_byHandle.end()) {
-      SetLastError(ERROR_INVALID_HANDLE);
-      return false;
-    }
-    std::free(found->second->data);
-    delete found->second;
-    m_byHandle.erase(found);
-    return true;
+    const bool isKnown = m_byHandle.erase(reinterpret_cast<std::uintptr_t>(handle)) != 0;
+    return isKnown || FailWith(ERROR_INVALID_HANDLE, false);
   }
 
  private:
   std::mutex m_mutex;
-  std::unordered_map<std::uintptr_t, Block*> m_byHandle;
+  std::unordered_map<std::uintptr_t, std::unique_ptr<Block>> m_byHandle;
 };
 
 // False when there is no memory; the block then stays as it was.
@@ -103,45 +91,32 @@ bool Resize(Block& block, SIZE_T size, bool zero) {
 }  // namespace
 
 HGLOBAL GlobalAlloc(UINT flags, SIZE_T size) {
-  const HGLOBAL block = Blocks::Instance().Add(size, (flags & GMEM_MOVEABLE) != 0, (flags & GMEM_ZEROINIT) != 0);
-  if (block == nullptr) SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-  return block;
+  return platform::Guarded<HGLOBAL>(nullptr, [&] {
+    return Blocks::Instance().Add(size, (flags & GMEM_MOVEABLE) != 0, (flags & GMEM_ZEROINIT) != 0);
+  });
 }
 
 // A locked or fixed block is moved only with GMEM_MOVEABLE among the flags; here that means that it
 // cannot change its size without, since nothing says whether it could grow where it is. A fixed
 // block keeps its address, which is its handle, and can only shrink.
 HGLOBAL GlobalReAlloc(HGLOBAL handle, SIZE_T size, UINT flags) {
-  if ((flags & GMEM_MODIFY) != 0) {
-    SetLastError(ERROR_INVALID_PARAMETER);
-    return nullptr;
-  }
+  if ((flags & GMEM_MODIFY) != 0) return FailWith<HGLOBAL>(ERROR_INVALID_PARAMETER);
   return Blocks::Instance().With<HGLOBAL>(handle, nullptr, [&](Block& block) -> HGLOBAL {
     // Who holds the address of a locked block would be left with nothing.
     if (block.movable && block.locks > 0 && size == 0) return nullptr;
     const bool mayMove = block.movable && (block.locks == 0 || (flags & GMEM_MOVEABLE) != 0);
     if (!mayMove) {
-      if (size > block.capacity) {
-        SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-        return nullptr;
-      }
+      if (size > block.capacity) return FailWith<HGLOBAL>(ERROR_NOT_ENOUGH_MEMORY);
       block.size = size;
       return handle;
     }
-    if (!Resize(block, size, (flags & GMEM_ZEROINIT) != 0)) {
-      SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-      return nullptr;
-    }
-    return handle;
+    return Resize(block, size, (flags & GMEM_ZEROINIT) != 0) ? handle : FailWith<HGLOBAL>(ERROR_NOT_ENOUGH_MEMORY);
   });
 }
 
 LPVOID GlobalLock(HGLOBAL handle) {
   return Blocks::Instance().With<LPVOID>(handle, nullptr, [](Block& block) -> LPVOID {
-    if (block.data == nullptr) {
-      SetLastError(ERROR_DISCARDED);
-      return nullptr;
-    }
+    if (block.data == nullptr) return FailWith<LPVOID>(ERROR_DISCARDED);
     if (block.movable && block.locks < GMEM_LOCKCOUNT) ++block.locks;
     return block.data;
   });
@@ -150,24 +125,13 @@ LPVOID GlobalLock(HGLOBAL handle) {
 BOOL GlobalUnlock(HGLOBAL handle) {
   return Blocks::Instance().With<BOOL>(handle, FALSE, [](Block& block) -> BOOL {
     if (!block.movable) return TRUE;
-    if (block.locks == 0) {
-      SetLastError(ERROR_NOT_LOCKED);
-      return FALSE;
-    }
-    if (--block.locks > 0) return TRUE;
-    SetLastError(NO_ERROR);
-    return FALSE;
+    if (block.locks == 0) return FailWith(ERROR_NOT_LOCKED);
+    return --block.locks > 0 ? TRUE : FailWith(NO_ERROR);  // as published: the last unlock returns FALSE, too
   });
 }
 
 SIZE_T GlobalSize(HGLOBAL handle) {
   return Blocks::Instance().With<SIZE_T>(handle, 0, [](Block& block) { return block.size; });
-}
-
-UINT GlobalFlags(HGLOBAL handle) {
-  return Blocks::Instance().With<UINT>(handle, GMEM_INVALID_HANDLE, [](Block& block) -> UINT {
-    return block.locks | (block.movable && block.data == nullptr ? GMEM_DISCARDED : 0);
-  });
 }
 
 HGLOBAL GlobalFree(HGLOBAL handle) {

@@ -4,7 +4,6 @@
 
 #include <cerrno>
 #include <mutex>
-#include <new>
 #include <vector>
 
 namespace platform {
@@ -50,7 +49,7 @@ DWORD OpenFile::Close() {
 HANDLE AddHandle(std::shared_ptr<HandleObject> object, DWORD access) {
   Table& table = TheTable();
   const std::lock_guard lock(table.mutex);
-  try {
+  return Guarded(INVALID_HANDLE_VALUE, [&] {
     table.unused.reserve(table.slots.size() + 1);
     std::size_t number = table.slots.size();
     if (!table.unused.empty()) {
@@ -61,10 +60,7 @@ HANDLE AddHandle(std::shared_ptr<HandleObject> object, DWORD access) {
       table.slots.push_back({std::move(object), access});
     }
     return reinterpret_cast<HANDLE>((number + 1) * 4);
-  } catch (const std::bad_alloc&) {
-    SetLastError(ERROR_NOT_ENOUGH_MEMORY);
-    return INVALID_HANDLE_VALUE;
-  }
+  });
 }
 
 HandleUse UseHandle(HANDLE handle) {
@@ -88,14 +84,8 @@ std::shared_ptr<HandleObject> RemoveHandle(HANDLE handle) {
 FileUse UseFile(HANDLE handle, DWORD access) {
   HandleUse use = UseHandle(handle);
   const auto* file = dynamic_cast<OpenFile*>(use.object.get());
-  if (file == nullptr) {
-    SetLastError(ERROR_INVALID_HANDLE);
-    return {};
-  }
-  if ((use.access & access) != access) {
-    SetLastError(ERROR_ACCESS_DENIED);
-    return {};
-  }
+  if (file == nullptr) return FailWith<FileUse>(ERROR_INVALID_HANDLE);
+  if ((use.access & access) != access) return FailWith<FileUse>(ERROR_ACCESS_DENIED);
   const int descriptor = file->Descriptor();
   return {std::move(use.object), descriptor};
 }

@@ -16,6 +16,7 @@
 namespace {
 
 using platform::FailWith;
+using platform::Guarded;
 
 enum Style { kShortDate, kLongDate, kTime, kStyleCount };
 
@@ -88,18 +89,16 @@ class Formatters {
   UDateFormat* m_formats[kStyleCount] = {};
 };
 
-int Fails(DWORD error) { return FailWith(error); }
-
 // The text with its terminator; its length alone when the capacity is 0.
 int Format(Style style, UDate milliseconds, LPWSTR text, int capacity) {
   UDateFormat* format = Formatters::For(style);
-  if (format == nullptr) return Fails(ERROR_OUTOFMEMORY);
+  if (format == nullptr) return FailWith<int>(ERROR_OUTOFMEMORY);
   WCHAR buffer[256];
   UErrorCode error = U_ZERO_ERROR;
   const int length = udat_format(format, milliseconds, buffer, 256, nullptr, &error);
-  if (U_FAILURE(error)) return Fails(ERROR_INVALID_PARAMETER);
+  if (U_FAILURE(error)) return FailWith<int>(ERROR_INVALID_PARAMETER);
   if (capacity == 0) return length + 1;
-  if (capacity <= length) return Fails(ERROR_INSUFFICIENT_BUFFER);
+  if (capacity <= length) return FailWith<int>(ERROR_INSUFFICIENT_BUFFER);
   // Programs expect the plain space that Windows puts before AM and PM.
   for (int i = 0; i < length; ++i) text[i] = buffer[i] == 0x202F ? u' ' : buffer[i];
   text[length] = 0;
@@ -113,8 +112,8 @@ bool AreFlagsKnown(LCID locale, LPCWSTR picture, int capacity) {
 }  // namespace
 
 int GetDateFormatW(LCID locale, DWORD flags, const SYSTEMTIME* date, LPCWSTR format, LPWSTR text, int capacity) {
-  if (!AreFlagsKnown(locale, format, capacity)) return Fails(ERROR_INVALID_PARAMETER);
-  if (flags > DATE_LONGDATE) return Fails(ERROR_INVALID_FLAGS);
+  if (!AreFlagsKnown(locale, format, capacity)) return FailWith<int>(ERROR_INVALID_PARAMETER);
+  if (flags > DATE_LONGDATE) return FailWith<int>(ERROR_INVALID_FLAGS);
   SYSTEMTIME now, midnight;
   if (date == nullptr) GetLocalTime(&now);
   midnight = date == nullptr ? now : *date;
@@ -122,25 +121,19 @@ int GetDateFormatW(LCID locale, DWORD flags, const SYSTEMTIME* date, LPCWSTR for
   FILETIME check;
   if (!SystemTimeToFileTime(&midnight, &check)) return 0;
   const auto day = std::chrono::sys_days(std::chrono::year(midnight.wYear) / midnight.wMonth / midnight.wDay);
-  try {
-    return Format(flags == DATE_LONGDATE ? kLongDate : kShortDate, day.time_since_epoch().count() * 86400000.0, text,
-                  capacity);
-  } catch (const std::bad_alloc&) {
-    return Fails(ERROR_NOT_ENOUGH_MEMORY);
-  }
+  const double milliseconds = day.time_since_epoch().count() * 86400000.0;
+  return Guarded(0,
+                 [&] { return Format(flags == DATE_LONGDATE ? kLongDate : kShortDate, milliseconds, text, capacity); });
 }
 
 int GetTimeFormatW(LCID locale, DWORD flags, const SYSTEMTIME* time, LPCWSTR format, LPWSTR text, int capacity) {
-  if (!AreFlagsKnown(locale, format, capacity)) return Fails(ERROR_INVALID_PARAMETER);
-  if (flags != 0) return Fails(ERROR_INVALID_FLAGS);
+  if (!AreFlagsKnown(locale, format, capacity)) return FailWith<int>(ERROR_INVALID_PARAMETER);
+  if (flags != 0) return FailWith<int>(ERROR_INVALID_FLAGS);
   SYSTEMTIME of;
   if (time == nullptr) GetLocalTime(&of);
   if (time != nullptr) of = *time;
   if (of.wHour > 23 || of.wMinute > 59 || of.wSecond > 59 || of.wMilliseconds > 999)
-    return Fails(ERROR_INVALID_PARAMETER);
-  try {
-    return Format(kTime, ((of.wHour * 60.0 + of.wMinute) * 60 + of.wSecond) * 1000, text, capacity);
-  } catch (const std::bad_alloc&) {
-    return Fails(ERROR_NOT_ENOUGH_MEMORY);
-  }
+    return FailWith<int>(ERROR_INVALID_PARAMETER);
+  const double milliseconds = ((of.wHour * 60.0 + of.wMinute) * 60 + of.wSecond) * 1000;
+  return Guarded(0, [&] { return Format(kTime, milliseconds, text, capacity); });
 }

@@ -4,20 +4,15 @@
 
 #include <algorithm>
 #include <cstring>
-#include <new>
 #include <string>
 
 #include "qxcore/platform/posix/code_page.h"
+#include "qxcore/platform/posix/failure.h"
 #include "qxcore/platform/posix/table_codec.h"
 
 namespace {
 
 using namespace platform;
-
-int Fail(DWORD error) {
-  SetLastError(error);
-  return 0;
-}
 
 // The pages whose conversions take no flags.
 bool TakesNoFlags(UINT page) {
@@ -53,8 +48,8 @@ bool EncodeFlagsAllowed(UINT page, DWORD flags) {
 
 // The end of both directions: query, too small, or the length.
 int Finish(const Decoded& result, std::size_t capacity) {
-  if (result.length > 0x7FFFFFFF) return Fail(ERROR_INVALID_PARAMETER);
-  if (capacity != 0 && result.length > capacity) return Fail(ERROR_INSUFFICIENT_BUFFER);
+  if (result.length > 0x7FFFFFFF) return FailWith<int>(ERROR_INVALID_PARAMETER);
+  if (capacity != 0 && result.length > capacity) return FailWith<int>(ERROR_INSUFFICIENT_BUFFER);
   return static_cast<int>(result.length);
 }
 
@@ -105,7 +100,7 @@ int Decode(const CodePageInfo& page, DWORD flags, const char* bytes, std::size_t
       result = DecodeSymbol(bytes, count, text, capacity);
       break;
   }
-  if (strict && !result.valid) return Fail(ERROR_NO_UNICODE_TRANSLATION);
+  if (strict && !result.valid) return FailWith<int>(ERROR_NO_UNICODE_TRANSLATION);
   return Finish(result, capacity);
 }
 
@@ -153,16 +148,16 @@ int Encode(const CodePageInfo& page, DWORD flags, const WCHAR* text, std::size_t
       break;
     case CodePageKind::kUtf8:
       result = EncodeUtf8(text, count, bytes, capacity);
-      if ((flags & WC_ERR_INVALID_CHARS) != 0 && !result.valid) return Fail(ERROR_NO_UNICODE_TRANSLATION);
+      if ((flags & WC_ERR_INVALID_CHARS) != 0 && !result.valid) return FailWith<int>(ERROR_NO_UNICODE_TRANSLATION);
       break;
     case CodePageKind::kIcu:
       result = EncodeIcu(page, text, count, bytes, capacity);
-      if ((flags & WC_ERR_INVALID_CHARS) != 0 && !result.valid) return Fail(ERROR_NO_UNICODE_TRANSLATION);
+      if ((flags & WC_ERR_INVALID_CHARS) != 0 && !result.valid) return FailWith<int>(ERROR_NO_UNICODE_TRANSLATION);
       if (usedDefault != nullptr) *usedDefault = !result.valid;
       break;
     case CodePageKind::kSymbol:
       result = EncodeSymbol(text, count, bytes, capacity);
-      if (!result.valid) return Fail(ERROR_NO_UNICODE_TRANSLATION);
+      if (!result.valid) return FailWith<int>(ERROR_NO_UNICODE_TRANSLATION);
       break;
   }
   return Finish(result, capacity);
@@ -173,32 +168,26 @@ int Encode(const CodePageInfo& page, DWORD flags, const WCHAR* text, std::size_t
 int MultiByteToWideChar(UINT number, DWORD flags, LPCSTR bytes, int count, LPWSTR text, int capacity) {
   if (bytes == nullptr || count == 0 || capacity < 0 || (capacity > 0 && text == nullptr) ||
       static_cast<const void*>(bytes) == text)
-    return Fail(ERROR_INVALID_PARAMETER);
+    return FailWith<int>(ERROR_INVALID_PARAMETER);
   const CodePageInfo* page = FindCodePage(ResolveCodePage(number));
-  if (page == nullptr) return Fail(ERROR_INVALID_PARAMETER);
-  if (!DecodeFlagsAllowed(page->number, flags)) return Fail(ERROR_INVALID_FLAGS);
+  if (page == nullptr) return FailWith<int>(ERROR_INVALID_PARAMETER);
+  if (!DecodeFlagsAllowed(page->number, flags)) return FailWith<int>(ERROR_INVALID_FLAGS);
   const std::size_t length = count < 0 ? std::strlen(bytes) + 1 : static_cast<std::size_t>(count);
-  try {
-    return Decode(*page, flags, bytes, length, text, static_cast<std::size_t>(capacity));
-  } catch (const std::bad_alloc&) {
-    return Fail(ERROR_NOT_ENOUGH_MEMORY);
-  }
+  return Guarded(0, [&] { return Decode(*page, flags, bytes, length, text, static_cast<std::size_t>(capacity)); });
 }
 
 int WideCharToMultiByte(UINT number, DWORD flags, LPCWSTR text, int count, LPSTR bytes, int capacity,
                         LPCSTR defaultChar, LPBOOL usedDefault) {
   if (text == nullptr || count == 0 || capacity < 0 || (capacity > 0 && bytes == nullptr) ||
       static_cast<const void*>(bytes) == text)
-    return Fail(ERROR_INVALID_PARAMETER);
+    return FailWith<int>(ERROR_INVALID_PARAMETER);
   const CodePageInfo* page = FindCodePage(ResolveCodePage(number));
-  if (page == nullptr) return Fail(ERROR_INVALID_PARAMETER);
-  if (!EncodeFlagsAllowed(page->number, flags)) return Fail(ERROR_INVALID_FLAGS);
+  if (page == nullptr) return FailWith<int>(ERROR_INVALID_PARAMETER);
+  if (!EncodeFlagsAllowed(page->number, flags)) return FailWith<int>(ERROR_INVALID_FLAGS);
   const bool noDefaults = page->number == CP_UTF8 || page->number == CP_UTF7 || page->kind == CodePageKind::kSymbol;
-  if (noDefaults && (defaultChar != nullptr || usedDefault != nullptr)) return Fail(ERROR_INVALID_PARAMETER);
+  if (noDefaults && (defaultChar != nullptr || usedDefault != nullptr)) return FailWith<int>(ERROR_INVALID_PARAMETER);
   const std::size_t length = count < 0 ? std::char_traits<WCHAR>::length(text) + 1 : static_cast<std::size_t>(count);
-  try {
+  return Guarded(0, [&] {
     return Encode(*page, flags, text, length, bytes, static_cast<std::size_t>(capacity), defaultChar, usedDefault);
-  } catch (const std::bad_alloc&) {
-    return Fail(ERROR_NOT_ENOUGH_MEMORY);
-  }
+  });
 }

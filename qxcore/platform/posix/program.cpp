@@ -58,16 +58,11 @@ LPWSTR GetCommandLineW() {
 }
 
 DWORD GetModuleFileNameW(HMODULE module, LPWSTR path, DWORD capacity) {
-  if (module != nullptr) {
-    SetLastError(ERROR_MOD_NOT_FOUND);
-    return 0;
-  }
+  if (module != nullptr) return FailWith<DWORD>(ERROR_MOD_NOT_FOUND);
   char file[PATH_MAX];
   const ssize_t length = readlink("/proc/self/exe", file, sizeof(file));
-  if (length < 0 || capacity == 0) {
-    SetLastError(length < 0 ? ErrorFromErrno(errno) : ERROR_INSUFFICIENT_BUFFER);
-    return 0;
-  }
+  if (length < 0) return FailWith<DWORD>(ErrorFromErrno(errno));
+  if (capacity == 0) return FailWith<DWORD>(ERROR_INSUFFICIENT_BUFFER);
   const std::u16string wide = ToWindowsPath(std::string_view(file, static_cast<std::size_t>(length)));
   const bool fits = wide.size() < capacity;
   const std::size_t count = fits ? wide.size() : capacity - 1;

@@ -115,27 +115,6 @@ LSTATUS RegDeleteKeyW(HKEY key, LPCWSTR path) {
   });
 }
 
-LSTATUS RegQueryInfoKeyW(HKEY key, LPWSTR className, LPDWORD classLength, LPDWORD, LPDWORD subKeys,
-                         LPDWORD longestSubKey, LPDWORD longestClass, LPDWORD values, LPDWORD longestValueName,
-                         LPDWORD longestValue, LPDWORD securityDescriptor, FILETIME* lastWrite) {
-  return RegistryResult([&]() -> DWORD {
-    const RegistryKeyUse use(key, KEY_QUERY_VALUE);
-    use.MustExist();
-    const RegistryKeys::Facts keys = use->keys.Describe(use.Id());
-    const RegistryValues::Facts content = use->values.Describe(use.Id());
-    ClearClass(className, classLength);
-    Store(subKeys, keys.count);
-    Store(longestSubKey, keys.longestName);
-    Store<DWORD>(longestClass, 0);
-    Store(values, content.count);
-    Store(longestValueName, content.longestName);
-    Store(longestValue, content.longestData);
-    Store<DWORD>(securityDescriptor, 0);
-    Store(lastWrite, FILETIME{0, 0});
-    return ERROR_SUCCESS;
-  });
-}
-
 LSTATUS RegEnumKeyExW(HKEY key, DWORD index, LPWSTR name, LPDWORD nameLength, LPDWORD, LPWSTR className,
                       LPDWORD classLength, FILETIME* lastWrite) {
   if (name == nullptr || nameLength == nullptr) return ERROR_INVALID_PARAMETER;

@@ -14,7 +14,7 @@ namespace platform {
 
 using KeyId = std::int64_t;  // never used again for another key
 
-// Names are told apart by their upper-case letters. The bytes are in the order of the code units, so that
+// Names are distinguished by their upper-case letters. The bytes are in the order of the code units, so that
 // comparing them byte by byte compares the names.
 std::string FoldRegistryName(std::u16string_view name);
 

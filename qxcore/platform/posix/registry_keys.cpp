@@ -96,12 +96,6 @@ DWORD RegistryKeys::Delete(KeyId parent, std::u16string_view path) {
   return ERROR_SUCCESS;
 }
 
-RegistryKeys::Facts RegistryKeys::Describe(KeyId key) {
-  SqliteQuery query(m_describe.Prepared());
-  query.Bind(key).Step();
-  return {static_cast<DWORD>(query.Number(0)), static_cast<DWORD>(query.Number(1) / 2)};
-}
-
 const std::u16string* RegistryKeys::SubKey(KeyId key, DWORD index) {
   return m_window.At(key, index, m_database.Generation(), [&](std::vector<std::u16string>& names) {
     SqliteQuery query(m_subKeys.Prepared());

@@ -22,10 +22,6 @@ class RegistryKeys {
   // With its values; ERROR_ACCESS_DENIED when it has sub-keys or is a root.
   DWORD Delete(KeyId parent, std::u16string_view path);
 
-  struct Facts {
-    DWORD count, longestName;
-  };
-  Facts Describe(KeyId key);
   // In the order of the upper-case names. Null behind the last one; good until the next call of a member.
   const std::u16string* SubKey(KeyId key, DWORD index);
 
@@ -43,7 +39,6 @@ class RegistryKeys {
   RegistryStatement m_hasSubKey{m_database, "SELECT 1 FROM keys WHERE parent = ? LIMIT 1"};
   RegistryStatement m_deleteValues{m_database, "DELETE FROM vals WHERE key = ?"};
   RegistryStatement m_delete{m_database, "DELETE FROM keys WHERE id = ?"};
-  RegistryStatement m_describe{m_database, "SELECT count(*), ifnull(max(length(name)), 0) FROM keys WHERE parent = ?"};
   RegistryStatement m_subKeys{m_database, "SELECT name FROM keys WHERE parent = ? ORDER BY folded LIMIT ? OFFSET ?"};
 
   RegistryCache<KeyId, SizeOf> m_found;

@@ -48,11 +48,4 @@ bool RegistryValues::Delete(KeyId key, std::u16string_view name) {
   return m_database.HasChanged();
 }
 
-RegistryValues::Facts RegistryValues::Describe(KeyId key) {
-  SqliteQuery query(m_describe.Prepared());
-  query.Bind(key).Step();
-  return {static_cast<DWORD>(query.Number(0)), static_cast<DWORD>(query.Number(1) / 2),
-          static_cast<DWORD>(query.Number(2))};
-}
-
 }  // namespace platform

@@ -27,11 +27,6 @@ class RegistryValues {
   // False when there is none.
   bool Delete(KeyId key, std::u16string_view name);
 
-  struct Facts {
-    DWORD count, longestName, longestData;
-  };
-  Facts Describe(KeyId key);
-
  private:
   static std::size_t SizeOf(const std::optional<RegistryValue>& value) {
     return value.has_value() ? value->name.size() * sizeof(WCHAR) + value->data.size() : 0;
@@ -47,9 +42,6 @@ class RegistryValues {
                           " WHERE EXISTS (SELECT 1 FROM keys WHERE id = ?1)"
                           " ON CONFLICT(key, folded) DO UPDATE SET type = excluded.type, data = excluded.data"};
   RegistryStatement m_delete{m_database, "DELETE FROM vals WHERE key = ? AND folded = ?"};
-  RegistryStatement m_describe{m_database,
-                               "SELECT count(*), ifnull(max(length(name)), 0), ifnull(max(length(data)), 0)"
-                               " FROM vals WHERE key = ?"};
 
   RegistryCache<std::optional<RegistryValue>, SizeOf> m_found;
   RegistryWindow<RegistryValue> m_window;

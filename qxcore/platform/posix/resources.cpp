@@ -5,7 +5,9 @@
 #include <array>
 #include <string_view>
 
+#include "qxcore/platform/internal/utf.h"
 #include "qxcore/platform/module.h"
+#include "qxcore/platform/posix/failure.h"
 #include "qxcore/platform/resource_table.h"
 
 namespace {
@@ -46,12 +48,9 @@ template <class Put>
 constexpr std::size_t ReadText(std::string_view spelling, Put put) {
   std::size_t count = 0;
   auto emit = [&](char32_t c) {
-    if (c >= 0x10000) {
-      put(count++, static_cast<WCHAR>(0xD7C0 + (c >> 10)));
-      put(count++, static_cast<WCHAR>(0xDC00 + (c & 0x3FF)));
-    } else {
-      put(count++, static_cast<WCHAR>(c));
-    }
+    WCHAR units[2] = {};
+    const WCHAR* end = platform::PutUtf16(c, units);
+    for (const WCHAR* unit = units; unit != end; ++unit) put(count++, *unit);
   };
   for (std::size_t i = 1; i + 1 < spelling.size(); ++i) {
     const unsigned char c = static_cast<unsigned char>(spelling[i]);
@@ -127,20 +126,15 @@ HINSTANCE ModuleHandle() noexcept { return &g_library; }
 
 HMODULE GetModuleHandleW(LPCWSTR name) {
   if (name == nullptr) return &g_program;
-  SetLastError(ERROR_MOD_NOT_FOUND);
-  return nullptr;
+  return platform::FailWith<HMODULE>(ERROR_MOD_NOT_FOUND);
 }
 
 int LoadStringW(HINSTANCE instance, UINT id, LPWSTR buffer, int size) {
-  if (buffer == nullptr || size < 0) {
-    SetLastError(ERROR_INVALID_PARAMETER);
-    return 0;
-  }
+  if (buffer == nullptr || size < 0) return platform::FailWith<int>(ERROR_INVALID_PARAMETER);
   const StringResource* text = FindText(instance, id & 0xFFFF);
   if (text == nullptr) {
     if (size > 0) buffer[0] = 0;
-    SetLastError(ERROR_RESOURCE_NAME_NOT_FOUND);
-    return 0;
+    return platform::FailWith<int>(ERROR_RESOURCE_NAME_NOT_FOUND);
   }
   if (size == 0) {  // the caller wants the resource itself
     *reinterpret_cast<const WCHAR**>(buffer) = text->text;
@@ -155,10 +149,10 @@ int LoadStringW(HINSTANCE instance, UINT id, LPWSTR buffer, int size) {
 HRSRC FindResourceW(HMODULE module, LPCWSTR name, LPCWSTR type) {
   if (reinterpret_cast<std::uintptr_t>(type) != reinterpret_cast<std::uintptr_t>(RT_STRING)) {
     const platform::ResourceBytes found = platform::FindRegisteredResource(module, type, name);
-    if (found.data == nullptr) SetLastError(ERROR_RESOURCE_TYPE_NOT_FOUND);
+    if (found.data == nullptr) return platform::FailWith<HRSRC>(ERROR_RESOURCE_TYPE_NOT_FOUND);
     return reinterpret_cast<HRSRC>(const_cast<void*>(found.data));
   }
-  // A block holds the sixteen texts whose ids divided by sixteen, plus one, give its name.
+  // A block holds the sixteen texts whose ids divided by sixteen, plus one, are its name.
   const auto block = reinterpret_cast<std::uintptr_t>(name);
   const HINSTANCE instance = module != nullptr ? module : &g_program;
   if (block > 0 && block <= 0xFFFF) {
@@ -166,8 +160,7 @@ HRSRC FindResourceW(HMODULE module, LPCWSTR name, LPCWSTR type) {
       if (instance->strings[i].id / 16 + 1 == block)
         return reinterpret_cast<HRSRC>(const_cast<StringResource*>(&instance->strings[i]));
   }
-  SetLastError(ERROR_RESOURCE_NAME_NOT_FOUND);
-  return nullptr;
+  return platform::FailWith<HRSRC>(ERROR_RESOURCE_NAME_NOT_FOUND);
 }
 
 // What was registered is in memory already: a resource, what it is loaded as and its bytes are one address.

@@ -3,7 +3,6 @@
 #include <sys/stat.h>
 
 #include <cerrno>
-#include <new>
 #include <string>
 
 #include "qxcore/platform/posix/path.h"
@@ -36,32 +35,32 @@ std::string ConvertMode(const WCHAR* mode) {
   return result + "e";
 }
 
+// The file, or null and why.
+std::FILE* Open(const WCHAR* path, const WCHAR* mode, int& why) {
+  const Resolved entry = ResolvePath(path);
+  why = ErrnoFromError(entry.error);
+  if (entry.error != ERROR_SUCCESS) return nullptr;
+  const std::string how = ConvertMode(mode);
+  struct stat info;
+  const bool there = stat(entry.path.c_str(), &info) == 0;
+  const bool writes = how.find_first_of("wa+") != std::string::npos;
+  why = EACCES;
+  if (there && (S_ISDIR(info.st_mode) || (writes && S_ISREG(info.st_mode) && (info.st_mode & 0222) == 0)))
+    return nullptr;
+  why = ENOENT;
+  if (entry.wantsFolder) return nullptr;
+  std::FILE* file = std::fopen(entry.path.c_str(), how.c_str());
+  why = errno;
+  return file;
+}
+
 }  // namespace
 
 std::FILE* WideFileOpen(const WCHAR* path, const WCHAR* mode) {
-  try {
-    const Resolved entry = ResolvePath(path);
-    if (entry.error != ERROR_SUCCESS) {
-      errno = ErrnoFromError(entry.error);
-      return nullptr;
-    }
-    const std::string how = ConvertMode(mode);
-    struct stat info;
-    const bool there = stat(entry.path.c_str(), &info) == 0;
-    const bool writes = how.find_first_of("wa+") != std::string::npos;
-    if ((there && S_ISDIR(info.st_mode)) || (there && writes && S_ISREG(info.st_mode) && (info.st_mode & 0222) == 0)) {
-      errno = EACCES;
-      return nullptr;
-    }
-    if (entry.wantsFolder) {
-      errno = ENOENT;
-      return nullptr;
-    }
-    return std::fopen(entry.path.c_str(), how.c_str());
-  } catch (const std::bad_alloc&) {
-    errno = ENOMEM;
-    return nullptr;
-  }
+  int why = ENOMEM;
+  std::FILE* file = Guarded<std::FILE*>(nullptr, [&] { return Open(path, mode, why); });
+  if (file == nullptr) errno = why;
+  return file;
 }
 
 WCHAR* WideFullPath(WCHAR* buffer, const WCHAR* path, std::size_t capacity) {

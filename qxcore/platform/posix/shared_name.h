@@ -20,10 +20,10 @@ struct SharedMemory {
 };
 
 // The object's name for a mapping's: "Global\" and "Local\" in front mean nothing more, other backslashes are
-// ERROR_PATH_NOT_FOUND; too long gives ERROR_FILENAME_EXCED_RANGE.
+// ERROR_PATH_NOT_FOUND; too long is ERROR_FILENAME_EXCED_RANGE.
 DWORD NameOfSharedMemory(LPCWSTR name, std::string& object);
 
-// Takes hold of the memory of that name, which is made with this size where there is none. ERROR_ACCESS_DENIED when
+// Takes hold of the memory of that name, which is made with this size where it is missing. ERROR_ACCESS_DENIED when
 // somebody else made it, or could open it.
 SharedMemory OpenSharedMemory(const std::string& object, std::uint64_t size);
 

@@ -96,11 +96,6 @@ BOOL FileTimeToLocalFileTime(const FILETIME* fileTime, FILETIME* localTime) {
   return TRUE;
 }
 
-BOOL LocalFileTimeToFileTime(const FILETIME* localTime, FILETIME* fileTime) {
-  *fileTime = ToFileTime(FromFileTime(*localTime) - LocalOffset());
-  return TRUE;
-}
-
 BOOL DosDateTimeToFileTime(WORD date, WORD time, FILETIME* fileTime) {
   const SYSTEMTIME fields = {static_cast<WORD>(1980 + (date >> 9)),
                              static_cast<WORD>(date >> 5 & 15),
@@ -111,15 +106,6 @@ BOOL DosDateTimeToFileTime(WORD date, WORD time, FILETIME* fileTime) {
                              static_cast<WORD>((time & 31) * 2),
                              0};
   return SystemTimeToFileTime(&fields, fileTime);
-}
-
-BOOL FileTimeToDosDateTime(const FILETIME* fileTime, WORD* date, WORD* time) {
-  SYSTEMTIME fields;
-  if (!FileTimeToSystemTime(fileTime, &fields)) return FALSE;
-  if (fields.wYear < 1980 || fields.wYear > 2107) return FailWith(ERROR_INVALID_PARAMETER);
-  *date = static_cast<WORD>((fields.wYear - 1980) << 9 | fields.wMonth << 5 | fields.wDay);
-  *time = static_cast<WORD>(fields.wHour << 11 | fields.wMinute << 5 | fields.wSecond / 2);
-  return TRUE;
 }
 
 LONG CompareFileTime(const FILETIME* a, const FILETIME* b) {

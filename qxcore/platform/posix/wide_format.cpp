@@ -5,9 +5,9 @@
 #include <climits>
 #include <cmath>
 #include <cstring>
-#include <new>
 #include <string>
 
+#include "qxcore/platform/posix/failure.h"
 #include "qxcore/platform/wide.h"
 
 namespace platform {
@@ -404,11 +404,7 @@ bool FormatTo(Sink& sink, const WCHAR* format, Arguments& from) {
 int FormatAll(Sink& sink, const WCHAR* format, std::va_list arguments) {
   Arguments from;
   va_copy(from.list, arguments);
-  bool good = false;
-  try {
-    good = FormatTo(sink, format, from);
-  } catch (const std::bad_alloc&) {  // a precision in the millions
-  }
+  const bool good = Guarded(false, [&] { return FormatTo(sink, format, from); });  // a precision in the millions
   va_end(from.list);
   return good && sink.Count() <= INT_MAX ? static_cast<int>(sink.Count()) : -1;
 }

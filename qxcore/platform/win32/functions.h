@@ -116,7 +116,7 @@ QXCORE_API UINT GetOEMCP();
 
 // The words that the program was started with, quoted where they need it.
 QXCORE_API LPWSTR GetCommandLineW();
-// The program's own file, for a null module only; others give ERROR_MOD_NOT_FOUND. A path that does not fit is cut,
+// The program's own file, for a null module only; others yield ERROR_MOD_NOT_FOUND. A path that does not fit is cut,
 // with ERROR_INSUFFICIENT_BUFFER.
 QXCORE_API DWORD GetModuleFileNameW(HMODULE module, LPWSTR path, DWORD capacity);
 #define GetCommandLine GetCommandLineW
@@ -131,9 +131,7 @@ QXCORE_API DWORD GetTickCount();
 QXCORE_API BOOL FileTimeToSystemTime(const FILETIME* fileTime, SYSTEMTIME* time);
 QXCORE_API BOOL SystemTimeToFileTime(const SYSTEMTIME* time, FILETIME* fileTime);
 QXCORE_API BOOL FileTimeToLocalFileTime(const FILETIME* fileTime, FILETIME* localTime);
-QXCORE_API BOOL LocalFileTimeToFileTime(const FILETIME* localTime, FILETIME* fileTime);
 QXCORE_API BOOL DosDateTimeToFileTime(WORD date, WORD time, FILETIME* fileTime);
-QXCORE_API BOOL FileTimeToDosDateTime(const FILETIME* fileTime, WORD* date, WORD* time);
 QXCORE_API LONG CompareFileTime(const FILETIME* a, const FILETIME* b);
 
 QXCORE_API int GetDateFormatW(LCID locale, DWORD flags, const SYSTEMTIME* date, LPCWSTR format, LPWSTR text,
@@ -172,7 +170,6 @@ QXCORE_API HGLOBAL GlobalReAlloc(HGLOBAL block, SIZE_T size, UINT flags);
 QXCORE_API LPVOID GlobalLock(HGLOBAL block);
 QXCORE_API BOOL GlobalUnlock(HGLOBAL block);
 QXCORE_API SIZE_T GlobalSize(HGLOBAL block);
-QXCORE_API UINT GlobalFlags(HGLOBAL block);
 QXCORE_API HGLOBAL GlobalFree(HGLOBAL block);
 
 // --- the registry: one database under the user's data folder (docs/settings.md) ---
@@ -183,10 +180,6 @@ QXCORE_API LSTATUS RegCreateKeyExW(HKEY key, LPCWSTR path, DWORD reserved, LPWST
                                    LPDWORD disposition);
 QXCORE_API LSTATUS RegCloseKey(HKEY key);
 QXCORE_API LSTATUS RegDeleteKeyW(HKEY key, LPCWSTR path);
-QXCORE_API LSTATUS RegQueryInfoKeyW(HKEY key, LPWSTR className, LPDWORD classLength, LPDWORD reserved, LPDWORD subKeys,
-                                    LPDWORD longestSubKey, LPDWORD longestClass, LPDWORD values,
-                                    LPDWORD longestValueName, LPDWORD longestValue, LPDWORD securityDescriptor,
-                                    FILETIME* lastWrite);
 QXCORE_API LSTATUS RegEnumKeyExW(HKEY key, DWORD index, LPWSTR name, LPDWORD nameLength, LPDWORD reserved,
                                  LPWSTR className, LPDWORD classLength, FILETIME* lastWrite);
 QXCORE_API LSTATUS RegEnumValueW(HKEY key, DWORD index, LPWSTR name, LPDWORD nameLength, LPDWORD reserved, LPDWORD type,

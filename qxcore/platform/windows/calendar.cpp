@@ -36,7 +36,7 @@ std::size_t FormatCalendar(WCHAR* buffer, std::size_t capacity, const WCHAR* for
     WCHAR code[] = {'!', 0, 0, 0, 0}, text[128] = {0, *format};
     std::size_t count = 2;
     if (*format == '%') {
-      // The mark in front tells a code without text from one that is unknown.
+      // The mark in front distinguishes a code without text from an unknown one.
       code[1] = '%';
       code[2] = *++format;
       if (code[2] == '#') code[3] = *++format;

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "qxcore/core/module_state.h"
+#include "qxcore/platform/internal/path_parts.h"
 
 namespace {
 
@@ -303,10 +304,7 @@ HRESULT SFile::FindFirst(const SString& mask) {
   if (search == INVALID_HANDLE_VALUE) return Result(kNotFound);
   m_find = search;
   // The folder of the search, in front of every name that it finds.
-  const SStringView view = wanted.View();
-  std::size_t end = view.find_last_of(WTEXT("\\/"));
-  if (end == SStringView::npos && view.size() >= 2 && view[1] == ':') end = 1;
-  m_fullName = end == SStringView::npos ? SString() : wanted.Left(static_cast<int>(end) + 1);
+  m_fullName = wanted.Left(static_cast<int>(platform::FolderLength(wanted.View())));
   SplitFilename();
   if (TakeFound(data.cFileName) == Result(kOk) || FindNext() == Result(kOk)) return Result(kOk);
   const DWORD error = ::GetLastError();
@@ -317,12 +315,8 @@ HRESULT SFile::FindFirst(const SString& mask) {
 
 // Makes the entry's name the object's; kNotFound for "." and "..".
 HRESULT SFile::TakeFound(const WCHAR* entryName) {
-  if (entryName[0] == '.' && (entryName[1] == 0 || (entryName[1] == '.' && entryName[2] == 0)))
-    return Result(kNotFound);
-  const SStringView view = m_fullName.View();
-  std::size_t end = view.find_last_of(WTEXT("\\/"));
-  if (end == SStringView::npos && view.size() >= 2 && view[1] == ':') end = 1;
-  SString name = end == SStringView::npos ? SString() : m_fullName.Left(static_cast<int>(end) + 1);
+  if (platform::IsDotName(entryName)) return Result(kNotFound);
+  SString name = m_fullName.Left(static_cast<int>(platform::FolderLength(m_fullName.View())));
   name += entryName;
   m_fullName = name;
   SplitFilename();

@@ -2,14 +2,13 @@
 
 #include <algorithm>
 
+#include "qxcore/platform/internal/path_parts.h"
 #include "qxcore/platform/wide.h"
 #include "qxcore/system/file/file.h"
 #include "qxcore/system/file/internal/links.h"
 #include "qxcore/system/time/time.h"
 
 namespace {
-
-bool IsDotName(const WCHAR* name) { return name[0] == '.' && (name[1] == 0 || (name[1] == '.' && name[2] == 0)); }
 
 // "folder\name", in one allocation.
 SString JoinPath(const SString& folder, const SString& name) {
@@ -31,12 +30,14 @@ SString SBaseFind::GetFilePath() const {
 SString SBaseFind::GetFileTitleW() const {
   const SString name = GetFileName();
   const int dot = name.ReverseFindPos('.', name.Length() - 1);
-  return dot <= 0 || IsDotName(name) ? name : name.Left(dot);
+  return dot <= 0 || platform::IsDotName<WCHAR>(name) ? name : name.Left(dot);
 }
 
 SString SBaseFind::GetFileURL() const { return SFile::PathToURL(GetFilePath()); }
 
-int SBaseFind::IsDots() const { return MatchesMask(FILE_ATTRIBUTE_DIRECTORY) && IsDotName(GetFileName()); }
+int SBaseFind::IsDots() const {
+  return MatchesMask(FILE_ATTRIBUTE_DIRECTORY) && platform::IsDotName<WCHAR>(GetFileName());
+}
 
 SFileFind::~SFileFind() { SFileFind::Close(); }
 
@@ -73,9 +74,8 @@ int SFileFind::FindFile(const WCHAR* mask, unsigned long) {
     return 0;
   }
   const SStringView path(full);
-  const std::size_t last = path.find_last_of(WTEXT("\\/"));
   try {
-    m_root = path.substr(0, last == SStringView::npos ? 0 : last);
+    m_root = path.substr(0, platform::FolderLength(path) - 1);  // without the backslash, which a full path has
   } catch (...) {
     SFileFind::Close();
     throw;

@@ -1,5 +1,6 @@
 // SFile's operations on names: splitting, making, normal forms and URLs.
 
+#include "qxcore/platform/internal/path_parts.h"
 #include "qxcore/platform/wide.h"
 #include "qxcore/system/file/file.h"
 
@@ -53,14 +54,10 @@ int SFile::SplitPath(const SString& path, SString& drive, SString& directory, SS
   const SStringView view = full.View();
   for (SString* part : {&directory, &name, &extension}) *part = SString();
   drive = GetCurrentDrive();
-  std::size_t at = 0;
-  if (view.size() >= 2 && view[0] == '\\' && view[1] == '\\') {
-    const std::size_t end = view.find(WCHAR('\\'), 2);
-    at = end == SStringView::npos ? view.size() : end;
-    drive = full.Left(static_cast<int>(end == SStringView::npos ? at : end + 1));
-  } else if (view.size() >= 2 && view[1] == ':') {
-    drive = full.Left(2) + WTEXT("\\");
-    at = 2;
+  std::size_t at = platform::DriveLength(view);
+  if (at > 0) {
+    drive = full.Left(static_cast<int>(at));
+    if (view[1] == ':' || at < view.size()) drive += WCHAR('\\');
   }
   if (at < view.size() && view[at] == '\\') {
     ++at;
@@ -158,7 +155,7 @@ SString SFile::PathToURL(const SString& path) {
 }
 
 int SFile::IsReserved(const SString& name) {
-  // The platform knows devices that are there; of others the name alone tells.
+  // The platform knows devices that are there; the others are known by their names alone.
   WIN32_FILE_ATTRIBUTE_DATA data;
   if (!name.IsEmpty() && ::GetFileAttributesExW(name, GetFileExInfoStandard, &data) &&
       (data.dwFileAttributes & FILE_ATTRIBUTE_DEVICE) != 0)

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "qxcore/platform/internal/path_parts.h"
 #include "qxcore/system/file/file.h"
 
 namespace {
@@ -12,7 +13,7 @@ DWORD AttributesOf(const SString& name) {
   return name.IsEmpty() ? INVALID_FILE_ATTRIBUTES : ::GetFileAttributesW(name);
 }
 
-// The text that one of the platform's buffer-filling calls gives; empty on failure.
+// The text that one of the platform's buffer-filling calls returns; empty on failure.
 template <class Call>
 SString Fetch(Call call) {
   WCHAR local[MAX_PATH];
@@ -28,16 +29,6 @@ SString Fetch(Call call) {
 
 SString CurrentPath() {
   return Fetch([](DWORD size, WCHAR* buffer) { return ::GetCurrentDirectoryW(size, buffer); });
-}
-
-// Length of "C:", or of "\\server".
-int DriveLength(const SString& path) {
-  const SStringView view = path.View();
-  if (view.size() >= 2 && view[0] == '\\' && view[1] == '\\') {
-    const std::size_t end = view.find(WCHAR('\\'), 2);
-    return static_cast<int>(end == SStringView::npos ? view.size() : end);
-  }
-  return view.size() >= 2 && view[1] == ':' ? 2 : 0;
 }
 
 enum class Space { kFree, kTotal };
@@ -76,12 +67,12 @@ HRESULT SFile::Delete(const SString& name) { return Result(::DeleteFileW(name) !
 
 SString SFile::GetCurrentDirectoryW() {
   const SString path = CurrentPath();
-  return path.Mid(DriveLength(path));
+  return path.Mid(static_cast<int>(platform::DriveLength(path.View())));
 }
 
 SString SFile::GetCurrentDrive() {
   const SString path = CurrentPath();
-  return path.IsEmpty() ? path : path.Left(DriveLength(path)) + WTEXT("\\");
+  return path.IsEmpty() ? path : path.Left(static_cast<int>(platform::DriveLength(path.View()))) + WTEXT("\\");
 }
 
 HRESULT SFile::SetCurrentDirectoryW(const SString& path) {

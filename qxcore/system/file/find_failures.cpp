@@ -1,14 +1,15 @@
 #include "qxcore/system/file/find_failures.h"
 
+#include "qxcore/platform/internal/path_parts.h"
+
 namespace {
 
 // The folder that a mask looks into: "C:\dir" for "C:\dir\*.*", "C:\" for "C:\*.*".
 SString FolderOf(const SString& mask) {
-  const SStringView view = mask.View();
-  const std::size_t last = view.find_last_of(WTEXT("\\/"));
-  if (last == SStringView::npos) return SString(WTEXT("."));
-  const bool isRoot = last == 0 || view[last - 1] == ':';
-  return mask.Left(static_cast<int>(isRoot ? last + 1 : last));
+  const auto length = static_cast<int>(platform::FolderLength(mask.View()));
+  if (length == 0) return SString(WTEXT("."));
+  const bool isRoot = length == 1 || mask[length - 1] == ':' || mask[length - 2] == ':';
+  return mask.Left(isRoot ? length : length - 1);
 }
 
 }  // namespace
