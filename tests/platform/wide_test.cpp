@@ -116,10 +116,8 @@ Text Format(const WCHAR* format, ...) {
 }
 
 TEST(Format, Integers) {
-  EXPECT_EQ(Format(WTEXT("%d|%5d|%-5d|%05d|%+d|% d"), -1, 42, 42, -42, 42, 42), WTEXT("-1|   42|42   |-0042|+42| 42"));
-  EXPECT_EQ(Format(WTEXT("%u|%x|%X|%o|%#x|%#o|%#x"), 4294967295u, 255, 255, 8, 255, 8, 0),
-            WTEXT("4294967295|ff|FF|10|0xff|010|0"));
-  EXPECT_EQ(Format(WTEXT("%.3d|%5.3d|%.0d|%#.3x|%#08x"), 7, 7, 0, 3, 3), WTEXT("007|  007||0x003|0x000003"));
+  // Flags, widths and precisions: tests/string/convert_format_test.cpp, beside the narrow runtime.
+  EXPECT_EQ(Format(WTEXT("%u|%#x|%.0d|%#08x"), 4294967295u, 0, 0, 3), WTEXT("4294967295|0||0x000003"));
   EXPECT_EQ(Format(WTEXT("%I64d|%lld|%I64x"), -1LL << 40, 1LL << 40, 1LL << 40),
             WTEXT("-1099511627776|1099511627776|10000000000"));
   EXPECT_EQ(Format(WTEXT("%ld|%lu|%hd|%I32d"), -5L, 5UL, 70000, 9), WTEXT("-5|5|4464|9"));

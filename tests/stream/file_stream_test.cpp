@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <cerrno>
+#include <fstream>
 #include <random>
 #include <string>
 #include <vector>
@@ -105,6 +106,17 @@ TEST(RealFiles, SkippingIsReading) {
     EXPECT_EQ(in->Read(), -1);
     EXPECT_TRUE(in->IsEOF());
   }
+  EXPECT_FALSE(file.SeekPos(5));
+  EXPECT_EQ(file.Read(), static_cast<unsigned char>(bytes[5]));
+  file.Close();
+  EXPECT_EQ(file.Read(), -1);
+}
+
+TEST(RealFiles, WhatCannotBeOpenedThrows) {
+  TempFolder folder;
+  for (const SString& path : {Path(folder.File(WTEXT("missing"))), Path(folder.Path()), SString()})
+    EXPECT_THROW(SInputFile{path}, SEIOCantOpenForReading);
+  EXPECT_THROW(SOutputFile(Path(folder.File(WTEXT("no\\such\\folder")))), SEIOCantOpenForWriting);
 }
 
 TEST(RealFiles, WritingAndAppending) {
@@ -138,6 +150,8 @@ TEST(RealFiles, WritingAndAppending) {
   more.Write(0x141);  // the low eight bits
   more.Close();
   more.Close();
+  EXPECT_EQ(more.GetPosition(), -1);
+  EXPECT_THROW(more.Write('x'), SEIOWriteFailed);
   EXPECT_EQ(ReadAll(path), bytes + "!A");
   SOutputFile(Path(path)).Close();
   EXPECT_EQ(ReadAll(path), "");
@@ -170,6 +184,14 @@ TEST(RealFiles, LinesOfTheAnsiPage) {
   stream.Reset();
   EXPECT_EQ(file.ReadLn(), SString(WTEXT("two")));
   EXPECT_NE(file.GetFile(), nullptr);
+  EXPECT_FALSE(stream.SeekPos(second));
+  EXPECT_EQ(stream.Read(), 't');
+  WCHAR rest[2];
+  EXPECT_EQ(stream.Read(rest, 5), 4u) << "whole characters only";
+  EXPECT_EQ(SStringView(rest, 2), WTEXT("wo"));
+  EXPECT_EQ(stream.GetPos(), second + 3);
+  WriteAll(path, "cut\r");
+  EXPECT_EQ(SSeekableInputANSIFile(Path(path)).ReadLn(), SString(WTEXT("cut\r")));
 }
 
 class Indicator : public SProgressIndicatorEx {
@@ -231,6 +253,18 @@ TEST(RealFiles, ProgressAndCancelling) {
   indicator.cancelAt = indicator.questions + 1;
   EXPECT_THROW(file.SeekPos(99), SEIOAbortedException);
   EXPECT_EQ(file.GetPos(), 11u);
+  Indicator single;
+  SInputFile bytewise(Path(path), &single);
+  single.cancelAt = 3;
+  const auto readAll = [&bytewise] {
+    while (bytewise.Read() >= 0) {
+    }
+  };
+  EXPECT_THROW(readAll(), SEIOAbortedException);
+  single.cancelAt = single.questions + 1;
+  EXPECT_THROW(bytewise.SeekPos(10), SEIOAbortedException);
+  EXPECT_FALSE(bytewise.SeekPos(10));
+  EXPECT_EQ(bytewise.Read(), static_cast<unsigned char>(bytes[10]));
 }
 
 TEST(RealFiles, CancelledLinesLoseNothing) {
@@ -326,6 +360,41 @@ TEST(InputPushbackStream, AFailingSourceDoesNotSwallowWhatIsHeld) {
 }
 
 #ifndef _WIN32
+TEST(RealFilesOnLinux, FilesThatDenyTheirContentLoseNothing) {
+  std::ifstream plain("/proc/self/limits", std::ios::binary);
+  if (!plain) GTEST_SKIP() << "no such file system here";
+  const std::string expected{std::istreambuf_iterator<char>(plain), std::istreambuf_iterator<char>()};
+  SInputFile file(SString(WTEXT("C:\\proc\\self\\limits")));
+  EXPECT_EQ(file.GetFileSize(), 0u);
+  EXPECT_EQ(file.Available(), 1u);
+  std::string all, block(1000, '\0');
+  while (const unsigned long got = file.Read(block.data(), 1000)) all.append(block, 0, got);
+  EXPECT_EQ(all, expected);
+}
+
+TEST(RealFilesOnLinux, AFullDiskIsReported) {
+  const SString full(WTEXT("C:\\dev\\full"));
+  if (GetFileAttributesW(full) == INVALID_FILE_ATTRIBUTES) GTEST_SKIP() << "no such device here";
+  const std::string bytes = RandomBytes(200000);
+  SOutputFile file(full);
+  EXPECT_THROW(file.Write(bytes.data(), 200000), SEIODiskFullException);
+  EXPECT_THROW(file.Close(), SEIOException);
+  SOutputFile buffered(full);
+  buffered.Write('x');
+  EXPECT_THROW(buffered.Flush(), SEIODiskFullException);
+  SOutputFile closing(full);
+  closing.Write('x');
+  EXPECT_THROW(closing.Close(), SEIODiskFullException);
+  EXPECT_NO_THROW({
+    SOutputFile destroyed(full);
+    destroyed.Write('x');
+  });
+  SOutputFile inner(full);
+  SOutputBufferStream outer(inner, 16);
+  outer.Write("waiting", 7);
+  EXPECT_THROW(outer.Close(), SEIODiskFullException);
+}
+
 // A read that fails is no end of the data: /proc/self/mem cannot be read at its start.
 TEST(RealFilesOnLinux, ReadErrorsAreRemembered) {
   SInputFile file(SString(WTEXT("C:\\proc\\self\\mem")));

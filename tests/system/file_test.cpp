@@ -163,7 +163,12 @@ TEST(Files, OpenWriteSeekRead) {
   EXPECT_EQ(count, 0u);
   position = -20;
   EXPECT_EQ(file.Seek(position, FILE_CURRENT), Code(SFile::kSeekFailed));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_NEGATIVE_SEEK));
   EXPECT_EQ(position, -20);
+  constexpr std::int64_t kFar = (std::int64_t{3} << 32) + 5;  // behind 12 GiB, in a file with holes
+  EXPECT_EQ(file.RestorePosition(kFar), Code(SFile::kOk));
+  EXPECT_EQ(file.SavePosition(position), Code(SFile::kOk));
+  EXPECT_EQ(position, kFar);
   EXPECT_EQ(file.RestorePosition(4), Code(SFile::kOk));
   EXPECT_EQ(file.SetEndOfFile(), Code(SFile::kOk));
   EXPECT_EQ(file.Flush(), Code(SFile::kOk));
@@ -252,8 +257,9 @@ TEST(Files, CloseTellsOfABadHandle) {
   TempFolder folder;
   SFile file(Str(folder.File(WTEXT("a"))));
   file.Open();
-  CloseHandle(file.GetHandle());
+  EXPECT_TRUE(CloseHandle(file.GetHandle()));
   EXPECT_EQ(file.Close(), Code(SFile::kCloseFailed));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_INVALID_HANDLE));
   file.Open();
   CloseHandle(file.GetHandle());
   SFile copy;
@@ -286,7 +292,12 @@ TEST(Files, SharingAndReadOnly) {
   EXPECT_EQ(file.Open(), Code(SFile::kOk));
   EXPECT_EQ(file.GetAccess(), static_cast<unsigned long>(GENERIC_READ));
   file.Close();
+  if (!IsWine()) {  // which lets the superuser write it
+    EXPECT_EQ(CreateFileW(path.c_str(), GENERIC_WRITE, 0, nullptr, OPEN_EXISTING, 0, nullptr), INVALID_HANDLE_VALUE);
+    EXPECT_EQ(GetLastError(), DWORD(ERROR_ACCESS_DENIED));
+  }
   EXPECT_EQ(file.Delete(), Code(SFile::kDeleteFailed));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_ACCESS_DENIED));
   EXPECT_EQ(file.SetAttributes(FILE_ATTRIBUTE_NORMAL), Code(SFile::kOk));
   EXPECT_EQ(file.Delete(), Code(SFile::kOk));
   EXPECT_EQ(file.Exists(), 0);
@@ -296,6 +307,16 @@ TEST(Files, PropertiesAndContent) {
   TempFolder folder;
   const test::Text path = folder.File(WTEXT("a"));
   SFile file(Str(path));
+  unsigned long attributes = 0;
+  EXPECT_EQ(file.GetAttributes(attributes), Code(SFile::kGetAttributesFailed));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_FILE_NOT_FOUND));
+  WriteAll(path, "12345");
+  EXPECT_EQ(file.GetAttributes(attributes), Code(SFile::kOk));
+  EXPECT_EQ(attributes & ~static_cast<unsigned long>(FILE_ATTRIBUTE_NORMAL),
+            static_cast<unsigned long>(FILE_ATTRIBUTE_ARCHIVE));
+  WIN32_FILE_ATTRIBUTE_DATA data;
+  ASSERT_TRUE(GetFileAttributesExW(path.c_str(), GetFileExInfoStandard, &data));
+  EXPECT_EQ(data.nFileSizeLow, 5u);
   const std::pair<std::string, short> contents[] = {{"", SFile::kEmptyContent},
                                                     {"text\r\n", SFile::kNarrowText},
                                                     {std::string("a\0b", 3), SFile::kBinaryContent},
@@ -320,6 +341,8 @@ TEST(Files, PropertiesAndContent) {
   FILETIME byName, byHandle, created;
   EXPECT_EQ(file.GetDateTime(&byName), Code(SFile::kOk));
   EXPECT_EQ(file.GetDateTime(&created, 1), Code(SFile::kOk));
+  EXPECT_LE(CompareFileTime(&created, &byName), 0);
+  EXPECT_GT(byName.dwHighDateTime, 0x01D00000u);  // later than 2014
   file.OpenExisting();
   EXPECT_EQ(file.GetDateTime(&byHandle), Code(SFile::kOk));
   EXPECT_EQ(CompareFileTime(&byName, &byHandle), 0);
@@ -330,23 +353,44 @@ TEST(Files, PropertiesAndContent) {
   EXPECT_EQ(file.CompareDateTime(&byName), 1);
 }
 
+// A failure with its code and the platform's reason.
+void ExpectFailure(HRESULT result, SFile::Status status, DWORD error) {
+  EXPECT_EQ(GetLastError(), error);
+  EXPECT_EQ(result, Code(status));
+}
+
 TEST(Files, RenameCopyDelete) {
   TempFolder folder;
+  const auto named = [&folder](const WCHAR* name) { return Str(folder.File(name)); };
   WriteAll(folder.File(WTEXT("a.txt")), "A");
   WriteAll(folder.File(WTEXT("b.txt")), "B");
-  SFile file(Str(folder.File(WTEXT("a.txt"))));
-  EXPECT_EQ(file.Rename(Str(folder.File(WTEXT("b.txt")))), Code(SFile::kMoveFailed));
+  SFile file(named(WTEXT("a.txt")));
+  ExpectFailure(file.Rename(named(WTEXT("b.txt"))), SFile::kMoveFailed, ERROR_ALREADY_EXISTS);
+  ExpectFailure(SFile(named(WTEXT("no"))).Rename(named(WTEXT("x"))), SFile::kMoveFailed, ERROR_FILE_NOT_FOUND);
   EXPECT_EQ(file.GetName(), SString(WTEXT("a")));
-  EXPECT_EQ(file.Rename(Str(folder.File(WTEXT("c.dat")))), Code(SFile::kOk));
+  EXPECT_EQ(file.Rename(named(WTEXT("c.dat"))), Code(SFile::kOk));
   EXPECT_EQ(file.GetName(), SString(WTEXT("c")));
   EXPECT_EQ(file.GetExtension(), SString(WTEXT("dat")));
-  EXPECT_EQ(file.Copy(Str(folder.File(WTEXT("b.txt"))), 0), Code(SFile::kCopyFailed));
-  EXPECT_EQ(file.Copy(Str(folder.File(WTEXT("b.txt"))), 1), Code(SFile::kOk));
+  ExpectFailure(file.Copy(named(WTEXT("b.txt")), 0), SFile::kCopyFailed, ERROR_FILE_EXISTS);
+  EXPECT_EQ(file.Copy(named(WTEXT("b.txt")), 1), Code(SFile::kOk));
   EXPECT_EQ(ReadAll(folder.File(WTEXT("b.txt"))), "A");
+  WriteAll(folder.File(WTEXT("new")), "new");
+  EXPECT_TRUE(MoveFileExW(named(WTEXT("new")), named(WTEXT("b.txt")), MOVEFILE_REPLACE_EXISTING));
+  EXPECT_EQ(ReadAll(folder.File(WTEXT("b.txt"))), "new");
   // It moves, but its new name is all extension.
-  EXPECT_EQ(file.Rename(Str(folder.File(WTEXT(".hidden")))), Code(SFile::kMoveFailed));
+  EXPECT_EQ(file.Rename(named(WTEXT(".hidden"))), Code(SFile::kMoveFailed));
   EXPECT_EQ(ReadAll(folder.File(WTEXT(".hidden"))), "A");
-  EXPECT_EQ(SFile::Delete(Str(folder.File(WTEXT(".hidden")))), Code(SFile::kOk));
+  EXPECT_EQ(SFile::Delete(named(WTEXT(".hidden"))), Code(SFile::kOk));
+  ExpectFailure(SFile::Delete(named(WTEXT(".hidden"))), SFile::kDeleteFailed, ERROR_FILE_NOT_FOUND);
+
+  const SString sub = named(WTEXT("sub"));
+  EXPECT_EQ(SFile::CreateDirectoryW(sub), Code(SFile::kOk));
+  ExpectFailure(SFile::CreateDirectoryW(sub), SFile::kCreateDirectoryFailed, ERROR_ALREADY_EXISTS);
+  ExpectFailure(SFile::CreateDirectoryW(named(WTEXT("x\\y"))), SFile::kCreateDirectoryFailed, ERROR_PATH_NOT_FOUND);
+  ExpectFailure(SFile::Delete(sub), SFile::kDeleteFailed, ERROR_ACCESS_DENIED);
+  ExpectFailure(SFile::RemoveDirectoryW(Str(folder.Path())), SFile::kRemoveDirectoryFailed, ERROR_DIR_NOT_EMPTY);
+  ExpectFailure(SFile::RemoveDirectoryW(named(WTEXT("b.txt"))), SFile::kRemoveDirectoryFailed, ERROR_DIRECTORY);
+  EXPECT_EQ(SFile::RemoveDirectoryW(sub), Code(SFile::kOk));
 }
 
 TEST(Files, SearchInOneFolder) {

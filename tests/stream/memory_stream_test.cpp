@@ -1,4 +1,4 @@
-// Files, memory, buffers and push-back.
+// Streams over memory, buffers and push-back; those over files are in file_stream_test.cpp.
 
 #include <deque>
 #include <memory>
@@ -6,19 +6,14 @@
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/stream/input_buffer.h"
 #include "qxcore/stream/input_buffer_stream.h"
-#include "qxcore/stream/input_file.h"
 #include "qxcore/stream/input_global.h"
 #include "qxcore/stream/input_pushback_stream.h"
 #include "qxcore/stream/output_buffer_stream.h"
 #include "qxcore/stream/output_file.h"
 #include "qxcore/stream/output_global.h"
 #include "qxcore/stream/output_string_stream.h"
-#include "qxcore/stream/seekable_input_ansi_file.h"
-#include "qxcore/stream/seekable_string_input_stream.h"
 #include "tests/stream/reader_fixture.h"
 #include "tests/support/failing_allocations.h"
-#include "tests/support/temporary_folder.h"
-#include "tests/support/wine.h"
 
 using namespace std::string_literals;
 
@@ -55,180 +50,6 @@ std::string ReadRest(SInputStream& in, unsigned long piece = 1000) {
   std::string block(piece, 0);
   while (unsigned long got = in.Read(block.data(), piece)) all.append(block, 0, got);
   return all;
-}
-
-// Remembers what it was told; cancels when the position passes a limit.
-class Indicator : public SProgressIndicatorEx {
- public:
-  explicit Indicator(std::uint64_t cancelAt = ~0ull) : m_cancelAt(cancelAt) {}
-  void SetRange(std::uint64_t, std::uint64_t to) override { range = to; }
-  void SetPos(std::uint64_t position) override {
-    EXPECT_GE(position, m_position) << "progress does not go back";
-    m_position = position;
-    ++moves;
-  }
-  std::uint64_t GetPos() const override { return m_position; }
-  bool IsCancelled() override {
-    bool cancels = m_position >= m_cancelAt;
-    if (cancels) m_cancelAt = ~0ull;  // once: the user may go on
-    return cancels;
-  }
-  std::uint64_t range = 0;
-  int moves = 0;
-
- private:
-  std::uint64_t m_cancelAt;
-  std::uint64_t m_position = 0;
-};
-
-class FileStreams : public testing::Test {
- protected:
-  TemporaryFolder folder;
-};
-
-TEST_F(FileStreams, Input_ReadsWhatIsThereAndThenTheEnd) {
-  const std::string bytes = Pattern(200000);
-  SInputFile file(folder.Make("a", bytes));
-  EXPECT_EQ(file.Available(), 200000u);
-  EXPECT_EQ(file.Read(), static_cast<unsigned char>(bytes[0]));
-  char none;
-  EXPECT_EQ(file.Read(&none, 0), 0u);
-  EXPECT_EQ(file.Skip(10), 10u);
-  EXPECT_EQ(ReadRest(file), bytes.substr(11));
-  EXPECT_EQ(file.Read(), -1);
-  EXPECT_TRUE(file.IsEOF());
-  EXPECT_EQ(file.GetError(), 0);
-  EXPECT_FALSE(file.SeekPos(5));
-  EXPECT_EQ(file.Read(), static_cast<unsigned char>(bytes[5]));
-  file.Close();
-  EXPECT_EQ(file.Read(), -1);
-
-  SInputFile empty(folder.Make("empty", ""));
-  EXPECT_TRUE(empty.IsEOF());
-  EXPECT_EQ(empty.Available(), 0u);
-  EXPECT_EQ(empty.Read(), -1);
-}
-
-TEST_F(FileStreams, Input_ThatCannotBeOpenedThrows) {
-  EXPECT_THROW(SInputFile(folder.Path("missing")), SEIOCantOpenForReading);
-  EXPECT_THROW(SInputFile(folder.Path("")), SEIOCantOpenForReading) << "a folder";
-  EXPECT_THROW(SInputFile{SString::null}, SEIOCantOpenForReading);
-  EXPECT_THROW(SOutputFile(folder.Path("no\\such\\folder")), SEIOCantOpenForWriting);
-}
-
-TEST_F(FileStreams, FilesThatDenyTheirContent_LoseNothing) {
-  if (GetFileAttributesW(WTEXT("C:\\proc\\self\\limits")) == INVALID_FILE_ATTRIBUTES)
-    GTEST_SKIP() << "no such file system here";
-  std::ifstream plain("/proc/self/limits", std::ios::binary);
-  std::string expected{std::istreambuf_iterator<char>(plain), std::istreambuf_iterator<char>()};
-  SInputFile file(WTEXT("C:\\proc\\self\\limits"));
-  EXPECT_EQ(file.GetFileSize(), 0u);
-  EXPECT_EQ(file.Available(), 1u);
-  EXPECT_EQ(ReadRest(file), expected);
-}
-
-TEST_F(FileStreams, Progress_MovesAndCancellingTakesNothing) {
-  const std::string bytes = Pattern(1000000);
-  SString path = folder.Make("big", bytes);
-  Indicator indicator(500000);
-  SInputFile file(path, &indicator);
-  EXPECT_EQ(indicator.range, bytes.size());
-  std::string all;
-  int cancelled = 0;
-  for (;;) {
-    std::string block(70000, 0);
-    try {
-      unsigned long got = file.Read(block.data(), 70000);
-      if (got == 0) break;
-      all.append(block, 0, got);
-    } catch (const SEIOAbortedException&) {
-      ++cancelled;
-    }
-  }
-  EXPECT_EQ(cancelled, 1);
-  EXPECT_EQ(all, bytes);
-  EXPECT_GE(indicator.moves, 10);
-  Indicator single(1000);
-  SInputFile bytewise(path, &single);
-  EXPECT_THROW(
-      {
-        while (bytewise.Read() >= 0) {
-        }
-      },
-      SEIOAbortedException);
-  Indicator seeking(0);
-  SInputFile other(path, &seeking);
-  EXPECT_THROW(other.SeekPos(10), SEIOAbortedException);
-  EXPECT_FALSE(other.SeekPos(10));
-  EXPECT_EQ(other.Read(), static_cast<unsigned char>(bytes[10]));
-}
-
-TEST_F(FileStreams, Output_CreatesCutsAndAppends) {
-  SString path = folder.Path("out");
-  {
-    SOutputFile file(path);
-    file.Write("first", 5);
-    file.Write('!');
-    EXPECT_EQ(file.GetPosition(), 6);
-    file.Close();
-    file.Close();
-    EXPECT_EQ(file.GetPosition(), -1);
-    EXPECT_THROW(file.Write('x'), SEIOWriteFailed);
-  }
-  EXPECT_EQ(folder.Content("out"), "first!");
-  {
-    SOutputFile file;
-    file.Init(path, SOutputFile::kAppend);
-    file.Write(" more", 5);
-  }
-  EXPECT_EQ(folder.Content("out"), "first! more");
-  SOutputFile(path).Close();
-  EXPECT_EQ(folder.Content("out"), "");
-}
-
-TEST_F(FileStreams, FullDisk_IsTold) {
-  if (IsWindows() || !std::filesystem::exists("/dev/full")) GTEST_SKIP() << "no such device here";
-  SString full = WTEXT("C:\\dev\\full");
-  const std::string bytes = Pattern(200000);
-  SOutputFile file(full);
-  EXPECT_THROW(file.Write(bytes.data(), 200000), SEIODiskFullException);
-  EXPECT_THROW(file.Close(), SEIOException);
-  SOutputFile buffered(full);
-  buffered.Write('x');
-  EXPECT_THROW(buffered.Flush(), SEIODiskFullException);
-  SOutputFile closing(full);
-  closing.Write('x');
-  EXPECT_THROW(closing.Close(), SEIODiskFullException);
-  EXPECT_NO_THROW({
-    SOutputFile destroyed(full);
-    destroyed.Write('x');
-  });
-  SOutputFile inner(full);
-  SOutputBufferStream outer(inner, 16);
-  outer.Write("waiting", 7);
-  EXPECT_THROW(outer.Close(), SEIODiskFullException);
-}
-
-TEST_F(FileStreams, AnsiFile_SeeksAndReadsLines) {
-  SSeekableInputANSIFile file(folder.Make("ansi", "one\r\ntw\xE9\n\nlast\r"));
-  EXPECT_TRUE(file.SeekSupported());
-  EXPECT_EQ(file.ReadLn(), WTEXT("one"));
-  unsigned long second = file.GetPos();
-  EXPECT_EQ(file.ReadLn(), WTEXT("tw\u00E9"));
-  EXPECT_EQ(file.ReadLn(), WTEXT(""));
-  EXPECT_EQ(file.ReadLn(), WTEXT("last\r"));
-  EXPECT_TRUE(file.IsEOF());
-  EXPECT_NE(file.GetFile(), nullptr);
-  SSeekableStringInputStream text(file);
-  EXPECT_FALSE(text.SeekPos(second));
-  EXPECT_EQ(text.Read(), 't');
-  text.Mark(1);
-  WCHAR rest[2];
-  EXPECT_EQ(text.Read(rest, 5), 4u) << "whole characters only";
-  EXPECT_EQ(SStringView(rest, 2), WTEXT("w\u00E9"));
-  text.Reset();
-  EXPECT_EQ(text.Read(), 'w');
-  EXPECT_EQ(text.GetPos(), second + 2);
 }
 
 TEST(MemoryStreams, Buffer_SeeksMarksAndEnds) {
