@@ -59,6 +59,15 @@ def literal(comment):
     return comment.replace("\\", "\\\\")
 
 
+def with_examples(header):
+    """The comment that opens a file: between fences stands code as it is."""
+    inside, lines = False, []
+    for line in header:
+        inside ^= line.startswith("```")
+        lines.append(line if inside else literal(line.strip()))
+    return lines
+
+
 def strip_code(line):
     """The line without strings and comments, for counting braces."""
     line = re.sub(r'"(\\.|[^"\\])*"', '""', line)
@@ -120,8 +129,9 @@ class Filter:
         i = 0
         while i < len(lines) and (lines[i].startswith("//") or not lines[i].strip()):
             if lines[i].startswith("//"):
-                self.header.append(literal(lines[i][2:].strip()))
+                self.header.append(lines[i][2:].removeprefix(" ").rstrip())
             i += 1
+        self.header = with_examples(self.header)
         if self.header:
             self.out.append("/** @file\n * " + "\n * ".join(self.header) + " */")
         if not any(re.match(r"(template.*>\s*)?(class|struct)\b[^;]*$", line) for line in lines):

@@ -1,4 +1,5 @@
 // Orders of map keys. A comparer has one static function Compare(a, b): negative, 0 or positive.
+// Threads: comparers keep no state and serve any thread.
 #pragma once
 
 #include "qxcore/platform/bmp.h"

@@ -2,7 +2,7 @@
 //
 // The elements derive from SDListItem; the list owns them and deletes them through their virtual
 // destructor. An item is in one list at a time. Nothing here allocates or throws. Null items and
-// positions out of range are ignored or give null. Access by position walks the list.
+// positions out of range are ignored or return null. Access by position walks the list.
 //
 // For one thread at a time.
 #pragma once
@@ -71,7 +71,7 @@ class QXCORE_API SDList {
   SDListItem* WINAPI DetachAt(long index);
 
   // Calls `visit` for every item from head to tail; no result stops it. The call may delete its item, but
-  // not the one behind. Gives the number of calls that did not return 0.
+  // not the one behind. Returns the number of calls that did not return 0.
   int WINAPI ForEach(Visit visit);
 
   // Exchange the places of two items.
@@ -89,7 +89,7 @@ class QXCORE_API SDList {
   void QuickSort(Compare compare, long left, long right);
   friend class SDListIterator;
   void LinkBefore(SDListItem* item, SDListItem* before);  // null: at the tail
-  SDListItem* Unlink(SDListItem* item);                   // gives the item
+  SDListItem* Unlink(SDListItem* item);                   // returns the item
 
  private:
   void SortRange(Compare compare, SDListItem* first, SDListItem* last, long count);
@@ -106,11 +106,11 @@ static_assert(sizeof(void*) != 4 || (sizeof(SDList) == 12 && sizeof(SDListItem) 
 // First and Last come back.
 class QXCORE_API SDListIterator {
  public:
-  // Begins at the item that the list's GetAt gives for the index.
+  // Begins at the item that the list's GetAt returns for the index.
   explicit SDListIterator(SDList& list, long index = 0) : m_list(&list), m_current(list.GetAt(index)) {}
 
   SDListItem* GetCurrent() const { return m_current; }  // null beyond either end
-  // Move, and give the item at the new position, or null.
+  // Move, and return the item at the new position, or null.
   SDListItem* First() { return m_current = m_list->GetHead(); }
   SDListItem* Last() { return m_current = m_list->GetTail(); }
   SDListItem* Next() { return m_current = m_current != nullptr ? m_current->GetNext() : nullptr; }

@@ -40,7 +40,7 @@ class QXCORE_API __SList {
   virtual ~__SList();
 
   virtual Node* AllocNode() = 0;                   // room for a node and its payload; throws SEOutOfMemory
-  virtual void FreeNode(Node* node) = 0;           // gives the room back; the payload has ended
+  virtual void FreeNode(Node* node) = 0;           // frees the room; the payload has ended
   virtual void DestroyPayload(void* payload) = 0;  // ends the payload's life
   virtual void CopyPayload(Node* node, const void* source) = 0;  // constructs a copy in the node
 
@@ -101,7 +101,7 @@ class QXCORE_API __SList {
 
 static_assert(sizeof(void*) != 4 || sizeof(__SList) == 20, "the layout is public");
 
-// A list of T. `Allocator` gives the memory of the nodes (see SNodePools). T needs to be copyable; its
+// A list of T. `Allocator` supplies the memory of the nodes (see SNodePools). T needs to be copyable; its
 // destructor must not throw.
 template <class T, class Allocator = SNodePools>
 class SList : public __SList {
@@ -179,7 +179,7 @@ class SList : public __SList {
   iterator AddBack(const T& value) { return iterator(InsertInto(*this, m_end, &value)); }
   iterator Insert(const_iterator before, const T& value) { return iterator(InsertInto(*this, before.m_node, &value)); }
   void push_back(const T& value) { AddBack(value); }  // for std::back_inserter
-  // Removes the element and gives the place behind it.
+  // Removes the element and returns the place behind it.
   iterator Erase(const_iterator place) {
     iterator next(place.m_node->m_next);
     EraseFrom(*this, place.m_node);

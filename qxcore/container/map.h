@@ -4,7 +4,7 @@
 // replaces the value of an existing key and keeps the key object. The unsorted map removes in linear
 // time, since it keeps a table of its entries. For maps from text to text take those of string_map.h.
 //
-// Iterating gives entries: for (auto& [key, value] : map). One map is for one thread at a time.
+// Iterating yields entries: for (auto& [key, value] : map). One map is for one thread at a time.
 #pragma once
 
 #include <cstddef>
@@ -149,7 +149,7 @@ class SMap : public SMapBase<K, V, Comparer, Allocator> {
   SMap& operator=(const SMap& other) { return __STree::operator=(other), *this; }
   SMap& operator=(SMap&& other) noexcept { return __STree::Swap(other), *this; }
 
-  // Inserts, or replaces the value of an existing key. Gives the value in the map.
+  // Inserts, or replaces the value of an existing key. Returns the value in the map.
   V& Add(const K& key, const V& value) {
     auto place = this->FindPlace(key);
     if (place.m_found == nullptr) {
@@ -251,7 +251,7 @@ class SUnsortedMap : public SMapBase<K, V, Comparer, Allocator> {
   }
   SUnsortedMap& operator=(SUnsortedMap&& other) noexcept { return Swap(other), *this; }
 
-  // Inserts at the end, or replaces the value of an existing key, which keeps its place. Gives the value
+  // Inserts at the end, or replaces the value of an existing key, which keeps its place. Returns the value
   // in the map.
   V& Add(const K& key, const V& value) {
     auto place = this->FindPlace(key);

@@ -19,7 +19,7 @@ class QXCORE_API SNodePools {
     if (!IsPooled(size, alignment)) return SMemAlloc(size);
     return Pool(size).Alloc();
   }
-  // Gives back what Alloc gave for the same size and alignment.
+  // Frees what Alloc returned for the same size and alignment.
   static void Free(void* node, std::size_t size, std::size_t alignment) noexcept {
     if (!IsPooled(size, alignment)) return SMemFree(node);
     m_pools[IndexOf(size)].load(std::memory_order_relaxed)->Free(node);

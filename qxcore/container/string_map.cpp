@@ -40,7 +40,7 @@ bool IsEscape(WCHAR c, const WCHAR* escapes) {
   return false;
 }
 
-// Reads up to the separator or the end of the text, without its escapes; gives where it stopped.
+// Reads up to the separator or the end of the text, without its escapes; returns where it stopped.
 const WCHAR* ReadEscaped(const WCHAR* at, WCHAR separator, const WCHAR* escapes, SString* part) {
   *part = SString::null;
   const WCHAR* run = at;

@@ -40,7 +40,7 @@ class QXCORE_API SMapListFormat {
   SString Take() { return m_text.Detach(); }
 
   // Reads the next entry at *at and moves *at behind it and its item separator; false at the end.
-  // *hasValue tells whether there was a pair separator. `escapes` are the escape characters, or null.
+  // *hasValue says whether there was a pair separator. `escapes` are the escape characters, or null.
   static bool Read(const WCHAR** at, WCHAR item, WCHAR pair, const WCHAR* escapes, SString* key, SString* value,
                    bool* hasValue);
 
@@ -96,7 +96,7 @@ class SStringMapShell : public Map {
   // ordinary characters. What follows the last item separator without a pair separator is a key with the
   // value `defaultValue`; when it is empty there is no item.
   // A key that is in the map gets the new value when `replace` is not 0, else it keeps its own.
-  // Gives the number of items read. A failure leaves the entries added so far.
+  // Returns the number of items read. A failure leaves the entries added so far.
   int AddFromList(const WCHAR* list, const WCHAR* defaultValue, WCHAR itemSeparator, WCHAR pairSeparator,
                   const WCHAR* escapes, int replace) {
     SString text(list);  // the list may be a value of this map

@@ -22,7 +22,7 @@
 class SStringTable;
 
 // The iterators of SStringTable. `Element` is SString or const SString; kStep is 1 (first to last) or
-// -1 (last to first). They are random-access iterators, and tell by themselves whether they are inside.
+// -1 (last to first). They are random-access iterators, and know whether they are inside.
 template <class Element, int kStep>
 class SStringTableIterator {
  public:
@@ -143,7 +143,7 @@ class QXCORE_API SStringTable : public __STable {
   const_reverse_iterator crend() const { return rend(); }
 
   // --- modification ---
-  // Appends and gives the new element's index.
+  // Appends and returns the new element's index.
   int Add(SString text) {
     int index = GetCount();
     if (!HasRoom()) [[unlikely]]
@@ -155,7 +155,7 @@ class QXCORE_API SStringTable : public __STable {
   void push_back(const SString& text) { Add(text); }  // for std::back_inserter
   void Insert(int i, SString text);                   // in front of element i, 0 <= i <= GetCount()
   void Remove(int i);
-  // Give an iterator to the element that comes next in the iterator's direction.
+  // Return an iterator to the element that comes next in the iterator's direction.
   iterator Remove(const_iterator at);
   reverse_iterator Remove(const_reverse_iterator at);
   // Moves one element; `to` is its index afterwards.
@@ -163,11 +163,11 @@ class QXCORE_API SStringTable : public __STable {
   void MoveTo(const_iterator from, int to) { MoveTo(from.GetIndex(), to); }
   void Swap(int i, int j) { GetArray()[i].Swap(GetArray()[j]); }
   void Reverse();
-  void Clear() { __STable::Clear(); }  // gives the memory back, too
+  void Clear() { __STable::Clear(); }  // frees the memory, too
   void Reserve(int n);                 // room for n elements in all, at least
 
   // --- comparison ---
-  // 1 when both are the same object, which is meant and makes a table greater than itself; else the
+  // 1 when both are the same object, which on purpose makes a table greater than itself; else the
   // difference of the counts; where they are equal, the first difference of two elements at the same
   // index, by code unit up to their first NUL: negative or positive; else 0.
   int Compare(const SStringTable& other) const;
@@ -189,7 +189,7 @@ class QXCORE_API SStringTable : public __STable {
   void SortOnLength(int direction = kAscending);        // by the number of code units
 
   // --- joining ---
-  // Prefix, the elements with the separator between them, suffix. An empty table gives an empty text,
+  // Prefix, the elements with the separator between them, suffix. An empty table yields an empty text,
   // without prefix and suffix.
   SString Format(const SString& prefix, const SString& separator, const SString& suffix) const;
   // Every element followed by the separator, the last one, too.
@@ -198,16 +198,16 @@ class QXCORE_API SStringTable : public __STable {
 
   // --- the list form ---
   // The elements with the separator between them; in the elements an escape character stands before
-  // each separator and each escape character. The two characters have to differ; escape 0 is none. No
-  // element and one empty element both give an empty text.
+  // each separator and each escape character. The two characters have to differ; escape 0 means no escape. No
+  // element and one empty element both yield an empty text.
   SString GetAsList(WCHAR separator, WCHAR escape) const;
   operator SString() const { return GetAsList(WTEXT('\n'), WTEXT('\\')); }
 
-  // Appends the parts of a list, and gives their number. A part ends at any character of `separators` (null:
+  // Appends the parts of a list, and returns their number. A part ends at any character of `separators` (null:
   // none). Behind it further separators are skipped as long as each differs from the one before it:
   // carriage return and line feed are one break (two such pairs, too), and two equal separators have an
   // empty part between them. An escape character makes the next character literal; alone at the end it
-  // stands for itself; 0 is none. A separator at the very end has an empty last part behind it; an empty
+  // stands for itself; 0 means no escape. A separator at the very end has an empty last part behind it; an empty
   // list has no parts. So AddFromList takes back what GetAsList gave, but for a table of one empty element.
   int AddFromList(const SString& list, const WCHAR* separators, WCHAR escape);
   // The list is text `id` of the library's string table; one that is not there is empty.

@@ -2,7 +2,7 @@
 //
 // The orders by text run a three-way quicksort that takes the next few characters of a text as one number
 // (J. Bentley and R. Sedgewick, "Fast algorithms for sorting and searching strings", 1997): what a group of
-// texts begins with alike is read once, not in every comparison. Where numbers do not tell all, or partitions
+// texts begins with alike is read once, not in every comparison. Where numbers do not decide, or partitions
 // go badly, std::sort takes over, which is never quadratic.
 
 #include <algorithm>
@@ -21,12 +21,12 @@ using Text = const WCHAR*;
 static_assert(sizeof(SString) == sizeof(Text), "strings are sorted as the pointers that they are");
 Text* TextsOf(SStringTable& table) { return reinterpret_cast<Text*>(table.GetArray()); }
 
-// An order gives numbers for the start of a text so that a smaller number comes first. Texts with the same number
+// An order makes numbers of the start of a text so that a smaller number comes first. Texts with the same number
 // begin with the same Step::characters, and have ended (isEnd), or can be compared by what follows.
 struct Step {
   int characters;
   bool isEnd;
-  bool isWhole = true;  // else the number does not tell all of what it stands for
+  bool isWhole = true;  // else the number stands for a part of the text only
 };
 
 constexpr int kUnits = 4;  // 16-bit units in a number
@@ -79,7 +79,7 @@ struct Naturally {
   static std::uint64_t Key(Text text) {
     if (IsDigit(*text)) {
       const Run run(text);
-      // Beyond the most, values are not told apart, and so zeros must not be, either.
+      // Beyond the largest, values compare equal, and so must zeros.
       const auto zeros =
           run.value == Run::kMost ? 0 : static_cast<std::uint64_t>((std::min)(run.zeros, Run::kMostZeros));
       return UnitAt(0, WTEXT('0')) | run.value << 16 | zeros;

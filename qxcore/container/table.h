@@ -32,7 +32,7 @@ class QXCORE_API __STable {
   virtual void Destroy(void* element);                         // ends an element's life; nothing to do here
   virtual void CopyTo(void* destination, const void* source);  // constructs a copy; here of the bytes
   virtual void* Allocate(int n);                               // raw storage; throws SEOutOfMemory
-  virtual void Free(void* block);                              // gives a block of Allocate back
+  virtual void Free(void* block);                              // frees a block of Allocate
 
   // The address of element i, which is not checked.
   void* GetAt(int i) { return m_data + std::ptrdiff_t{i} * m_elementSize; }
@@ -43,7 +43,7 @@ class QXCORE_API __STable {
 
   // Sets the capacity to n, which must not be below the count; 0 does nothing. A failure leaves the table as it was.
   void GrowTo(int n);
-  // Opens a slot in front of element i and gives its address; the caller constructs an element there.
+  // Opens a slot in front of element i and returns its address; the caller constructs an element there.
   // When copying an element fails on the way, the elements behind it are given up.
   void* NewAt(int i);
   void CloseSlot(int i);  // undoes NewAt when the element could not be constructed

@@ -92,7 +92,7 @@ class QXCORE_API __STableDumb {
   // Sets the capacity to n, which must not be below the count, in a block that is not shared; 0 does
   // nothing.
   void GrowTo(int n);
-  // Opens a slot in front of element i and gives its address; its content is undefined.
+  // Opens a slot in front of element i and returns its address; its content is undefined.
   void* NewAt(int i);
   // Inserts a copy of the element, which may lie in this table.
   void Insert(int i, const void* element);

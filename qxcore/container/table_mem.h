@@ -30,7 +30,7 @@ class QXCORE_API __STableMem {
   virtual void Destroy(void* element);                         // ends an element's life; nothing to do here
   virtual void CopyTo(void* destination, const void* source);  // constructs a copy; here of the bytes
   virtual void* Allocate(int n);                               // a block for n elements; throws SEOutOfMemory
-  virtual void Free(void* block);                              // gives a block of Allocate back
+  virtual void Free(void* block);                              // frees a block of Allocate
 
   // Writable access detaches.
   void* GetAt(int i) { return static_cast<char*>(GetArray()) + std::ptrdiff_t{i} * ElemSize(); }
@@ -44,7 +44,7 @@ class QXCORE_API __STableMem {
 
   // Sets the capacity to n, which must not be below the count.
   void GrowTo(int n);
-  // Opens a slot in front of element i and gives its address; the caller constructs an element there.
+  // Opens a slot in front of element i and returns its address; the caller constructs an element there.
   void* NewAt(int i);
   void CloseSlot(int i);  // undoes NewAt when the element could not be constructed
   // Inserts a copy of the element, which may lie in this table.

@@ -3,7 +3,7 @@
 // Iterators are plain pointers, so range-for and all standard algorithms work. An iterator or a
 // reference is valid until the table grows, is assigned to, or (shared tables) is detached.
 // Writable access detaches a shared table; read through a const table, GetConst or cbegin to keep the
-// block shared.
+// block shared. Threads: one table belongs to one thread at a time.
 #pragma once
 
 #include <cstddef>
@@ -61,7 +61,7 @@ class STableShell : public Base {
 
   // --- modification. `value` may be an element of this table. Failures leave the table as it was
   // (inserting in front of elements of an STable: see NewAt) ---
-  // Appends a copy and gives its index.
+  // Appends a copy and returns its index.
   int Add(const T& value) {
     int index = this->GetCount();
     if (this->HasRoom()) [[likely]] {
@@ -81,7 +81,7 @@ class STableShell : public Base {
   void MoveTo(int from, int to) { Base::MoveTo(from, to); }  // `to` is the element's index afterwards
   void Swap(int i, int j) { Base::Swap(i, j); }
   void Reverse() { Base::Reverse(); }
-  void Clear() { Base::Clear(); }          // gives the memory back, too
+  void Clear() { Base::Clear(); }          // frees the memory, too
   void GrowTo(int n) { Base::GrowTo(n); }  // room for exactly n >= GetCount() elements; 0 does nothing
 
  protected:

@@ -41,7 +41,7 @@ class QXCORE_API __STree {
     iterator() = default;
     // Stands at an entry of the tree, or with null behind the last one.
     iterator(const __STree* tree, Entry* entry) : m_tree(tree), m_entry(entry) {}
-    // In the order of the keys; Previous from behind the last one gives that.
+    // In the order of the keys; Previous from behind the last one returns that.
     void Next() { m_entry = Successor(m_entry); }
     void Previous() { m_entry = m_entry != nullptr ? Predecessor(m_entry) : m_tree->GetLastEntry(); }
     friend bool operator==(const iterator& a, const iterator& b) { return a.m_entry == b.m_entry; }
@@ -66,7 +66,7 @@ class QXCORE_API __STree {
   virtual void FreeEntry(Entry* entry) = 0;
   virtual void DestroyPayload(Entry* entry) = 0;
   virtual void CopyPayload(Entry* entry, const void* source) = 0;  // constructs a copy in the entry
-  // Negative, 0 or positive; the keys are what KeyOf gives, or what the operations below were called with.
+  // Negative, 0 or positive; the keys are what KeyOf returns, or what the operations below were called with.
   virtual int CompareKey(long a, long b) const = 0;
   virtual long KeyOf(const void* payload) const = 0;
 
@@ -83,13 +83,13 @@ class QXCORE_API __STree {
   // the caller constructs the payload, or calls Discard.
   bool GetVoid(long key, void** payload);
   // Replaces the payload with the key by a copy, or inserts one. When copying over an old payload fails,
-  // its entry is gone. Gives the new payload.
+  // its entry is gone. Returns the new payload.
   void* AddCopy(long key, const void* source);
   void* AddCopy(const void* source) { return AddCopy(KeyOf(source), source); }
 
   // --- removal; true when there was something to remove ---
   bool Remove(long key);
-  bool Remove(Entry* entry);  // null gives false
+  bool Remove(Entry* entry);  // false for null
   bool Remove(const iterator& place) { return Remove(place.m_entry); }
   void Discard(Entry* entry);  // removes an entry whose payload does not live
   void Clear();
@@ -137,7 +137,7 @@ class QXCORE_API __STree {
   }
 
   // --- the steps that typed trees are made of ---
-  // Descends from the root; `compare` gives the order of the wanted key and an entry.
+  // Descends from the root; `compare` returns the order of the wanted key and an entry.
   template <class Compare>
   Place Descend(Compare compare) const {
     Place place{nullptr, nullptr, false};

@@ -1,5 +1,5 @@
-// Validation entry points. The checks are compiled out: each of them always gives 1. They stay so
-// that modules which were built against them keep linking.
+// Validation entry points. The checks are compiled out: each of them always returns 1. They stay so
+// that modules which were built against them keep linking. Threads: the functions may be called in any thread.
 #pragma once
 
 #include "qxcore/core/object.h"

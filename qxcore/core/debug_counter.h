@@ -17,7 +17,7 @@ QXCORE_API int SDbgAddCounter(const WCHAR* name, const WCHAR* unit, const std::i
 QXCORE_API void SDbgRemoveCounter(const std::int32_t* value) noexcept;
 
 // Calls `visit` for every counter, in the order in which they were registered. `visit` must not add or
-// remove counters. Gives the number of counters.
+// remove counters. Returns the number of counters.
 QXCORE_API int SDbgForEachCounter(void (*visit)(const WCHAR* name, const WCHAR* unit, std::int32_t value,
                                                 void* context),
                                   void* context);

@@ -2,9 +2,12 @@
 //
 // The library's exceptions have a fixed layout, so what lies behind one of them is not a member but a second base of
 // what is thrown. Who catches an SException asks SGetErrorCause:
-//   catch (const SException& failure) {
-//     Show(failure.GetText(), std::strerror(SGetErrorCause(failure)));
-//   }
+// ```cpp
+// catch (const SException& failure) {
+//   Show(failure.GetText(), std::strerror(SGetErrorCause(failure)));
+// }
+// ```
+// Threads: an exception belongs to the thread that caught it.
 #pragma once
 
 #include "qxcore/core/exception.h"
@@ -17,7 +20,7 @@ class QXCORE_API SErrorCause {
   SErrorCause(const SErrorCause&) = default;
   SErrorCause& operator=(const SErrorCause&) = default;
   virtual ~SErrorCause();
-  int GetError() const { return m_error; }  // 0 where there is none
+  int GetError() const { return m_error; }  // 0 when unknown
 
  private:
   int m_error;

@@ -2,6 +2,7 @@
 //
 // Every exception carries a text for the user and a 32-bit result code in the COM form; the codes of
 // the library have facility 0x99 (0x8099xxxx). Exceptions are thrown by value and caught by reference.
+// Threads: an exception belongs to the thread that caught it.
 #pragma once
 
 #include "qxcore/platform/export.h"
@@ -32,7 +33,7 @@ class QXCORE_API SException {
 
 static_assert(sizeof(void*) != 4 || sizeof(SException) == 12, "the layout is public");
 
-// A failure of the platform or of COM, told by its HRESULT.
+// A failure of the platform or of COM, described by its HRESULT.
 class QXCORE_API SECOMException : public SException {
  public:
   // With the system's message, or a text of its own.
@@ -74,7 +75,7 @@ class QXCORE_API SEZipException : public SException {
 // A Win32 error code with its system message. Not thrown by the library; a value for clients.
 class QXCORE_API SEWinError {
  public:
-  // `code` as GetLastError gives it.
+  // `code` as GetLastError returns it.
   explicit SEWinError(DWORD code) : m_code(static_cast<HRESULT>(code)) {}
   virtual ~SEWinError();
 

@@ -57,7 +57,7 @@ void* MergeChains(void* a, void* b) {
   return first;
 }
 
-// Cuts off the run at the front of the chain that is in order, or in reverse order, and gives it in
+// Cuts off the run at the front of the chain that is in order, or in reverse order, and returns it in
 // order. A chain of freed elements mostly consists of few such runs.
 void* TakeRun(void*& chain) {
   void* first = chain;
@@ -125,7 +125,7 @@ SFixedAlloc::~SFixedAlloc() {
 
 long SFixedAlloc::GetTotalBytes() noexcept { return g_totalBytes.load(std::memory_order_relaxed); }
 
-// Called under the lock with an empty free list; gives the first element of the free list.
+// Called under the lock with an empty free list; returns the first element of the free list.
 void* SFixedAlloc::AddBlock() {
   constexpr std::size_t kMost = std::numeric_limits<std::int32_t>::max();  // the statistics have 32 bits
   if (m_elementsPerBlock == 0 || m_elementsPerBlock > (kMost - sizeof(Block)) / m_elementSize) throw SEOutOfMemory();

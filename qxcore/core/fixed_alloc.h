@@ -23,8 +23,8 @@ class QXCORE_API SFixedAlloc : public SIdleConsumer {
   // `elementSize` is in bytes; less than a pointer is raised to a pointer. Elements follow each other
   // without gaps behind one pointer, so they are aligned to a pointer at most, and to no more than
   // their size. With 0 elements per block the number follows from the system's page size; for elements
-  // of 1/16 to 1/2 of the allocation granularity (4 to 32 KB) it then is 0, such an allocator has
-  // nothing to give, and Alloc throws: pass a number. With a name the two statistics are debug counters;
+  // of 1/16 to 1/2 of the allocation granularity (4 to 32 KB) it then is 0 and Alloc
+  // always throws: pass a number. With a name the two statistics are debug counters;
   // the name is copied. A null `list` is the common idle-consumer list. Throws SEOutOfMemory.
   SFixedAlloc(unsigned int elementSize, unsigned int elementsPerBlock, const WCHAR* name, SIdleConsumerList* list);
 
@@ -56,16 +56,16 @@ class QXCORE_API SFixedAlloc : public SIdleConsumer {
     ++m_freesSinceTrim;
   }
 
-  // Releases every block; elements still in use become invalid. Gives the number of blocks released.
+  // Releases every block; elements still in use become invalid. Returns the number of blocks released.
   long FreeAll() noexcept;
 
   // Releases the blocks all of whose elements are free, and orders the free list by address. Takes no
-  // memory, so it helps when memory is out. Gives the number of blocks released, 0 when nothing was
+  // memory, so it helps when memory is out. Returns the number of blocks released, 0 when nothing was
   // freed since the last trim.
   long FreeUnused() noexcept;
 
   // Trims when something was freed since the last trim; with a count of 0 only when that is as many
-  // elements as a block holds. Always 0: no further idle time is wanted.
+  // elements as a block holds. Always returns 0: no further idle time is wanted.
   int OnIdle(int count) override;
 
   unsigned int GetAllocSize() const { return m_elementSize; }  // bytes of one element

@@ -4,7 +4,7 @@
 // time through that list, to all consumers at once or to one after the other in rotation.
 //
 // A null list stands for the process-wide common list: every member function of SIdleConsumerList
-// may be called through a null pointer and then works on the common list. That is meant.
+// may be called through a null pointer and then works on the common list, on purpose.
 //
 // For the user-interface thread only; nothing is locked. A consumer may unregister (and delete) itself
 // or others, and register new ones, while it is being called.
@@ -27,7 +27,7 @@ class QXCORE_API SIdleConsumer {
   virtual ~SIdleConsumer();  // unregisters
 
   // Called in idle time. `count` is what the idle loop passes on: how often it has been idle since the
-  // last message. Non-zero when the consumer wants more idle time. Here it does nothing and gives 0.
+  // last message. Returns non-zero when the consumer wants more idle time. Here it does nothing and returns 0.
   virtual int OnIdle(int count);
 
  protected:
@@ -54,11 +54,11 @@ class QXCORE_API SIdleConsumerList {
   void Unregister(SIdleConsumer* consumer);
 
   int GetCount() const;
-  // Moves the front consumer to the back and gives it; null when there is none.
+  // Moves the front consumer to the back and returns it; null for an empty list.
   SIdleConsumer* GetNext();
 
   // Calls every consumer with `count`, front to back; one that is registered meanwhile is called, too.
-  // 1 if any of them wants more time, else 0. A count of 0 calls nobody and gives 0.
+  // Returns 1 if any of them wants more time, else 0. A count of 0 calls nobody and returns 0.
   int OnIdleAll(int count);
 
   // Calls one consumer. The front one keeps its place as long as it wants more time (result 1); else it
@@ -67,8 +67,9 @@ class QXCORE_API SIdleConsumerList {
   int OnIdleNext(int count);
 
  private:
-  struct Storage;
+  struct Place;
   struct Walk;
+  struct Storage;
   struct Fields {
     std::int32_t m_cycle;  // consumers still to be served in the current cycle of OnIdleNext
     Storage* m_storage;    // exists only while a consumer is registered

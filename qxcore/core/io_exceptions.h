@@ -1,13 +1,14 @@
 // The exceptions of streams and encodings. Each one's code and text are fixed when it is made, so
 // that they survive the unwinding of the code that raised it. The texts come from the library's
 // string table; the codes follow 0x80990050 + (string id - 200) where nothing else is said.
+// Threads: an exception belongs to the thread that caught it.
 #pragma once
 
 #include "qxcore/core/exception.h"
 
 class QXCORE_API SEIOException : public SException {
  public:
-  // The failure that errno tells: its text, and the code 0x80990040.
+  // The failure that errno names: its text, and the code 0x80990040.
   SEIOException();
   explicit SEIOException(HRESULT code);  // the text is errno's
   SEIOException(HRESULT code, const SString& text) : SException(text, code) {}

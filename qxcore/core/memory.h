@@ -19,5 +19,5 @@ QXCORE_API void* SMemTryAlloc(std::size_t size) noexcept;
 // old block as it was. A null block is allocated.
 QXCORE_API void* SMemRealloc(void* block, std::size_t size);
 
-// Gives a block back; null is ignored.
+// Frees a block; null is ignored.
 QXCORE_API void SMemFree(void* block) noexcept;

@@ -1,6 +1,6 @@
 // The instance handles of one module, used to look up its resources.
 //
-// Written when a module is attached, read afterwards; not locked.
+// Threads: written when a module is attached, and only read afterwards, in any thread; not locked.
 #pragma once
 
 #include "qxcore/platform/export.h"
@@ -31,8 +31,8 @@ class QXCORE_API SModuleState {
   SString Format(unsigned int id, const Arguments&... arguments) = delete;
 
  protected:
-  // Redirects the resource handle and gives back the former one. A null handle changes nothing and
-  // gives null.
+  // Redirects the resource handle and returns the former one. A null handle changes nothing and
+  // returns null.
   static HINSTANCE SetResInstance(SModuleState* state, HINSTANCE instance);
 
  private:

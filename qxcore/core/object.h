@@ -5,7 +5,7 @@
 // records of the library and of every module that links to it hang in one list, g_pClassInfo.
 //
 // The list is not locked: records are made and ended while modules are loaded and unloaded, which
-// the system serialises.
+// the system serialises. Threads: the type tests may run in any thread.
 #pragma once
 
 #include <cstddef>
@@ -62,7 +62,7 @@ class QXCORE_API SObject {
   static void operator delete(void* block) noexcept;
   static void operator delete(void*, void*) noexcept {}
 
-  // The three type tests may be called through a null object pointer and then give 0. That is meant:
+  // The three type tests may be called through a null object pointer and then return 0, on purpose:
   // a caller tests a pointer that may be null in one call.
   int IsA(const SClassInfo* info) const;            // 1 if the object's own class is `info`
   int IsKindOf(const SClassInfo* info) const;       // 1 if it is `info` or derives from it

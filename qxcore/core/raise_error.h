@@ -3,6 +3,7 @@
 // Code that may not throw (a merge that has to return what it has, a procedure that the system called)
 // passes its message to g_RaiseError. What then happens is the program's choice: the window framework
 // installs a reporter that shows the message; without a reporter nothing is shown.
+// Threads: the reporter is set at start-up and runs in the thread that reports.
 #pragma once
 
 #include "qxcore/platform/export.h"

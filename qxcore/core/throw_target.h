@@ -2,8 +2,10 @@
 //
 // A SThrowTarget counts its names in a process-wide registry while it is active, so that code which
 // wants to abort can ask first whether anyone listens, and otherwise handle the condition itself:
-//   STargetedException abort(WTEXT("Scripting,DlgAbort"), text);
-//   if (abort.HasTarget()) throw abort;
+// ```cpp
+// STargetedException abort(WTEXT("Scripting,DlgAbort"), text);
+// if (abort.HasTarget()) throw abort;
+// ```
 // Names stand in comma-separated lists; empty parts are empty names. The registry is not locked:
 // everything here belongs to one thread.
 #pragma once
@@ -32,8 +34,8 @@ class QXCORE_API STargetedException {
   int HasTarget() const;
 
   // 1 if one of the targets occurs in the catcher's list, followed by a comma or the list's end. Only
-  // the end of the name is looked at, so a catcher "XAbort" answers to the target "Abort", too; that is
-  // meant.
+  // the end of the name is looked at, so a catcher "XAbort" answers to the target "Abort", too, on
+  // purpose.
   int Match(const SThrowTarget& target) const;
 
   const SString& GetTargets() const { return m_targets; }  // the names, separated by commas

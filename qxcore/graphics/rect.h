@@ -24,6 +24,8 @@ class SSize : public SIZE {
   constexpr SSize& operator+=(const SIZE& size) { return *this = *this + size; }
   constexpr SSize& operator-=(const SIZE& size) { return *this = *this - size; }
   constexpr bool operator==(const SIZE& size) const { return cx == size.cx && cy == size.cy; }
+  // Two of the class are no less alike when exchanged, which C++20 tries; without this one, that is ambiguous.
+  constexpr bool operator==(const SSize& size) const { return *this == static_cast<const SIZE&>(size); }
 };
 
 // A place.
@@ -48,6 +50,7 @@ class SPoint : public POINT {
   constexpr SPoint& operator+=(const SIZE& size) { return *this = *this + size; }
   constexpr SPoint& operator-=(const SIZE& size) { return *this = *this - size; }
   constexpr bool operator==(const POINT& point) const { return x == point.x && y == point.y; }
+  constexpr bool operator==(const SPoint& point) const { return *this == static_cast<const POINT&>(point); }
 };
 
 // A rectangle. It is empty when its width or its height is 0 or less; what combines rectangles takes an empty
@@ -141,6 +144,7 @@ class SRect : public RECT {
   constexpr bool operator==(const RECT& rect) const {
     return left == rect.left && top == rect.top && right == rect.right && bottom == rect.bottom;
   }
+  constexpr bool operator==(const SRect& rect) const { return *this == static_cast<const RECT&>(rect); }
 };
 
 static_assert(sizeof(SRect) == 16 && sizeof(SPoint) == 8 && sizeof(SSize) == 8, "the records themselves");

@@ -1,4 +1,4 @@
-// The names that readers and writers of text share.
+// The names that readers and writers of text share. Threads: nothing here is changed at run time.
 #pragma once
 
 class SAbstractIO {

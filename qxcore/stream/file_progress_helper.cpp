@@ -136,7 +136,7 @@ unsigned long SFileProgressHelper::CountAvailable() {
   return LookAhead() ? 1 : 0;
 }
 
-// A file that fails has nothing more to give, either; a loop up to the end must not run for ever.
+// A file that fails is at its end, too; a loop up to the end must not run for ever.
 bool SFileProgressHelper::IsAtEnd() const { return m_file == nullptr || std::feof(m_file) != 0 || m_error != 0; }
 
 // Only what has a size is known to be able to go back; asking a pipe would lose nothing, but a device may lie.

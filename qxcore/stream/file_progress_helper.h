@@ -3,6 +3,7 @@
 // With an indicator, a read asks before it takes anything from the file: whenever the position has moved by
 // a hundredth of the file's size since the last time, the indicator is moved and asked whether the user
 // cancelled; then SEIOAbortedException is thrown, and no byte is lost. Seeking asks each time.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <cstdint>

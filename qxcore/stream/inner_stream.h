@@ -1,4 +1,5 @@
 // The stream that a filter, reader or writer works on: borrowed or owned.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 // Holds a stream and deletes it at the end when it owns it. Owned from the first moment on: also when the

@@ -1,14 +1,15 @@
 // SInputBinaryStream: objects read themselves from a stream in the library's binary format.
-//
-//   SInputFile file(path);
-//   SInputBinaryStream in(file);
-//   in >> title >> names >> settings;
-//
+// ```cpp
+// SInputFile file(path);
+// SInputBinaryStream in(file);
+// in >> title >> names >> settings;
+// ```
 // The counterpart of SOutputBinaryStream; docs/binary-format.md has the bytes. Data from outside may be wrong
 // or cut: no operator takes memory beyond 3 MB for a string that the stream cannot confirm, and none recurses.
 // The operators throw SEEOFException where a length or a count is cut, SEIOException ("Invalid string in binary
 // stream", code 0x80990040) for an impossible length, and what the wrapped stream throws. A text keeps its
 // value then; a collection has what was read so far.
+// Threads: a stream and the stream that it reads belong to one thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -46,7 +47,7 @@ static_assert(sizeof(void*) != 4 || sizeof(SInputBinaryStream) == 12, "the layou
 QXCORE_API std::int32_t SReadCount(SInputBinaryStream& stream);
 
 // A text, up to its first zero byte. Bytes that are missing at the end of the stream cut the text silently, which
-// is meant: the next read tells.
+// is on purpose: the next read fails.
 QXCORE_API SInputBinaryStream& operator>>(SInputBinaryStream& stream, SString& text);
 // Empty the collection, then read as many items as the count says; none for a count of zero or less. A key that
 // comes twice has its last value.

@@ -1,4 +1,4 @@
-// Input from a block of memory that the caller keeps.
+// Input from a block of memory that the caller keeps. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <concepts>

@@ -2,7 +2,7 @@
 //
 // Reads take blocks from the runtime's buffer; for many single bytes put an SInputBufferStream in front.
 // The end-of-file flag is set once a read met the end; IsEOF is that flag. What a failing read delivered
-// counts; the error itself is asked for with GetError.
+// counts; the error itself is asked for with GetError. Threads: a stream belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/stream/file_progress_helper.h"

@@ -1,4 +1,4 @@
-// Input from global memory.
+// Input from global memory. Threads: a stream belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/stream/input_buffer.h"

@@ -1,4 +1,5 @@
 // A filter that lets the reader push bytes back.
+// Threads: a stream and its inner stream belong to one thread at a time.
 #pragma once
 
 #include "qxcore/stream/inner_stream.h"

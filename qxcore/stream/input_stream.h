@@ -1,7 +1,7 @@
 // The byte input of the whole library: files, memory, filters.
 //
-// Conventions of all input streams: a single-byte Read gives 0 to 255, or -1 at the end of the data; a
-// block Read gives the number of bytes delivered, and fewer than asked for means that the end was
+// Conventions of all input streams: a single-byte Read returns 0 to 255, or -1 at the end of the data; a
+// block Read returns the number of bytes delivered, and fewer than asked for means that the end was
 // reached. Reads throw for what a caller cannot expect (a file that does not open, the user's
 // cancelling, misuse of marks), never for the end. A stream is used by one thread at a time.
 #pragma once
@@ -16,19 +16,19 @@ class QXCORE_API SInputStream : public SObject {
 
   // The next byte, or -1 at the end.
   virtual int Read() = 0;
-  // Up to `count` bytes into `buffer`; gives how many. 0 for a count of 0, without touching the source.
+  // Up to `count` bytes into `buffer`; returns how many. 0 for a count of 0, without touching the source.
   // Here: byte by byte through Read().
   virtual unsigned long Read(void* buffer, unsigned long count);
-  // Passes over up to `count` bytes; gives how many. Here: byte by byte through Read().
+  // Passes over up to `count` bytes; returns how many. Here: byte by byte through Read().
   virtual unsigned long Skip(unsigned long count);
-  // How many bytes can be read at least; 0 at the end, and where a stream cannot tell.
+  // How many bytes can be read at least; 0 at the end, and where a stream does not know.
   virtual unsigned long Available();
   // 1 when the end was reached, else 0.
   virtual int IsEOF() = 0;
   // Remembers the position for Reset, for as long as no more than `limit` bytes are read. Here: nothing
   // is remembered.
   virtual void Mark(unsigned long limit);
-  // Goes back to the mark. Throws SEIOResetInvalid where there is none, which is always so here.
+  // Goes back to the mark. Throws SEIOResetInvalid where no mark is set, which is always so here.
   virtual void Reset();
   // Ends the stream. Here: nothing.
   virtual void Close();
@@ -40,8 +40,8 @@ class QXCORE_API SInputStream : public SObject {
   // that fails in the middle looks like the end of the data: who must not lose any asks here.
   virtual int GetError() const;
 
-  // Up to `count` characters, which is not 0, as the single Read gives them one by one: 16-bit characters of a
-  // reader of text, else bytes. Gives how many, at least one but at the end. Here: one, through Read(), so that
+  // Up to `count` characters, which is not 0, as the single Read returns them one by one: 16-bit characters of a
+  // reader of text, else bytes. Returns how many, 0 only at the end. Here: one, through Read(), so that
   // nothing is lost when that throws.
   virtual unsigned long ReadCharacters(WCHAR* buffer, unsigned long count);
 

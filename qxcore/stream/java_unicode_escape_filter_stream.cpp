@@ -187,7 +187,7 @@ void Filter::Close() {
 
 namespace {
 
-// Copies what begins with a backslash but is no plain escape; `at` is moved behind it. Gives the end.
+// Copies what begins with a backslash but is no plain escape; `at` is moved behind it. Returns the end.
 WCHAR* CopyBackslash(WCHAR* out, const char*& at, const char* end) {
   const char* afterLetters = at + 1;
   while (afterLetters != end && *afterLetters == 'u') ++afterLetters;
@@ -197,7 +197,7 @@ WCHAR* CopyBackslash(WCHAR* out, const char*& at, const char* end) {
   return out;
 }
 
-// Writes the text up to its NUL to `out`, which has room for as many characters as there are bytes; gives the end.
+// Writes the text up to its NUL to `out`, which has room for as many characters as there are bytes; returns the end.
 WCHAR* UnescapeTo(WCHAR* out, const char* at, const char* end) {
   constexpr std::ptrdiff_t kLength = kEscapeLength;
   for (;;) {
@@ -232,7 +232,7 @@ SString Filter::Unescape(const char* begin, const char* end, SString* copy) {
     WCHAR* out = result.GetBufferSetLength(static_cast<int>(size));
     const std::ptrdiff_t length = UnescapeTo(out, begin, end) - out;
     result.Unlock(static_cast<int>(length));
-    if (length < size / 2) result = SString(result.View());  // gives back what the escapes took
+    if (length < size / 2) result = SString(result.View());  // frees what the escapes took
   }
   if (copy != nullptr) *copy = result;
   return result;

@@ -2,12 +2,13 @@
 //
 // Characters above 127 become escapes of six: a backslash, "u" and four upper-case hexadecimal digits; those above
 // U+FFFF are two escapes, one for each surrogate. What looks like an escape already gets one more "u", so that Unescape
-// gives back what went in, for every text without NUL. (The scheme is that of
+// restores what went in, for every text without NUL. (The scheme is that of
 // Java source files, JLS 3.3.)
 //
-// The inner stream gives 16-bit characters, as SMultiFormatReaderUnicode does; those of a stream of bytes
+// The inner stream returns 16-bit characters, as SMultiFormatReaderUnicode does; those of a stream of bytes
 // count as U+0000 to U+00FF. At most one character more is taken from it than the output needs. When it throws in
-// the middle of a block, the read gives what it has, and the next one throws.
+// the middle of a block, the read returns what it has, and the next one throws.
+// Threads: a stream and its inner stream belong to one thread at a time; the static functions serve any thread.
 #pragma once
 
 #include <cstddef>
@@ -30,9 +31,9 @@ class QXCORE_API SJavaUnicodeEscapeFilterStream : public SInputStream {
 
   // The next character of the escaped text, 0 to 127, or -1 at the end.
   int Read() override;
-  // Up to `count` characters, a byte each; gives how many, fewer only at the end.
+  // Up to `count` characters, a byte each; returns how many, fewer only at the end.
   unsigned long Read(void* buffer, unsigned long count) override;
-  // Passes over up to `count` characters of the escaped text; gives how many.
+  // Passes over up to `count` characters of the escaped text; returns how many.
   unsigned long Skip(unsigned long count) override;
   // What the inner stream has, at a byte a character, and what waits here.
   unsigned long Available() override;
@@ -43,7 +44,7 @@ class QXCORE_API SJavaUnicodeEscapeFilterStream : public SInputStream {
 
   // The text without its escapes, up to the NUL, or up to `end` if that comes first. A backslash, one "u" and
   // four hexadecimal digits of either case are one character; with more than one "u", one of them goes.
-  // Everything else stands for itself, bytes above 127 as U+0080 to U+00FF. A null text gives an empty string. The
+  // Everything else stands for itself, bytes above 127 as U+0080 to U+00FF. A null text becomes an empty string. The
   // result is also put into *copy, unless that is null. Throws SEOutOfMemory.
   static SString Unescape(const char* text, SString* copy = nullptr);
   static SString Unescape(const char* begin, const char* end, SString* copy = nullptr);

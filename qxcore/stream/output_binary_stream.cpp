@@ -20,7 +20,7 @@ void Put(unsigned char* at, std::uint32_t value, int bytes) {
   for (int i = 0; i < bytes; ++i) at[i] = static_cast<unsigned char>(value >> 8 * i);
 }
 
-// Puts the length in front of the text at `text`, where there is room for the longest prefix; gives where it begins.
+// Puts the length in front of the text at `text`, where there is room for the longest prefix; returns where it begins.
 unsigned char* PutPrefix(unsigned char* text, std::uint32_t n) {
   if (n < 0xFF) {
     Put(text - 1, n, 1);

@@ -1,12 +1,13 @@
 // SOutputBinaryStream: objects write themselves to a stream in the library's binary format.
-//
-//   SOutputFile file(path);
-//   SOutputBinaryStream out(file);
-//   out << title << names << settings;
-//
-// Every class that can be written has an operator<< of its own, which takes the stream first and gives it
-// back. All numbers are little-endian on every target; docs/binary-format.md has the bytes. The operators
+// ```cpp
+// SOutputFile file(path);
+// SOutputBinaryStream out(file);
+// out << title << names << settings;
+// ```
+// Every class that can be written has an operator<< of its own, which takes the stream first and returns
+// it. All numbers are little-endian on every target; docs/binary-format.md has the bytes. The operators
 // throw what the wrapped stream throws, and SEOutOfMemory for a working buffer; what was written before stays.
+// Threads: a stream and the stream that it writes belong to one thread at a time.
 #pragma once
 
 #include <cstdint>

@@ -18,7 +18,7 @@ SOutputBufferStream::~SOutputBufferStream() {
   try {
     FlushBuffer();
   } catch (...) {
-    // A destructor has nobody to tell; Flush and Close do.
+    // A destructor cannot report failures; Flush and Close do.
   }
   SMemFree(m_buffer);
 }

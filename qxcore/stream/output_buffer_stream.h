@@ -1,4 +1,5 @@
 // A filter that gathers small writes into large ones.
+// Threads: a stream and its inner stream belong to one thread at a time.
 #pragma once
 
 #include "qxcore/stream/inner_stream.h"

@@ -1,8 +1,8 @@
 // Output to a file.
 //
 // Failures throw SEIODiskFullException when the device is full, else SEIOWriteFailed. The runtime buffers:
-// that everything arrived is known only when Flush or Close came back. The destructor closes, too, but has
-// nobody to tell.
+// that everything arrived is known only when Flush or Close came back. The destructor closes, too, but cannot
+// report a failure. Threads: a stream belongs to one thread at a time.
 #pragma once
 
 #include <cstdio>

@@ -30,7 +30,7 @@ SOutputFileOnChange::~SOutputFileOnChange() {
   try {
     if (!m_hasFailed) Close(nullptr);
   } catch (...) {
-    // A destructor has nobody to tell; Close does.
+    // A destructor cannot report failures; Close does.
   }
   delete m_target;
 }

@@ -2,6 +2,7 @@
 //
 // A file that does not exist yet is written straight away. For an existing one all output is kept in memory
 // until Close, which compares it with the file and writes only what differs from it.
+// Threads: a stream belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/stream/output_stream.h"
@@ -26,7 +27,7 @@ class QXCORE_API SOutputFileOnChange : public SOutputStream {
   void Flush() override;
   void Close() override { Close(nullptr); }
   // Ends the output and sets *changed (if not null) to 1 when the file was new or was written, to 0 when it
-  // was left as it is; a later Close only tells that again. Throws SEIOCantOpenForWriting, SEIOWriteFailed,
+  // was left as it is; a later Close only reports that again. Throws SEIOCantOpenForWriting, SEIOWriteFailed,
   // SEIOCouldNotTrunc, and for a new file what SOutputFile::Close throws. After a failure with an existing
   // file the output is still there, and Close can be tried again.
   void Close(int* changed);

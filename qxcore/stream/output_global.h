@@ -1,4 +1,4 @@
-// Output into global memory that grows in steps of 8192 bytes.
+// Output into global memory that grows in steps of 8192 bytes. Threads: a stream belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/stream/output_stream.h"
@@ -25,11 +25,11 @@ class QXCORE_API SOutputGlobal : public SOutputStream {
   // second form sets *memory to null, so that the caller cannot free it, too.
   void Attach(void* memory, unsigned long used);
   void Attach(void** memory, unsigned long used);
-  // Gives the memory, unlocked, to the caller, who then owns it; null when nothing was written.
+  // Hands the memory, unlocked, to the caller, who then owns it; null when nothing was written.
   HGLOBAL Detach();
-  // The same into *memory; gives 1, or 0 when nothing was written.
+  // The same into *memory; returns 1, or 0 when nothing was written.
   int GetHGlobal(SHGlobal* memory);
-  // What was written as 16-bit text; gives 1, or 0 when nothing was written.
+  // What was written as 16-bit text; returns 1, or 0 when nothing was written.
   int GetString(SString* text) const;
   unsigned long UsedSize() const { return static_cast<unsigned long>(m_write - m_base); }
   const void* GetData() const { return m_base; }  // valid until the next write

@@ -12,7 +12,7 @@ class QXCORE_API SOutputStream : public SObject {
 
   // Writes one byte, the low eight bits.
   virtual void Write(int byte) = 0;
-  // Writes a block; gives the number of bytes written, which is `count` unless it throws. Here: byte by
+  // Writes a block; returns the number of bytes written, which is `count` unless it throws. Here: byte by
   // byte through Write(int).
   virtual unsigned long Write(const void* buffer, unsigned long count);
   // Hands everything that waits to the target. Here: nothing waits.

@@ -27,7 +27,7 @@ Stream::~SOutputStringStream() {
   try {
     WriteWaiting();
   } catch (...) {
-    // A destructor has nobody to tell; Close does.
+    // A destructor cannot report failures; Close does.
   }
 }
 

@@ -2,8 +2,9 @@
 //
 // Formats with bit kOptionalBOM or kRequiredBOM begin with a byte order mark, also when no text follows.
 // A character that cannot be mapped is replaced ('?' unless changed) or dropped, and the encoding warning
-// tells of it; with the lossless policy it throws an exception of the SEIOCantMap family. A surrogate pair may
+// says so; with the lossless policy it throws an exception of the SEIOCantMap family. A surrogate pair may
 // come in two calls: its first half waits, until Close at the latest.
+// Threads: a stream belongs to one thread at a time.
 #pragma once
 
 #include <memory>
@@ -34,9 +35,9 @@ class QXCORE_API SOutputStringStream : public SOutputStream {
 
   // One 16-bit character.
   void Write(int character) override;
-  // `count` bytes of 16-bit characters, whole ones only; gives the number of bytes taken.
+  // `count` bytes of 16-bit characters, whole ones only; returns the number of bytes taken.
   unsigned long Write(const void* buffer, unsigned long count) override;
-  // `count` characters; gives their number.
+  // `count` characters; returns their number.
   unsigned long Write(const WCHAR* text, unsigned int count);
   unsigned long Write(const SString& text) {
     return Write(text.GetSafePointer(), static_cast<unsigned>(text.Length()));
@@ -49,14 +50,14 @@ class QXCORE_API SOutputStringStream : public SOutputStream {
   // Writes what waits and closes the target.
   void Close() override;
 
-  // The text so far, when it is kept in memory; gives 1, else 0 and an empty string.
+  // The text so far, when it is kept in memory; returns 1, else 0 and an empty string.
   int GetString(SString* text) const;
 
   // The format of what follows. A mark stands only at the very beginning. Throws SEIOInvalidEncoding when
   // the machine does not support it.
   void SetFormat(Encoding format);
   Encoding GetFormat() const;
-  // What stands for characters that cannot be mapped; 0 drops them. Gives the former one.
+  // What stands for characters that cannot be mapped; 0 drops them. Returns the former one.
   WCHAR SetReplacement(WCHAR replacement);
   WCHAR GetReplacement() const;
   // That characters were replaced or dropped; empty while none was.

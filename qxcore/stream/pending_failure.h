@@ -1,4 +1,5 @@
 // A failure that waits: a read that already has something to deliver returns that, and the next one throws.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <exception>

@@ -1,4 +1,5 @@
 // What long work reports to, and asks whether to go on. Implemented by programs.
+// Threads: the indicator is called in the thread that reads.
 #pragma once
 
 #include <cstdint>

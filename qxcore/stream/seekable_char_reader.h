@@ -1,4 +1,5 @@
 // Characters with positions: what SSeekableStringInputStream reads from.
+// Threads: a reader belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/platform/export.h"

@@ -1,4 +1,4 @@
-// Input from a file of ANSI text that can seek and read lines.
+// Input from a file of ANSI text that can seek and read lines. Threads: a stream belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/stream/file_progress_helper.h"
@@ -24,7 +24,7 @@ class QXCORE_API SSeekableInputANSIFile : public SInputStream,
   bool GetPlace(std::uint64_t* place) override { return GetFilePlace(place); }
   bool GoToPlace(std::uint64_t place) override { return GoToFilePlace(place); }
 
-  // The next character of the ANSI code page, its default character for what is none; or -1.
+  // Invalid bytes of the ANSI code page give its default character; -1 at the end.
   int ReadChar() override;
   // The next line, converted with the ANSI code page.
   SString ReadLn() override;

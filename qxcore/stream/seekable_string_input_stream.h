@@ -1,7 +1,7 @@
 // An input stream over a seekable character reader.
 //
-// Like the multi-format readers it delivers 16-bit characters: single reads give one character, block
-// reads bytes of whole characters.
+// Like the multi-format readers it delivers 16-bit characters: single reads return one character, block
+// reads bytes of whole characters. Threads: a stream belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/stream/inner_stream.h"
@@ -22,7 +22,7 @@ class QXCORE_API SSeekableStringInputStream : public SInputStream {
 
   // The next character, 0 to 0xFFFF, or -1.
   int Read() override { return m_reader->ReadChar(); }
-  // Up to `count` bytes of 16-bit characters, whole ones only; gives the number of bytes.
+  // Up to `count` bytes of 16-bit characters, whole ones only; returns the number of bytes.
   unsigned long Read(void* buffer, unsigned long count) override;
   SString ReadLn() { return m_reader->ReadLn(); }
   bool SeekPos(unsigned long position) { return m_reader->SeekPos(position); }

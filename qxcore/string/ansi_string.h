@@ -4,6 +4,7 @@
 // handed on; the object that owns the text must outlive the others, and only one of them may end it
 // with Done (the destructor of an object that was copied from would end it a second time, so the
 // copy constructor is deleted and an assigned-to object should be given Detach before it ends).
+// Threads: an object belongs to one thread at a time; g_bSwcstombszHadLoss is shared and not locked.
 #pragma once
 
 #include "qxcore/platform/export.h"

@@ -1,4 +1,5 @@
 // MD5 message digest (RFC 1321). Not for security: it is a fingerprint of contents.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <cstddef>

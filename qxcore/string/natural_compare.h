@@ -6,7 +6,7 @@
 //     runs is compared as numbers of any length; a side with nothing left but zeros is the smaller.
 //  3. Equal numbers: more leading zeros are greater ("a01" after "a1").
 // Results are negative, 0 or positive; the difference itself is given where it fits an int. A null text
-// is an empty one. The order is total.
+// is an empty one. The order is total. Threads: the functions may be called in any thread.
 #pragma once
 
 #include "qxcore/platform/export.h"

@@ -5,10 +5,7 @@
 #include <algorithm>
 #include <climits>
 
-#include "qxcore/core/exception.h"
 #include "qxcore/platform/wide.h"
-#include "qxcore/string/string_buffer.h"
-#include "qxcore/string/text_conversion.h"
 
 constinit const SStaticString<0> g_emptyString = SStaticString<0>::Of(WTEXT(""));
 
@@ -23,21 +20,12 @@ void CopyText(WCHAR* to, const WCHAR* from, int n) {
   std::memmove(to, from, static_cast<std::size_t>(n) * sizeof(WCHAR));
 }
 
-// What no int can hold is more than any buffer takes.
-int LengthOf(SStringView text) {
-  if (text.size() > static_cast<std::size_t>(INT_MAX)) throw SEOutOfMemory();
-  return static_cast<int>(text.size());
-}
+// What no int can hold is more than any buffer takes; AllocBuffer refuses the largest int as well.
+int LengthOf(SStringView text) { return static_cast<int>(std::min(text.size(), static_cast<std::size_t>(INT_MAX))); }
 int LengthOf(const WCHAR* text) { return LengthOf(SString::ViewOf(text)); }
 
 int LengthUpTo(const WCHAR* text, int limit) {
   return static_cast<int>(platform::WideLength(text, static_cast<std::size_t>(limit)));
-}
-
-int AnsiLength(const char* text) {
-  const std::size_t length = text != nullptr ? std::strlen(text) : 0;
-  if (length > static_cast<std::size_t>(INT_MAX)) throw SEOutOfMemory();
-  return static_cast<int>(length);
 }
 
 }  // namespace
@@ -55,12 +43,6 @@ SString::SString(const WCHAR* text) : SString(ViewOf(text)) {}
 SString::SString(SStringView text) : m_text(AllocBuffer(LengthOf(text))) {
   if (!text.empty()) CopyText(m_text, text.data(), Length());
 }
-
-SString::SString(const char* text) : SString() { *this = text; }
-
-SString::SString(const char* text, int count) : SString(SAnsiToString(text, count)) {}
-
-SString::SString(const SStringBuffer& buffer) : SString(buffer.View()) {}
 
 SString::SString(int truth) : SString(truth != 0 ? Yes : No) {}
 
@@ -109,16 +91,10 @@ SString& SString::operator=(SStringView text) {
   return *this;
 }
 
-SString& SString::operator=(const char* text) { return *this = SAnsiToString(text, AnsiLength(text)); }
-
 SString& SString::operator=(WCHAR character) {
   AssignCopy(character != 0 ? 1 : 0, &character);
   return *this;
 }
-
-SString& SString::operator=(char character) { return *this = SAnsiToString(&character, character != 0 ? 1 : 0); }
-
-SString& SString::operator=(const SStringBuffer& buffer) { return *this = SString(buffer); }
 
 // --- appending ---
 
@@ -136,12 +112,6 @@ SString& SString::operator+=(SStringView text) {
   ConcatInPlace(LengthOf(text), text.data());
   return *this;
 }
-
-SString& SString::operator+=(const char* text) { return *this += SAnsiToString(text, AnsiLength(text)); }
-
-SString& SString::operator+=(char character) { return *this += SAnsiToString(&character, character != 0 ? 1 : 0); }
-
-SString& SString::operator+=(const SStringBuffer& buffer) { return *this += SString(buffer); }
 
 void SString::ConcatByCopy(int n, const WCHAR* text) {
   if (n <= 0) return;
@@ -165,12 +135,8 @@ static SString Concat(SStringView a, SStringView b) {
 SString operator+(const SString& a, const SString& b) { return Concat(a.View(), b.View()); }
 SString operator+(const SString& a, const WCHAR* b) { return Concat(a.View(), SString::ViewOf(b)); }
 SString operator+(const WCHAR* a, const SString& b) { return Concat(SString::ViewOf(a), b.View()); }
-SString operator+(const SString& a, const char* b) { return a + SString(b); }
-SString operator+(const char* a, const SString& b) { return SString(a) + b; }
 SString operator+(const SString& a, WCHAR b) { return Concat(a.View(), SStringView(&b, 1)); }
 SString operator+(WCHAR a, const SString& b) { return Concat(SStringView(&a, 1), b.View()); }
-SString operator+(const SString& a, char b) { return a + SString(&b, 1); }
-SString operator+(char a, const SString& b) { return SString(&a, 1) + b; }
 
 // --- copy-on-write ---
 

@@ -438,7 +438,7 @@ inline SString operator+(SString&& a, const char* b) { return std::move(a += b);
 inline SString operator+(SString&& a, WCHAR b) { return std::move(a += b); }
 inline SString operator+(SString&& a, char b) { return std::move(a += b); }
 SString operator+(const SString&, int) = delete;   // neither a number's digits
-SString operator+(const SString&, long) = delete;  // nor a step of a pointer is meant
+SString operator+(const SString&, long) = delete;  // nor a step of a pointer
 
 // The text of the string table, or `fallback` where the table has none.
 QXCORE_API SString SStringLoad(unsigned int id, const WCHAR* fallback = nullptr, HINSTANCE instance = nullptr);

@@ -81,6 +81,10 @@ SStringBuffer& SStringBuffer::operator=(const WCHAR* text) {
   return *this += kept;
 }
 
+SString::SString(const SStringBuffer& buffer) : SString(buffer.View()) {}
+SString& SString::operator=(const SStringBuffer& buffer) { return *this = SString(buffer); }
+SString& SString::operator+=(const SStringBuffer& buffer) { return *this += SString(buffer); }
+
 SString SStringBuffer::Detach() {
   SString content;
   if (m_text.IsEmpty()) {

@@ -1,6 +1,6 @@
 // SStringBuffer: builds long texts by repeated appending, with room that grows by a ratio.
 //
-// The first append reserves 262,144 characters unless told otherwise; for short texts, set a small
+// The first append reserves 262,144 characters by default; for short texts, set a small
 // capacity or use SString. Appending is amortised O(1). Not for use by two threads at once.
 // An append may come from the buffer's own content. Failure throws SEOutOfMemory and changes nothing.
 #pragma once

@@ -1,11 +1,33 @@
-// Code pages, classification and numbers of SString.
+// Narrow text, code pages, classification and numbers of SString.
 
+#include <algorithm>
+#include <climits>
 #include <cstdlib>
 
 #include "qxcore/core/internal/working_buffer.h"
 #include "qxcore/platform/wide.h"
 #include "qxcore/string/string.h"
 #include "qxcore/string/text_conversion.h"
+
+// --- narrow text, converted with the ANSI code page ---
+
+// What no int can hold is more than any string takes.
+static SString Widened(const char* text) {
+  const std::size_t length = text != nullptr ? std::strlen(text) : 0;
+  return SAnsiToString(text, static_cast<int>(std::min(length, static_cast<std::size_t>(INT_MAX))));
+}
+static SString Widened(char character) { return SAnsiToString(&character, character != 0 ? 1 : 0); }
+
+SString::SString(const char* text) : SString(Widened(text)) {}
+SString::SString(const char* text, int count) : SString(SAnsiToString(text, count)) {}
+SString& SString::operator=(const char* text) { return *this = Widened(text); }
+SString& SString::operator=(char character) { return *this = Widened(character); }
+SString& SString::operator+=(const char* text) { return *this += Widened(text); }
+SString& SString::operator+=(char character) { return *this += Widened(character); }
+SString operator+(const SString& a, const char* b) { return a + Widened(b); }
+SString operator+(const char* a, const SString& b) { return Widened(a) + b; }
+SString operator+(const SString& a, char b) { return a + Widened(b); }
+SString operator+(char a, const SString& b) { return Widened(a) + b; }
 
 // --- code pages ---
 

@@ -4,6 +4,7 @@
 //  1. the character at index m_length is 0 (except while a buffer is lent out);
 //  2. there is room for m_allocLength + 1 characters;
 //  3. a buffer whose count is kStatic is never written and never freed.
+// Threads: the count is changed with interlocked operations only; everything else belongs to the holder that writes.
 #pragma once
 
 #include <cstddef>

@@ -2,10 +2,13 @@
 //
 // They refer to the string, which must stay alive and unchanged meanwhile. The token iterators yield
 // each token as a new SString and are false once they stand behind the last one:
-//   for (word_iterator word(text); word; ++word) Use(*word);
+// ```cpp
+// for (word_iterator word(text); word; ++word) Show(*word);
+// ```
 // A token that begins at the very end of the text still counts where a separator stands before it
 // (parts: "a," has two), or where it is the first token of an empty text (parts and lines: one, empty).
-// A line end at the end of the text does not begin another line; white space at the end no word.
+// A trailing line end adds no line; trailing white space adds no word.
+// Threads: an iterator belongs to one thread at a time, as the text does that it walks.
 #pragma once
 
 #include "qxcore/platform/export.h"
@@ -42,7 +45,7 @@ class QXCORE_API STokenIterator {
 };
 
 // Runs of characters that are not white space. The first token begins at the beginning of the string,
-// and is empty when the string begins with white space; that is meant.
+// and is empty when the string begins with white space, on purpose.
 class QXCORE_API word_iterator : public STokenIterator {
  public:
   // Stands at the first token of the string, which must outlive the iterator.
@@ -98,7 +101,7 @@ class QXCORE_API parts_iterator : public STokenIterator {
   WCHAR m_separator;
 };
 
-// Walks characters. Reading at the end gives the terminator.
+// Walks characters. Reading at the end returns the terminator.
 class QXCORE_API const_iterator {
  public:
   // Stands at index `start`, from 0 to the length, of the string, which must outlive the iterator.

@@ -1,4 +1,5 @@
 // A handle of the platform's global memory, not owned unless a user says so.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/platform/export.h"

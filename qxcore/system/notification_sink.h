@@ -1,11 +1,13 @@
 // SNotificationSink: the base class of sinks, which counts the references and registers and unregisters.
-//
-//   class TitleKeeper : public SNotificationSink {
-//     int WINAPI OnNotification(int kind, void* context, unsigned long data) override { ... }
-//   };
-//   TitleKeeper keeper;
-//   SNotificationManager::Advise(&keeper, SNotificationManager::NotificationKind(WTEXT("TitleChanged")));
-//
+// ```cpp
+// class TitleKeeper : public SNotificationSink {
+//   int WINAPI OnNotification(int kind, void* context, unsigned long data) override {
+//     return Keep(kind, context, data);
+//   }
+// };
+// TitleKeeper keeper;
+// SNotificationManager::Advise(&keeper, SNotificationManager::NotificationKind(WTEXT("TitleChanged")));
+// ```
 // A sink ends its registrations when it is destroyed. For the user-interface thread only.
 #pragma once
 
@@ -20,7 +22,8 @@ class QXCORE_API SNotificationSink : public ISNotificationSink {
     kCounted  // the last Release deletes it, so it must be made with new; its maker holds the first reference
   };
 
-  explicit SNotificationSink(Lifetime lifetime = Lifetime::kOwned) : m_references(1), m_lifetime(lifetime) {}  // see Lifetime
+  explicit SNotificationSink(Lifetime lifetime = Lifetime::kOwned)
+      : m_references(1), m_lifetime(lifetime) {}  // see Lifetime
   SNotificationSink(const SNotificationSink&) = delete;
   SNotificationSink& operator=(const SNotificationSink&) = delete;
 

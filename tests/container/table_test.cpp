@@ -15,6 +15,7 @@
 #include "qxcore/container/table_mem.h"
 #include "qxcore/core/exception.h"
 #include "qxcore/core/internal/memory_failures.h"
+#include "qxcore/core/memory.h"
 
 namespace {
 

@@ -3,8 +3,8 @@
 set(guides README.md docs/strings.md docs/writing-text.md docs/text-encodings.md docs/containers.md docs/binary-format.md docs/notifications.md
   docs/files-and-finders.md docs/time.md docs/settings.md docs/archives.md docs/mapped-files.md docs/drawing.md
   docs/windows.md docs/unattended.md docs/rtf.md docs/status-bars.md docs/splitters-and-tabs.md)
+find_package(Python3 REQUIRED COMPONENTS Interpreter)
 if(TARGET qxtool)
-  find_package(Python3 REQUIRED COMPONENTS Interpreter)
   foreach(guide ${guides})
     string(MAKE_C_IDENTIFIER ${guide} name)
     set(program)
@@ -26,6 +26,16 @@ if(TARGET qxtool)
     set_tests_properties(docs.${name} PROPERTIES TIMEOUT 300)
   endforeach()
 endif()
+
+# The examples of the headers are compiled and run by test_docs.
+add_custom_target(header_examples COMMAND ${Python3_EXECUTABLE} ${CMAKE_CURRENT_LIST_DIR}/header_examples.py
+  ${PROJECT_SOURCE_DIR} ${CMAKE_CURRENT_BINARY_DIR}/header_examples)
+add_dependencies(test_docs header_examples)
+target_include_directories(test_docs PRIVATE ${CMAKE_CURRENT_BINARY_DIR}/header_examples)
+target_link_libraries(test_docs PRIVATE ZLIB::ZLIB)
+
+# The arrows between folders that docs/architecture.md draws are those of the includes, and nothing goes in circles.
+add_test(NAME docs.layers COMMAND ${Python3_EXECUTABLE} ${CMAKE_CURRENT_LIST_DIR}/layers_test.py ${PROJECT_SOURCE_DIR})
 
 # The reference pages: a public name without a comment is an error.
 if(NOT WIN32)

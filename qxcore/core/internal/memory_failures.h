@@ -1,7 +1,7 @@
 // Where tests make the library's memory fail.
 #pragma once
 
-#include "qxcore/core/memory.h"
+#include "qxcore/platform/export.h"
 
 // For memory that must come from elsewhere (the platform's global memory): true when that allocation is
 // to fail by an order of SMemFailAt; counts like an allocation.

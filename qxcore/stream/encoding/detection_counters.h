@@ -1,4 +1,5 @@
 // The evidence that a detection found for each candidate encoding.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <cstdint>

@@ -11,6 +11,7 @@
 //
 // A level that looks at the whole input keeps up to 16 MB of it. More is looked at in pieces where the inner stream
 // can go back (GetPlace), and else kept, too, up to 2 GB; what is longer then stays provisional while it is ASCII.
+// Threads: a reader and its source belong to one thread at a time.
 #pragma once
 
 #include <cstdint>

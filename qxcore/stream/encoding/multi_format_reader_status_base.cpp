@@ -38,7 +38,7 @@ void StatusBase::FreeBuffer(BufferStatus& buffer) noexcept {
   buffer = BufferStatus();
 }
 
-static void Grow(SMultiFormatReaderStatusBase::BufferStatus& buffer, unsigned long size) {
+static void Grow(SRawBuffer& buffer, unsigned long size) {
   const unsigned long before = static_cast<unsigned long>(buffer.start - buffer.block);
   const bool fits = size <= buffer.capacity - before;
   if (fits && !buffer.isBorrowed) return;

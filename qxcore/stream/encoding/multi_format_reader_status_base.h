@@ -1,5 +1,5 @@
 // What all multi-format readers know of themselves: the requested and the selected encoding, how the
-// selection came about, and what was lost while reading.
+// selection came about, and what was lost while reading. Threads: a reader belongs to one thread at a time.
 #pragma once
 
 #include <memory>
@@ -7,6 +7,7 @@
 #include "qxcore/platform/export.h"
 #include "qxcore/stream/encoding/detection_counters.h"
 #include "qxcore/stream/encoding/multi_format_support.h"
+#include "qxcore/stream/encoding/raw_buffer.h"
 #include "qxcore/string/string.h"
 
 struct SReaderState;
@@ -15,17 +16,7 @@ class QXCORE_API SMultiFormatReaderStatusBase {
  public:
   using Support = SAbstractIO::SMultiFormatSupport;  // the encodings
   using Encoding = Support::Encoding;                // see multi_format_support.h
-
-  // A growing buffer: bytes lie from start to end, in a block of `capacity` bytes.
-  struct BufferStatus {
-    unsigned char* block = nullptr;  // the bytes in use and the room around them
-    unsigned char* start = nullptr;  // first byte not used yet
-    unsigned char* end = nullptr;    // behind the last byte
-    unsigned long capacity = 0;      // bytes of the block
-    bool isBorrowed = false;         // the block is another's: it is never written, and copied before it grows
-
-    unsigned long Size() const { return static_cast<unsigned long>(end - start); }  // bytes not used yet
-  };
+  using BufferStatus = SRawBuffer;                   // a growing buffer
 
   // Status bits.
   enum Status : unsigned {
@@ -69,7 +60,7 @@ class QXCORE_API SMultiFormatReaderStatusBase {
  protected:
   // Nothing is selected yet. Throws SEOutOfMemory.
   explicit SMultiFormatReaderStatusBase(Encoding requested);
-  static void FreeBuffer(BufferStatus& buffer) noexcept;  // gives the block back and empties the buffer
+  static void FreeBuffer(BufferStatus& buffer) noexcept;  // frees the block and empties the buffer
 
   Encoding m_requested;                   // hint and policy
   BufferStatus m_raw;                     // bytes not decoded yet

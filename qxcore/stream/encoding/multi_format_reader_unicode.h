@@ -1,16 +1,17 @@
 // The reader that delivers text of any encoding as UTF-16 characters.
-//
-//   SInputFile file(path);
-//   SMultiFormatReaderUnicode reader(file, SMultiFormatReaderUnicode::Support::kANSI |
-//                                              SMultiFormatReaderUnicode::Support::kFullDetect);
-//   while (!reader.IsEOF()) Use(reader.ReadLn());
-//   Show(reader.GetDetectionWarning(), reader.GetEncodingWarning());
-//
+// ```cpp
+// SInputFile file(path);
+// SMultiFormatReaderUnicode reader(file, SMultiFormatReaderUnicode::Support::kANSI |
+//                                            SMultiFormatReaderUnicode::Support::kFullDetect);
+// while (!reader.IsEOF()) Show(reader.ReadLn());
+// Show(reader.GetDetectionWarning(), reader.GetEncodingWarning());
+// ```
 // A character that cannot be mapped is replaced (U+FFFD unless changed) or dropped, and the encoding
 // warning says so; with the lossless policy it throws an exception of the SEIOCantMap family, after
 // everything before it was delivered, and again at each further read. Whatever throws in the middle of a
 // block, a line or the rest: the read returns what it has, and the next one throws.
 // Read errors of the source look like the end of the data; ask GetError.
+// Threads: a reader and its source belong to one thread at a time.
 #pragma once
 
 #include "qxcore/stream/encoding/multi_format_reader_base.h"

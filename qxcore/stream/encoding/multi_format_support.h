@@ -4,7 +4,7 @@
 //   bits 0-15   code page (kind ANSI; 0 = the active one) or form bits (kind Unicode)
 //   bits 16-19  kind
 //   bits 20-27  policy and the XML flag
-// docs/text-encodings.md tells the whole story with examples.
+// docs/text-encodings.md explains all of it with examples. Threads: the functions may be called in any thread.
 #pragma once
 
 #include "qxcore/container/map.h"
@@ -107,6 +107,6 @@ class SAbstractIO::SMultiFormatSupport {
 
   using EncodingMap = SMap<SString, Encoding, SAscStrNoC>;  // names, ordered without regard to case
   // Adds name and value of encodings to a sorted map: the display name of each value, with `aliases` all
-  // names; with `installedOnly` only those that the machine supports. Gives how many names were added.
+  // names; with `installedOnly` only those that the machine supports. Returns how many names were added.
   QXCORE_API static int ListAvailableEncodings(EncodingMap& names, int installedOnly, int aliases);
 };

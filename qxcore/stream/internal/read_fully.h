@@ -9,7 +9,7 @@ inline unsigned long SReadSome(SInputStream& in, void* buffer, unsigned long cou
   return got <= count ? got : 0;
 }
 
-// Reads until `count` bytes are there or a read gives none; adds them to `done`, also when a read throws.
+// Reads until `count` bytes are there or a read returns 0; adds them to `done`, also when a read throws.
 inline void SReadFully(SInputStream& in, void* buffer, unsigned long count, unsigned long& done) {
   unsigned char* out = static_cast<unsigned char*>(buffer);
   for (unsigned long left = count; left > 0;) {

@@ -1,4 +1,5 @@
 // SCRC32: a running CRC-32 as zip, gzip and PNG use it (ISO 3309; polynomial 0xEDB88320, reflected).
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <cstdint>

@@ -2,6 +2,7 @@
 //
 // The input is not copied: what SetInput was given must stay where it is until it is used up or replaced.
 // Failures throw SEZipException, or SEOutOfMemory; the inflater then goes on only after Reset.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -20,7 +21,7 @@ class QXCORE_API SInflater {
 
   // The next `count` bytes of input; what is left of former input is forgotten.
   void SetInput(const void* bytes, int count);
-  // Decompresses up to `length` bytes into `buffer` and gives how many. 0 when more input is needed, when a
+  // Decompresses up to `length` bytes into `buffer` and returns how many. 0 when more input is needed, when a
   // dictionary is, and at the end of the data. Damaged data throws SEZipException, "zlib error!!!".
   int Inflate(void* buffer, int length);
 
@@ -41,7 +42,7 @@ class QXCORE_API SInflater {
 
   // Begins anew, for data of the same kind; input is forgotten.
   void Reset();
-  // Gives the memory back. Inflate then gives 0; Reset does not revive it.
+  // Frees the memory. Inflate then returns 0; Reset does not revive it.
   void End();
 
  protected:

@@ -1,4 +1,5 @@
 // SInflaterInputStream: a filter that decompresses raw deflate data.
+// Threads: a stream and its inner stream belong to one thread at a time.
 #pragma once
 
 #include "qxcore/stream/inner_stream.h"
@@ -8,7 +9,7 @@
 class QXCORE_API SInflaterInputStream : public SInputStream {
   QXCORE_DECLARE_CLASS(SInflaterInputStream)
 
-  // Decompresses what `in` gives, which must stay alive; the second form deletes it at the end when `owns` is
+  // Decompresses what `in` delivers; it must stay alive; the second form deletes it at the end when `owns` is
   // set. `size` is how many bytes are read from it at a time, at least 1. Throws SEOutOfMemory.
   explicit SInflaterInputStream(SInputStream& in, unsigned long size = 512);
   SInflaterInputStream(SInputStream* in, unsigned long size, bool owns);
@@ -17,10 +18,10 @@ class QXCORE_API SInflaterInputStream : public SInputStream {
   ~SInflaterInputStream() override;
 
   int Read() override;
-  // What one step of the inflater gives: at least 1 byte and often fewer than `count`, which is no end; 0 is
+  // Returns what one step of the inflater yields: at least 1 byte, often fewer than `count` before the end; 0 is
   // the end, or data that needs a dictionary. Whatever goes wrong, an inner stream that ends too early or throws
-  // included, is SEZipException with "Invalid ZLIB data format", which is meant; only SEOutOfMemory
-  // passes. GetError tells whether the inner stream failed.
+  // included, is SEZipException with "Invalid ZLIB data format", on purpose; only SEOutOfMemory
+  // passes. GetError says whether the inner stream failed.
   unsigned long Read(void* buffer, unsigned long count) override;
   unsigned long Skip(unsigned long count) override;
   // 1 when the end of the compressed data was read.
@@ -31,7 +32,7 @@ class QXCORE_API SInflaterInputStream : public SInputStream {
  protected:
   // For a derived class whose own member is the inner stream; it sets m_in before the first read.
   explicit SInflaterInputStream(unsigned long size);
-  // Gives the inflater the next input. Throws SEEOFException when there is none.
+  // Passes the next input to the inflater. Throws SEEOFException at the end.
   void Fill();
 
   // Where the compressed data comes from.

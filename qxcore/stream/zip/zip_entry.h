@@ -1,6 +1,7 @@
 // SZipEntry: what an archive says of one of its entries.
 //
 // Made by the two readers of archives, SZipFile and SZipInputStream.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -13,7 +14,7 @@ class QXCORE_API SZipEntry {
  public:
   // Attributes: every entry is read-only; deflated ones are compressed, names that end with "/" are folders.
   enum Attributes : unsigned { kReadOnly = 0x1, kDirectory = 0x10, kCompressed = 0x800 };
-  enum : std::int64_t { kUnknown = -1 };  // a number that the archive has not told yet
+  enum : std::int64_t { kUnknown = -1 };  // a number that the archive has not stated yet
 
   // The name as the archive has it, parts separated by "/" by those who keep to the format; it may be absolute,
   // lead upwards, or hold backslashes. Flag bit 11 makes it UTF-8, else it is in the ANSI code page; it ends

@@ -60,7 +60,7 @@ class FoundEntry {
     if (m_data.GetNextEntry() == nullptr) SThrowZip(WTEXT("invalid LOC header signature"));
   }
 
-  // All of its data, checked against what the directory tells of it.
+  // All of its data, checked against what the directory says of it.
   void CopyTo(SOutputStream& out) {
     std::int64_t size = 0;
     unsigned char bytes[16384];

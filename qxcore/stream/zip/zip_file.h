@@ -1,13 +1,16 @@
 // SZipFile: lists the entries of a zip archive through its central directory, as a finder lists files.
-//
-//   SZipFile archive(path);
-//   for (int found = archive.FindFile(WTEXT("*"), ~0ul); found; found = archive.FindNextFile())
-//   use(archive.GetEntry()); if (archive.HasFailed()) ...
-//
+// ```cpp
+// SZipFile archive(path);
+// for (int found = archive.FindFile(WTEXT("*"), ~0ul); found; found = archive.FindNextFile()) {
+//   Show(archive.GetEntry());
+// }
+// if (archive.HasFailed()) Show("the directory is damaged");
+// ```
 // Only archives that are whole are opened: what stands in front of the first entry's place or behind the
 // archive's end, several parts, and sizes in 64 bits are refused. Failures throw SEZipException with kSZipFailed;
 // its text is empty when the file does not open or is too short. The file stays open, for reading, as long as
 // the object; others may write it meanwhile, which can damage what is read but nothing else.
+// Threads: an archive belongs to one thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -30,7 +33,7 @@ class QXCORE_API SZipFile {
   SZipFile& operator=(const SZipFile&) = delete;
   virtual ~SZipFile();
 
-  // Goes to the first entry; 0 when the archive is empty. Pattern and mask have no say, which is meant: they
+  // Goes to the first entry; 0 when the archive is empty. Pattern and mask are ignored, on purpose: they
   // are there to make the call that of a finder, and the caller compares with MatchesMask and SString::Match.
   // Throws SEZipException: an empty text when the directory ends too early, "invalid CEN header signature",
   // "invalid compression method" (neither stored nor deflated), "invalid CEN entry size" (the data would reach
@@ -58,8 +61,8 @@ class QXCORE_API SZipFile {
 
   // Writes the data of the first entry with this name, case included, to `out`, which stays open. Throws
   // SEZipException as the constructor, FindFile and SZipInputStream do; "entry not found"; "invalid LOC header
-  // signature"; and, when the data is not what the directory tells, "invalid entry size" or "invalid entry CRC".
-  // An archive that ends too early gives SEEOFException; those of `out` pass.
+  // signature"; and, when the data is not what the directory says, "invalid entry size" or "invalid entry CRC".
+  // An archive that ends too early throws SEEOFException; exceptions of `out` pass through.
   static void ExtractTo(const SString& archive, const SString& entry, SOutputStream& out);
   // The same into the file `target`, which is created or replaced once the entry was found; what was begun
   // and failed is deleted (behind a link: emptied).

@@ -1,11 +1,11 @@
 // SZipInputStream: reads the entries of a zip archive one after the other from any stream.
 //
 // Each entry is found through its local header, in the order of the archive; the central directory behind
-// them is not looked at. GetNextEntry goes to an entry, whose data the stream then gives. Sizes are checked
+// them is not looked at. GetNextEntry goes to an entry, whose data the stream then delivers. Sizes are checked
 // against what the archive says of them; checksums are not, for who wants only a part of an entry does
 // not pay for the rest: compare GetCRC with the entry's when all of it was read. Damage throws
 // SEZipException, an archive that ends too early SEEOFException; after either the stream is of no
-// more use. GetError tells whether the source failed.
+// more use. GetError says whether the source failed. Threads: a stream and its source belong to one thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -24,7 +24,7 @@ class QXCORE_API SZipInputStream : public SInflaterInputStream {
   SZipInputStream(SInputStream* in, bool owns);
 
   // Goes to the next entry, over what is left of the present one. Null when no local header follows: at the
-  // central directory, and in front of anything else that is none. The entry is the stream's own and changes
+  // central directory, and in front of anything else that is no entry. The entry is the stream's own and changes
   // with the next call. Throws SEZipException for entries that cannot be read: "encrypted ZIP entry not
   // supported", "only DEFLATED entries can have EXT descriptor", "missing entry name", "ZIP64 entry not
   // supported" (sizes of 4 GB and more).
@@ -49,9 +49,9 @@ class QXCORE_API SZipInputStream : public SInflaterInputStream {
   std::uint32_t GetCRC() const { return m_crc.GetValue(); }
 
  protected:
-  // Reads a local header into the entry; false when what follows is none, which stays in the stream.
+  // Reads a local header into the entry; false when what follows is no header; it stays in the stream.
   bool ReadLOC();
-  // Behind deflated data: gives back what was read too far, reads the descriptor, checks the sizes.
+  // Behind deflated data: pushes back what was read too far, reads the descriptor, checks the sizes.
   void ReadEnd();
   // Throws SEEOFException when fewer bytes follow.
   void ReadFully(void* buffer, unsigned long count);

@@ -29,7 +29,7 @@ int SCurrentDirectory::Assign(const SString& path, int unconditional) {
   m_unconditional = unconditional;
   if (before.CompareNoCase(target) == 0) return 0;
   const int changed = Set(target);
-  // Behind a link the system tells the folder that it leads to.
+  // Behind a link the system names the folder that it leads to.
   if (changed) m_assigned = Get();
   return changed;
 }

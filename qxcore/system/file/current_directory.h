@@ -1,9 +1,9 @@
 // SCurrentDirectory: changes the process's current directory and brings it back.
-//
-//   SCurrentDirectory guard;
-//   guard.Assign(L"C:\\data", 0);
-//   ...  // relative names are looked up there; the end of the guard restores
-//
+// ```cpp
+// SCurrentDirectory guard;
+// guard.Assign(folder, 0);
+// SFile settings(WTEXT("settings.ini"));  // is looked up there; the end of the guard restores
+// ```
 // The current directory belongs to the process: other threads see the change. Names are compared without
 // regard to case on both targets. Results of the platform's calls: 1, or 0 with the last error.
 #pragma once
@@ -19,7 +19,7 @@ class QXCORE_API SCurrentDirectory {
   explicit SCurrentDirectory(const SString& path, int unconditional = 0) { Assign(path, unconditional); }
   SCurrentDirectory(const SCurrentDirectory&) = delete;
   SCurrentDirectory& operator=(const SCurrentDirectory&) = delete;
-  // Restores, if Restore would; what fails then is not told.
+  // Calls Restore where it is due; failures are ignored.
   ~SCurrentDirectory();
 
   // The current directory, without a backslash at its end but for a root. Empty on failure.
@@ -42,7 +42,7 @@ class QXCORE_API SCurrentDirectory {
 
  private:
   SString m_returnTo;
-  SString m_assigned;  // as the system tells it, which may spell it otherwise than the caller
+  SString m_assigned;  // as the system names it, which may spell it otherwise than the caller
   int m_unconditional = 0;
 };
 

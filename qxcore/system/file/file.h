@@ -2,7 +2,7 @@
 //
 // Names are Windows paths with backslashes on every target (a slash is a character that no name may
 // hold). Results are 32-bit status codes: 0 for success, 1 for success with a restriction, else one of
-// SFile::Status, whose message GetStatusText gives; the platform's last-error value tells more. Nothing is
+// SFile::Status, whose message GetStatusText returns; the platform's last-error value says more. Nothing is
 // thrown but SEOutOfMemory, by the operations that make strings; then nothing was done to files.
 // An SFile belongs to one thread at a time; the current directory is the process's.
 #pragma once
@@ -64,7 +64,7 @@ class QXCORE_API SFile {
   // Closes both handles; a failure of that is lost here: call Done before.
   ~SFile();
 
-  // As the constructors, but tell the status. All close the handles first: kCloseFailed, kFindCloseFailed.
+  // As the constructors, but return the status. All close the handles first: kCloseFailed, kFindCloseFailed.
   HRESULT Init();
   // E_FAIL when the other file's handle cannot be duplicated; the names are taken all the same.
   HRESULT Init(const SFile& other);
@@ -93,13 +93,13 @@ class QXCORE_API SFile {
 
   // --- the open file ---
 
-  // Open the file, or create it where there is none, for reading, and for writing unless the attributes hold
+  // Open the file, or create a missing one, for reading, and for writing unless the attributes hold
   // read-only. `share` are FILE_SHARE flags. A former handle is closed first (kCloseFailed). The two differ
   // in the code of a failure only: kOpenFailed, kCreateFailed. Child processes inherit the handle.
   HRESULT Open(unsigned long attributes = kCurrentAttributes, unsigned long share = FILE_SHARE_READ);
   HRESULT Create(unsigned long attributes = kCurrentAttributes, unsigned long share = FILE_SHARE_READ);
   // Opens a file that exists (else kNotFound): for reading only when others may write or the file is read-only,
-  // else for writing, too. Where that fails, once more for reading only with others writing; that gives
+  // else for writing, too. Where that fails, once more for reading only with others writing; that returns
   // kRestricted. kOpenFailed otherwise.
   HRESULT OpenExisting(unsigned long share = FILE_SHARE_READ);
   // kCloseFailed when the platform cannot close properly (data may be lost); it is closed all the same. A
@@ -110,7 +110,7 @@ class QXCORE_API SFile {
   unsigned long GetAccess() const { return m_access; }  // GENERIC_READ, GENERIC_WRITE; 0 when closed
   HANDLE GetHandle() const { return m_file; }           // still owned by the object; null when closed
 
-  // `count`: bytes wanted on entry, done on return. A short write is kWriteFailed; a read that gives less has
+  // `count`: bytes wanted on entry, done on return. A short write is kWriteFailed; a read that returns less has
   // met the end. kReadFailed leaves what was read in the buffer and `count`.
   HRESULT Write(const void* buffer, unsigned long& count);
   HRESULT Read(void* buffer, unsigned long& count);
@@ -166,7 +166,7 @@ class QXCORE_API SFile {
   // has that entry's name; "." and ".." are passed over. kInvalidFilename for an empty mask, kNotFound when
   // nothing fits. A former search is closed (kFindCloseFailed).
   HRESULT FindFirst(const SString& mask);
-  // The next entry; kFindNextFailed when there is none or the folder cannot be read on (GetLastError tells:
+  // The next entry; kFindNextFailed at the end or when the folder cannot be read on (GetLastError says:
   // ERROR_NO_MORE_FILES is the end).
   HRESULT FindNext();
   HRESULT FindClose();

@@ -1,4 +1,5 @@
 // SFileFind: the search in one folder, straight from the platform.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/system/file/finder.h"
@@ -19,7 +20,7 @@ class QXCORE_API SFileFind : public SBaseFind {
 
   // Keeps the last-error value when it succeeds.
   int Close() override;
-  // Yields all that fits, "." and "..", too. When it gives 0, the finder is closed and the last error is
+  // Yields all that fits, "." and "..", too. When it returns 0, the finder is closed and the last error is
   // the platform's, or ERROR_INVALID_NAME for a mask whose full path has more than 259 characters. The
   // attributes are not used.
   int FindFile(const WCHAR* mask = nullptr, unsigned long attributes = 0) override;
@@ -40,7 +41,7 @@ class QXCORE_API SFileFind : public SBaseFind {
  private:
   int GiveTime(const FILETIME& from, STime* time) const;
 
-  WIN32_FIND_DATAW m_data = {};  // of the current entry; no name when there is none
+  WIN32_FIND_DATAW m_data = {};  // of the current entry; no name without an entry
   HANDLE m_search = nullptr;     // null when no search runs
   SString m_root;                // the folder of the search
   SString m_mask;

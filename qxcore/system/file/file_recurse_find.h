@@ -1,4 +1,5 @@
 // SFileRecurseFind: the search in one folder, then in every folder below it.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/system/file/folder_recurse.h"
@@ -13,7 +14,7 @@ class QXCORE_API SFileRecurseFind : public SFileFind {
   // looks from the drive's root on); without either it is the current directory. The file mask holds in
   // every folder. Yields what SFileFind yields in each, folders, "." and "..", too; SRecurseFindFiles sifts
   // the files out. The attributes are not used.
-  // When it gives 0, the last error is the first failure, or ERROR_FILE_NOT_FOUND when all was read.
+  // When it returns 0, the last error is the first failure, or ERROR_FILE_NOT_FOUND when all was read.
   int FindFile(const WCHAR* mask = nullptr, unsigned long attributes = 0) override;
   // At the end 0, with ERROR_NO_MORE_FILES when the whole tree was read, else with the first failure.
   int FindNextFileW() override;

@@ -1,14 +1,15 @@
 // SFindFailures: what a walk through a tree could not read.
 //
 // A walk passes over a folder that it cannot enter and goes on with the next. So that nothing is missed
-// silently, each such folder is counted here and told to the sink, and a walk that missed something ends
+// silently, each such folder is counted here and reported to the sink, and a walk that missed something ends
 // with the first failure as the last-error value instead of ERROR_NO_MORE_FILES.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/platform/export.h"
 #include "qxcore/string/string.h"
 
-// Is told of every folder that a walk could not read, at the moment when the walk meets it.
+// Is called for every folder that a walk could not read, at the moment when the walk meets it.
 class QXCORE_API SFindFailureSink {
  public:
   virtual ~SFindFailureSink() = default;

@@ -2,6 +2,7 @@
 //
 // A filter passes everything on to the finder that it wraps, which must live as long as the filter, and
 // leaves out the entries that do not pass. A mask of 0 filters nothing. Filters can be put around filters.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/system/file/finder.h"

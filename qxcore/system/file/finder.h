@@ -1,7 +1,7 @@
 // SFinder: the one interface of everything that looks for files and folders.
 //
 // FindFile starts a search and stands on its first entry, FindNextFileW goes on, and between them the
-// accessors describe the current entry; where there is none (before the search, behind its end, after
+// accessors describe the current entry; without one (before the search, behind its end, after
 // Close) texts are empty, lengths 0, and everything else 0. Results are 1 for true and 0 for false, and
 // where one is 0 the platform's last-error value says why: ERROR_FILE_NOT_FOUND when nothing fits the
 // mask, ERROR_NO_MORE_FILES at the end. Nothing is thrown but SEOutOfMemory; a search that
@@ -12,7 +12,7 @@
 // FILE_ATTRIBUTE_REPARSE_POINT (0x400), together with the attributes of what it leads to. A link that
 // leads nowhere is an entry on Linux (Wine does not list those). Entries come in the order of the file
 // system; names that differ only in case are entries of their own. Names that Windows cannot hold come
-// mapped on Linux (docs/portable-layer.md) and can be opened by what the finder gives.
+// mapped on Linux (docs/portable-layer.md) and can be opened by what the finder returns.
 #pragma once
 
 #include <cstddef>
@@ -46,7 +46,7 @@ class QXCORE_API SFinder {
   // The folder of the search, also at its end; without a backslash behind it ("C:" for "C:\").
   virtual SString GetRoot() const = 0;
   virtual std::uint64_t GetLength() const = 0;  // bytes; 0 for folders
-  // Give the time in *time, in whole seconds, by way of today's difference to UTC (see STime's constructor from
+  // Store the time in *time, in whole seconds, by way of today's difference to UTC (see STime's constructor from
   // file times; SFile::GetDateTime has the exact one). 0, and *time as it was, without an entry.
   virtual int GetCreationTime(STime* time) const = 0;
   virtual int GetLastAccessTime(STime* time) const = 0;

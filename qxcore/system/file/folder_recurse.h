@@ -5,8 +5,8 @@
 // attribute and never entered, so no walk comes back to where it was; where the system mounts a folder
 // into itself, the length of paths ends the branch.
 //
-// A folder that cannot be read ends its branch, and the walk goes on; GetFailures tells (find_failures.h).
-// One open search is held for each level, never more than 128.
+// A folder that cannot be read ends its branch, and the walk goes on; GetFailures lists it (find_failures.h).
+// One open search is held for each level, never more than 128. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/system/file/file_find.h"
@@ -19,7 +19,7 @@ class QXCORE_API SFolderRecurse : public SBaseFind {
    public:
     // `parent` is the node above, null for the top; not owned by this node.
     explicit SFolderFinderNode(SFolderFinderNode* parent) : m_parent(parent) {}
-    // Destroys the node, keeping the last-error value, and gives its parent.
+    // Destroys the node, keeping the last-error value, and returns its parent.
     SFolderFinderNode* SelfDestroy();
     // Moves on to an entry that is neither "." nor ".."; stays where it is when the current one is such.
     // 0 at the end or on failure, as FindNextFileW.
@@ -33,7 +33,7 @@ class QXCORE_API SFolderRecurse : public SBaseFind {
   ~SFolderRecurse() override;
 
   int Close() override;
-  // The attributes are not used. When it gives 0, the last error is that of the search in the first folder.
+  // The attributes are not used. When it returns 0, the last error is that of the search in the first folder.
   int FindFile(const WCHAR* mask = nullptr, unsigned long attributes = 0) override;
   // At the end 0, with ERROR_NO_MORE_FILES when the whole tree was read, else with the first failure.
   int FindNextFileW() override;

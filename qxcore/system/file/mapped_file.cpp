@@ -116,7 +116,7 @@ HRESULT SMappedFile::Set(const SMappedFile& other, bool duplicate) {
   if (this == &other) return S_OK;
   HRESULT status = Done();
   if (status < 0) return status;
-  // The mapping first, for taking one gives up all that is held.
+  // The mapping first, for taking one releases all that is held.
   status = SMappedMemory::Set(other, duplicate);
   if (status < 0) return status;
   status = m_file.Init(other.m_file);

@@ -1,14 +1,14 @@
 // SMappedFile: a mapping of a file, with a cursor that reads and writes in sequence through a view.
-//
-//   SMappedFile file(path);
-//   unsigned long count = sizeof buffer;
-//   HRESULT status = file.Read(buffer, &count);
-//
+// ```cpp
+// SMappedFile file(path);
+// unsigned long count = sizeof buffer;
+// HRESULT status = file.Read(buffer, &count);
+// ```
 // The cursor moves over the view that the object has: one that the caller opened with GetView, at whose first byte
-// it begins, or, where there is none, one of the whole file that the first operation opens by itself. The view
+// it begins, or, without a view, one of the whole file that the first operation opens by itself. The view
 // does not grow with the file: bytes behind its end are the end. Read and Write survive a file that another
 // program cuts: they stop where its pages end, with a failure. In its last page, bytes behind the new end
-// read as zero, and what is written there is lost.
+// read as zero, and what is written there is lost. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -36,17 +36,17 @@ class QXCORE_API SMappedFile : public SMappedMemory {
   SFile& GetFile() { return m_file; }
   SMappedView& GetView() { return m_view; }
 
-  // `count`: bytes wanted on entry, done on return. At the view's end Read gives fewer; 0. SFile::kReadFailed when
+  // `count`: bytes wanted on entry, done on return. At the view's end Read delivers fewer; 0. SFile::kReadFailed when
   // pages are missing. Write writes what fits and is SFile::kWriteFailed when that is not all: it does not lengthen
   // the file (OpenMapping does), and writes nothing to a file for reading only. E_POINTER for a null count or
   // buffer. Without a view both open one: SMappedMemory::OpenMapping's and SMappedView::OpenView's failures.
   HRESULT Read(void* buffer, unsigned long* count);
   HRESULT Write(const void* buffer, unsigned long* count);
-  // Moves the cursor and tells its position in *position, from the view's start. Origin 0: to *position; 1: by
+  // Moves the cursor and stores its position in *position, from the view's start. Origin 0: to *position; 1: by
   // *position, which is then read as a signed number. E_INVALIDARG for other origins; SFile::kSeekFailed before the
-  // start (last error ERROR_NEGATIVE_SEEK) and where the position cannot be told. Behind the end is allowed.
+  // start (last error ERROR_NEGATIVE_SEEK) and where the position is unknown. Behind the end is allowed.
   HRESULT Seek(unsigned long* position, unsigned long origin);
-  // With a view what SMappedView::FlushView gives, the wrong way round: E_FAIL when all went well. Without one the
+  // With a view what SMappedView::FlushView returns, inverted: E_FAIL when all went well. Without one the
   // file is flushed, with SFile::Flush's result; 1 when it is not open.
   HRESULT Flush();
 

@@ -2,7 +2,7 @@
 // in SMappedFile, by a file.
 //
 // Results are 32-bit codes: 0 for success, 1 for nothing to do, negative ones of SFile::Status or of the system for
-// failures; the platform's last-error value tells more. An object belongs to one thread at a time. A mapping
+// failures; the platform's last-error value says more. An object belongs to one thread at a time. A mapping
 // with a name is shared by all who open one of that name: see docs/mapped-files.md.
 #pragma once
 
@@ -25,7 +25,7 @@ class QXCORE_API SMappedMemory {
   // Closes the handle; a failure of that is lost here: call Done before.
   virtual ~SMappedMemory();
 
-  // Gives up what the object holds: here CloseMapping.
+  // Releases what the object holds: here CloseMapping.
   virtual HRESULT Done();
 
   // Makes a mapping of `size` bytes, the default size for 0, and closes a former one first (0x8099000B). Of a file,
@@ -42,12 +42,12 @@ class QXCORE_API SMappedMemory {
 
   // Takes over a handle as it is; one that the object has is not closed. Null for none.
   void AttachMapping(void* mapping) { m_mapping = mapping; }
-  // Gives the handle to the caller, who then owns it; null for none.
+  // Hands the handle to the caller, who then owns it; null without a mapping.
   void* DetachMapping();
   void* GetSafeMapping() const { return m_mapping; }  // still the object's; null for none
   int IsMapped() const { return m_mapping != nullptr; }
 
-  // Replaces the handle: gives up the former one (Done), then takes over `mapping` as it is, or, with `duplicate`, an
+  // Replaces the handle: releases the former one (Done), then takes over `mapping` as it is, or, with `duplicate`, an
   // inheritable duplicate of the same access. The handle that is held already changes nothing. E_FAIL when it cannot
   // be duplicated.
   HRESULT Set(void* mapping, bool duplicate);

@@ -4,6 +4,7 @@
 // codes as those of SMappedMemory. What a view of a file shows changes with the file. A file that another program
 // cuts has no pages behind its new end: on Linux, who touches one through the pointer is sent SIGBUS, which ends
 // the process; SMappedFile::Read and Write do not. Windows lets nobody cut a file that is mapped.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -15,7 +16,7 @@ class QXCORE_API SMappedView {
   SMappedView() = default;
   // Nothing is mapped yet.
   explicit SMappedView(const SMappedMemory& mapping) { Set(mapping); }
-  // Copies take the other's view over, which is meant: see Set.
+  // Copies take the other's view over, on purpose: see Set.
   SMappedView(const SMappedView& other) { Set(other, true); }
   SMappedView& operator=(const SMappedView& other) {
     Set(other, true);
@@ -41,7 +42,7 @@ class QXCORE_API SMappedView {
   HRESULT OpenView(unsigned long size, std::uint64_t offset = 0);
   // 1 without a view; 0x8099000B when it cannot be unmapped, and then it stays.
   HRESULT CloseView();
-  // Writes what was changed to the file. 1 without a view. The other results are the wrong way round, which is meant,
+  // Writes what was changed to the file. 1 without a view. The other results are inverted, on purpose,
   // as callers rely on it: E_FAIL (0x80004005) when all went well, 0x8099000F when it did not.
   HRESULT FlushView();
 

@@ -5,7 +5,7 @@
 
 namespace {
 
-// What the walk tells goes to the failures of the object that outlives it.
+// What the walk reports goes to the failures of the object that outlives it.
 class Forward final : public SFindFailureSink {
  public:
   explicit Forward(SFindFailures& failures) : m_failures(failures) {}

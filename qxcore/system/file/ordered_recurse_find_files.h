@@ -1,4 +1,5 @@
 // SOrderedRecurseFindFiles: the files of a tree in order of their full paths.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/container/string_table.h"

@@ -1,8 +1,12 @@
 // SRecurseFindFiles and SRecurseFindFolders: the files, or the folders, of a tree.
-//
-//   SRecurseFindFiles files;
-//   for (int found = files.FindFile(L"C:\\data\\*.txt"); found; found = files.FindNextFileW())
-//   Use(files.GetFilePath()); if (!files.GetFailures().IsEmpty()) ...  // some folders could not be read
+// ```cpp
+// SRecurseFindFiles files;
+// for (int found = files.FindFile(folder + WTEXT("\\*.txt")); found; found = files.FindNextFileW()) {
+//   Show(files.GetFilePath());
+// }
+// if (!files.GetFailures().IsEmpty()) Show("some folders could not be read");
+// ```
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/system/file/file_recurse_find.h"

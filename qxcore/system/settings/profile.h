@@ -4,7 +4,7 @@
 // the platform's functions do with the file (text encodings, quotation marks, comments, names without a
 // folder) is in docs/settings.md. Nothing is kept in memory: every call reads or writes the file. Nothing
 // is thrown but SEOutOfMemory. Values with leading or trailing blanks, quotation marks around them or line
-// ends do not come back as they were written.
+// ends do not come back as they were written. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -15,17 +15,17 @@
 
 class QXCORE_API SProfile {
  public:
-  // What the operations give.
+  // What the operations return.
   enum Status : std::uint32_t {
     kOk = 0,
-    kWriteFailed = 0xC0000000,  // GetLastError tells why
+    kWriteFailed = 0xC0000000,  // GetLastError says why
   };
 
   SProfile() = default;
   // The third argument is not used.
   SProfile(const SString& file, const SString& section, int unused) { Init(file, section, unused); }
 
-  // Remember the file's name and the section, and forget them; both give 0 and touch no file.
+  // Remember the file's name and the section, and forget them; both return 0 and touch no file.
   HRESULT Init(const SString& file, const SString& section, int unused);
   void Done();
 
@@ -38,7 +38,7 @@ class QXCORE_API SProfile {
   HRESULT WriteProfile(const SString& key, long value);
   HRESULT WriteProfile(const SString& key, const SString& value);
 
-  // Read at most 255 characters of the value. A key that is missing gives the default, an empty value 0 as
+  // Read at most 255 characters of the value. A missing key yields the default, an empty value 0 as
   // truth and number, and the default as text. 0, or E_POINTER.
   HRESULT GetProfile(const SString& key, int* out, int standard) const;    // as SString::ToBOOL
   HRESULT GetProfile(const SString& key, long* out, long standard) const;  // as SString::ToLONG

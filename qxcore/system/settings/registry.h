@@ -3,7 +3,7 @@
 // On Windows this is the registry; elsewhere a database of the user's that holds the same trees
 // (docs/settings.md). Results are 32-bit codes: 0, kDefaultUsed, E_FAIL, E_POINTER, E_INVALIDARG.
 // Nothing is thrown but SEOutOfMemory. Reads never leave an output undefined: on any failure the default
-// stands in it. Without an open key, writes and deletions give 0 and do nothing. An object belongs to
+// stands in it. Without an open key, writes and deletions return 0 and do nothing. An object belongs to
 // one thread at a time.
 //
 // Truth values are kept as the texts Yes and No. Read, a text is true when it is Yes, True or 1 in any
@@ -18,7 +18,7 @@
 
 class QXCORE_API SRegistry {
  public:
-  // What the operations give besides the platform-wide codes.
+  // What the operations return besides the platform-wide codes.
   enum Status : std::uint32_t {
     kOk = 0,
     kDefaultUsed = 1,  // the value or the key is not there
@@ -27,7 +27,7 @@ class QXCORE_API SRegistry {
   // --- opening ---
 
   SRegistry() = default;
-  // As Init; a failure is told by IsOpen.
+  // As Init; IsOpen says whether it worked.
   SRegistry(HKEY root, const SString& path, int create) { Init(root, path, create); }
   SRegistry(const SRegistry&) = delete;
   SRegistry& operator=(const SRegistry&) = delete;
@@ -39,7 +39,7 @@ class QXCORE_API SRegistry {
   // HKEY_CURRENT_USER, then below HKEY_LOCAL_MACHINE, and makes a key that is in neither below the first.
   // E_FAIL; no key is open then.
   // When a key is open and path and `create` are those of the last opening, it stays open, whatever the
-  // root; that is meant. (A key found through a null root was opened with `create` 0.)
+  // root, on purpose. (A key found through a null root was opened with `create` 0.)
   HRESULT Init(HKEY root, const SString& path, int create);
   // Closes the key and forgets the path.
   void Done();
@@ -59,7 +59,7 @@ class QXCORE_API SRegistry {
   HRESULT WriteProfile(const SString& name, int value);
   // A 32-bit number, or its decimal digits as a text when `asNumber` is 0.
   HRESULT WriteProfile(const SString& name, long value, int asNumber);
-  // A text. Its size is given as twice the length plus 1, half a terminator; that is meant, and what reads
+  // A text. Its size is given as twice the length plus 1, half a terminator, on purpose, and what reads
   // texts here knows it.
   HRESULT WriteProfile(const SString& name, const SString& value);
   // At most `size` bytes of a block of global memory, which stays the caller's; E_INVALIDARG for none of them.
@@ -85,12 +85,12 @@ class QXCORE_API SRegistry {
   // are empty. Class texts are mostly empty.
   long GetEnumKey(long index, SString* name, SString* className = nullptr) const;
   // 32-bit numbers come as their digits, without a sign, all other values as the text that their bytes are.
-  // Values with names of more than 255 characters give ERROR_MORE_DATA (234).
+  // Values with names of more than 255 characters yield ERROR_MORE_DATA (234).
   long GetEnumValue(long index, SString* name, SString* value = nullptr, unsigned long* type = nullptr) const;
 
   // --- deletion; what is not there counts as deleted ---
 
-  // The value, or, where there is none of the name, the sub-key as DeleteKey.
+  // The value, or, where no value has the name, the sub-key as DeleteKey.
   HRESULT DeleteProfile(const SString& name, int recursive);
   // The sub-key `name`, with everything below it when `recursive` is not 0; an empty name is this key itself.
   // E_FAIL for a key with sub-keys that are to stay or cannot be deleted; the others are gone then.

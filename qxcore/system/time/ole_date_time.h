@@ -4,6 +4,7 @@
 // day, and for negative values, too, it counts forward from the whole day: -1.25 is 29 December 1899
 // 06:00 (the automation date convention; so -0.25 and 0.25 are the same time). Valid are the years
 // 100 to 9999. Times are whole seconds: fractions of one are rounded when fields are asked for.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <cstdint>
@@ -63,7 +64,7 @@ class QXCORE_API SOleDateTime {
   int GetAsSystemTime(SYSTEMTIME& time) const;
   // Seconds since 1970 of this date and time as local time; -1 when it is invalid or the runtime cannot
   // convert it. It is read as standard time, and when daylight saving turns out to be in force an hour is
-  // taken off, unless the result is 3600 or less; that is meant.
+  // taken off, unless the result is 3600 or less, on purpose.
   std::int32_t GetTime() const;
 
   // --- order ---

@@ -3,7 +3,7 @@
 // Calendar fields and texts come from the runtime library, in its local time or in UTC. The range is
 // 13 December 1901 to 19 January 2038; on Windows the runtime breaks down no time before 1970: fields
 // are -1 and texts empty there. Arithmetic wraps around at the ends of the range. Differences between
-// the targets: docs/time.md.
+// the targets: docs/time.md. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <compare>
@@ -20,7 +20,7 @@ class QXCORE_API STime {
   // --- construction ---
   // `dst` says what the fields mean: 1 daylight-saving time, 0 standard time, -1 whichever is in force at
   // that time. Fields out of range carry over (31 February is 2 or 3 March); what lies outside the
-  // 32 bits gives -1, the runtime's sign of an impossible date.
+  // 32 bits yields -1, the runtime's sign of an impossible date.
   constexpr STime() noexcept = default;  // 1 January 1970 00:00 UTC
   constexpr explicit STime(std::int32_t time) noexcept : m_time(time) {}
   // Local time; month 1 to 12.
@@ -31,7 +31,7 @@ class QXCORE_API STime {
   explicit STime(const SYSTEMTIME& time, int dst = -1);
   // A file time in UTC, brought to local time with the difference to UTC that is in force today, whatever
   // its date, and then read as local time of its date. So a time in the other half of the year can come
-  // out an hour off; that is meant, as the platform's own dialogs show file times like this. 0 when it
+  // out an hour off, on purpose, as the platform's own dialogs show file times like this. 0 when it
   // cannot be converted or lies before 1900.
   explicit STime(const FILETIME& time, int dst = -1);
 

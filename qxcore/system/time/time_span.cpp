@@ -6,7 +6,7 @@ namespace {
 
 constexpr int kLongestText = 128;
 
-// Appends one code's number; gives the new length.
+// Appends one code's number; returns the new length.
 int AppendNumber(WCHAR* text, int length, const WCHAR* format, long number) {
   WCHAR digits[16];
   const int count = platform::WideFormat(digits, 16, format, number);

@@ -1,6 +1,6 @@
 // STimeSpan: a length of time in whole seconds, in 32 bits (68 years either way).
 //
-// Arithmetic wraps around at the ends of the range.
+// Arithmetic wraps around at the ends of the range. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <compare>
@@ -30,7 +30,7 @@ class QXCORE_API STimeSpan {
   int GetSeconds() const { return m_seconds % 60; }       // within the minute
 
   // %D days ("%ld"), %H hours within the day, %M minutes within the hour, %S seconds within the minute (each
-  // "%02d"); a percent sign before any other character gives that character. Everything else is copied, a
+  // "%02d"); a percent sign before any other character yields that character. Everything else is copied, a
   // percent sign at the end, too. What exceeds 128 characters is cut off.
   SString Format(const WCHAR* format) const;
   SString Format(unsigned int id) const;  // the format is a text of the library's string table

@@ -3,13 +3,13 @@
 
 #include <cstdint>
 
-#include "qxcore/stream/encoding/multi_format_reader_status_base.h"
+#include "qxcore/stream/encoding/raw_buffer.h"
 
 // A view on a buffer that the reader owns. Positions count from the beginning of the input, so that they stay what
 // they are when bytes before them are dropped.
 class SRawInput {
  public:
-  using Buffer = SMultiFormatReaderStatusBase::BufferStatus;
+  using Buffer = SRawBuffer;
 
   explicit SRawInput(Buffer& buffer) : m_buffer(buffer) {}
   SRawInput(const SRawInput&) = delete;

@@ -21,7 +21,7 @@ std::size_t UnitsOfCharacter(const WCHAR* text, std::size_t count) {
   return static_cast<std::size_t>(at - text);
 }
 
-// Each encoder gives the number of bytes, or kUnmappable when a character of the piece cannot be mapped.
+// Each encoder returns the number of bytes, or kUnmappable when a character of the piece cannot be mapped.
 
 std::size_t EncodeASCII(const WCHAR* text, std::size_t count, char* bytes) {
   for (std::size_t i = 0; i < count; ++i) {
@@ -55,7 +55,7 @@ std::size_t EncodePage(unsigned page, const WCHAR* text, std::size_t count, char
   BOOL usedDefault = FALSE;
   int written = WideCharToMultiByte(page, WC_NO_BEST_FIT_CHARS, text, size, bytes, room, nullptr, &usedDefault);
   if (written > 0) return usedDefault ? kUnmappable : static_cast<std::size_t>(written);
-  // Pages that take no flags do not tell of losses either: the text must come back from the bytes.
+  // Pages that take no flags do not report losses either: the text must come back from the bytes.
   written = WideCharToMultiByte(page, 0, text, size, bytes, room, nullptr, nullptr);
   WCHAR back[kPiece];
   int length = written > 0 ? MultiByteToWideChar(page, 0, bytes, written, back, static_cast<int>(kPiece)) : 0;

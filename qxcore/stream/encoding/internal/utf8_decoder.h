@@ -1,14 +1,7 @@
 // UTF-8 to UTF-16, as far as all is well; what stands in the way is looked at with platform::StepUtf8.
 #pragma once
 
-#include <cstddef>
-
-#include "qxcore/platform/win32.h"
-
-struct SUtf8Run {
-  const unsigned char* in;  // first byte not used
-  WCHAR* out;               // behind the last character
-};
+#include "qxcore/stream/encoding/internal/utf8_run.h"
 
 // Decodes sequences of one to three bytes until the end or the first sequence that is cut, illegal or longer.
 // Surrogates in three bytes each are taken as they stand, because files of the library hold them so; overlong forms are

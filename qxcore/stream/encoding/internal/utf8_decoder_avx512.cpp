@@ -67,7 +67,7 @@ QXCORE_TARGET inline __m512i Widen(const unsigned char* at) {
   return _mm512_cvtepu8_epi16(_mm256_loadu_si256(reinterpret_cast<const __m256i*>(at)));
 }
 
-// Decodes half a block; gives the end of the output.
+// Decodes half a block; returns the end of the output.
 QXCORE_TARGET inline WCHAR* DecodeHalf(const unsigned char* in, std::uint32_t above, std::uint32_t three,
                                        std::uint32_t continuation, WCHAR* out) {
   const __m512i low6 = _mm512_set1_epi16(0x3F);

@@ -1,7 +1,7 @@
 // The UTF-8 decoder for processors with AVX-512 VBMI2: 64 bytes at a time, whatever they hold.
 #pragma once
 
-#include "qxcore/stream/encoding/internal/utf8_decoder.h"
+#include "qxcore/stream/encoding/internal/utf8_run.h"
 
 #if defined(__x86_64__) || defined(__i386__)
 #define QXCORE_HAS_AVX512_DECODER 1

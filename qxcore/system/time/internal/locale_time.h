@@ -8,5 +8,5 @@
 // that the platform knows, which are those from 1601 on. The record's day of the week is not looked at.
 SString SLocaleDate(const SYSTEMTIME& date, DWORD style);
 
-// The time of day, with seconds. Empty when it is none.
+// The time of day, with seconds. Empty when it is invalid.
 SString SLocaleTime(const SYSTEMTIME& time);
