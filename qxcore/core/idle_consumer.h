@@ -27,7 +27,7 @@ class QXCORE_API SIdleConsumer {
   virtual ~SIdleConsumer();  // unregisters
 
   // Called in idle time. `count` is what the idle loop passes on: how often it has been idle since the
-  // last message. Returns non-zero when the consumer wants more idle time. Here it does nothing and returns 0.
+  // last message. Returns non-zero when the consumer wants more idle time. The base version returns 0.
   virtual int OnIdle(int count);
 
  protected:

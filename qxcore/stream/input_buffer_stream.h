@@ -33,10 +33,10 @@ class QXCORE_API SInputBufferStream : public SInputStream {
   void Mark(unsigned long limit) override;
   // Throws SEIOResetInvalid without a mark.
   void Reset() override;
-  // Gives the buffer's content up and closes the inner stream.
+  // Drops the buffer's content and closes the inner stream.
   void Close() override;
   int GetError() const override { return m_in->GetError(); }
-  // Places are those of the inner stream. Going to one gives the mark up.
+  // Places are those of the inner stream. Going to one drops the mark.
   bool GetPlace(std::uint64_t* place) override;
   bool GoToPlace(std::uint64_t place) override;
 

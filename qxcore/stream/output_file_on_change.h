@@ -23,7 +23,7 @@ class QXCORE_API SOutputFileOnChange : public SOutputStream {
   // Throw what SOutputFile and SOutputGlobal throw; SEIOWriteFailed when the stream is closed.
   void Write(int byte) override;
   unsigned long Write(const void* buffer, unsigned long count) override;
-  // Of an existing file nothing is written before Close.
+  // Nothing is written to an existing file before Close.
   void Flush() override;
   void Close() override { Close(nullptr); }
   // Ends the output and sets *changed (if not null) to 1 when the file was new or was written, to 0 when it

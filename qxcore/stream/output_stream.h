@@ -1,7 +1,7 @@
 // The byte output of the whole library: files, memory, filters.
 //
-// Write failures throw (SEIODiskFullException, SEIOWriteFailed). Destructors never throw: who must
-// know that everything arrived calls Close, or Flush, before. A stream is used by one thread at a time.
+// Write failures throw (SEIODiskFullException, SEIOWriteFailed). Destructors never throw: call Close, or Flush,
+// before, to know that everything arrived. A stream is used by one thread at a time.
 #pragma once
 
 #include "qxcore/core/object.h"
@@ -12,12 +12,12 @@ class QXCORE_API SOutputStream : public SObject {
 
   // Writes one byte, the low eight bits.
   virtual void Write(int byte) = 0;
-  // Writes a block; returns the number of bytes written, which is `count` unless it throws. Here: byte by
-  // byte through Write(int).
+  // Writes a block; returns the number of bytes written, which is `count` unless it throws. The base
+  // version goes byte by byte.
   virtual unsigned long Write(const void* buffer, unsigned long count);
-  // Hands everything that waits to the target. Here: nothing waits.
+  // Hands everything that waits to the target. In the base version nothing waits.
   virtual void Flush();
-  // Flushes and ends the stream. Here: nothing.
+  // Flushes and ends the stream. The base version does nothing.
   virtual void Close();
 
  protected:

@@ -10,11 +10,11 @@ class SPendingFailure {
  public:
   // Keeps the exception that is being handled.
   void Keep() { m_failure = std::current_exception(); }
-  // Gives the kept one up.
+  // Drops the kept one.
   void Forget() { m_failure = nullptr; }
   // Whether one is kept.
   bool IsThere() const { return m_failure != nullptr; }
-  // Throws what is kept, once; nothing when there is none.
+  // Throws what is kept, once; does nothing without one.
   void Throw() {
     if (m_failure != nullptr) std::rethrow_exception(std::exchange(m_failure, nullptr));
   }

@@ -14,7 +14,7 @@ class QXCORE_API SAbstractIO::SIOSeekableCharReader {
   virtual int ReadChar() = 0;
   // The next line, without its line feed and a carriage return before that.
   virtual SString ReadLn() = 0;
-  // Moves to a position; true on failure. Positions are the reader's own: only what GetPos gave is one.
+  // Moves to a position; true on failure. Positions are the reader's own: only what GetPos returned is one.
   virtual bool SeekPos(unsigned long position) = 0;
   virtual unsigned long GetPos() const = 0;
   // Whether SeekPos can go back.

@@ -294,7 +294,7 @@ class QXCORE_API SString {
   std::string ToUtf8() const;
 
   // --- classification ---
-  // Of the character at an index; 0 for an index out of range.
+  // Ask for the character at an index; 0 for an index out of range.
   int IsASCII(int index) const;
   int IsAlpha(int index) const;
   int IsAlphaNum(int index) const;
@@ -303,7 +303,7 @@ class QXCORE_API SString {
   int IsUpper(int index) const;
   int IsWhitespace(int index) const;
   int IsXDigit(int index) const;
-  // Of the whole string.
+  // Ask for the whole string.
   int IsInteger() const;         // a sign or none, then decimal digits
   int IsNumber() const;          // what ToDouble reads to its end: sign, digits, point, exponent
   int CanConvertToMBCS() const;  // the text survives the way to the ANSI code page and back

@@ -22,7 +22,7 @@ bool SameEntry(const Resolved& a, const Resolved& b) {
 
 DWORD LastErrno() { return ErrorFromErrno(errno); }
 
-// Of an entry that must be there; a file has no backslash at the end of its name.
+// The error for an entry that must be there; a file has no backslash at the end of its name.
 DWORD Missing(const Resolved& entry) {
   if (entry.error != ERROR_SUCCESS) return entry.error;
   if (!entry.exists) return ERROR_FILE_NOT_FOUND;

@@ -96,7 +96,7 @@ QXCORE_API short GetKeyState(int key);
 QXCORE_API short GetAsyncKeyState(int key);
 QXCORE_API BOOL GetKeyboardState(BYTE* state);
 QXCORE_API BOOL SetKeyboardState(BYTE* state);
-// Of the layout of an American keyboard.
+// For the layout of an American keyboard.
 QXCORE_API short VkKeyScanW(WCHAR character);
 QXCORE_API UINT MapVirtualKeyW(UINT code, UINT kind);
 #define VkKeyScan VkKeyScanW

@@ -36,7 +36,7 @@ class QXCORE_API SZipEntry {
   std::int64_t GetSize() const { return m_size; }
   // Where the local header stands in the archive; for SZipInputStream counted from where the stream began.
   std::int64_t GetOffset() const { return m_offset; }
-  // Of the enumeration above.
+  // Bits of the enumeration above.
   unsigned long GetAttributes() const { return m_attributes; }
   // Type and rights of the file where the archive was made on a Unix system (st_mode), else 0. Only the central
   // directory has them.

@@ -120,7 +120,7 @@ SString SFile::NormalizeFileName(const SString& name, int asOnDisk) {
   const SString full = FullPath(name);
   if (asOnDisk == 0 || full.IsEmpty()) return full;
   if (Exists(full)) return ToLongNames(full);
-  // Of a file to come, the folder can be spelled.
+  // The folder of a file to come can be spelled.
   const std::size_t last = full.View().find_last_of(WCHAR('\\'));
   if (last == SStringView::npos || last < RootLength(full.View())) return full;
   return ToLongNames(full.Left(static_cast<int>(last))) + full.Mid(static_cast<int>(last));

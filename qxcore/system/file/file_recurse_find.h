@@ -19,7 +19,7 @@ class QXCORE_API SFileRecurseFind : public SFileFind {
   // At the end 0, with ERROR_NO_MORE_FILES when the whole tree was read, else with the first failure.
   int FindNextFileW() override;
 
-  // Of both searches together; FindFile begins anew. See SFolderRecurse.
+  // The failures of both searches together; FindFile begins anew. See SFolderRecurse.
   const SFindFailures& GetFailures() const { return m_folders.GetFailures(); }
   // See SFindFailures::SetSink.
   void SetFailureSink(SFindFailureSink* sink) { m_folders.SetFailureSink(sink); }

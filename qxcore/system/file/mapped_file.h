@@ -19,7 +19,7 @@
 class QXCORE_API SMappedFile : public SMappedMemory {
  public:
   SMappedFile() = default;
-  // Of the file with this full name; nothing is opened yet.
+  // For the file with this full name; nothing is opened yet.
   explicit SMappedFile(const SString& fullName) : m_file(fullName) {}
   // Second handles to the same file and mapping, and a cursor at the same place.
   SMappedFile(const SMappedFile& other) : SMappedMemory() { Set(other, true); }

@@ -28,8 +28,8 @@ class QXCORE_API SMappedMemory {
   // Releases what the object holds: here CloseMapping.
   virtual HRESULT Done();
 
-  // Makes a mapping of `size` bytes, the default size for 0, and closes a former one first (0x8099000B). Of a file,
-  // the file grows to that size. 0x80990014 (SFile::kMappingFailed) when it cannot be made: the file does not open,
+  // Makes a mapping of `size` bytes, the default size for 0, and closes a former one first (0x8099000B). A mapped
+  // file grows to that size. 0x80990014 (SFile::kMappingFailed) when it cannot be made: the file does not open,
   // is for reading only and smaller, there is no room. `name` may be null.
   HRESULT CreateMapping(unsigned long sizeLow, unsigned long sizeHigh, const WCHAR* name);
   HRESULT CreateMapping(std::uint64_t size, const WCHAR* name = nullptr);
@@ -56,7 +56,7 @@ class QXCORE_API SMappedMemory {
   HRESULT Set(const SMappedMemory& other, bool duplicate);
 
  protected:
-  // The file to map, its size, and whether it is for reading only: null for the paging file, which is so here,
+  // The file to map, its size, and whether it is for reading only: null for the paging file, as in this class,
   // INVALID_HANDLE_VALUE for a file that does not open.
   virtual void* GetFileHandle(int* readOnly, unsigned long* sizeLow, unsigned long* sizeHigh);
 

@@ -15,7 +15,7 @@ class QXCORE_API SOrderedRecurseFindFiles {
   int FindFile(const WCHAR* mask = nullptr);
   // 0 when the current file is the last one, which it stays.
   int FindNextFileW();
-  // Of the current file; empty without one.
+  // The path of the current file; empty without one.
   SString GetFilePath() const;
   // All that were found, in order.
   const SStringTable& GetPaths() const { return m_paths; }

@@ -132,7 +132,7 @@ SString STime::FormatGmt(unsigned int id) const {
 
 namespace {
 
-// Of a breakdown in local time; empty on failure.
+// The text of a breakdown in local time; empty on failure.
 SString LocaleText(const STime& time, bool wantsDate, DWORD dateFlags) {
   std::tm fields;
   if (!time.GetLocalTm(&fields)) return SString();

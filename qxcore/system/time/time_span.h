@@ -13,7 +13,7 @@
 class QXCORE_API STimeSpan {
  public:
   constexpr STimeSpan() noexcept = default;  // of no length
-  // Of so many seconds, or of the sum of the parts, each of which may have any size and sign.
+  // A length of so many seconds, or the sum of the parts, each of which may have any size and sign.
   constexpr explicit STimeSpan(std::int32_t seconds) noexcept : m_seconds(seconds) {}
   constexpr STimeSpan(int days, int hours, int minutes, int seconds) noexcept
       : m_seconds(static_cast<std::int32_t>(
