@@ -18,6 +18,7 @@ struct OLEMENUGROUPWIDTHS;
 // The frame window of an application that shows embedded documents in place; the order of its functions is the
 // published one. The library calls EnableModeless alone.
 struct IOleInPlaceFrame {
+  // As published; the library does not call them.
   virtual HRESULT WINAPI QueryInterface(const GUID& id, void** object) = 0;
   virtual ULONG WINAPI AddRef() = 0;
   virtual ULONG WINAPI Release() = 0;
@@ -33,6 +34,7 @@ struct IOleInPlaceFrame {
   virtual HRESULT WINAPI SetStatusText(LPCWSTR text) = 0;
   // FALSE disables the frame's modeless dialogs, TRUE enables them.
   virtual HRESULT WINAPI EnableModeless(BOOL enable) = 0;
+  // As published; the library does not call it.
   virtual HRESULT WINAPI TranslateAccelerator(MSG* message, WORD id) = 0;
 
  protected:

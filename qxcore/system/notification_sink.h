@@ -22,8 +22,8 @@ class QXCORE_API SNotificationSink : public ISNotificationSink {
     kCounted  // the last Release deletes it, so it must be made with new; its maker holds the first reference
   };
 
-  explicit SNotificationSink(Lifetime lifetime = Lifetime::kOwned)
-      : m_references(1), m_lifetime(lifetime) {}  // see Lifetime
+  // With one reference, the maker's.
+  explicit SNotificationSink(Lifetime lifetime = Lifetime::kOwned) : m_references(1), m_lifetime(lifetime) {}
   SNotificationSink(const SNotificationSink&) = delete;
   SNotificationSink& operator=(const SNotificationSink&) = delete;
 
