@@ -92,10 +92,6 @@ void* RemoveObject(Kind kind, const void* handle) {
   return object;
 }
 
-void DisownObject(const void* handle) {
-  if (Slot* slot = SlotOf(Kind::Window, handle)) slot->thread.store(nullptr, std::memory_order_relaxed);
-}
-
 Window* FindOwnWindow(HWND handle, const Thread* thread) {
   const auto value = reinterpret_cast<std::uintptr_t>(handle);
   if (value < 0x10000 || value > 0x7FFFFFFF) return nullptr;

@@ -42,7 +42,6 @@ enum class Kind : BYTE { Free, Window, Menu, Accelerators, Hook, Batch, Cursor }
 void* AddObject(Kind kind, void* object, Thread* thread);
 void* FindObject(Kind kind, const void* handle);
 void* RemoveObject(Kind kind, const void* handle);
-void DisownObject(const void* handle);  // the slot belongs to no thread any more
 
 template <class T, Kind kind, class Handle>
 T* FindAs(Handle handle) {
