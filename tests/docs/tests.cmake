@@ -32,6 +32,7 @@ add_custom_target(header_examples COMMAND ${Python3_EXECUTABLE} ${CMAKE_CURRENT_
   ${PROJECT_SOURCE_DIR} ${CMAKE_CURRENT_BINARY_DIR}/header_examples)
 add_dependencies(test_docs header_examples)
 target_include_directories(test_docs PRIVATE ${CMAKE_CURRENT_BINARY_DIR}/header_examples)
+target_sources(test_docs PRIVATE ${CMAKE_CURRENT_LIST_DIR}/../ui/time_limit.cpp)
 target_link_libraries(test_docs PRIVATE ZLIB::ZLIB)
 
 # The arrows between folders that docs/architecture.md draws are those of the includes, and nothing goes in circles.

@@ -3,9 +3,9 @@
 // A program that is driven by a script sets a mode in which nothing waits for a person. A message box is then
 // answered with its default button, or the operation is aborted with an STargetedException that names the box, so
 // that the script reports what blocked it; dialogs are always aborted. See docs/unattended.md.
-//
-//   SetInteractiveMode unattended(kInteractiveAbort);   // until the end of the block
-//
+// ```cpp
+// SetInteractiveMode unattended(kInteractiveAbort);   // until the end of the block
+// ```
 // The modes are process-wide and belong to the user-interface thread.
 #pragma once
 

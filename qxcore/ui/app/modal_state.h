@@ -1,8 +1,8 @@
 // SModalState: while it lasts, the windows of the application are disabled, and its message loop drops input for the
 // owner window.
-//
-//   SModalState modal(1);      // until the end of the block
-//
+// ```cpp
+// SModalState modal(1);      // until the end of the block
+// ```
 // States nest, and may stop in any order: a window is enabled again when the last state that wants it disabled has
 // stopped. Windows that were disabled before stay so. Process-wide, for the user-interface thread.
 #pragma once

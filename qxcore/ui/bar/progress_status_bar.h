@@ -1,15 +1,15 @@
 // SProgressStatusBar: a status bar that shows a progress and a Cancel button over its main pane while long work runs.
-//
-//   bar.StartProgress(1);
-//   for (...) {
-//     bar.GetProgressCtrl().SetPos(done);
-//     // take messages here, or the button cannot be pressed
-//     SProgressStatusBar::Status status;
-//     bar.GetSetProgressStatus(&status, nullptr);
-//     if (status.m_flags & SProgressStatusBar::kCancelRequested) break;
-//   }
-//   bar.EndProgress();
-//
+// ```cpp
+// bar.StartProgress(1);
+// for (int done = 0; done < 100; ++done) {
+//   bar.GetProgressCtrl().SetPos(done);
+//   // take messages here, or the button cannot be pressed
+//   SProgressStatusBar::Status status;
+//   bar.GetSetProgressStatus(&status, nullptr);
+//   if (status.m_flags & SProgressStatusBar::kCancelRequested) break;
+// }
+// bar.EndProgress();
+// ```
 // While the progress can be cancelled, the button has the focus; Enter and Escape press it as Space does. Afterwards
 // the focus returns to where it was. For the user-interface thread.
 #pragma once

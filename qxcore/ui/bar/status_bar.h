@@ -3,14 +3,14 @@
 // It wraps the system's status bar control and owns the list of panes: it decides every pane's width, keeps every
 // pane's text, and gives both to the control. Where a pane has kSPaneSplice, the panes of an SStatusBarLayout can be
 // shown between the bar's own ones, for example those of the active kind of document.
-//
-//   SStatusBar bar;
-//   bar.Create(frame);
-//   bar.InsertPane(0, 0, kSPaneMain | kSPaneStretch);    // messages: as wide as there is room
-//   bar.InsertPane(1, 60, 0);                            // 60 pixels
-//   bar.InsertPane(2, 0, kSPaneAutoSize);                // as wide as its text
-//   bar.SetPaneText(kSMainPane, &text, 1);
-//
+// ```cpp
+// SStatusBar bar;
+// bar.Create(frame);
+// bar.InsertPane(0, 0, kSPaneMain | kSPaneStretch);    // messages: as wide as there is room
+// bar.InsertPane(1, 60, 0);                            // 60 pixels
+// bar.InsertPane(2, 0, kSPaneAutoSize);                // as wide as its text
+// bar.SetPaneText(kSMainPane, &text, 1);
+// ```
 // Widths are pixels of the bar's DPI: those of 96 dots an inch until the window is created; from then on those of its
 // screen. When the DPI changes, the widths and borders that the bar holds are scaled. The control shows the first 256
 // panes. The index kSMainPane (-1) names the main pane. An invalid index gives 0, or the empty string, and changes

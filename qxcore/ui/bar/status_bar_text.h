@@ -1,7 +1,7 @@
 // SSetStatusBarText: shows a message in the status bar's main pane, and the wait cursor, until the end of a block.
-//
-//   SSetStatusBarText message(WTEXT("Reading the file"));
-//
+// ```cpp
+// SSetStatusBarText message(WTEXT("Reading the file"));
+// ```
 // The text goes to the application's owner window by kSMsgStatusText; a frame with a status bar shows it there, and
 // afterwards what stood there before. Messages nest. For the user-interface thread.
 #pragma once

@@ -1,13 +1,13 @@
 // Exchange of data between a dialog's controls and its variables, with checks.
-//
-//   void SSizeDlg::DoDataExchange(SDataExchange* exchange) {
-//     exchange->Text(IDC_NAME, &m_name);
-//     exchange->MaxLength(m_name, 40);
-//     exchange->Number(IDC_COUNT, &m_count);
-//     exchange->Range(m_count, 1, 99);
-//     exchange->Check(IDC_FRAME, &m_hasFrame);
-//   }
-//
+// ```cpp
+// void SSizeDlg::DoDataExchange(SDataExchange* exchange) {
+//   exchange->Text(IDC_NAME, &m_name);
+//   exchange->MaxLength(m_name, 40);
+//   exchange->Number(IDC_COUNT, &m_count);
+//   exchange->Range(m_count, 1, 99);
+//   exchange->Check(IDC_FRAME, &m_hasFrame);
+// }
+// ```
 // One function serves both ways: SaveAndValidate() says which. A check stands behind the exchange of its variable and
 // looks only when data is taken; when it fails, the user is told with SMessageBox, the control gets the focus, and
 // UpdateData returns 0. In an unattended mode that message box is answered or aborted like any other.

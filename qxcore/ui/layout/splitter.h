@@ -3,11 +3,11 @@
 // A static splitter has a fixed grid; its panes are added by the program. A dynamic one begins with one pane, and the
 // user splits it by dragging the split boxes at the ends of the shared scroll bars, or by a double click on them; its
 // panes are made from a class record. Both are created as a child, usually in SFrameWnd::OnCreateClient:
-//
-//   m_splitter.CreateStatic(this, 1, 2, WS_CHILD | WS_VISIBLE, kSFirstPane);
-//   m_splitter.AddPane(0, 0, &STreeView::classSTreeView, SSize(200, 0), context);
-//   m_splitter.AddPane(0, 1, &STextView::classSTextView, SSize(0, 0), context);
-//
+// ```cpp
+// m_splitter.CreateStatic(this, 1, 2, WS_CHILD | WS_VISIBLE, kSFirstPane);
+// m_splitter.AddPane(0, 0, &STreeView::classSTreeView, SSize(200, 0), context);
+// m_splitter.AddPane(0, 1, &STextView::classSTextView, SSize(0, 0), context);
+// ```
 // How sizes are found: pane_sizing.h. Sizes are pixels of the window's DPI; when that changes, thicknesses, minima
 // and ideal sizes change with it.
 //

@@ -3,10 +3,10 @@
 // Beside the strip lies a horizontal scroll bar, and at the right edge a vertical one, which serve the window that is
 // shown: it gets their messages, and its GetScrollBarCtrl may return GetTabScrollBar. The user moves the border
 // between strip and scroll bar with the mouse; a double click on it halves the width again.
-//
-//   m_tabs.Create(this, nullptr, context, WS_CHILD | WS_VISIBLE, kSFirstPane);
-//   m_tabs.AddTab(&STextView::classSTextView, WTEXT("readme.txt"), context);
-//
+// ```cpp
+// m_tabs.Create(this, nullptr, context, WS_CHILD | WS_VISIBLE, kSFirstPane);
+// m_tabs.AddTab(&STextView::classSTextView, WTEXT("readme.txt"), context);
+// ```
 // Keyboard: Ctrl+Tab and Ctrl+PageDown show the next tab, Ctrl+Shift+Tab and Ctrl+PageUp the one before; F6 goes from
 // the window to the tabs and on, see SSplitterWnd; on the tabs the arrows, Home and End choose, Ctrl with the arrows
 // moves the border, and Enter, Escape and Tab return to the window.

@@ -1,20 +1,20 @@
 // The functions that make the entries of message maps. A handler whose shape does not fit its message does not
 // compile, and an entry needs no code at start-up.
-//
-//   class SNoteView : public SView {
-//     ...
-//     int OnCreate(CREATESTRUCTW* create);
-//     void OnLButtonDown(UINT flags, SPoint point);
-//     void OnClear();
-//     void OnUpdateClear(SCmdUI* ui);
-//     QXCORE_DECLARE_MESSAGE_MAP()
-//   };
-//   QXCORE_IMPLEMENT_MESSAGE_MAP(SNoteView, SView,
-//     on<WM_CREATE, &SNoteView::OnCreate>(),
-//     on<WM_LBUTTONDOWN, &SNoteView::OnLButtonDown>(),
-//     command<ID_CLEAR, &SNoteView::OnClear>(),
-//     update<ID_CLEAR, &SNoteView::OnUpdateClear>())
-//
+// ```cpp
+// class SNoteView : public SView {
+//  public:
+//   int OnCreate(CREATESTRUCTW* create);
+//   void OnLButtonDown(UINT flags, SPoint point);
+//   void OnClear();
+//   void OnUpdateClear(SCmdUI* ui);
+//   QXCORE_DECLARE_MESSAGE_MAP()
+// };
+// QXCORE_IMPLEMENT_MESSAGE_MAP(SNoteView, SView,
+//   on<WM_CREATE, &SNoteView::OnCreate>(),
+//   on<WM_LBUTTONDOWN, &SNoteView::OnLButtonDown>(),
+//   command<ID_CLEAR, &SNoteView::OnClear>(),
+//   update<ID_CLEAR, &SNoteView::OnUpdateClear>())
+// ```
 // A handler may be inherited; one of several overloads is chosen with a static_cast. Which handlers a message
 // takes stands in message_shapes.h; LRESULT(WPARAM, LPARAM) fits every window message.
 #pragma once
