@@ -1,4 +1,4 @@
-// SDrawBackground: the gradient background of a window.
+// SDrawBackground: the gradient background of a window. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/graphics/gradient.h"

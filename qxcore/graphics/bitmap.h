@@ -1,4 +1,4 @@
-// SBitmap: a picture in memory that a memory context draws on.
+// SBitmap: a picture in memory that a memory context draws on. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/graphics/gdi_object.h"

@@ -1,4 +1,4 @@
-// SBrush: what areas are filled with.
+// SBrush: what areas are filled with. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include <type_traits>

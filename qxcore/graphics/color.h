@@ -2,6 +2,7 @@
 //
 // A colour is a 32-bit value 0x00BBGGRR: red in the low byte, green in the second, blue in the third. Two values
 // beyond that are markers: 0xFF000000 is the default colour (of whoever asks), 0xFFFFFFFF is no colour.
+// Threads: a value belongs to one thread at a time; the functions serve any thread.
 #pragma once
 
 #include <cstdint>

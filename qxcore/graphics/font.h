@@ -2,6 +2,7 @@
 //
 // A font is described by the face's name, a height and a style. A height above 0 is the whole line's, ascent
 // and descent; below 0 that of the letters alone (the em), both in pixels; 0 takes a default of the system.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/graphics/gdi_object.h"

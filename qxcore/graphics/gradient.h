@@ -21,6 +21,7 @@
 //
 // The kinds from corner on end with a frame of the frame type. An unknown kind draws nothing, and neither does an
 // empty rectangle. Rectangles are put in order before they are used, without changing the caller's.
+// Threads: a value belongs to one thread at a time; the functions serve any thread.
 #pragma once
 
 #include "qxcore/graphics/dc.h"

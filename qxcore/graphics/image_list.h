@@ -1,4 +1,4 @@
-// SImageList: small pictures of one size, drawn by number.
+// SImageList: small pictures of one size, drawn by number. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/core/object.h"

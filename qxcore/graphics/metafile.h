@@ -1,4 +1,5 @@
 // Metafiles: drawing calls that are recorded and played back on other contexts. Both kinds live in memory.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/graphics/dc.h"

@@ -1,4 +1,4 @@
-// SPen: what lines and outlines are drawn with.
+// SPen: what lines and outlines are drawn with. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/graphics/gdi_object.h"

@@ -1,4 +1,4 @@
-// Bitmaps to and from PNG files.
+// Bitmaps to and from PNG files. Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/graphics/bitmap.h"

@@ -3,6 +3,7 @@
 // They are the records themselves (same layout, no further field), so each converts freely to and from POINT,
 // SIZE and RECT, and passes wherever a pointer to one is wanted. Right and bottom lie outside a rectangle, so
 // its width is right - left. Sums may not leave the range of a LONG.
+// Threads: a value belongs to one thread at a time; the functions serve any thread.
 #pragma once
 
 #include <algorithm>

@@ -1,4 +1,5 @@
 // SRgn: a set of pixels, kept as rectangles; for clipping, filling and hit tests.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/graphics/gdi_object.h"

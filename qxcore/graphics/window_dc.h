@@ -1,4 +1,5 @@
 // The contexts of windows, each for a scope: the destructor gives it back.
+// Threads: an object belongs to one thread at a time.
 #pragma once
 
 #include "qxcore/graphics/dc.h"

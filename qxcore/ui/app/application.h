@@ -9,6 +9,7 @@
 // Messages that idle work posts do not start another idle period, so that it cannot keep the program busy for ever.
 //
 // What a handler throws, and nobody catches, is passed to the error reporter by Run, which goes on.
+// For the user-interface thread.
 #pragma once
 
 #include "qxcore/graphics/rect.h"

@@ -7,6 +7,7 @@
 //
 // A word that begins with "-" or "/" is a switch, unless a "--" came before; "-" alone is a file. A switch is kept
 // without its mark; a value may follow behind ":" or "=". Names are compared without regard to case.
+// Threads: a value belongs to one thread at a time; the functions serve any thread.
 #pragma once
 
 #include "qxcore/container/string_table.h"

@@ -1,4 +1,5 @@
 // What the framework does with failures that no caller learns of; see qxcore/core/raise_error.h for the reporter.
+// For the user-interface thread.
 #pragma once
 
 #include <exception>

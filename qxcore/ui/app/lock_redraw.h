@@ -1,6 +1,7 @@
 // SLockRedraw: suspends a window's redrawing until the end of a block.
 //
 // Locks nest by window: it is drawn again when the last one is gone. A window that is destroyed meanwhile is forgotten.
+// For the user-interface thread.
 #pragma once
 
 #include "qxcore/platform/export.h"

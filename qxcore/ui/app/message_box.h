@@ -1,4 +1,4 @@
-// The library's message box, which follows the interaction mode.
+// The library's message box, which follows the interaction mode. For the user-interface thread.
 #pragma once
 
 #include "qxcore/platform/export.h"

@@ -2,6 +2,7 @@
 //
 // The application empties their maps at idle time. While anybody holds the lock, nothing is freed; the framework
 // holds it while a message is being handled, so an object that a handler was given is valid until it returns.
+// For the user-interface thread.
 #pragma once
 
 #include "qxcore/platform/export.h"

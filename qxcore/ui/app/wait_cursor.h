@@ -1,4 +1,4 @@
-// SWaitCursor: shows the wait cursor until the end of a block.
+// SWaitCursor: shows the wait cursor until the end of a block. For the user-interface thread.
 #pragma once
 
 #include "qxcore/platform/export.h"

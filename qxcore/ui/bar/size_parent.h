@@ -1,4 +1,4 @@
-// The private messages between a frame and its bars.
+// The private messages between a frame and its bars. For the user-interface thread.
 #pragma once
 
 #include "qxcore/graphics/rect.h"

@@ -1,6 +1,7 @@
 // SStatusBarPane and SStatusBarPanes: the records of a status bar's panes and the table that holds them.
 //
 // The table belongs to an SStatusBar or an SStatusBarLayout, which show its panes; change it through them.
+// For the user-interface thread.
 #pragma once
 
 #include <cstddef>

@@ -1,4 +1,4 @@
-// SProgressCtrl: a progress bar of the system.
+// SProgressCtrl: a progress bar of the system. For the user-interface thread.
 #pragma once
 
 #include "qxcore/ui/window/window.h"

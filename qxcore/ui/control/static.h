@@ -1,4 +1,4 @@
-// SStatic: a text, picture or frame of the system that does nothing by itself.
+// SStatic: a text, picture or frame of the system that does nothing by itself. For the user-interface thread.
 #pragma once
 
 #include "qxcore/ui/window/window.h"

@@ -1,4 +1,5 @@
 // SCreateContext: what a frame's client is created from; passed on through Create to WM_CREATE.
+// For the user-interface thread.
 #pragma once
 
 #include "qxcore/core/object.h"

@@ -11,6 +11,7 @@
 // One function serves both ways: SaveAndValidate() says which. A check stands behind the exchange of its variable and
 // looks only when data is taken; when it fails, the user is told with SMessageBox, the control gets the focus, and
 // UpdateData returns 0. In an unattended mode that message box is answered or aborted like any other.
+// For the user-interface thread.
 #pragma once
 
 #include "qxcore/string/string.h"

@@ -3,6 +3,7 @@
 // DoModal shows the box, waits for the user and returns the identifier of the button; in a mode in which nobody is
 // there it throws an STargetedException that names the box instead (see interaction_mode.h). The template comes from
 // the resources, by name or MAKEINTRESOURCEW number, or from memory in the published binary layout.
+// For the user-interface thread.
 #pragma once
 
 #include "qxcore/ui/window/window.h"

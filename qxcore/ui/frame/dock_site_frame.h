@@ -1,7 +1,7 @@
 // SDockSiteFrameWnd: a frame at whose edges control bars stand; the usual main window of a program.
 //
 // It shows the messages of SSetStatusBarText in the main pane of its status bar, the first child that is one, and
-// afterwards what stood there before.
+// afterwards what stood there before. For the user-interface thread.
 #pragma once
 
 #include "qxcore/ui/bar/status_texts.h"

@@ -2,7 +2,7 @@
 //
 // Commands go to the active view, then to the frame, then to the application. A frame is made with new and deletes
 // itself with its window. The identifier of its client is kSFirstPane; control bars take their strips first, see
-// RecalcLayout.
+// RecalcLayout. For the user-interface thread.
 #pragma once
 
 #include "qxcore/ui/bar/size_parent.h"

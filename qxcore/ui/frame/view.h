@@ -1,7 +1,7 @@
 // SView: a child window that shows something; derive from it and override OnDraw.
 //
 // A click makes a view the active one of its frame, which then offers it all commands first. A view is made with new,
-// usually by a frame from an SCreateContext, and deletes itself with its window.
+// usually by a frame from an SCreateContext, and deletes itself with its window. For the user-interface thread.
 #pragma once
 
 #include "qxcore/ui/frame/create_context.h"

@@ -6,6 +6,7 @@
 // 0 and the window shows as many bars as fit.
 //
 // Plain arithmetic without a window; products are 64 bits wide.
+// Threads: a value belongs to one thread at a time; the functions serve any thread.
 #pragma once
 
 #include <cstdint>

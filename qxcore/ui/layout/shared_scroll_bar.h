@@ -1,4 +1,4 @@
-// The scroll bars that a splitter or a tab window shares among its windows.
+// The scroll bars that a splitter or a tab window shares among its windows. For the user-interface thread.
 #pragma once
 
 #include "qxcore/platform/export.h"

@@ -3,6 +3,7 @@
 //
 // A tab takes its width and the spacing; it is drawn one spacing wider, so that its slanted right edge lies over the
 // left one of the next tab. Its right edge is thus its offset, its width and twice the spacing.
+// For the user-interface thread.
 #pragma once
 
 #include "qxcore/core/memory.h"

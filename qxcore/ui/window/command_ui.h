@@ -2,7 +2,7 @@
 //
 // Whoever shows commands makes an SCmdUI for an item, sets its fields and calls DoUpdate with the first target
 // of the routing. The base class updates a menu item, or the window m_sender when there is no menu; bars derive
-// a class of their own and override the setters.
+// a class of their own and override the setters. For the user-interface thread.
 #pragma once
 
 #include "qxcore/ui/window/message_map.h"

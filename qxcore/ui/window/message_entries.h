@@ -17,6 +17,7 @@
 // ```
 // A handler may be inherited; one of several overloads is chosen with a static_cast. Which handlers a message
 // takes stands in message_shapes.h; LRESULT(WPARAM, LPARAM) fits every window message.
+// Threads: nothing here is changed at run time.
 #pragma once
 
 #include "qxcore/ui/window/message_map.h"

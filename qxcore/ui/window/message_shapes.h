@@ -6,6 +6,7 @@
 //
 // Handles of windows, menus and device contexts are turned into objects; where no permanent object exists, the
 // object is temporary and lives at least until the handler has returned.
+// Threads: nothing here is changed at run time.
 #pragma once
 
 #include <cstdint>
