@@ -66,7 +66,7 @@ class SSizeDlg : public SDlg {
     const int result = SDlg::OnInitDialog();
     GetDlgItem(IDC_COUNT)->GetWindowTextW(&m_shown);
     GetDlgItem(IDC_COUNT)->SetWindowTextW(WTEXT("8"));
-    OnOK();
+    PostMessageW(WM_COMMAND, IDOK);
     return result;
   }
   SString m_shown;
