@@ -190,8 +190,9 @@ TEST(RealFiles, LinesOfTheAnsiPage) {
   EXPECT_EQ(stream.Read(rest, 5), 4u) << "whole characters only";
   EXPECT_EQ(SStringView(rest, 2), WTEXT("wo"));
   EXPECT_EQ(stream.GetPos(), second + 3);
-  WriteAll(path, "cut\r");
-  EXPECT_EQ(SSeekableInputANSIFile(Path(path)).ReadLn(), SString(WTEXT("cut\r")));
+  const test::Text cut = folder.File(WTEXT("cut"));
+  WriteAll(cut, "cut\r");
+  EXPECT_EQ(SSeekableInputANSIFile(Path(cut)).ReadLn(), SString(WTEXT("cut\r")));
 }
 
 class Indicator : public SProgressIndicatorEx {
