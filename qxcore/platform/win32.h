@@ -22,6 +22,7 @@
 
 #include <commctrl.h>
 #include <commdlg.h>
+#include <shellapi.h>
 
 // From a header whose other macros are named like members of the library.
 #ifndef GET_X_LPARAM
@@ -147,6 +148,7 @@ using REGSAM = DWORD;
 #include "qxcore/platform/win32/menu.h"
 #include "qxcore/platform/win32/message.h"
 #include "qxcore/platform/win32/scroll.h"
+#include "qxcore/platform/win32/shell.h"
 #include "qxcore/platform/win32/window.h"
 
 #endif
