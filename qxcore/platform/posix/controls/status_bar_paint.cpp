@@ -19,10 +19,15 @@ void Fill(HDC dc, const RECT& rect, COLORREF color) {
   ExtTextOutW(dc, 0, 0, ETO_OPAQUE, &rect, nullptr, 0, nullptr);
 }
 
+// A text is indented at the side where it begins, and may fill the part to its other edge.
+RECT Indented(RECT rect, UINT side) {
+  if (side != DT_RIGHT) rect.left += kTextIndent;
+  if (side != DT_LEFT) rect.right -= kTextIndent;
+  return rect;
+}
+
 // A text has up to three sections, which tabs part: left, centred, right.
-void DrawSections(HDC dc, RECT rect, const BarPart& part) {
-  rect.left += kTextIndent;
-  rect.right -= kTextIndent;
+void DrawSections(HDC dc, const RECT& rect, const BarPart& part) {
   const UINT reading = part.type & SBT_RTLREADING ? DT_RTLREADING : 0;
   const UINT sides[] = {reading ? DT_RIGHT : DT_LEFT, DT_CENTER, reading ? DT_LEFT : DT_RIGHT};
   std::size_t start = 0;
@@ -30,7 +35,8 @@ void DrawSections(HDC dc, RECT rect, const BarPart& part) {
     const bool isLast = side == sides[2] || (part.type & SBT_NOTABPARSING);
     const std::size_t tab = isLast ? Text::npos : part.text.find(u'\t', start);
     const std::size_t end = std::min(tab, part.text.size());
-    DrawTextW(dc, part.text.data() + start, static_cast<int>(end - start), &rect,
+    RECT place = Indented(rect, side);
+    DrawTextW(dc, part.text.data() + start, static_cast<int>(end - start), &place,
               side | reading | DT_SINGLELINE | DT_VCENTER | DT_NOPREFIX);
     if (tab >= part.text.size()) return;
     start = tab + 1;
