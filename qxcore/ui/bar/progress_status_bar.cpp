@@ -26,7 +26,9 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(SProgressStatusBar, SStatusBar, on<WM_SIZE, &SProgr
 QXCORE_IMPLEMENT_MESSAGE_MAP(SProgressStatusBar::CancelButton, SButton,
                              on<WM_SETCURSOR, &SProgressStatusBar::CancelButton::OnSetCursor>(),
                              on<WM_GETDLGCODE, &SProgressStatusBar::CancelButton::OnGetDlgCode>(),
-                             on<WM_KEYDOWN, &SProgressStatusBar::CancelButton::OnKeyDown>())
+                             on<WM_KEYDOWN, &SProgressStatusBar::CancelButton::OnKeyDown>(),
+                             on<WM_PAINT, &SProgressStatusBar::CancelButton::OnPaint>(),
+                             on<WM_ERASEBKGND, &SProgressStatusBar::CancelButton::OnEraseBkgnd>())
 
 SProgressStatusBar::~SProgressStatusBar() = default;
 SProgressStatusBar::CancelButton::~CancelButton() = default;
@@ -175,5 +177,41 @@ void SProgressStatusBar::CancelButton::OnKeyDown(UINT key, UINT, UINT) {
     SendMessageW(BM_CLICK);
   } else {
     Default();
+  }
+}
+
+// --- how the button looks ---
+
+// The control paints some changes of its state at once.
+LRESULT SProgressStatusBar::CancelButton::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+  const HWND window = m_hWnd;
+  const LRESULT state = window != nullptr ? ::SendMessageW(window, BM_GETSTATE, 0, 0) : 0;
+  const LRESULT result = SButton::WindowProc(message, wParam, lParam);
+  if (message != BM_GETSTATE && m_hWnd == window && ::IsWindow(window) &&
+      ::SendMessageW(window, BM_GETSTATE, 0, 0) != state) {
+    Invalidate(0);
+  }
+  return result;
+}
+
+// A frame in the text's colour shows the focus.
+void SProgressStatusBar::CancelButton::OnPaint() {
+  SPaintDC dc(m_hWnd);
+  const LRESULT state = SendMessageW(BM_GETSTATE);
+  const bool isPushed = (state & BST_PUSHED) != 0;
+  SRect rect = GetClientRect();
+  dc.FillSolidRect(rect, ::GetSysColor(COLOR_3DFACE));
+  const SSelectObject font(dc, GetFont());
+  SString text;
+  GetWindowTextW(&text);
+  dc.SetBkMode(TRANSPARENT);
+  dc.SetTextColor(::GetSysColor(IsWindowEnabled() ? COLOR_BTNTEXT : COLOR_GRAYTEXT));
+  SRect place = rect;
+  if (isPushed) place.Offset(1, 1);
+  dc.DrawTextW(text.View(), place, DT_SINGLELINE | DT_CENTER | DT_VCENTER);
+  if (state & BST_FOCUS) {
+    dc.FrameRect(rect, ::GetSysColorBrush(COLOR_BTNTEXT));
+  } else {
+    dc.DrawEdge(rect, isPushed ? BDR_SUNKENOUTER : BDR_RAISEDINNER, BF_RECT);
   }
 }

@@ -60,12 +60,16 @@ class QXCORE_API SProgressStatusBar : public SStatusBar {
   QXCORE_DECLARE_MESSAGE_MAP()
 
  private:
-  // Tells its parent when the pointer is over it, and takes Enter and Escape.
+  // Notifies its parent when the pointer is over it, and takes Enter and Escape. It is only as high as its text, so it
+  // draws itself with thin edges: the control's own would cover the text.
   class QXCORE_API CancelButton : public SButton {
    public:
     ~CancelButton() override;
+    LRESULT WindowProc(UINT message, WPARAM wParam, LPARAM lParam) override;
 
    protected:
+    void OnPaint();
+    int OnEraseBkgnd(SDC*) { return 1; }
     int OnSetCursor(SWnd* window, UINT hit, UINT message);
     UINT OnGetDlgCode();
     void OnKeyDown(UINT key, UINT repeats, UINT flags);
