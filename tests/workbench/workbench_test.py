@@ -1,0 +1,254 @@
+#!/usr/bin/env python3
+"""Drives qxworkbench by scripts, as a process, and looks at what a user would find: the list, messages, files.
+
+usage: workbench_test.py WORKBENCH QXTOOL [WRAPPER...]
+Each run has a time limit: whatever waits for a person fails the test.
+"""
+
+import os
+import pathlib
+import shutil
+import struct
+import subprocess
+import sys
+import tempfile
+import unittest
+
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "support"))
+import wine  # noqa: E402
+
+WORKBENCH, TOOL = [], []
+ON_WINE = "wine" in sys.argv[3:]
+LIMIT = 120  # seconds
+SAMPLES = pathlib.Path(__file__).resolve().parents[2] / "samples/texts/files"
+CORPUS = pathlib.Path(os.environ.get("QXCORE_CORPUS", "/nowhere")) / "encodings"
+MODES = ("show", "answer", "abort")
+GERMAN = "Größe, Übermaß und Äpfel\nfür jeden etwas\n"
+EURO = "für jeden 5 €\n"
+
+
+class WorkbenchTest(unittest.TestCase):
+    def setUp(self):
+        self.folder = pathlib.Path(tempfile.mkdtemp(prefix="qxworkbench-test-"))
+        self.addCleanup(shutil.rmtree, self.folder, ignore_errors=True)
+        self.texts = self.folder / "texts"
+        self.texts.mkdir()
+
+    def run_script(self, text, *options, before=None):
+        (self.folder / "script.txt").write_text(text, encoding="utf-8")
+        environment = dict(os.environ, QXCORE_REGISTRY=str(self.folder / "registry.db"))
+        return subprocess.run([*WORKBENCH, "--script", "script.txt", *options], cwd=self.folder, env=environment,
+                              stdin=subprocess.DEVNULL, capture_output=True, timeout=LIMIT, preexec_fn=before)
+
+    def run_done(self, text, *options):
+        result = self.run_script(text, *options)
+        self.assertEqual((result.returncode, result.stderr.decode()), (0, ""), result.stdout.decode())
+        return result.stdout.decode().replace("\r\n", "\n")
+
+    def write(self, name, content, encoding="utf-8"):
+        path = self.texts / name
+        path.parent.mkdir(parents=True, exist_ok=True)
+        path.write_bytes(content if isinstance(content, bytes) else content.encode(encoding))
+        return path
+
+    def write_three(self):
+        self.write("a.txt", GERMAN, "cp1252")
+        self.write("b.txt", GERMAN)
+        self.write("below/c.txt", GERMAN, "utf-16")
+
+    def contents(self):
+        return {path.relative_to(self.folder).as_posix(): path.read_bytes() for path in self.texts.rglob("*") if path.is_file()}
+
+    def converted_by_tool(self, name, to):
+        subprocess.run([*TOOL, "convert", "--to", to, "texts/" + name, "expected.out"], cwd=self.folder, check=True,
+                       capture_output=True, timeout=LIMIT)
+        return (self.folder / "expected.out").read_bytes()
+
+    # --- the list ---
+
+    def test_a_folder_is_listed_and_sorted(self):
+        self.write_three()
+        rows = self.run_done("open texts\nsort size down\nprint list\nsort name\nprint list\nprint status\n").splitlines()
+        self.assertEqual([row.split("\t")[0].replace("\\", "/") for row in rows[:3]], ["below/c.txt", "b.txt", "a.txt"])
+        self.assertEqual([row.split("\t")[0].replace("\\", "/") for row in rows[3:6]], ["a.txt", "b.txt", "below/c.txt"])
+        self.assertIn("Cp1252", rows[3].split("\t")[1])
+        self.assertTrue(rows[6].startswith("3 files in "), rows[6])
+
+    def test_a_dropped_folder_is_opened(self):
+        self.write_three()
+        self.assertEqual(len(self.run_done("drop texts\nprint list\n").splitlines()), 3)
+
+    def test_keys_move_and_show(self):
+        self.write_three()
+        shown = self.run_done("open texts\nkey home\nkey down\nwait\nkey enter\nwait\nprint preview\n")
+        self.assertEqual(shown, GERMAN)
+
+    def test_a_preview_in_another_encoding(self):
+        self.write("a.txt", GERMAN, "cp850")
+        shown = self.run_done("open texts\npreview a.txt as Cp850\nprint preview\n")
+        self.assertEqual(shown, GERMAN)
+
+    def test_a_large_file_is_shown_in_parts(self):
+        line = b"0123456789 a line of sixty-three characters and its end, LF...\n"
+        self.write("large.txt", line * (18 * 1024 * 1024 // len(line)))
+        shown = self.run_done("open texts\nprint list\npreview large.txt\npart next\nwait\npart next\nwait\nprint preview\nprint timing\n")
+        self.assertIn("ASCII", shown.splitlines()[0])
+        lines = shown.splitlines()[1:-1]
+        self.assertEqual(lines[-1].encode() + b"\n", line)
+        self.assertLess(len(lines), 18 * 1024 * 1024 // len(line))
+
+    @unittest.skipUnless(CORPUS.is_dir(), "needs QXCORE_CORPUS")
+    def test_the_corpus_is_detected_as_by_the_tool(self):
+        shutil.copytree(CORPUS, self.texts, dirs_exist_ok=True)
+        names = sorted(path.relative_to(self.texts).as_posix() for path in self.texts.rglob("*") if path.is_file())
+        lines = self.run_done("open texts\nprint list\n").splitlines()
+        listed = {row.split("\t")[0].replace("\\", "/"): row.split("\t")[1] for row in lines}
+        self.assertEqual(sorted(listed), names)
+        report = subprocess.run([*TOOL, "detect", *names], cwd=self.texts, capture_output=True, timeout=LIMIT).stdout.decode()
+        for row in report.splitlines():
+            name = next(name for name in names if row.startswith(name + " "))
+            self.assertTrue(row[len(name):].strip().startswith(listed[name]), (row, listed[name]))
+
+    # --- conversion, in each mode ---
+
+    @unittest.skipUnless(CORPUS.is_dir(), "needs QXCORE_CORPUS")
+    def test_the_corpus_is_converted_as_by_the_tool(self):
+        for part in ("ascii", "cp850", "cp866", "euc-jp", "derived"):
+            shutil.copytree(CORPUS / part, self.texts / part)
+        before = self.contents()
+        self.run_done("open texts\nselect all\nanswer yes\nconvert UTF-8 to out\nwait\n")
+        self.assertEqual(self.contents(), before)
+        for name in before:
+            name = name.removeprefix("texts/")
+            self.assertEqual((self.folder / "out" / name).read_bytes(), self.converted_by_tool(name, "UTF-8"), name)
+
+    def test_the_question_in_each_mode(self):
+        """Without losses the default is to convert; with losses it is not; abort never guesses."""
+        for mode in MODES:
+            for target, lossy in (("UTF-8", False), ("Cp437", True)):
+                with self.subTest(mode=mode, lossy=lossy):
+                    self.write("a.txt", GERMAN + EURO, "cp1252")
+                    before = self.contents()
+                    answer = "answer yes\n" if mode == "show" else ""
+                    result = self.run_script(f"open texts\nselect all\n{answer}convert {target}\nprint status\n", "--mode", mode)
+                    changed = self.contents() != before
+                    if mode == "abort":
+                        self.assertEqual(result.returncode, 1)
+                        self.assertIn('Aborting on "Convert" dialog', result.stderr.decode())
+                        self.assertFalse(changed)
+                    else:
+                        self.assertEqual(result.returncode, 0, result.stderr.decode())
+                        self.assertEqual(changed, mode == "show" or not lossy)
+                        text = "1 file was converted" if changed else "Nothing was converted."
+                        self.assertEqual(result.stdout.decode().strip(), text)
+
+    def test_no_is_an_answer(self):
+        self.write_three()
+        before = self.contents()
+        self.assertIn("Nothing was converted.", self.run_done("open texts\nselect all\nanswer no\nconvert UTF-8\nprint status\n"))
+        self.assertEqual(self.contents(), before)
+
+    # --- what goes wrong ---
+
+    def test_bad_folders_are_told_in_each_mode(self):
+        self.write("a.txt", GERMAN)
+        for mode in MODES:
+            result = self.run_script("-open nowhere\n-open texts/a.txt\nopen texts\nprint list\n", "--mode", mode)
+            self.assertEqual(result.returncode, 0)
+            messages = result.stderr.decode().splitlines()
+            self.assertEqual(len(messages), 2, messages)
+            self.assertIn("script.txt:1: ", messages[0])
+            self.assertIn("there is no such folder", messages[0])
+            self.assertIn("it is no folder", messages[1])
+            self.assertEqual(len(result.stdout.decode().splitlines()), 1)
+        result = subprocess.run([*WORKBENCH, "nowhere", "--picture", "p.png"], cwd=self.folder, capture_output=True, timeout=LIMIT)
+        self.assertEqual(result.returncode, 1)
+        self.assertIn(b"there is no such folder", result.stderr)
+
+    def test_a_file_that_vanishes(self):
+        """Between listing and converting one file goes: the others are converted, the message names it."""
+        self.write_three()
+        fifo = self.folder / "go"
+        script = "open texts\nselect all\necho listed\npause go\nanswer yes\nconvert UTF-8\nprint status\n"
+        (self.folder / "script.txt").write_text(script)
+        process = subprocess.Popen([*WORKBENCH, "--script", "script.txt"], cwd=self.folder, stdout=subprocess.PIPE, stderr=subprocess.PIPE)
+        try:
+            self.assertEqual(process.stdout.readline().strip(), b"listed")
+            (self.texts / "b.txt").unlink()
+            fifo.write_bytes(b"")
+            out, err = process.communicate(timeout=LIMIT)
+        finally:
+            process.kill()
+        self.assertEqual(process.returncode, 1)
+        self.assertIn("2 files were converted; b.txt: ", err.decode())
+        self.assertEqual((self.texts / "a.txt").read_bytes(), GERMAN.encode())
+
+    @unittest.skipIf(ON_WINE, "needs a limit of the size of files")
+    def test_a_full_disk_leaves_the_files_as_they_were(self):
+        self.write("a.txt", GERMAN * 20000, "cp1252")
+        before = self.contents()
+
+        def limit():
+            import resource
+            import signal
+            signal.signal(signal.SIGXFSZ, signal.SIG_IGN)
+            resource.setrlimit(resource.RLIMIT_FSIZE, (200000, 200000))
+
+        result = self.run_script("open texts\nselect all\nanswer yes\nconvert UTF-8\n", before=limit)
+        self.assertEqual(result.returncode, 1)
+        self.assertRegex(result.stderr.decode(), r"script.txt:4: 0 files were converted; a.txt: \S")
+        self.assertEqual(self.contents(), before)
+
+    def test_a_full_device_is_told(self):
+        self.write("full", GERMAN, "cp1252")
+        (self.folder / "out").mkdir()
+        (self.folder / "out/full").symlink_to("/dev/full")
+        result = self.run_script("open texts\nselect all\nanswer yes\nconvert UTF-8 to out\n")
+        self.assertEqual(result.returncode, 1)
+        self.assertIn("0 files were converted; full: ", result.stderr.decode())
+
+    def test_cancel_in_the_middle(self):
+        for number in range(300):
+            self.write(f"{number:03}.txt", GERMAN, "cp1252")
+        before = self.contents()
+        # In the trial, in the conversion itself, while the folder is being looked at.
+        shown = self.run_done("open texts\nselect all\ncancel after 50\nconvert UTF-8\nprint status\n")
+        self.assertEqual(shown, "Cancelled: 0 files were converted, 300 files left as before\n")
+        self.assertEqual(self.contents(), before)
+        shown = self.run_done("open texts\nselect all\nanswer yes\ncancel after 400\nconvert UTF-8\nprint status\n")
+        self.assertEqual(shown, "Cancelled: 100 files were converted, 200 files left as before\n")
+        for name, content in self.contents().items():
+            self.assertEqual(content, GERMAN.encode("utf-8" if name < "texts/100" else "cp1252"), name)
+        shown = self.run_done("cancel after 20\nopen texts\nprint status\n")
+        self.assertEqual(shown, "Cancelled after 20 files\n")
+
+    # --- pictures, settings ---
+
+    def test_a_picture_is_saved(self):
+        self.write_three()
+        for arguments in (["texts", "--picture", "one.png"], ["--script", "script.txt"]):
+            (self.folder / "script.txt").write_text("size 600 400\nopen texts\npreview a.txt\npicture two.png\n")
+            subprocess.run([*WORKBENCH, *arguments], cwd=self.folder, check=True, timeout=LIMIT, capture_output=True)
+        for name, size in (("one.png", None), ("two.png", (600, 400))):
+            content = (self.folder / name).read_bytes()
+            self.assertEqual(content[:8], b"\x89PNG\r\n\x1a\n")
+            if size:
+                self.assertEqual(struct.unpack(">II", content[16:24]), size)
+
+    @unittest.skipIf(ON_WINE, "the registry is the user's")
+    def test_the_splitter_keeps_its_place(self):
+        self.run_done("split 222\n")
+        self.assertIn(" 222 ", self.run_done("print splitter\n"))
+
+    def test_wrong_scripts_are_refused_before_they_begin(self):
+        result = self.run_script("open texts\nfly away\n")
+        self.assertEqual(result.returncode, 2)
+        self.assertIn('script.txt: line 2: there is no command "fly"', result.stderr.decode())
+
+
+if __name__ == "__main__":
+    workbench, tool, *wrapper = sys.argv[1:]
+    wine.keep_running(wrapper)
+    WORKBENCH.extend(wrapper + [os.path.abspath(workbench)])
+    TOOL.extend(wrapper + [os.path.abspath(tool)])
+    unittest.main("__main__", argv=sys.argv[:1], verbosity=2)
