@@ -12,7 +12,7 @@ namespace platform {
 // The content of a resource; null data for none.
 struct ResourceBytes {
   const void* data = nullptr;  // stays the owner's
-  std::size_t size = 0;  // in bytes
+  std::size_t size = 0;        // in bytes
 };
 
 // Registers a resource of `module` (null: the program) under a type and a name; each is a text or a number

@@ -8,9 +8,9 @@ namespace platform::model {
 // A top-level window and what is below it share one surface.
 struct Target {
   HWND top = nullptr;
-  SIZE size{};      // of the surface
-  POINT origin{};   // of the client area, or of the whole window, on the surface
-  Region visible;   // on the surface
+  SIZE size{};               // of the surface
+  POINT origin{};            // of the client area, or of the whole window, on the surface
+  Region visible;            // on the surface
   void** surface = nullptr;  // the top-level window's slot; only its own thread uses it
 };
 
