@@ -2,16 +2,15 @@
 
 #include <utility>
 
+#include "qxcore/core/internal/quietly.h"
+
 namespace {
 SErrorReporter g_reporter = nullptr;
 }
 
 void g_RaiseError(const WCHAR* text) noexcept {
   if (g_reporter == nullptr) return;
-  try {
-    g_reporter(text != nullptr ? text : WTEXT(""));
-  } catch (...) {
-  }
+  SQuietly([text] { g_reporter(text != nullptr ? text : WTEXT("")); });
 }
 
 SErrorReporter g_SetErrorReporter(SErrorReporter reporter) noexcept { return std::exchange(g_reporter, reporter); }

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "qxcore/core/internal/quietly.h"
 #include "qxcore/core/memory.h"
 
 QXCORE_IMPLEMENT_CLASS(SOutputBufferStream, SOutputFilterStream, 0)
@@ -15,11 +16,7 @@ SOutputBufferStream::SOutputBufferStream(SOutputStream* out, unsigned long size,
 }
 
 SOutputBufferStream::~SOutputBufferStream() {
-  try {
-    FlushBuffer();
-  } catch (...) {
-    // A destructor cannot report failures; Flush and Close do.
-  }
+  SQuietly([this] { FlushBuffer(); });
   SMemFree(m_buffer);
 }
 

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstring>
 
+#include "qxcore/core/internal/quietly.h"
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/platform/win32.h"
 #include "qxcore/stream/output_file.h"
@@ -27,11 +28,9 @@ SOutputStream* SOutputFileOnChange::OpenTarget() {
 }
 
 SOutputFileOnChange::~SOutputFileOnChange() {
-  try {
+  SQuietly([this] {
     if (!m_hasFailed) Close(nullptr);
-  } catch (...) {
-    // A destructor cannot report failures; Close does.
-  }
+  });
   delete m_target;
 }
 

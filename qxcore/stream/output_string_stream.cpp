@@ -1,5 +1,6 @@
 #include "qxcore/stream/output_string_stream.h"
 
+#include "qxcore/core/internal/quietly.h"
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/core/module_state.h"
 #include "qxcore/platform/internal/utf.h"
@@ -24,11 +25,7 @@ Stream::SOutputStringStream(SOutputStream* out, Encoding format, bool owns)
 }
 
 Stream::~SOutputStringStream() {
-  try {
-    WriteWaiting();
-  } catch (...) {
-    // A destructor cannot report failures; Close does.
-  }
+  SQuietly([this] { WriteWaiting(); });
 }
 
 void Stream::Begin() {

@@ -2,6 +2,7 @@
 
 #include <memory>
 
+#include "qxcore/core/internal/quietly.h"
 #include "qxcore/graphics/rtf/document.h"
 #include "qxcore/graphics/rtf/internal/rich_edit.h"
 
@@ -29,11 +30,10 @@ int Convert(SRtfDocument& document, SRichEditCtrl*& edit, SString* result, const
 
 int SRtfDocument::CreateEditCtrl() {
   if (m_edit != nullptr) return 1;
-  try {
+  SQuietly([this] {
     auto edit = std::make_unique<SRichEditCtrl>();
     if (edit->Create() != 0) m_edit = edit.release();
-  } catch (...) {
-  }
+  });
   return m_edit != nullptr;
 }
 

@@ -1,6 +1,7 @@
 // Taking one entry out of an archive.
 
 #include "qxcore/core/exception.h"
+#include "qxcore/core/internal/quietly.h"
 #include "qxcore/stream/input_file.h"
 #include "qxcore/stream/output_file.h"
 #include "qxcore/stream/zip/internal/zip_format.h"
@@ -17,11 +18,7 @@ class NewFile {
   NewFile& operator=(const NewFile&) = delete;
   ~NewFile() {
     if (m_isFinished) return;
-    try {
-      m_file.Close();
-    } catch (...) {
-      // It is given up anyway.
-    }
+    SQuietly([this] { m_file.Close(); });
     TakeBack();
   }
 
@@ -40,11 +37,7 @@ class NewFile {
       return;
     }
     // Without the link nobody would find what it leads to.
-    try {
-      SOutputFile emptied(m_path);
-    } catch (...) {
-      // There is nothing to empty.
-    }
+    SQuietly([this] { SOutputFile emptied(m_path); });
   }
 
   SString m_path;

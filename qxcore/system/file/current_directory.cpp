@@ -1,13 +1,11 @@
 #include "qxcore/system/file/current_directory.h"
 
+#include "qxcore/core/internal/quietly.h"
 #include "qxcore/system/file/file.h"
 
+// Where memory is out, the directory stays where it is.
 SCurrentDirectory::~SCurrentDirectory() {
-  try {
-    Restore();
-  } catch (...) {
-    // Out of memory: it stays where it is.
-  }
+  SQuietly([this] { Restore(); });
 }
 
 SString SCurrentDirectory::Get() {
