@@ -4,6 +4,7 @@
 
 #include "qxcore/core/module_state.h"
 #include "qxcore/platform/internal/path_parts.h"
+#include "qxcore/system/file/internal/result.h"
 
 namespace {
 
@@ -12,9 +13,6 @@ constexpr DWORD kShareAll = FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELE
 
 // The platform counts in 32 bits.
 constexpr unsigned long kLargestPiece = 0x40000000;
-
-HRESULT Result(SFile::Status status) { return static_cast<HRESULT>(status); }
-HRESULT Result(bool succeeded, SFile::Status failure) { return Result(succeeded ? SFile::kOk : failure); }
 
 // A handle, or null.
 HANDLE OpenPlatformFile(const SString& name, DWORD access, DWORD share, DWORD disposition, DWORD attributes,

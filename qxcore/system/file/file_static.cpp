@@ -4,10 +4,9 @@
 
 #include "qxcore/platform/internal/path_parts.h"
 #include "qxcore/system/file/file.h"
+#include "qxcore/system/file/internal/result.h"
 
 namespace {
-
-HRESULT Result(bool succeeded, SFile::Status failure) { return static_cast<HRESULT>(succeeded ? SFile::kOk : failure); }
 
 DWORD AttributesOf(const SString& name) {
   return name.IsEmpty() ? INVALID_FILE_ATTRIBUTES : ::GetFileAttributesW(name);

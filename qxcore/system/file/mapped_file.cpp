@@ -4,12 +4,11 @@
 #include <limits>
 
 #include "qxcore/platform/internal/view.h"
+#include "qxcore/system/file/internal/result.h"
 
 namespace {
 
 constexpr HRESULT kNothingToDo = 1;
-
-HRESULT Result(SFile::Status status) { return static_cast<HRESULT>(status); }
 
 }  // namespace
 

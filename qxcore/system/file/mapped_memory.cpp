@@ -3,16 +3,7 @@
 #include <limits>
 
 #include "qxcore/system/file/file.h"
-
-namespace {
-
-HRESULT Result(bool succeeded, SFile::Status failure) { return static_cast<HRESULT>(succeeded ? SFile::kOk : failure); }
-
-std::uint64_t Join(unsigned long low, unsigned long high) {
-  return static_cast<std::uint64_t>(static_cast<DWORD>(high)) << 32 | static_cast<DWORD>(low);
-}
-
-}  // namespace
+#include "qxcore/system/file/internal/result.h"
 
 SMappedMemory::~SMappedMemory() { CloseMapping(); }
 

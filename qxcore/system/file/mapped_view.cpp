@@ -2,16 +2,11 @@
 
 #include "qxcore/platform/internal/view.h"
 #include "qxcore/system/file/file.h"
+#include "qxcore/system/file/internal/result.h"
 
 namespace {
 
 constexpr HRESULT kNothingToDo = 1;
-
-HRESULT Result(SFile::Status status) { return static_cast<HRESULT>(status); }
-
-std::uint64_t Join(unsigned long low, unsigned long high) {
-  return static_cast<std::uint64_t>(static_cast<DWORD>(high)) << 32 | static_cast<DWORD>(low);
-}
 
 }  // namespace
 
