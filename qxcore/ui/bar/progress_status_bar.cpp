@@ -182,15 +182,14 @@ void SProgressStatusBar::CancelButton::OnKeyDown(UINT key, UINT, UINT) {
 
 // --- how the button looks ---
 
-// The control paints some changes of its state at once.
+// The control paints some changes of its state at once; they are painted over.
 LRESULT SProgressStatusBar::CancelButton::WindowProc(UINT message, WPARAM wParam, LPARAM lParam) {
+  if (message == BM_GETSTATE || m_hWnd == nullptr) return SButton::WindowProc(message, wParam, lParam);
   const HWND window = m_hWnd;
-  const LRESULT state = window != nullptr ? ::SendMessageW(window, BM_GETSTATE, 0, 0) : 0;
+  const LRESULT state = ::SendMessageW(window, BM_GETSTATE, 0, 0);
   const LRESULT result = SButton::WindowProc(message, wParam, lParam);
-  if (message != BM_GETSTATE && m_hWnd == window && ::IsWindow(window) &&
-      ::SendMessageW(window, BM_GETSTATE, 0, 0) != state) {
-    Invalidate(0);
-  }
+  const bool lives = ::IsWindow(window) && FromHandlePermanent(window) == this;
+  if (lives && ::SendMessageW(window, BM_GETSTATE, 0, 0) != state) Invalidate(0);
   return result;
 }
 
