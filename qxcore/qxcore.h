@@ -115,6 +115,7 @@
 #include "qxcore/system/time/ole_date_time.h"
 #include "qxcore/system/time/time.h"
 #include "qxcore/system/time/time_span.h"
+#include "qxcore/ui/accessible/accessible.h"
 #include "qxcore/ui/app/application.h"
 #include "qxcore/ui/app/command_line.h"
 #include "qxcore/ui/app/error_report.h"

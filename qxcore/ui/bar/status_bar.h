@@ -19,9 +19,12 @@
 // For the user-interface thread.
 #pragma once
 
+#include <memory>
+
 #include "qxcore/ui/bar/ctrl_bar.h"
 #include "qxcore/ui/bar/status_bar_panes.h"
 
+class SAccessible;
 class SStatusBarLayout;
 struct SPaneSpace;
 
@@ -63,6 +66,9 @@ class QXCORE_API SStatusBar : public SCtrlBar {
   int GetPaneCount() const { return m_panes.GetCount(); }  // own panes
   // The place of a pane in client coordinates. Returns 1, or 0.
   int GetPaneRect(int index, SRect* rect) const;
+  // What a screen reader or a test learns of the panes, those of a shown layout included; the object must not outlive
+  // the window.
+  std::unique_ptr<SAccessible> MakeAccessible();
 
   // --- the layout that is spliced in ---
 
@@ -96,6 +102,7 @@ class QXCORE_API SStatusBar : public SCtrlBar {
   LRESULT OnSetMinHeight(WPARAM height, LPARAM);
   LRESULT OnDpiChanged(WPARAM wParam, LPARAM lParam);
   void OnSettingChange(UINT what, LPCWSTR area);
+  LRESULT OnGetObject(WPARAM wParam, LPARAM lParam);
 
   QXCORE_DECLARE_MESSAGE_MAP()
 
@@ -111,6 +118,7 @@ class QXCORE_API SStatusBar : public SCtrlBar {
 
  private:
   friend class SStatusBarLayout;
+  class Panes;  // the accessible object
   int ExtraCount() const;
   int GetControlRect(int controlIndex, SRect* rect) const;
   const SStatusBarPane* FindShown(int controlIndex) const;

@@ -9,15 +9,13 @@
 #include "qxcore/ui/bar/status_bar_layout.h"
 #include "qxcore/ui/window/message_entries.h"
 
-QXCORE_IMPLEMENT_MESSAGE_MAP(SStatusBar, SCtrlBar, on<WM_NCHITTEST, &SStatusBar::OnNcHitTest>(),
-                             on<WM_SIZE, &SStatusBar::OnSize>(), on<WM_PAINT, &SStatusBar::OnPaint>(),
-                             on<WM_NCCALCSIZE, &SStatusBar::OnNcCalcSize>(),
-                             reflected<WM_DRAWITEM, &SStatusBar::DrawItem>(), on<WM_SETTEXT, &SStatusBar::OnSetText>(),
-                             on<WM_GETTEXT, &SStatusBar::OnGetText>(),
-                             on<WM_GETTEXTLENGTH, &SStatusBar::OnGetTextLength>(),
-                             on<SB_SETMINHEIGHT, &SStatusBar::OnSetMinHeight>(),
-                             on<WM_DPICHANGED, &SStatusBar::OnDpiChanged>(),
-                             on<WM_SETTINGCHANGE, &SStatusBar::OnSettingChange>())
+QXCORE_IMPLEMENT_MESSAGE_MAP(
+    SStatusBar, SCtrlBar, on<WM_NCHITTEST, &SStatusBar::OnNcHitTest>(), on<WM_SIZE, &SStatusBar::OnSize>(),
+    on<WM_PAINT, &SStatusBar::OnPaint>(), on<WM_NCCALCSIZE, &SStatusBar::OnNcCalcSize>(),
+    reflected<WM_DRAWITEM, &SStatusBar::DrawItem>(), on<WM_SETTEXT, &SStatusBar::OnSetText>(),
+    on<WM_GETTEXT, &SStatusBar::OnGetText>(), on<WM_GETTEXTLENGTH, &SStatusBar::OnGetTextLength>(),
+    on<SB_SETMINHEIGHT, &SStatusBar::OnSetMinHeight>(), on<WM_DPICHANGED, &SStatusBar::OnDpiChanged>(),
+    on<WM_SETTINGCHANGE, &SStatusBar::OnSettingChange>(), on<WM_GETOBJECT, &SStatusBar::OnGetObject>())
 
 namespace {
 

@@ -21,11 +21,14 @@
 // owner's. For the user-interface thread.
 #pragma once
 
+#include <memory>
+
 #include "qxcore/container/table_dumb.h"
 #include "qxcore/ui/frame/create_context.h"
 #include "qxcore/ui/layout/pane_sizing.h"
 #include "qxcore/ui/window/window.h"
 
+class SAccessible;
 class SView;
 
 // The most rows, and the most columns.
@@ -155,6 +158,8 @@ class QXCORE_API SSplitterWnd : public SWnd {
   // Takes them back: a dynamic splitter makes and deletes rows and columns as needed. Returns 1; 0 and changes nothing
   // for a text that is invalid or belongs to another grid.
   int SetState(const SString& state);
+  // What a screen reader or a test learns of the bars; the object must not outlive the window.
+  std::unique_ptr<SAccessible> MakeAccessible();
 
   // The splitter itself, then, for identifiers from 0x8000 to 0xEFFF, its parent and the application.
   int OnCmdMsg(UINT id, int code, void* extra, S_CMDHANDLERINFO* info) override;
@@ -181,7 +186,7 @@ class QXCORE_API SSplitterWnd : public SWnd {
   virtual void StartTracking(int code);
   // Ends it; with `accept` the new place is taken.
   virtual void StopTracking(int accept);
-  // Gives a row the size that puts the bar below it where the tracker's top is, and lays out.
+  // Sizes a row so that the bar below it lies where the tracker's top is, and lays out.
   virtual void TrackRowSize(int y, int row);
   // The same for a column by the tracker's left.
   virtual void TrackColumnSize(int x, int column);
@@ -209,6 +214,7 @@ class QXCORE_API SSplitterWnd : public SWnd {
   void OnDisplayChange(UINT depth, int width, int height);
   void OnSysColorChange();
   LRESULT OnDpiChanged(WPARAM wParam, LPARAM lParam);
+  LRESULT OnGetObject(WPARAM wParam, LPARAM lParam);
 
   // --- the geometry, pixels of the window's DPI; a derived class may set it before the window is created ---
 
@@ -243,6 +249,7 @@ class QXCORE_API SSplitterWnd : public SWnd {
 
  private:
   friend class SPaneFocus;
+  class Bars;  // the accessible object
 
   // --- the half of the fields that belongs to one direction: rows, or columns ---
   STableDumb<SPaneInfo>& Table(bool rows) { return rows ? m_rows : m_columns; }

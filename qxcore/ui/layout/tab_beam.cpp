@@ -18,7 +18,8 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(
     on<WM_KEYDOWN, &STabBeam::OnKeyDown>(), on<WM_GETDLGCODE, &STabBeam::OnGetDlgCode>(),
     on<WM_SETFOCUS, &STabBeam::OnSetFocus>(), on<WM_KILLFOCUS, &STabBeam::OnKillFocus>(),
     on<WM_SETFONT, &STabBeam::OnSetFont>(), on<WM_SYSCOLORCHANGE, &STabBeam::OnSysColorChange>(),
-    on<WM_SETTINGCHANGE, &STabBeam::OnWinIniChange>(), on<0x02E0 /* WM_DPICHANGED */, &STabBeam::OnDpiChanged>())
+    on<WM_SETTINGCHANGE, &STabBeam::OnWinIniChange>(), on<0x02E0 /* WM_DPICHANGED */, &STabBeam::OnDpiChanged>(),
+    on<WM_GETOBJECT, &STabBeam::OnGetObject>())
 
 STabBeam::STabBeam() = default;
 

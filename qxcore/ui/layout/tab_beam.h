@@ -9,11 +9,15 @@
 // and the buttons. For the user-interface thread.
 #pragma once
 
+#include <memory>
+
 #include "qxcore/container/table_dumb.h"
 #include "qxcore/graphics/dc.h"
 #include "qxcore/graphics/font.h"
 #include "qxcore/ui/layout/tab_strip.h"
 #include "qxcore/ui/window/window.h"
+
+class SAccessible;
 
 // Codes of the notifications.
 inline constexpr int kSTabChanging = 0x0501;  // a nonzero result keeps the former tab
@@ -46,7 +50,7 @@ class QXCORE_API STabBeam : public SWnd {
   virtual int DeleteTab(int index);
   // The tab of a window; -1 for none.
   virtual int FindTab(const SWnd* window);
-  // Gives a tab the width of its text and the spacing.
+  // Sets the width of a tab to that of its text and the spacing.
   virtual void AdjustTabSize(int index);
 
   using SWnd::Create;
@@ -89,6 +93,8 @@ class QXCORE_API STabBeam : public SWnd {
   HFONT GetTextFont() const { return m_font; }
   // Chooses a tab as the user does, with notifications. Returns 0 when it is invalid, current, or was refused.
   int ChooseTab(int index);
+  // What a screen reader or a test learns of the tabs; the object must not outlive the window.
+  std::unique_ptr<SAccessible> MakeAccessible();
 
   int PreCreateWindow(CREATESTRUCTW* create) override;
 
@@ -130,6 +136,7 @@ class QXCORE_API STabBeam : public SWnd {
   void OnSysColorChange();
   void OnWinIniChange(UINT what, LPCWSTR area);
   LRESULT OnDpiChanged(WPARAM wParam, LPARAM lParam);
+  LRESULT OnGetObject(WPARAM wParam, LPARAM lParam);
 
   STableDumb<STab*> m_tabs;  // owned
   int m_count = 0;
