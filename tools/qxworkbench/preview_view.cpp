@@ -49,8 +49,9 @@ bool PreviewView::Step() {
   const bool goesOn = m_text.Step();
   const bool fillsWindow = m_rowsShown <= FirstRow() + PageRows();
   m_rowsShown = m_text.LineCount();
-  RowsChanged();
   if (fillsWindow || !goesOn) Invalidate(0);
+  if (!goesOn) UpdateWindow();  // how wide the lines are shows when they are drawn
+  RowsChanged();
   return goesOn;
 }
 
@@ -99,8 +100,8 @@ void PreviewView::DrawRow(SDC* dc, int row, const SRect& rect) {
   const int width = dc->GetTextExtent(text).cx;
   if (width <= m_widest) return;
   m_widest = width;
-  PostMessageW(WM_NULL);  // idle work follows, which sets the scroll bar
   m_rowsShown = -1;
+  PostMessageW(WM_NULL);  // idle work follows, which sets the scroll bar
 }
 
 // The scroll bars are the tab window's: idle work gives them this view's numbers when it is the one they serve.
