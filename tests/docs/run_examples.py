@@ -105,14 +105,16 @@ def main():
 
     lines = pathlib.Path(options.guide).read_text(encoding="utf-8").split("\n")
     wine.keep_running(options.wrapper)
-    command_line = shlex.join([*options.wrapper, os.path.abspath(options.tool)])
     with tempfile.TemporaryDirectory() as folder:
         work = pathlib.Path(folder) / "work"
         shutil.copytree(options.samples, work)
         commands = pathlib.Path(folder) / "bin"
         commands.mkdir()
-        (commands / "qxtool").write_text(f'#!/bin/sh\nexec {command_line} "$@"\n')
-        (commands / "qxtool").chmod(0o755)
+        for name in ("qxtool", "qxworkbench"):  # which stand in one folder
+            program = pathlib.Path(os.path.abspath(options.tool))
+            command_line = shlex.join([*options.wrapper, str(program.with_name(program.name.replace("qxtool", name)))])
+            (commands / name).write_text(f'#!/bin/sh\nexec {command_line} "$@"\n')
+            (commands / name).chmod(0o755)
         # A zone, a locale and a registry of the examples' own.
         environment = dict(os.environ, PATH=f"{commands}:{os.environ['PATH']}", TZ="UTC", LC_ALL="C.UTF-8",
                            QXCORE_REGISTRY=str(pathlib.Path(folder) / "registry.db"))

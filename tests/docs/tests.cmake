@@ -2,7 +2,7 @@
 # in one program.
 set(guides README.md docs/strings.md docs/writing-text.md docs/text-encodings.md docs/containers.md docs/binary-format.md docs/notifications.md
   docs/files-and-finders.md docs/time.md docs/settings.md docs/archives.md docs/mapped-files.md docs/drawing.md
-  docs/windows.md docs/unattended.md docs/rtf.md docs/status-bars.md docs/splitters-and-tabs.md)
+  docs/windows.md docs/unattended.md docs/rtf.md docs/status-bars.md docs/splitters-and-tabs.md docs/workbench.md)
 find_package(Python3 REQUIRED COMPONENTS Interpreter)
 if(TARGET qxtool)
   foreach(guide ${guides})
