@@ -221,7 +221,7 @@ Run STextDecoder::DecodeWhole(const unsigned char* in, const unsigned char* end,
       *written++ = out[i];
     } else if (m_isLossless) {
       m_isLossIllegal = true;
-      return {LocateInWhole(in, end, static_cast<std::size_t>(i)), written, true};
+      return {DecodeClean(in, end, out, i), written, true};
     } else if (m_replacement != 0) {
       *written++ = m_replacement;
       ++m_losses.replaced;
@@ -232,22 +232,43 @@ Run STextDecoder::DecodeWhole(const unsigned char* in, const unsigned char* end,
   return {end, written};
 }
 
-// The shortest beginning of the bytes that has so many characters: its length is found by halving.
-const unsigned char* STextDecoder::LocateInWhole(const unsigned char* in, const unsigned char* end,
-                                                 std::size_t count) const {
-  const auto characters = [&](std::ptrdiff_t bytes) {
-    return static_cast<std::size_t>(MultiByteToWideChar(
-        Support::CodePageOf(m_encoding), 0, reinterpret_cast<const char*>(in), static_cast<int>(bytes), nullptr, 0));
-  };
+// How many characters the first bytes of a text have by the platform's conversion.
+std::size_t STextDecoder::CharactersIn(const unsigned char* in, std::ptrdiff_t bytes) const {
+  return static_cast<std::size_t>(MultiByteToWideChar(
+      Support::CodePageOf(m_encoding), 0, reinterpret_cast<const char*>(in), static_cast<int>(bytes), nullptr, 0));
+}
+
+// The end of the shortest beginning of the bytes that has so many characters: its length is found by halving.
+const unsigned char* STextDecoder::ShortestOf(const unsigned char* in, const unsigned char* end,
+                                              std::size_t count) const {
   std::ptrdiff_t less = 0, enough = end - in;
   if (count == 0) return in;
   while (enough - less > 1) {
     const std::ptrdiff_t middle = less + (enough - less) / 2;
-    (characters(middle) < count ? less : enough) = middle;
+    (CharactersIn(in, middle) < count ? less : enough) = middle;
   }
-  // A character that is cut may count as one already: its other bytes add none.
-  while (enough < end - in && characters(enough + 1) == characters(enough)) ++enough;
   return in + enough;
+}
+
+// Decodes the first `count` characters, which can all be mapped, once more; returns the end of their bytes.
+const unsigned char* STextDecoder::DecodeClean(const unsigned char* in, const unsigned char* end, WCHAR* out,
+                                               int count) const {
+  const unsigned char* at = ShortestOf(in, end, static_cast<std::size_t>(count));
+  for (; at != end && count > 0; ++at) {  // cut, the last of them would not be itself
+    const int length = MultiByteToWideChar(Support::CodePageOf(m_encoding), 0, reinterpret_cast<const char*>(in),
+                                           static_cast<int>(at - in), out, static_cast<int>(end - in));
+    if (length == count && std::find(out, out + count, platform::kReplacementCharacter) == out + count) break;
+  }
+  return at;
+}
+
+const unsigned char* STextDecoder::LocateInWhole(const unsigned char* in, const unsigned char* end,
+                                                 std::size_t count) const {
+  const unsigned char* found = ShortestOf(in, end, count);
+  if (count == 0) return found;
+  // A character that is cut may count as one already: its other bytes add none.
+  while (found != end && CharactersIn(in, found + 1 - in) == CharactersIn(in, found - in)) ++found;
+  return found;
 }
 
 void STextDecoder::ThrowLoss() const {

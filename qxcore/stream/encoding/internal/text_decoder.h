@@ -77,6 +77,9 @@ class STextDecoder {
   Run RunKernel(const unsigned char* in, const unsigned char* end, WCHAR* out) const;
   Obstacle Look(const unsigned char* in, const unsigned char* end, bool isLast) const;
   Run DecodeWhole(const unsigned char* in, const unsigned char* end, WCHAR* out);
+  std::size_t CharactersIn(const unsigned char* in, std::ptrdiff_t bytes) const;
+  const unsigned char* ShortestOf(const unsigned char* in, const unsigned char* end, std::size_t count) const;
+  const unsigned char* DecodeClean(const unsigned char* in, const unsigned char* end, WCHAR* out, int count) const;
   const unsigned char* LocateInWhole(const unsigned char* in, const unsigned char* end, std::size_t count) const;
 
   Encoding m_encoding = 0;

@@ -1,6 +1,7 @@
 #include "qxcore/stream/encoding/internal/text_encoder.h"
 
 #include <algorithm>
+#include <bit>
 #include <cstring>
 
 #include "qxcore/core/io_exceptions.h"
@@ -11,7 +12,7 @@ using Support = SAbstractIO::SMultiFormatSupport;
 namespace {
 
 constexpr std::size_t kPiece = 1024;
-constexpr std::size_t kBytesPerUnit = 8;  // the escapes of stateful code pages included
+constexpr std::size_t kBytesPerUnit = 12;  // two, behind and before the longest escapes of a page that keeps a state
 constexpr std::size_t kUnmappable = static_cast<std::size_t>(-1);
 
 // Units that the first character takes: a whole surrogate pair is one.
@@ -42,6 +43,7 @@ std::size_t EncodeUtf8(const WCHAR* text, std::size_t count, char* bytes) {
 }
 
 std::size_t EncodeUtf16(const WCHAR* text, std::size_t count, bool isBigEndian, char* bytes) {
+  static_assert(std::endian::native == std::endian::little);
   std::memcpy(bytes, text, count * sizeof(WCHAR));
   if (isBigEndian) {
     for (std::size_t i = 0; i < count; ++i) std::swap(bytes[2 * i], bytes[2 * i + 1]);
@@ -84,7 +86,15 @@ std::size_t STextEncoder::EncodePiece(const WCHAR* text, std::size_t count, char
   }
 }
 
+bool STextEncoder::IsAsInMemory() const {
+  return Support::IsUnicode(m_encoding) && (m_encoding & (Support::kUtf8Form | Support::kBigEndian)) == 0;
+}
+
 void STextEncoder::Write(const WCHAR* text, std::size_t count, SOutputStream& out) {
+  if (count > 0 && IsAsInMemory()) {
+    out.Write(text, static_cast<unsigned long>(count * sizeof(WCHAR)));
+    return;
+  }
   char bytes[kPiece * kBytesPerUnit];
   while (count > 0) {
     std::size_t piece = std::min(count, kPiece);

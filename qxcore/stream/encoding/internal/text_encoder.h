@@ -34,6 +34,8 @@ class STextEncoder {
   std::uint64_t GetDropped() const { return m_dropped; }
 
  private:
+  // Whether the bytes of the target are those of the text.
+  bool IsAsInMemory() const;
   // Encodes one piece, at most kPiece characters, that ends at a character's end.
   std::size_t EncodePiece(const WCHAR* text, std::size_t count, char* bytes) const;
   void WriteCarefully(const WCHAR* text, std::size_t count, SOutputStream& out);
