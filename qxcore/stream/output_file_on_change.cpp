@@ -3,8 +3,10 @@
 #include <algorithm>
 #include <cstring>
 
+#include "qxcore/core/error_cause.h"
 #include "qxcore/core/internal/quietly.h"
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/platform/internal/error_number.h"
 #include "qxcore/platform/win32.h"
 #include "qxcore/stream/output_file.h"
 #include "qxcore/stream/output_global.h"
@@ -15,6 +17,12 @@ QXCORE_IMPLEMENT_CLASS(SOutputFileOnChange, SOutputStream, 0)
 namespace {
 
 constexpr HRESULT kSucceeded = SFile::kOk;
+
+// The exception for what the system refused just now, with its reason.
+template <class Exception>
+[[noreturn]] void ThrowLastError() {
+  throw SEWithError<Exception>(platform::ErrnoOf(::GetLastError()));
+}
 
 }  // namespace
 
@@ -88,9 +96,9 @@ bool SOutputFileOnChange::HasChanged() const {
 
 void SOutputFileOnChange::Replace() const {
   SFile file(m_path);
-  if (file.Create() != kSucceeded) throw SEIOCantOpenForWriting();
+  if (file.Create() != kSucceeded) ThrowLastError<SEIOCantOpenForWriting>();
   unsigned long count = m_content->UsedSize();
-  if (count != 0 && file.Write(m_content->GetData(), count) != kSucceeded) throw SEIOWriteFailed();
-  if (file.SetEndOfFile() != kSucceeded) throw SEIOCouldNotTrunc();
-  if (file.Close() != kSucceeded) throw SEIOWriteFailed();
+  if (count != 0 && file.Write(m_content->GetData(), count) != kSucceeded) ThrowLastError<SEIOWriteFailed>();
+  if (file.SetEndOfFile() != kSucceeded) ThrowLastError<SEIOCouldNotTrunc>();
+  if (file.Close() != kSucceeded) ThrowLastError<SEIOWriteFailed>();
 }

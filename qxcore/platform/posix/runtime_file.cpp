@@ -5,27 +5,12 @@
 #include <cerrno>
 #include <string>
 
+#include "qxcore/platform/internal/error_number.h"
 #include "qxcore/platform/posix/path.h"
 #include "qxcore/platform/wide.h"
 
 namespace platform {
 namespace {
-
-int ErrnoFromError(DWORD error) {
-  switch (error) {
-    case ERROR_FILE_NOT_FOUND:
-    case ERROR_PATH_NOT_FOUND:
-    case ERROR_INVALID_NAME:
-    case ERROR_BAD_NETPATH:
-      return ENOENT;
-    case ERROR_ACCESS_DENIED:
-      return EACCES;
-    case ERROR_NOT_ENOUGH_MEMORY:
-      return ENOMEM;
-    default:
-      return EINVAL;
-  }
-}
 
 // The mode as the C library takes it: text and binary are one, inherited handles are asked for with "N" left out.
 std::string ConvertMode(const WCHAR* mode) {
@@ -38,7 +23,7 @@ std::string ConvertMode(const WCHAR* mode) {
 // The file, or null and why.
 std::FILE* Open(const WCHAR* path, const WCHAR* mode, int& why) {
   const Resolved entry = ResolvePath(path);
-  why = ErrnoFromError(entry.error);
+  why = ErrnoOf(entry.error);
   if (entry.error != ERROR_SUCCESS) return nullptr;
   const std::string how = ConvertMode(mode);
   struct stat info;
