@@ -9,6 +9,7 @@ import json
 import os
 import pathlib
 import re
+import resource
 import shlex
 import shutil
 import signal
@@ -410,6 +411,33 @@ class ToolTest(ToolCase):
         self.assert_one_line(self.run_tool("convert", "in.txt", "folder"), 1, "folder: Cannot open for writing")
         self.assert_one_line(self.run_tool("convert", "in.txt", "nowhere/out.txt"), 1, "nowhere/out.txt: Cannot open for writing")
         self.assertEqual(self.names(), ["folder", "in.txt"])
+
+    def run_in_little_memory(self, *arguments, **keywords):
+        """With a gigabyte for all that the process maps; under Wine the 32 bits are bound enough."""
+        def bound():
+            resource.setrlimit(resource.RLIMIT_AS, (1 << 30, 1 << 30))
+        return subprocess.Popen([*TOOL, *arguments], cwd=self.folder, preexec_fn=None if ON_WINE else bound, **keywords)
+
+    def test_sizes_beyond_two_and_four_gigabytes(self):
+        tail = "café été\n".encode()
+        for size in ((2 << 30) - 7, (4 << 30) + 5):
+            with open(self.folder / "sparse.txt", "wb") as file:
+                file.write(b"begins as text\n")
+                file.seek(size)
+                file.write(tail)
+            with self.run_in_little_memory("detect", "--json", "sparse.txt", stdout=subprocess.PIPE) as tool:
+                entry = json.loads(tool.communicate()[0])["files"][0]
+            self.assertEqual((tool.returncode, entry["bytes"], entry["error"]), (0, size + len(tail), None))
+            self.assertNotEqual(entry["encoding"], "ASCII", size)  # the accents at the end are seen
+            if size > 4 << 30:
+                break  # reading all of it once is enough
+            words = ("convert", "--from", "UTF-8", "--to", "ASCII", "--replacement", "?", "--quiet", "sparse.txt", "-")
+            with self.run_in_little_memory(*words, stdout=subprocess.PIPE) as tool:
+                count, end = 0, b""
+                while piece := tool.stdout.read(1 << 20):
+                    count += len(piece)
+                    end = (end + piece)[-20:]
+            self.assertEqual((tool.returncode, count, end), (3, size + 9, bytes(11) + b"caf? ?t?\n"))
 
     def test_missing_code_page_is_told(self):
         self.write("in.txt", "äöü")

@@ -59,6 +59,14 @@ void OnSignal(int number) {
 
 #endif
 
+// The runtime's own buffers are as small as a block of the disk. One file at a time is written beside standard output.
+std::FILE* WithLargeBuffer(std::FILE* file) {
+  constexpr std::size_t kSize = 1 << 16;
+  static char buffers[2][kSize];
+  if (file != nullptr) std::setvbuf(file, buffers[file == stdout], _IOFBF, kSize);
+  return file;
+}
+
 }  // namespace
 
 bool Interrupted() { return g_signal != 0; }
@@ -73,6 +81,7 @@ void SetUpStreams() {
   _setmode(_fileno(stdin), _O_BINARY);
   _setmode(_fileno(stdout), _O_BINARY);
   _setmode(_fileno(stderr), _O_BINARY);
+  if (!IsTerminal(stdout)) WithLargeBuffer(stdout);
   if (IsTerminal(stdout) || IsTerminal(stderr)) {
     g_outputCodePage = GetConsoleOutputCP();
     if (g_outputCodePage && SetConsoleOutputCP(CP_UTF8)) std::atexit(RestoreConsole);
@@ -103,18 +112,21 @@ bool IsTerminal(std::FILE* stream) { return _isatty(_fileno(stream)) != 0; }
 // The runtime has no number of its own for a pipe that is being closed and says EINVAL.
 bool IsBrokenPipe(int error) { return error == EPIPE || error == EINVAL; }
 
-std::FILE* OpenForWriting(const std::filesystem::path& path) { return _wfopen(path.c_str(), L"wb"); }
+std::FILE* OpenForWriting(const std::filesystem::path& path) { return WithLargeBuffer(_wfopen(path.c_str(), L"wb")); }
 
 std::FILE* OpenNew(const std::filesystem::path& path, bool) {
   const int file = _wopen(path.c_str(), _O_WRONLY | _O_CREAT | _O_EXCL | _O_BINARY, _S_IREAD | _S_IWRITE);
-  return file < 0 ? nullptr : _fdopen(file, "wb");
+  return file < 0 ? nullptr : WithLargeBuffer(_fdopen(file, "wb"));
 }
 
 bool Synchronise(std::FILE* file) { return std::fflush(file) == 0 && _commit(_fileno(file)) == 0; }
 
 #else
 
-void SetUpStreams() { std::signal(SIGPIPE, SIG_IGN); }
+void SetUpStreams() {
+  std::signal(SIGPIPE, SIG_IGN);
+  if (!IsTerminal(stdout)) WithLargeBuffer(stdout);
+}
 
 void SetUp() {
   SetUpStreams();
@@ -134,11 +146,11 @@ bool IsTerminal(std::FILE* stream) { return isatty(fileno(stream)) != 0; }
 
 bool IsBrokenPipe(int error) { return error == EPIPE; }
 
-std::FILE* OpenForWriting(const std::filesystem::path& path) { return std::fopen(path.c_str(), "wb"); }
+std::FILE* OpenForWriting(const std::filesystem::path& path) { return WithLargeBuffer(std::fopen(path.c_str(), "wb")); }
 
 std::FILE* OpenNew(const std::filesystem::path& path, bool isPrivate) {
   const int file = open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, isPrivate ? 0600 : 0666);
-  return file < 0 ? nullptr : fdopen(file, "wb");
+  return file < 0 ? nullptr : WithLargeBuffer(fdopen(file, "wb"));
 }
 
 bool Synchronise(std::FILE* file) {

@@ -26,6 +26,18 @@ unsigned long CountingInput::Read(void* buffer, unsigned long count) {
   return got;
 }
 
+bool CountingInput::GetPlace(std::uint64_t* place) {
+  *place = m_count;
+  std::uint64_t inner;
+  return m_inner.GetPlace(&inner) && inner == m_count;
+}
+
+bool CountingInput::GoToPlace(std::uint64_t place) {
+  if (!m_inner.GoToPlace(place)) return false;
+  m_count = place;
+  return true;
+}
+
 bool CountingInput::StartsWith(std::string_view bytes) const {
   return m_count >= bytes.size() && std::memcmp(m_first, bytes.data(), bytes.size()) == 0;
 }

@@ -1,6 +1,7 @@
 // A file or standard input as text: the byte stream, the reader on it, and the progress bar.
 #pragma once
 
+#include <cstdint>
 #include <memory>
 #include <string>
 
@@ -20,6 +21,9 @@ class CountingInput : public SInputStream {
   int IsEOF() override { return m_inner.IsEOF(); }
   unsigned long Available() override { return m_inner.Available(); }
   int GetError() const override { return m_inner.GetError(); }
+  // A detection that looks at all of a file goes back; what it looked at counts once.
+  bool GetPlace(std::uint64_t* place) override;
+  bool GoToPlace(std::uint64_t place) override;
 
   unsigned long long Count() const { return m_count; }
   // Whether the input starts with these bytes, at most three.

@@ -1,5 +1,8 @@
 // qxtool sort: the lines of a text file in order, in UTF-8.
 
+#include <algorithm>
+#include <string>
+
 #include "qxcore/container/string_table.h"
 #include "qxcore/core/io_exceptions.h"
 #include "tools/common/console.h"
@@ -16,32 +19,56 @@ namespace {
 class Lines {
  public:
   void Add(SStringView text) {
-    for (const WCHAR c : text) {
-      const bool endsPair = c == '\n' && m_last == '\r';
-      m_last = c;
-      if (endsPair) continue;
-      if (c == '\n' || c == '\r') {
-        End();
-      } else {
-        m_line += c;
+    while (!text.empty()) {
+      if (m_endsWithCr && text.front() == '\n') {  // its line has ended
+        m_endsWithCr = false;
+        text.remove_prefix(1);
+        continue;
       }
+      const auto end = std::find_if(text.begin(), text.end(), [](WCHAR c) { return c == '\n' || c == '\r'; });
+      const auto length = static_cast<std::size_t>(end - text.begin());
+      m_endsWithCr = end != text.end() && *end == '\r';
+      if (end == text.end()) {
+        m_line += text;
+        return;
+      }
+      End(text.substr(0, length));
+      text.remove_prefix(length + 1);
     }
   }
   SStringTable& Finish() {
-    if (!m_line.empty()) End();
+    if (!m_line.empty()) End({});
     return m_lines;
   }
 
  private:
-  void End() {
-    m_lines.Add(SString(SStringView(m_line)));
-    m_line.clear();
+  void End(SStringView rest) {
+    if (m_line.empty()) {
+      m_lines.Add(SString(rest));
+    } else {
+      m_lines.Add(SString(SStringView(m_line += rest)));
+      m_line.clear();
+    }
   }
 
   SStringTable m_lines;
-  std::basic_string<WCHAR> m_line;
-  WCHAR m_last = 0;
+  std::basic_string<WCHAR> m_line;  // begun in the piece before
+  bool m_endsWithCr = false;
 };
+
+// In pieces, for a conversion has its price.
+void PrintLines(const SStringTable& lines) {
+  constexpr std::size_t kPiece = 16384;
+  std::basic_string<WCHAR> piece;
+  for (const SString& line : lines) {
+    piece += line.View();
+    piece += WTEXT('\n');
+    if (piece.size() < kPiece) continue;
+    Print(ToUtf8(SStringView(piece)));
+    piece.clear();
+  }
+  Print(ToUtf8(SStringView(piece)));
+}
 
 void ReadLines(const SortOptions& options, Lines& lines, SString& warning) {
   const Encoding from = options.from.empty() ? Encodings::kANSI | Encodings::kFullDetect | Encodings::kFavorGuess
@@ -82,7 +109,7 @@ int Sort(const SortOptions& options) {
   }
   SStringTable& table = lines.Finish();
   SortLines(options, table);
-  for (const SString& line : table) Print(ToUtf8(line) + "\n");
+  PrintLines(table);
   FlushPrinted();
   if (!warning.IsEmpty()) Complain(options.file + ": " + ToUtf8(warning));
   return kDone;
