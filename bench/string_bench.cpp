@@ -1,5 +1,6 @@
 // Strings, string buffers and MD5, beside std::u16string, QString and OpenSSL.
 
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -9,6 +10,7 @@
 #include "qxcore/string/string_buffer.h"
 #if BENCH_PEERS
 #include <openssl/evp.h>
+#include <unicode/ucnv.h>
 
 #include <QString>
 #endif
@@ -28,6 +30,14 @@ StdText Haystack(const WCHAR* word) {
   return text + word;
 }
 
+StdText LatinText() {
+  StdText text;
+  while (text.size() < 1'600'000)
+    text += WTEXT("Gr\u00F6\u00DFe und \u00C4pfel f\u00FCr jeden, plain text in between; ");
+  text.resize(1'600'000);
+  return text;
+}
+
 const std::vector<unsigned char>& Bytes64MB() {
   static const std::vector<unsigned char> bytes = [] {
     std::vector<unsigned char> made(64 << 20);
@@ -42,6 +52,15 @@ BENCH("copy and drop a shared string/ours") {
   SString text(kForty);
   for (auto _ : state) {
     SString copy(text);
+    benchmark::DoNotOptimize(copy);
+  }
+}
+
+// The peer that is there on both targets.
+BENCH("copy and drop a shared string/std::shared_ptr") {
+  auto text = std::make_shared<StdText>(kForty);
+  for (auto _ : state) {
+    auto copy = text;
     benchmark::DoNotOptimize(copy);
   }
 }
@@ -70,6 +89,21 @@ BENCH("find a word at the end of 1 MB/ours") {
 BENCH("find a word at the end of 1 MB, without case/ours") {
   SString text = SStringView(Haystack(WTEXT("toMorrow")));
   for (auto _ : state) benchmark::DoNotOptimize(text.FindNoCase(WTEXT("Tomorrow")));
+}
+
+// Its first and its last letter have more than two forms, or lie outside of ASCII.
+BENCH("find a word with k, i and an accent, without case/ours") {
+  SString text = SStringView(Haystack(WTEXT("k\u00E9pi")));
+  for (auto _ : state) benchmark::DoNotOptimize(text.FindNoCase(WTEXT("K\u00C9PI")));
+}
+
+BENCH("CharToOem of 1.6 million characters/ours") {
+  const SString text = SStringView(LatinText());
+  for (auto _ : state) {
+    SString converted = text;
+    converted.CharToOemW();
+    benchmark::DoNotOptimize(converted.Length());
+  }
 }
 
 BENCH("a million appends of 8 characters/ours") {
@@ -135,6 +169,26 @@ BENCH("find a word at the end of 1 MB, without case/QString") {
   QString text(AsQt(Haystack(WTEXT("toMorrow")).c_str()));
   QString word(AsQt(WTEXT("Tomorrow")));
   for (auto _ : state) benchmark::DoNotOptimize(text.indexOf(word, 0, Qt::CaseInsensitive));
+}
+
+BENCH("find a word with k, i and an accent, without case/QString") {
+  QString text(AsQt(Haystack(WTEXT("k\u00E9pi")).c_str()));
+  QString word(AsQt(WTEXT("K\u00C9PI")));
+  for (auto _ : state) benchmark::DoNotOptimize(text.indexOf(word, 0, Qt::CaseInsensitive));
+}
+
+BENCH("CharToOem of 1.6 million characters/ICU") {
+  const StdText text = LatinText();
+  UErrorCode error = U_ZERO_ERROR;
+  UConverter* converter = ucnv_open("ibm-437", &error);
+  std::vector<char> bytes(2 * text.size());
+  for (auto _ : state) {
+    ucnv_fromUChars(converter, bytes.data(), static_cast<std::int32_t>(bytes.size()), text.data(),
+                    static_cast<std::int32_t>(text.size()), &error);
+    benchmark::DoNotOptimize(bytes[0]);
+  }
+  if (U_FAILURE(error)) state.SkipWithError(u_errorName(error));
+  ucnv_close(converter);
 }
 
 BENCH("a million appends of 8 characters/std::u16string") {
