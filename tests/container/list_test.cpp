@@ -237,4 +237,90 @@ TEST(XDList, OperationsRelativeToAnItem) {
   EXPECT_EQ(Item::living, 0);
 }
 
+// All of them in any order, with and without a neighbour; what was detached is the caller's.
+TEST(XDList, RandomChanges_AreThoseOfAVector) {
+  std::mt19937 random(9);
+  SXDList list;
+  std::vector<int> peer;
+  for (int step = 0; step < 20000; ++step) {
+    const int count = static_cast<int>(peer.size());
+    const int at = count != 0 ? static_cast<int>(random() % peer.size()) : 0;
+    SDListItem* const reference = list.GetAt(at);
+    SDListItem* detached = nullptr;
+    int gone = -1;  // the index that leaves the list
+    const auto add = [&](int index) { peer.insert(peer.begin() + index, step); };
+    switch (random() % (count > 40 ? 14u : 11u)) {
+      case 0:
+        list.AddAt(new Item(step), at);
+        add(at);
+        break;
+      case 1:
+        list.AddAtHead(new Item(step));
+        add(0);
+        break;
+      case 2:
+        if (reference == nullptr) break;
+        list.AddBefore(reference, new Item(step));
+        add(at);
+        break;
+      case 3:
+        if (reference == nullptr) break;
+        list.AddAfter(reference, new Item(step));
+        add(at + 1);
+        break;
+      case 4:
+        list.DeleteBefore(reference);
+        gone = at - 1;
+        break;
+      case 5:
+        list.DeleteAfter(reference);
+        gone = at + 1;
+        break;
+      case 6:
+        detached = list.DetachBefore(reference);
+        gone = at - 1;
+        break;
+      case 7:
+        detached = list.DetachAfter(reference);
+        gone = at + 1;
+        break;
+      case 8:
+        detached = list.Detach(reference);
+        gone = at;
+        break;
+      case 9:
+        EXPECT_EQ(list.DetachAt(-1), nullptr);
+        EXPECT_EQ(list.DetachAt(count), nullptr);
+        detached = list.DetachAt(at);
+        gone = at;
+        break;
+      case 10:
+        list.AddAtTail(new Item(step));
+        add(count);
+        break;
+      case 11:
+        list.DeleteAt(at);
+        gone = at;
+        break;
+      case 12:
+        list.DeleteAtHead();
+        gone = 0;
+        break;
+      case 13:
+        detached = list.DetachAtTail();
+        gone = count - 1;
+    }
+    const bool isGone = gone >= 0 && gone < count;
+    if (detached != nullptr) {
+      ASSERT_TRUE(isGone);
+      ASSERT_EQ(ValueOf(detached), peer[static_cast<std::size_t>(gone)]);
+      ASSERT_TRUE(detached->GetNext() == nullptr && detached->GetPrevious() == nullptr);
+      delete detached;
+    }
+    if (isGone) peer.erase(peer.begin() + gone);
+    ASSERT_EQ(Values(list), peer) << "step " << step;
+    ASSERT_EQ(Item::living, static_cast<int>(peer.size()));
+  }
+}
+
 }  // namespace

@@ -49,7 +49,9 @@ TEST(StringTable, RandomChanges_AreThoseOfAVector) {
     const int count = table.GetCount();
     const WideString text = random.Make(6, WTEXT("abc"));
     const int at = random.Number(count + 1), from = count != 0 ? random.Number(count) : 0;
-    switch (random.Number(count > 60 ? 11 : 9)) {
+    const SStringTable holder = table;
+    const Texts held = peer;
+    switch (random.Number(count > 60 ? 12 : 10)) {
       case 0:
       case 1:
         ASSERT_EQ(table.Add(SStringView(text)), count);
@@ -89,14 +91,21 @@ TEST(StringTable, RandomChanges_AreThoseOfAVector) {
         std::reverse(peer.begin(), peer.end());
         break;
       case 9:
+        if (count == 0) break;
+        table.Reserve(count + from);
+        table.GetAt(from) += WTEXT('!');
+        peer[static_cast<std::size_t>(from)] += WTEXT('!');
+        break;
+      case 10:
         table += table;
         for (int i = 0; i < count; ++i) peer.push_back(WideString(peer[static_cast<std::size_t>(i)]));
         break;
-      case 10:
+      case 11:
         table = table[from];
         peer = {WideString(peer[static_cast<std::size_t>(from)])};
     }
     ASSERT_EQ(TextsOf(table), peer) << "step " << step;
+    ASSERT_EQ(TextsOf(holder), held) << "a copy must not change, step " << step;
   }
 }
 

@@ -104,6 +104,26 @@ TEST(FixedAlloc, RandomUse_GivesDistinctElementsAndReturnsEverything) {
   }
 }
 
+TEST(FixedAlloc, FreeAll_ForgetsTheFreeElementsToo) {
+  SFixedAlloc alloc(32, 4, WTEXT("all"), nullptr);
+  for (int round = 0; round < 3; ++round) {
+    auto elements = AllocMany(alloc, 9);
+    alloc.Free(elements[8]);
+    alloc.Free(elements[2]);
+    EXPECT_EQ(alloc.FreeAll(), 3);
+    EXPECT_EQ(alloc.GetElementsInUse(), 0);
+    EXPECT_EQ(alloc.FreeUnused(), 0) << "what was freed before is gone";
+    const std::set<char*> fresh = [&] {
+      auto again = AllocMany(alloc, 8);
+      for (char* element : again) std::memset(element, round, 32);
+      return std::set<char*>(again.begin(), again.end());
+    }();
+    EXPECT_EQ(fresh.size(), 8u);
+    EXPECT_EQ(alloc.GetBytes(), 2 * (32 * 4 + static_cast<std::int32_t>(sizeof(void*))));
+    alloc.FreeAll();
+  }
+}
+
 TEST(FixedAlloc, OnIdle_WaitsForABlockfulUnlessTold) {
   SFixedAlloc alloc(16, 4, WTEXT("idle"), nullptr);
   auto elements = AllocMany(alloc, 8);

@@ -145,6 +145,12 @@ TEST(Files, Searching) {
   EXPECT_EQ(Find(folder, WTEXT("x*.gz")), (Names{WTEXT("x.tar.gz")}));
   EXPECT_EQ(Find(folder, WTEXT("c")), (Names{WTEXT("c")}));
   EXPECT_EQ(Find(folder, (Text(400, '*') + WTEXT(".gz")).c_str()), (Names{WTEXT("x.tar.gz")}));
+  if (!kUnderWine) {  // names without an extension, and dots that may be missing
+    EXPECT_EQ(Find(folder, WTEXT("*.")), (Names{WTEXT("."), WTEXT(".."), WTEXT("c")}));
+    EXPECT_EQ(Find(folder, WTEXT("c.*")), (Names{WTEXT("c")}));
+    EXPECT_EQ(Find(folder, WTEXT("???.tx?")), (Names{WTEXT("a.txt"), WTEXT("ab.txt"), WTEXT("b.tx")}));
+    EXPECT_EQ(Find(folder, WTEXT("x.*.gz")), (Names{WTEXT("x.tar.gz")}));
+  }
   EXPECT_EQ(Find(folder, WTEXT("zz*")), Names{});
   EXPECT_EQ(GetLastError(), DWORD(ERROR_FILE_NOT_FOUND));
   EXPECT_EQ(Find(folder, WTEXT("no\\*")), Names{});
@@ -288,6 +294,38 @@ TEST(FilesOnLinux, FullDiskAndOtherDevices) {
   CloseHandle(full);
   EXPECT_EQ(OpenError(WTEXT("D:\\x"), GENERIC_READ, OPEN_EXISTING), DWORD(ERROR_PATH_NOT_FOUND));
   EXPECT_EQ(OpenError(WTEXT("\\\\server\\share\\x"), GENERIC_READ, OPEN_EXISTING), DWORD(ERROR_BAD_NETPATH));
+}
+#endif
+
+#ifndef _WIN32
+// Where a name cannot just change: the content moves, with its times and rights, or nothing does.
+TEST(Files, MovesToAnotherFileSystem) {
+  TempFolder folder;
+  const Text away = WTEXT("C:\\dev\\shm\\qxcore-test") + folder.Path().substr(folder.Path().rfind('\\') + 1);
+  if (!CreateDirectoryW(away.c_str(), nullptr)) GTEST_SKIP() << "no second file system";
+  const Text from = folder.File(WTEXT("from.txt")), to = away + WTEXT("\\to.txt");
+  const std::string content(300000, 'm');
+  ASSERT_TRUE(WriteAll(from, content));
+  SetLastError(0);
+  if (MoveFileExW(from.c_str(), to.c_str(), 0)) {
+    test::RemoveAll(away);
+    GTEST_SKIP() << "one file system only";
+  }
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_NOT_SAME_DEVICE));
+  EXPECT_TRUE(MoveFileExW(from.c_str(), to.c_str(), MOVEFILE_COPY_ALLOWED));
+  EXPECT_EQ(ReadAll(to), content);
+  EXPECT_EQ(GetFileAttributesW(from.c_str()), INVALID_FILE_ATTRIBUTES);
+  ASSERT_TRUE(WriteAll(from, "newer"));
+  EXPECT_FALSE(MoveFileW(from.c_str(), to.c_str()));
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_ALREADY_EXISTS));
+  EXPECT_EQ(ReadAll(to), content);
+  EXPECT_TRUE(MoveFileExW(from.c_str(), to.c_str(), MOVEFILE_COPY_ALLOWED | MOVEFILE_REPLACE_EXISTING));
+  EXPECT_EQ(ReadAll(to), "newer");
+  // Folders do not move that way.
+  CreateDirectoryW(folder.File(WTEXT("sub")).c_str(), nullptr);
+  EXPECT_FALSE(MoveFileExW(folder.File(WTEXT("sub")).c_str(), (away + WTEXT("\\sub")).c_str(), MOVEFILE_COPY_ALLOWED));
+  EXPECT_NE(GetFileAttributesW(folder.File(WTEXT("sub")).c_str()), INVALID_FILE_ATTRIBUTES);
+  test::RemoveAll(away);
 }
 #endif
 

@@ -54,6 +54,21 @@ TEST(BinaryStream, StringPrefixes_GrowAtTheirLimits) {
   }
 }
 
+TEST(BinaryStream, Counts_AreSignedAndLittleEndian) {
+  for (const std::int32_t count : {0, 1, -1, 0x01020304, INT32_MIN, INT32_MAX}) {
+    SOutputGlobal memory;
+    SOutputBinaryStream out(memory);
+    SWriteCount(out, count);
+    ASSERT_EQ(memory.UsedSize(), 4u);
+    const auto* bytes = static_cast<const unsigned char*>(memory.GetData());
+    EXPECT_EQ(bytes[0], count & 0xFF);
+    SInputBuffer whole(bytes, 4), cut(bytes, 3);
+    SInputBinaryStream in(whole), short_(cut);
+    EXPECT_EQ(SReadCount(in), count);
+    EXPECT_THROW(SReadCount(short_), SEEOFException);
+  }
+}
+
 TEST(BinaryStream, FileOfAnotherProgram_IsReadAndWrittenToTheByte) {
   const SStringTable strings{WTEXT(""),           WTEXT("AB"),        WTEXT("\x00E9\x20AC\xD83D\xDE00"),
                              Repeated('x', 253),  Repeated('y', 254), Repeated(0xFC, 32767) + WTEXT("z"),

@@ -18,6 +18,7 @@
 #include "qxcore/stream/seekable_string_input_stream.h"
 #include "tests/stream/reader_fixture.h"
 #include "tests/support/failing_allocations.h"
+#include "tests/support/steps.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"
 
@@ -41,7 +42,7 @@ std::string ReadMixed(SInputStream& in, unsigned seed) {
   std::mt19937 random(seed);
   std::string all;
   char block[5000];
-  for (;;) {
+  for (test::Steps steps;; steps.Take()) {
     switch (random() % 3) {
       case 0: {
         const int byte = in.Read();
@@ -220,7 +221,7 @@ TEST(RealFiles, ProgressAndCancelling) {
     SInputFile file(Path(path), &indicator);
     EXPECT_EQ(indicator.range, 100000u);
     EXPECT_EQ(indicator.position, 0u);
-    while (file.Read() >= 0) {
+    for (test::Steps steps; file.Read() >= 0; steps.Take()) {
     }
     EXPECT_EQ(indicator.position, 100000u);
     EXPECT_GE(indicator.questions, 100);
@@ -303,10 +304,10 @@ TEST(RealFiles, AllocationFailures) {
         pushback.Mark(0);
         // What fails behind something that was skipped fails the next time.
         unsigned long skipped = 0;
-        while (skipped < 1500) skipped += buffered.Skip(1500 - skipped);
+        for (test::Steps steps; skipped < 1500; steps.Take()) skipped += buffered.Skip(1500 - skipped);
         pushback.Reset();
         skipped = 0;
-        while (const unsigned long more = pushback.Skip(10000)) skipped += more;
+        for (test::Steps steps; const unsigned long more = pushback.Skip(10000); steps.Take()) skipped += more;
         EXPECT_EQ(skipped, 3005u);
       },
       [] {});
@@ -436,5 +437,57 @@ TEST(RealFilesOnLinux, LargePositionsAreNotWrapped) {
   EXPECT_EQ(file.GetPos(), 0x100000005u);
 }
 #endif
+
+// What a long detection does: look on, and go back to the next byte that was not delivered.
+TEST(RealFiles, PlacesLeadBackToTheNextByte) {
+  TempFolder folder;
+  const std::string bytes = RandomBytes(50000);
+  const test::Text path = folder.File(WTEXT("data"));
+  ASSERT_TRUE(WriteAll(path, bytes));
+  std::mt19937 random(2);
+  for (int round = 0; round < 60; ++round) {
+    SInputFile plain(Path(path)), inner(Path(path));
+    SInputBufferStream buffered(inner, 1 + random() % 3000);
+    for (SInputStream* in : std::vector<SInputStream*>{&plain, &buffered}) {
+      const unsigned long first = random() % 20000;
+      EXPECT_EQ(in->Skip(first), first);
+      EXPECT_EQ(in->Read(), static_cast<unsigned char>(bytes[first]));
+      std::uint64_t place = 0;
+      ASSERT_TRUE(in->GetPlace(&place));
+      in->Skip(random() % 40000);
+      ASSERT_TRUE(in->GoToPlace(place));
+      EXPECT_EQ(ReadMixed(*in, random()), bytes.substr(first + 1));
+    }
+  }
+}
+
+// Throws once, at the n-th read.
+class OnceCancelled : public PiecewiseInput {
+ public:
+  OnceCancelled(const std::string& bytes, int at) : PiecewiseInput(bytes, 30), m_left(at) {}
+  using PiecewiseInput::Read;
+  unsigned long Read(void* buffer, unsigned long count) override {
+    if (--m_left == 0) throw SEIOAbortedException();
+    return PiecewiseInput::Read(buffer, count);
+  }
+
+ private:
+  int m_left;
+};
+
+TEST(PushbackStreams, AResetForgetsTheFailureThatWaits) {
+  const std::string bytes = RandomBytes(1000);
+  OnceCancelled source(bytes, 4);
+  SInputBufferStream buffered(source, 64);
+  SInputPushbackStream pushback(buffered, 8);
+  pushback.Mark(2000);
+  char block[500];
+  const unsigned long before = pushback.Read(block, sizeof block);
+  EXPECT_LT(before, sizeof block);
+  pushback.Reset();
+  std::string all(1000, '\0');
+  EXPECT_EQ(pushback.Read(all.data(), 1000), 1000u);
+  EXPECT_EQ(all, bytes);
+}
 
 }  // namespace

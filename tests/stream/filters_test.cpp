@@ -2,6 +2,7 @@
 
 #include <zlib.h>
 
+#include <cerrno>
 #include <functional>
 #include <memory>
 #include <vector>
@@ -16,6 +17,7 @@
 #include "qxcore/stream/zip/zip_input_stream.h"
 #include "tests/stream/reader_fixture.h"
 #include "tests/stream/zip_builder.h"
+#include "tests/support/steps.h"
 
 namespace {
 
@@ -99,7 +101,7 @@ TEST(PairsOfFilters, OverASourceOfSingleBytes_GiveWhatIsAskedFor) {
         const auto in = open();
         std::string got;
         std::vector<char> block(count);
-        while (const unsigned long size = in->Read(block.data(), count)) {
+        for (test::Steps steps; const unsigned long size = in->Read(block.data(), count); steps.Take()) {
           got.append(block.data(), size);
           if (!outer.mayBeShort && got.size() < bytes.size()) {
             ASSERT_EQ(size, count) << "short before the end";
@@ -109,7 +111,7 @@ TEST(PairsOfFilters, OverASourceOfSingleBytes_GiveWhatIsAskedFor) {
       }
       const auto in = open();
       unsigned long skipped = 0;
-      while (const unsigned long more = in->Skip(4000 - skipped)) skipped += more;
+      for (test::Steps steps; const unsigned long more = in->Skip(4000 - skipped); steps.Take()) skipped += more;
       ASSERT_EQ(skipped, 4000u);
       ASSERT_EQ(in->Read(), static_cast<unsigned char>(bytes[4000]));
     }
@@ -162,6 +164,43 @@ class CancellingInput : public PiecewiseInput {
   int m_every;
   int m_asked = 0;
 };
+
+// Ends after so many bytes, as a source does that cannot be read on.
+class BrokenInput : public PiecewiseInput {
+ public:
+  BrokenInput(const std::string& bytes, std::size_t good)
+      : PiecewiseInput(bytes.substr(0, good), 500), m_isBroken(good < bytes.size()) {}
+  int GetError() const override { return m_isBroken && const_cast<BrokenInput*>(this)->IsEOF() ? EIO : 0; }
+
+ private:
+  bool m_isBroken;
+};
+
+TEST(PairsOfFilters, AFailedReadBehindGoodBlocksIsNeverTheEnd) {
+  const std::string bytes = Payload();
+  for (const Filter& outer : Filters()) {
+    for (const Filter& inner : Filters()) {
+      SCOPED_TRACE(std::string(outer.name) + " over " + inner.name);
+      const std::string all = inner.source(outer.source(bytes));
+      for (std::size_t good = 1; good < all.size(); good += 1 + all.size() / 37) {
+        std::string got;
+        bool isTold = false;
+        std::unique_ptr<SInputStream> in;
+        try {
+          in.reset(outer.make(inner.make(new BrokenInput(all, good))));
+          char block[300];
+          for (test::Steps steps; const unsigned long size = in->Read(block, sizeof block); steps.Take())
+            got.append(block, size);
+        } catch (const SException&) {
+          isTold = true;
+        }
+        isTold = isTold || in->GetError() == EIO;
+        ASSERT_TRUE(isTold || got.size() == bytes.size()) << "silent after " << good << " of " << all.size();
+        ASSERT_EQ(got, bytes.substr(0, got.size()));
+      }
+    }
+  }
+}
 
 TEST(PairsOfFilters, CancelledReadsLoseNothing) {
   const std::string bytes = Payload();

@@ -12,6 +12,7 @@
 #include "qxcore/stream/zip/inflater_input_stream.h"
 #include "tests/stream/zip_builder.h"
 #include "tests/support/failing_allocations.h"
+#include "tests/support/steps.h"
 #include "tests/support/text.h"
 
 namespace {
@@ -42,7 +43,7 @@ std::string ReadAll(SInputStream& in, unsigned seed) {
   std::mt19937 random(seed);
   std::string all;
   char block[6000];
-  for (;;) {
+  for (test::Steps steps;; steps.Take()) {
     const unsigned long got = in.Read(block, 1 + random() % sizeof block);
     if (got == 0) return all;
     all.append(block, got);
@@ -69,7 +70,7 @@ TEST(Inflater, PiecesOfAnySizeGiveTheWhole) {
       std::string all;
       std::size_t given = 0;
       char out[777];
-      while (!inflater.IsFinished()) {
+      for (test::Steps steps; !inflater.IsFinished(); steps.Take()) {
         if (inflater.GetRemaining() == 0) {
           ASSERT_LT(given, packed.size());
           const std::size_t piece = std::min<std::size_t>(1 + random() % 900, packed.size() - given);

@@ -12,6 +12,7 @@
 #include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_buffer.h"
 #include "tests/support/failing_allocations.h"
+#include "tests/support/steps.h"
 #include "tests/support/text.h"
 
 namespace {
@@ -41,7 +42,7 @@ std::string ReadAll(Filter& filter, int piece, int* failures = nullptr) {
   std::string text;
   RandomText random(8);
   char buffer[3000];
-  for (;;) {
+  for (test::Steps steps;; steps.Take()) {
     try {
       if (piece == 0) {
         const int c = filter.Read();

@@ -7,6 +7,7 @@
 #include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_buffer.h"
 #include "tests/stream/reader_fixture.h"
+#include "tests/support/steps.h"
 #include "tests/support/wine.h"
 
 namespace {
@@ -169,11 +170,12 @@ TEST(CancelledReads, LoseNothing) {
       },
       [](SMultiFormatReaderUnicode& reader, SString& text) {
         WCHAR block[3000];
-        while (const unsigned long size = reader.Read(block, sizeof block)) text += SStringView(block, size / 2);
+        for (test::Steps steps; const unsigned long size = reader.Read(block, sizeof block); steps.Take())
+          text += SStringView(block, size / 2);
       },
       [](SMultiFormatReaderUnicode& reader, SString& text) { text += reader.ReadAll(); },
       [](SMultiFormatReaderUnicode& reader, SString& text) {
-        while (!reader.IsEOF()) text += reader.ReadLn();
+        for (test::Steps steps; !reader.IsEOF(); steps.Take()) text += reader.ReadLn();
       }};
   for (Encoding request : {Support::kUTF8, kAnsi | Support::kQuickDetect | kGuess, kAnsi | kFull | kGuess}) {
     for (std::size_t way = 0; way < std::size(kWays); ++way) {
@@ -308,6 +310,39 @@ class OpinionatedReader : public SMultiFormatReaderUnicode {
   }
 };
 
+// Memory of the buffers from a derived class, which may give more than is asked for, or refuse.
+class ThriftyReader : public SMultiFormatReaderUnicode {
+ public:
+  using SMultiFormatReaderUnicode::SMultiFormatReaderUnicode;
+  unsigned long most = ~0ul;
+  int raws = 0, texts = 0;
+
+ protected:
+  void AllocRawData(BufferStatus& buffer, unsigned long size) override {
+    ++raws;
+    if (size > most) throw SEOutOfMemory();
+    SMultiFormatReaderUnicode::AllocRawData(buffer, size + 100);
+  }
+  void AllocStrData(BufferStatus& buffer, unsigned long size) override {
+    ++texts;
+    SMultiFormatReaderUnicode::AllocStrData(buffer, size + 100);
+  }
+};
+
+TEST(Overriding, BuffersOfADerivedReader) {
+  const std::string bytes = std::string(200000, 'a') + "caf\xC3\xA9";
+  PiecewiseInput in(bytes, 900);
+  ThriftyReader reader(in, kAnsi | kFull | kGuess);
+  reader.most = 100000;
+  EXPECT_THROW(reader.Read(), SEOutOfMemory) << "all of the input was wanted";
+  reader.most = ~0ul;
+  EXPECT_EQ(reader.ReadAll(), ReadBytes(bytes, Support::kUTF8).text) << "nothing was lost";
+  EXPECT_GT(reader.raws, 1);
+  EXPECT_GT(reader.texts, 0);
+  EXPECT_EQ(reader.GetCounters().ascii, -1) << "one lead byte";
+  EXPECT_GT(reader.GetCounters().utf8, 0);
+}
+
 TEST(Overriding, DerivedReadersScoreAndChoose) {
   PiecewiseInput in("\xE9t\xE9 \xE9t\xE9");
   OpinionatedReader reader(in, kAnsi | 1251 | kFull);
@@ -427,7 +462,8 @@ TEST(FullUnicode, PositionsAroundPairs) {
   PiecewiseInput in(bytes);
   SMultiFormatReaderUnicode reader(in, Support::kUTF8 | kStandard);
   SString text;
-  while (const unsigned long size = reader.Read(two, sizeof(WCHAR))) text += SStringView(two, size / 2);
+  for (test::Steps steps; const unsigned long size = reader.Read(two, sizeof(WCHAR)); steps.Take())
+    text += SStringView(two, size / 2);
   EXPECT_EQ(text, whole);
 }
 

@@ -10,6 +10,7 @@
 #include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_stream.h"
 #include "qxcore/stream/output_stream.h"
+#include "tests/support/steps.h"
 #include "tests/support/text.h"
 
 using Support = SAbstractIO::SMultiFormatSupport;
@@ -67,18 +68,18 @@ inline ReadResult ReadFrom(SInputStream& in, Encoding requested, int way = 0) {
   ReadResult result;
   SMultiFormatReaderUnicode reader(in, requested);
   try {
+    test::Steps steps;
     switch (way) {
       case 0:
-        do {
-          result.text += reader.ReadAll();
-        } while (!reader.IsEOF());
+        for (; !reader.IsEOF(); steps.Take()) result.text += reader.ReadAll();
         break;
       case 1:
-        for (int c; (c = reader.Read()) >= 0;) result.text += static_cast<WCHAR>(c);
+        for (int c; (c = reader.Read()) >= 0; steps.Take()) result.text += static_cast<WCHAR>(c);
         break;
       default: {
         WCHAR block[3000];
-        while (unsigned long bytes = reader.Read(block, sizeof block)) result.text += SStringView(block, bytes / 2);
+        for (; unsigned long bytes = reader.Read(block, sizeof block); steps.Take())
+          result.text += SStringView(block, bytes / 2);
       }
     }
   } catch (const SException& thrown) {

@@ -8,6 +8,7 @@
 #include "qxcore/core/io_exceptions.h"
 #include "tests/stream/reader_fixture.h"
 #include "tests/support/failing_allocations.h"
+#include "tests/support/steps.h"
 #include "tests/support/wine.h"
 
 using namespace std::string_literals;
@@ -380,7 +381,8 @@ TEST(CodePages, Tables_AgreeWithThePlatformsConversion) {
     EXPECT_TRUE(result.loss.IsEmpty()) << "page " << page;
     PiecewiseInput in(unmappable);
     SMultiFormatReaderUnicode reader(in, Support::kANSI | page);
-    while (!reader.IsEOF()) ASSERT_NE(reader.ReadLn().Find(WCHAR{0xFFFD}), nullptr) << "page " << page;
+    for (test::Steps steps; !reader.IsEOF(); steps.Take())
+      ASSERT_NE(reader.ReadLn().Find(WCHAR{0xFFFD}), nullptr) << "page " << page;
     ++tested;
   }
   EXPECT_GT(tested, 30);
@@ -437,7 +439,7 @@ TEST(Positions, LinesEndWithEveryEnding) {
   PiecewiseInput in("one\r\ntwo\n\nthree\r");
   SMultiFormatReaderUnicode reader(in, Support::kASCII);
   std::vector<SString> lines;
-  while (!reader.IsEOF()) lines.push_back(reader.ReadLn());
+  for (test::Steps steps; !reader.IsEOF(); steps.Take()) lines.push_back(reader.ReadLn());
   EXPECT_EQ(lines, (std::vector<SString>{WTEXT("one"), WTEXT("two"), WTEXT(""), WTEXT("three\r")}));
   EXPECT_EQ(reader.Available(), 0u);
   char nothing;
@@ -452,7 +454,7 @@ TEST(Failures, EachAllocationFailing_LosesNothing) {
         PiecewiseInput in(bytes);
         SMultiFormatReaderUnicode reader(in, kAnsi | kFull | Support::kFavorGuess);
         SString text;
-        while (!reader.IsEOF()) text = reader.ReadLn();
+        for (test::Steps steps; !reader.IsEOF(); steps.Take()) text = reader.ReadLn();
       },
       [] {});
   EXPECT_GT(failures, 2);

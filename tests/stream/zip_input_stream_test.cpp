@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <random>
 #include <string>
 #include <vector>
 
@@ -11,6 +12,7 @@
 #include "qxcore/stream/zip/zip_input_stream.h"
 #include "tests/stream/zip_builder.h"
 #include "tests/support/failing_allocations.h"
+#include "tests/support/steps.h"
 #include "tests/support/text.h"
 
 namespace {
@@ -20,7 +22,8 @@ using test::ZipPart;
 
 std::string ReadEntry(SZipInputStream& zip, unsigned long piece) {
   std::string all, block(piece, '\0');
-  while (const unsigned long got = zip.Read(block.data(), piece)) all.append(block, 0, got);
+  for (test::Steps steps; const unsigned long got = zip.Read(block.data(), piece); steps.Take())
+    all.append(block, 0, got);
   return all;
 }
 
@@ -29,7 +32,7 @@ std::string Outcome(const std::string& archive, int* entries = nullptr) {
   SInputBuffer memory(archive.data(), static_cast<unsigned long>(archive.size()));
   SZipInputStream zip(memory);
   try {
-    while (zip.GetNextEntry() != nullptr) {
+    for (test::Steps steps; zip.GetNextEntry() != nullptr; steps.Take()) {
       ReadEntry(zip, 1000);
       if (entries != nullptr) ++*entries;
     }
@@ -106,7 +109,8 @@ TEST(ZipInputStream, NamesAreDecodedByTheirFlag) {
   SInputBuffer memory(archive.data(), static_cast<unsigned long>(archive.size()));
   SZipInputStream zip(memory);
   std::vector<SString> names;
-  while (const SZipEntry* entry = zip.GetNextEntry()) names.push_back(entry->GetName());  // unread entries are passed
+  for (test::Steps steps; const SZipEntry* entry = zip.GetNextEntry(); steps.Take())
+    names.push_back(entry->GetName());  // unread entries are passed
   ASSERT_EQ(names.size(), 8u);
   EXPECT_EQ(names[6], SString(WTEXT("k\u00E4se \U0001F9C0")));
   EXPECT_EQ(names[7], SString("k\xE4se"));
@@ -188,6 +192,29 @@ TEST(ZipInputStream, MemoryOutIsSaidAsSuch) {
       [] {});
   EXPECT_GE(failures, 4);
   EXPECT_EQ(entries, 8);
+}
+
+TEST(ZipInputStream, WhatIsLongerThanItsHeaderSaysEndsThere) {
+  std::mt19937 random(1);
+  std::string content(300000, '\0');
+  for (char& byte : content) byte = static_cast<char>(random());
+  for (const bool isCompressed : {true, false}) {
+    test::ZipBuilder zip;
+    zip.parts.emplace_back("long", content);
+    (isCompressed ? zip.parts[0].compressedSize : zip.parts[0].size) = 1000;
+    const std::string archive = zip.Make();
+    SInputBuffer in(archive.data(), static_cast<unsigned long>(archive.size()));
+    SZipInputStream stream(in);
+    ASSERT_NE(stream.GetNextEntry(), nullptr);
+    char block[512];
+    unsigned long delivered = 0;
+    const auto readAll = [&] {
+      for (test::Steps steps; const unsigned long got = stream.Read(block, sizeof block); steps.Take())
+        delivered += got;
+    };
+    EXPECT_THROW(readAll(), SEZipException);
+    EXPECT_LT(delivered, 20000u) << "not only when all of it was read";
+  }
 }
 
 }  // namespace

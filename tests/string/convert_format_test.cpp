@@ -1,9 +1,13 @@
 // Conversions, classification, numbers, formatting, resource texts and digests.
 
+#include <algorithm>
+#include <cstdarg>
 #include <cstdio>
 #include <cstring>
+#include <vector>
 
 #include "qxcore/core/module_state.h"
+#include "qxcore/platform/module.h"
 #include "qxcore/platform/wide.h"
 #include "qxcore/string/ansi_string.h"
 #include "qxcore/string/md5.h"
@@ -37,6 +41,20 @@ TEST(Utf8Helpers, DamagedInput_IsDroppedAndNeverReadPastItsEnd) {
   const char cutAtOnce[] = {'\xC3', 0, 'X'};
   EXPECT_EQ(SString(SUTF82THelper(out, cutAtOnce, 10)), WTEXT(""));
   EXPECT_EQ(SString(SUTF82THelper(out, "abc", 0)), WTEXT(""));
+}
+
+// With a known length: the end comes back, and an inner NUL ends the text.
+TEST(Utf8Helpers, KnownLengths_GiveTheEndOfWhatWasWritten) {
+  const SStringView text = WTEXT("a\u00E9\u20AC\0z");
+  char bytes[32];
+  EXPECT_EQ(SEncodeUTF8(bytes, text) - bytes, 6);
+  EXPECT_STREQ(bytes, "a\xC3\xA9\xE2\x82\xAC");
+  WCHAR back[32];
+  EXPECT_EQ(SDecodeUTF8(back, std::string_view(bytes, 6)) - back, 3);
+  EXPECT_EQ(SString(back), WTEXT("a\u00E9\u20AC"));
+  EXPECT_EQ(SDecodeUTF8(back, std::string_view(bytes, 5)) - back, 2) << "cut in the last character";
+  EXPECT_EQ(SDecodeUTF8(back, std::string_view("ab\0c", 4)) - back, 2);
+  EXPECT_EQ(back[2], 0);
 }
 
 TEST(Utf8Pair, EveryCharacter_ComesBackAndEqualsThePlatforms) {
@@ -104,6 +122,22 @@ TEST(AnsiConversion, Loss_IsRecordedAndBuffersAreKeptTo) {
   EXPECT_EQ(Swcstombsz(nullptr, WTEXT("abc"), 3), 0);
   EXPECT_EQ(Swcstombsz(bytes, WTEXT("abcdef"), 2), 0) << "five bytes do not hold six and a NUL";
   EXPECT_EQ(bytes[0], 0);
+  WCHAR wide4[4];
+  EXPECT_EQ(Smbstowcsz(wide4, "a\xE9", 3), 3);
+  EXPECT_EQ(SString(wide4), WTEXT("a\u00E9"));
+  EXPECT_EQ(Smbstowcsz(nullptr, "abc", 0), 4) << "the room that is needed";
+  EXPECT_EQ(Smbstowcsz(nullptr, "abc", 3), 0);
+  EXPECT_EQ(Smbstowcsz(wide4, "abcd", 3), 0);
+  EXPECT_EQ(wide4[0], 0);
+  EXPECT_EQ(Smbstowcsz(wide4, nullptr, 3), 0);
+  EXPECT_EQ(SAnsiToString("a\xE9z", 2), WTEXT("a\u00E9"));
+  EXPECT_EQ(SAnsiToString("a\0z", 3), WTEXT("a"));
+  EXPECT_EQ(SAnsiToString(nullptr, 3), WTEXT(""));
+  const SString accented = WTEXT("na\u00EFve");
+  EXPECT_STREQ(accented.ToAnsi(bytes), "na\xEFve");
+  WCHAR copied[8];
+  EXPECT_EQ(accented.ToUnicode(copied), copied);
+  EXPECT_EQ(SString(copied), accented);
   EXPECT_EQ(SString(WTEXT("a\u00E9")).CanConvertToMBCS(), 1);
   EXPECT_EQ(SString(WTEXT("\u4E2D")).CanConvertToMBCS(), 0);
 
@@ -135,6 +169,19 @@ TEST(NoAccent, ComposedLetters_LoseTheirMarks) {
   SString text = WTEXT("\u00C9t\u00E9 na\u00EFf \u00F8 \u4E2D");
   EXPECT_EQ(text.NoAccent(), 3);
   EXPECT_EQ(text, WTEXT("Ete naif \u00F8 \u4E2D"));
+  // A part of the text: from an index on, so many characters.
+  const SString accents = WTEXT("\u00E9\u00E9\u00E9\u00E9");
+  for (int first = -1; first <= 5; ++first) {
+    for (int count = -1; count <= 5; ++count) {
+      const int begin = std::clamp(first, 0, 4), end = count < 0 ? 4 : std::clamp(begin + count, 0, 4);
+      SString part = accents;
+      EXPECT_EQ(part.NoAccent(first, count), end - begin) << first << ' ' << count;
+      const WideString expected = WideString(static_cast<std::size_t>(begin), 0xE9) +
+                                  WideString(static_cast<std::size_t>(end - begin), WTEXT('e')) +
+                                  WideString(static_cast<std::size_t>(4 - end), 0xE9);
+      EXPECT_EQ(part.View(), SStringView(expected));
+    }
+  }
 }
 
 TEST(Numbers, TextsAreReadAsStated) {
@@ -162,7 +209,11 @@ TEST(Classification, OutsideTheText_IsNothing) {
   EXPECT_TRUE(text.IsAlpha(0) && text.IsLower(0) && text.IsXDigit(0) && text.IsASCII(0));
   EXPECT_TRUE(text.IsUpper(1) && !text.IsXDigit(1) && text.IsDigit(2) && text.IsAlphaNum(2) && text.IsWhitespace(3));
   EXPECT_TRUE(text.IsAlpha(4) && text.IsLower(4) && !text.IsASCII(4) && text.IsUpper(5));
-  EXPECT_FALSE(text.IsAlpha(-1) || text.IsASCII(6) || text.IsASCII(99));
+  using Question = int (SString::*)(int) const;
+  for (const Question ask : {&SString::IsASCII, &SString::IsAlpha, &SString::IsAlphaNum, &SString::IsDigit,
+                             &SString::IsLower, &SString::IsUpper, &SString::IsWhitespace, &SString::IsXDigit}) {
+    for (const int index : {-1, text.Length(), 99}) EXPECT_EQ((text.*ask)(index), 0);
+  }
   EXPECT_EQ(SString::IsRtfText(WTEXT("{\\rtf1")), 1);
   EXPECT_EQ(SString::IsRtfText(WTEXT("{\\urtf1")), 1);
   EXPECT_EQ(SString::IsRtfText(WTEXT("{\\rt")), 0);
@@ -195,11 +246,21 @@ TEST(Format, Conversions_AgreeWithTheNarrowRuntime) {
   }
 }
 
+// As a function of a client hands its own arguments on.
+void FormatBy(SString& text, const WCHAR* format, ...) {
+  std::va_list arguments;
+  va_start(arguments, format);
+  text.FormatV(format, arguments);
+  va_end(arguments);
+}
+
 TEST(Format, TextOfAnyKindAndLength_Fits) {
   SString text;
   text.Format(WTEXT("%s|%S|%hs|%ls|%c|%5.2s|%%|%-4s|"), WTEXT("wide"), "narrow", "short", WTEXT("long"), 'x',
               WTEXT("abc"), WTEXT("z"));
   EXPECT_EQ(text, WTEXT("wide|narrow|short|long|x|   ab|%|z   |"));
+  FormatBy(text, WTEXT("%d-%s"), 7, text.GetSafePointer());
+  EXPECT_EQ(text, WTEXT("7-wide|narrow|short|long|x|   ab|%|z   |"));
   SString longText(SStringView(WideString(100000, WTEXT('y'))));
   text.Format(WTEXT("%s%s"), longText.GetSafePointer(), longText.GetSafePointer());
   EXPECT_EQ(text.Length(), 200000);
@@ -223,11 +284,29 @@ TEST(Resources, Texts_AreLoadedByTheirIds) {
   EXPECT_TRUE(text.IsEmpty());
   EXPECT_EQ(SCoreGetModuleState()->LoadStringW(196), WTEXT("Unexpected end of file."));
   EXPECT_EQ(SStringLoad(9, WTEXT("fallback")), WTEXT("fallback"));
+  EXPECT_EQ(SGetResInstance(WTEXT("any"), WTEXT("type")), SCoreGetModuleState()->GetResInstance());
   EXPECT_EQ(SString(SCoreGetModuleState()->GetResInstance(), 202), WTEXT("Write failed"));
   EXPECT_EQ(SCoreGetModuleState()->Format(222, WTEXT("ANSI")), WTEXT(" even though \"ANSI\" encoding was expected"));
   text.Format(222u, WTEXT("OEM"));
   EXPECT_EQ(text, WTEXT(" even though \"OEM\" encoding was expected"));
 }
+
+#ifndef _WIN32  // there, a module's texts come from its file
+TEST(Resources, LongTextsAndTheEndsOfTheTable) {
+  std::vector<WideString> contents = {WTEXT("one")};  // then around the first buffers, and far beyond
+  for (std::size_t size : {2045u, 2046u, 2047u, 2048u, 2557u, 2558u, 2560u, 100000u})
+    contents.emplace_back(size, WTEXT('r'));
+  std::vector<StringResource> texts;
+  for (const WideString& content : contents)
+    texts.push_back({static_cast<unsigned>(10 * texts.size() + 1), content.c_str(), content.size()});
+  HINSTANCE__ module = {texts.data(), texts.size()};
+  for (const StringResource& one : texts) EXPECT_TRUE(SString(&module, one.id) == one.text) << one.length;
+  for (unsigned id : {0u, 2u, 10u, 82u, 0xFFFFu}) EXPECT_EQ(SString(&module, id), WTEXT("")) << id;
+  WCHAR room[5];
+  EXPECT_EQ(LoadStringW(&module, 81, room, 5), 4);
+  EXPECT_EQ(SString(room), WTEXT("rrrr"));
+}
+#endif
 
 TEST(Digest, KnownMessagesAndPieces) {
   EXPECT_EQ(MD5(SString()), WTEXT("d41d8cd98f00b204e9800998ecf8427e"));

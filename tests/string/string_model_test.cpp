@@ -169,7 +169,7 @@ const Operation kOperations[] = {
     },
     [](Case& c) {  // written through a pointer: all of it, or a part that is measured or cut
       const int room = std::max(c.count, 1);
-      WCHAR* buffer = c.text.Lock(room);
+      WCHAR* buffer = c.index % 3 == 0 ? c.text.LockTchar(room) : c.text.Lock(room);
       std::fill_n(buffer, room, c.character);
       buffer[room] = 0;
       c.text.Unlock(c.index % 2 == 0 ? -1 : room / 2);

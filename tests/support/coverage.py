@@ -42,7 +42,7 @@ def main():
     counts = collections.defaultdict(lambda: [0, 0])
     missed = collections.defaultdict(set)
     for (name, line, _), is_taken in branches(build).items():
-        folder = "/".join(name.split("/")[:3 if name.startswith("qxcore/platform/") else 2])
+        folder = "/".join(name.split("/")[:-1][:4 if name.startswith("qxcore/platform/") else 2])
         for key in (folder, "all"):
             counts[key][0] += is_taken
             counts[key][1] += 1

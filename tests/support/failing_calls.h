@@ -1,5 +1,5 @@
 // Calls of the system that fail on order. The functions here stand in front of the C library's for the whole
-// program: include this in one source file of a test program only. Linux only.
+// program; they are weak, so that several source files may include this, and one may have its own. Linux only.
 #pragma once
 
 #include <dlfcn.h>
@@ -13,8 +13,6 @@
 #include <cstddef>
 #include <functional>
 
-namespace {
-
 struct Orders {
   long failAt = 0;  // the n-th call from now on; 0: none
   bool forever = false;
@@ -22,9 +20,9 @@ struct Orders {
   long calls = 0;
   bool hasFailed = false;
 };
-Orders g_orders;
+inline Orders g_orders;
 
-bool MustFail() {
+inline bool MustFail() {
   if (g_orders.failAt == 0) return false;
   ++g_orders.calls;
   const bool fails = g_orders.forever ? g_orders.calls >= g_orders.failAt : g_orders.calls == g_orders.failAt;
@@ -41,7 +39,8 @@ Function* Real(const char* name) {
 
 // The operation with the first, second, third ... call failing with the error, until all calls succeed;
 // `check` is told whether one failed.
-void WithEachCallFailing(int error, const std::function<void()>& operation, const std::function<void(bool)>& check) {
+inline void WithEachCallFailing(int error, const std::function<void()>& operation,
+                                const std::function<void(bool)>& check) {
   for (const bool forever : {false, true}) {
     for (long n = 1; n < 5000; ++n) {
       g_orders = {n, forever, error, 0, false};
@@ -54,13 +53,11 @@ void WithEachCallFailing(int error, const std::function<void()>& operation, cons
   }
 }
 
-}  // namespace
-
 // These stand in front of the C library's for the whole program.
-#define FAILING_CALL(name, declared, passed, specifier)  \
-  extern "C" int name declared specifier {               \
-    static auto* const real = Real<int declared>(#name); \
-    return MustFail() ? -1 : real passed;                \
+#define FAILING_CALL(name, declared, passed, specifier)          \
+  extern "C" __attribute__((weak)) int name declared specifier { \
+    static auto* const real = Real<int declared>(#name);         \
+    return MustFail() ? -1 : real passed;                        \
   }
 
 FAILING_CALL(stat, (const char* path, struct stat* info), (path, info), noexcept)
@@ -79,7 +76,7 @@ FAILING_CALL(statvfs, (const char* path, struct statvfs* info), (path, info), no
 FAILING_CALL(renameat2, (int fromFolder, const char* from, int toFolder, const char* to, unsigned flags),
              (fromFolder, from, toFolder, to, flags), noexcept)
 
-extern "C" int open(const char* path, int flags, ...) {
+extern "C" __attribute__((weak)) int open(const char* path, int flags, ...) {
   static auto* const real = Real<int(const char*, int, ...)>("open");
   std::va_list arguments;
   va_start(arguments, flags);
@@ -88,28 +85,28 @@ extern "C" int open(const char* path, int flags, ...) {
   return MustFail() ? -1 : real(path, flags, mode);
 }
 
-extern "C" int close(int file) {
+extern "C" __attribute__((weak)) int close(int file) {
   static auto* const real = Real<int(int)>("close");
   const int result = real(file);  // closed all the same, as the kernel does it
   return MustFail() ? -1 : result;
 }
 
-extern "C" ssize_t read(int file, void* buffer, std::size_t count) {
+extern "C" __attribute__((weak)) ssize_t read(int file, void* buffer, std::size_t count) {
   static auto* const real = Real<ssize_t(int, void*, std::size_t)>("read");
   return MustFail() ? -1 : real(file, buffer, count);
 }
 
-extern "C" ssize_t write(int file, const void* buffer, std::size_t count) {
+extern "C" __attribute__((weak)) ssize_t write(int file, const void* buffer, std::size_t count) {
   static auto* const real = Real<ssize_t(int, const void*, std::size_t)>("write");
   return MustFail() ? -1 : real(file, buffer, count);
 }
 
-extern "C" off_t lseek(int file, off_t offset, int whence) noexcept {
+extern "C" __attribute__((weak)) off_t lseek(int file, off_t offset, int whence) noexcept {
   static auto* const real = Real<off_t(int, off_t, int)>("lseek");
   return MustFail() ? -1 : real(file, offset, whence);
 }
 
-extern "C" ssize_t getdents64(int file, void* buffer, std::size_t count) noexcept {
+extern "C" __attribute__((weak)) ssize_t getdents64(int file, void* buffer, std::size_t count) noexcept {
   static auto* const real = Real<ssize_t(int, void*, std::size_t)>("getdents64");
   return MustFail() ? -1 : real(file, buffer, count);
 }

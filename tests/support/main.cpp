@@ -4,6 +4,10 @@
 
 #include "qxcore/platform/win32.h"
 
+#ifdef __GLIBC__
+#include <malloc.h>
+#endif
+
 #ifdef _WIN32
 static void SilenceDialogs() { SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOGPFAULTERRORBOX | SEM_NOOPENFILEERRORBOX); }
 #else
@@ -13,8 +17,16 @@ static void SilenceDialogs() {}
 // The buffer of a system message is not given back, once an exception; that is meant.
 extern "C" const char* __lsan_default_suppressions() { return "leak:SECOMException::GetText"; }
 
+// Memory of a young process is zero by chance: what comes from the heap here never is.
+static void FillFreshMemory() {
+#ifdef __GLIBC__
+  mallopt(M_PERTURB, 0x5A);
+#endif
+}
+
 int main(int argc, char** argv) {
   SilenceDialogs();
+  FillFreshMemory();
   testing::InitGoogleTest(&argc, argv);
   return RUN_ALL_TESTS();
 }

@@ -11,6 +11,9 @@ import re
 import subprocess
 import sys
 
+# A name behind a type, or at the beginning of a line, as constructors are; not one behind these words.
+DECLARED = re.compile(r"(?:^\s*|([\w>:&*]+)\s+[&*]*)(\w+)\(")
+CALLS = ("return", "new", "throw", "else", "case")
 SPECIAL = re.compile(r"^(vtable|typeinfo|VTT|guard variable|non-virtual thunk|virtual thunk|construction vtable)")
 
 
@@ -45,7 +48,9 @@ def published(headers):
                 scopes[-1] = (scopes[-1][0], access[1] == "public")
             if all(is_public for _, is_public in scopes):
                 name = next((name for name, _ in reversed(scopes) if name), "")
-                offered.update((name, member) for member in re.findall(r"(\w+)\(", line))
+                for before, member in re.findall(DECLARED, line):
+                    if member == name if before == "" else before not in CALLS:
+                        offered.add((name, member))
             for brace in re.findall(r"[{}]", line):
                 if brace == "{":
                     scopes.append(waiting or ("", True))

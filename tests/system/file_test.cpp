@@ -73,8 +73,11 @@ TEST(FileNames, MakingAndChecking) {
   file.Init(WTEXT("C:\\"), SString(), WTEXT("n"), WTEXT("x"));
   EXPECT_EQ(file.GetFullName(), SString(WTEXT("C:\\n.x")));  // of a given drive, the root
   file.Init(SString(), SString(), WTEXT("n"), WTEXT("x"));
-  // Round trip: what was made splits into the same parts.
+  // Round trip: what was made splits into the same parts, and they make the same name.
   const SString made = file.GetFullName();
+  EXPECT_EQ(file.SplitFilename(), 1);
+  file.MakeFilename();
+  EXPECT_EQ(file.GetFullName(), made);
   EXPECT_EQ(SFile(made).GetDirectory(), file.GetDirectory());
 
   EXPECT_EQ(file.Init(SString(WTEXT("C:\\what?.txt"))), Code(SFile::kInvalidFilename));
@@ -104,7 +107,7 @@ TEST(FileNames, NormalForms) {
   EXPECT_EQ(SFile::NormalizeDirectoryName(WTEXT(".")), SFile::GetCurrentDrive() + Here());
   TempFolder folder;
   WriteAll(folder.File(WTEXT("MixedCase.Txt")), "");
-  [[maybe_unused]] const SString real = Str(folder.File(WTEXT("MixedCase.Txt")));
+  const SString real = Str(folder.File(WTEXT("MixedCase.Txt")));
   SString other = Str(folder.Path()) + WTEXT("\\x\\..\\mixedcase.txt");
 #ifndef _WIN32  // Wine 8 leaves letters as they were given
   EXPECT_EQ(SFile::NormalizeFileName(other, 1).Right(14), real.Right(14));
@@ -112,6 +115,11 @@ TEST(FileNames, NormalForms) {
   EXPECT_EQ(SFile::NormalizeFileName(other).Right(14), SString(WTEXT("\\mixedcase.txt")));
   EXPECT_EQ(SFile::NormalizeFileName(Str(folder.File(WTEXT("new.TXT"))), 1).Right(8), SString(WTEXT("\\new.TXT")));
   EXPECT_EQ(SFile::ToLongNames(WTEXT("C:\\no\\such\\file")), SString(WTEXT("C:\\no\\such\\file")));
+  // A short name is another name of the same file.
+  const SString shorter = SFile::ToShortNames(Str(folder.File(WTEXT("MixedCase.Txt"))));
+  EXPECT_EQ(SFile::Exists(shorter), 1);
+  EXPECT_EQ(SFile::ToLongNames(shorter).CompareNoCase(SFile::ToLongNames(real)), 0);
+  EXPECT_EQ(SFile::ToShortNames(WTEXT("C:\\no\\such\\file")), SString(WTEXT("C:\\no\\such\\file")));
 }
 
 TEST(FileNames, Urls) {

@@ -240,6 +240,14 @@ TEST_F(MappedFileTest, ACursorMovesOverTheViewThatItIsGiven) {
   unsigned long count = sizeof text;
   EXPECT_EQ(file.Read(text, &count), 0);
   EXPECT_EQ(std::string(text, count), "0123");
+  // Up to the end of the file, though the view's pages reach beyond it.
+  SMappedFile rest(Make(Bytes(65536) + "0123456789", WTEXT("second")));
+  ASSERT_EQ(rest.OpenMapping(0, 0, nullptr), 0);
+  ASSERT_EQ(rest.GetView().Set(rest), 0);
+  ASSERT_EQ(rest.GetView().OpenView(0, std::uint64_t{65536}), 0);
+  count = sizeof text;
+  EXPECT_EQ(rest.Read(text, &count), 0);
+  EXPECT_EQ(std::string(text, count), "0123456789");
 }
 
 TEST_F(MappedFileTest, CopiesShareTheFileAndMovesEmptyTheOther) {

@@ -37,6 +37,7 @@ TEST(OleDates, EveryDayThereAndBack) {
             static_cast<WORD>(hour), static_cast<WORD>(minute), static_cast<WORD>(second),    0};
         ASSERT_TRUE(AreSame(time, expected)) << year << "-" << month << "-" << day << " " << date.GetValue();
         ASSERT_EQ(date.GetDayOfYear(), ++dayOfYear);
+        ASSERT_EQ(date.GetDayOfWeek(), dayOfWeek);
         const double whole = std::trunc(date.GetValue());
         ASSERT_TRUE(previous == -1e9 || whole == previous + 1) << whole;
         previous = whole;
@@ -67,6 +68,9 @@ TEST(OleDates, KnownValues) {
 
 TEST(OleDates, LimitsAndStatus) {
   SOleDateTime date(36526.5);
+  EXPECT_EQ(date.SetDateTime(2023, 12, 31, 24, 0, 0), SOleDateTime::kInvalid);
+  EXPECT_EQ(date.GetDayOfWeek(), -1);
+  EXPECT_EQ(date.SetDateTime(2000, 1, 1, 12, 0, 0), SOleDateTime::kValid);
   EXPECT_EQ(date.SetDate(2023, 2, 29), SOleDateTime::kInvalid);
   EXPECT_EQ(date.GetStatus(), 1);
   EXPECT_EQ(date.GetValue(), 36526.5);

@@ -8,6 +8,7 @@
 #include <sqlite3.h>
 #endif
 
+#include <algorithm>
 #include <atomic>
 #include <cstring>
 #include <thread>
@@ -206,6 +207,13 @@ TEST_F(Registry, BinaryValuesInGlobalMemory) {
   block.Alloc(0, 300);
   std::memset(block.Lock(), 0xAB, 300);
   block.Unlock();
+  block.ReAlloc(5000, GMEM_MOVEABLE | GMEM_ZEROINIT);
+  EXPECT_GE(block.Size(), 5000u);
+  const auto* bytes = static_cast<const unsigned char*>(block.Lock());
+  EXPECT_EQ(std::count(bytes, bytes + 300, 0xAB), 300);
+  EXPECT_EQ(std::count(bytes + 300, bytes + 5000, 0), 4700);
+  block.Unlock();
+  block.ReAlloc(300, GMEM_MOVEABLE);
   EXPECT_EQ(m_key.WriteProfile(WTEXT("binary"), block, 100ul), S_OK);
   EXPECT_EQ(m_key.WriteProfile(WTEXT("binary"), block, 0ul), E_INVALIDARG);
   EXPECT_EQ(m_key.WriteProfile(WTEXT("binary"), static_cast<void*>(nullptr), 5ul), E_INVALIDARG);

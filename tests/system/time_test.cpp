@@ -49,7 +49,13 @@ void CheckMoment(const ZonePeer& peer, std::int32_t time) {
   ASSERT_EQ(back, moment);
   ASSERT_EQ(moment.GetYear(), local.tm_year + 1900);
   ASSERT_EQ(moment.GetMonth(), local.tm_mon + 1);
+  ASSERT_EQ(moment.GetDayOfWeek(), local.tm_wday);
+  ASSERT_EQ(moment.GetGmtYear() - 1900, utc.tm_year);
+  ASSERT_EQ(moment.GetGmtMonth() - 1, utc.tm_mon);
+  ASSERT_EQ(moment.GetGmtDay(), utc.tm_mday);
   ASSERT_EQ(moment.GetGmtHour(), utc.tm_hour);
+  ASSERT_EQ(moment.GetGmtMinute(), utc.tm_min);
+  ASSERT_EQ(moment.GetGmtSecond(), utc.tm_sec);
   ASSERT_EQ(moment.GetGmtDayOfWeek(), utc.tm_wday);
 }
 

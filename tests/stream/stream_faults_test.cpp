@@ -1,4 +1,4 @@
-// Archives whose file, source or target fails: every call of the system in turn, every read, every write.
+// Streams and archives whose file, source or target fails: every call of the system in turn, every read, every write.
 
 #include <gtest/gtest.h>
 
@@ -7,6 +7,7 @@
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/stream/input_buffer.h"
+#include "qxcore/stream/output_file_on_change.h"
 #include "qxcore/stream/output_stream.h"
 #include "qxcore/stream/zip/zip_file.h"
 #include "qxcore/stream/zip/zip_input_stream.h"
@@ -16,6 +17,7 @@
 
 #ifndef _WIN32
 #include "tests/support/failing_calls.h"
+#include "tests/support/file_size_limit.h"
 #endif
 
 namespace {
@@ -94,6 +96,66 @@ TEST(ZipFaults, AFailedWriteIsTheWritersException) {
 }
 
 #ifndef _WIN32
+
+// Wherever the disk is full, at the first byte or when the last ones are flushed by the close: no half file stays.
+TEST(ZipFaults, AnExtractionThatFailsLeavesNoFile) {
+  test::TempFolder folder;
+  ASSERT_TRUE(test::WriteAll(folder.File(WTEXT("a.zip")), SomeArchive()));
+  const SString archive(folder.File(WTEXT("a.zip")).c_str());
+  const test::Text target = folder.File(WTEXT("target"));
+  SZipFile::ExtractFile(archive, WTEXT("deflated"), SString(target.c_str()));
+  const std::string whole = test::ReadAll(target);
+  for (const std::size_t limit : {std::size_t{0}, std::size_t{1}, whole.size() / 2, whole.size() - 1}) {
+    test::RemoveAll(target);
+    const int before = CountOpenHandles();
+    {
+      const test::FileSizeLimit full(limit);
+      EXPECT_THROW(SZipFile::ExtractFile(archive, WTEXT("deflated"), SString(target.c_str())), SEIOException) << limit;
+    }
+    EXPECT_EQ(GetFileAttributesW(target.c_str()), INVALID_FILE_ATTRIBUTES) << limit;
+    EXPECT_EQ(CountOpenHandles(), before);
+  }
+  // What had room for all of it is whole.
+  const test::FileSizeLimit enough(whole.size());
+  SZipFile::ExtractFile(archive, WTEXT("deflated"), SString(target.c_str()));
+  EXPECT_EQ(test::ReadAll(target), whole);
+}
+
+// The comparison that cannot read the file, the file that cannot be written: what is there at the end is the new
+// content, or the caller was told.
+TEST(OutputFileOnChangeFaults, NoFailedCallPassesAsDone) {
+  test::TempFolder folder;
+  const test::Text path = folder.File(WTEXT("out"));
+  const std::string former(40000, 'f'), content = former.substr(0, 39999) + "g";
+  for (const std::string& wanted : {former, content}) {
+    for (const int error : {EIO, ENOSPC, EACCES}) {
+      int said = -1;
+      WithEachCallFailing(
+          error,
+          [&] {
+            const Orders orders = g_orders;  // the file is made anew without failures
+            g_orders = {};
+            ASSERT_TRUE(test::WriteAll(path, former));
+            g_orders = orders;
+            said = -1;
+            try {
+              SOutputFileOnChange out{SString(path.c_str())};
+              out.Write(wanted.data(), static_cast<unsigned long>(wanted.size()));
+              out.Close(&said);
+            } catch (const SEIOException&) {
+            }
+          },
+          [&](bool failed) {
+            if (said >= 0) {
+              EXPECT_EQ(test::ReadAll(path), wanted);
+            }
+            if (!failed) {
+              EXPECT_EQ(said, wanted != former);
+            }
+          });
+    }
+  }
+}
 
 TEST(ZipFaults, ADirectoryThatCannotBeReadIsNeverShort) {
   test::TempFolder folder;
