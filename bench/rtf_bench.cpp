@@ -15,9 +15,9 @@
 #include <vector>
 
 #include "bench/bench.h"
-#include "qxcore/graphics/rtf/document.h"
 #include "qxcore/graphics/rtf/font_table.h"
 #include "qxcore/string/string_buffer.h"
+#include "qxcore/ui/rtf/document.h"
 
 namespace {
 

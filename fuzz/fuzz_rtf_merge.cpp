@@ -2,8 +2,8 @@
 
 #include "fuzz/fuzz_input.h"
 #include "qxcore/graphics/rtf/color_table.h"
-#include "qxcore/graphics/rtf/document.h"
 #include "qxcore/graphics/rtf/font_table.h"
+#include "qxcore/ui/rtf/document.h"
 #include "tests/rtf/reference_walk.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {

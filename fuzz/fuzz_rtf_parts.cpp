@@ -1,7 +1,7 @@
 // The parts of any text: each lies in it, and what is cut is exactly what was handed out.
 
 #include "fuzz/fuzz_input.h"
-#include "qxcore/graphics/rtf/document.h"
+#include "qxcore/ui/rtf/document.h"
 
 namespace {
 

@@ -1,7 +1,7 @@
 // RTF to text on any bytes, and what was written anew reads the same.
 
 #include "fuzz/fuzz_input.h"
-#include "qxcore/graphics/rtf/document.h"
+#include "qxcore/ui/rtf/document.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   if (size > 20000) return 0;

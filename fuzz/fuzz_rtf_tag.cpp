@@ -1,7 +1,7 @@
 // The tag reader on any text: every tag is of one of the stated kinds, and nothing but blanks lies between tags.
 
 #include "fuzz/fuzz_input.h"
-#include "qxcore/graphics/rtf/document.h"
+#include "qxcore/ui/rtf/document.h"
 
 namespace {
 

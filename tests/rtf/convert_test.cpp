@@ -3,7 +3,7 @@
 
 #include <gtest/gtest.h>
 
-#include "qxcore/graphics/rtf/document.h"
+#include "qxcore/ui/rtf/document.h"
 #include "tests/rtf/rtf_file.h"
 #include "tests/support/failing_allocations.h"
 #include "tests/support/text.h"

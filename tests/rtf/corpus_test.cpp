@@ -10,8 +10,8 @@
 #include <vector>
 
 #include "qxcore/graphics/rtf/color_table.h"
-#include "qxcore/graphics/rtf/document.h"
 #include "qxcore/graphics/rtf/font_table.h"
+#include "qxcore/ui/rtf/document.h"
 #include "tests/rtf/reference_walk.h"
 #include "tests/rtf/rtf_file.h"
 #include "tests/support/text.h"

@@ -1,6 +1,6 @@
 // Parts of a document, and references that are renumbered.
 
-#include "qxcore/graphics/rtf/document.h"
+#include "qxcore/ui/rtf/document.h"
 
 #include <gtest/gtest.h>
 

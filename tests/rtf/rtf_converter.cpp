@@ -11,7 +11,7 @@
 #include <io.h>
 #endif
 
-#include "qxcore/graphics/rtf/document.h"
+#include "qxcore/ui/rtf/document.h"
 #include "tests/rtf/rtf_file.h"
 
 static void Write(const SString& text) {

@@ -5,7 +5,7 @@
 #include <string>
 #include <vector>
 
-#include "qxcore/graphics/rtf/document.h"
+#include "qxcore/ui/rtf/document.h"
 #include "tests/support/text.h"
 
 namespace {

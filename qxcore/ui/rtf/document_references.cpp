@@ -1,8 +1,8 @@
 // Renumbering of font and colour references. The words are those of the Rich Text Format specification 1.9.1.
 
-#include "qxcore/graphics/rtf/document.h"
 #include "qxcore/graphics/rtf/internal/tag.h"
 #include "qxcore/string/string_buffer.h"
+#include "qxcore/ui/rtf/document.h"
 
 namespace {
 

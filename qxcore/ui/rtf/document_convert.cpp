@@ -3,10 +3,30 @@
 #include <memory>
 
 #include "qxcore/core/internal/quietly.h"
-#include "qxcore/graphics/rtf/document.h"
-#include "qxcore/graphics/rtf/internal/rich_edit.h"
+#include "qxcore/ui/app/application.h"
+#include "qxcore/ui/control/rich_edit.h"
+#include "qxcore/ui/rtf/document.h"
 
 namespace {
+
+constexpr long kNoLimit = 0x7FFFFFFE;
+
+// The window that the hidden control is a child of: the owner window, or where there is none, the dummy window.
+HWND ParentOfHidden() {
+  const HWND owner = SGetOwnerWnd()->GetSafeHwnd();
+  return owner != nullptr ? owner : SDummyWindow()->GetSafeHwnd();
+}
+
+// The parent learns nothing of a control that belongs to no one but the document.
+int CreateHidden(SRichEditCtrl& edit) {
+  if (!edit.CreateEx(WS_EX_NOPARENTNOTIFY, nullptr, nullptr, WS_CHILD | ES_MULTILINE, 0, 0, 0, 0, ParentOfHidden(),
+                     nullptr)) {
+    return 0;
+  }
+  edit.SetTextMode(TM_RICHTEXT);
+  edit.SetTextLimit(kNoLimit);
+  return 1;
+}
 
 // Puts the text into the control and hands out what `read` gets back.
 int Convert(SRtfDocument& document, SRichEditCtrl*& edit, SString* result, const SString& text,
@@ -28,11 +48,13 @@ int Convert(SRtfDocument& document, SRichEditCtrl*& edit, SString* result, const
 
 }  // namespace
 
+// A control whose parent was destroyed has no window any more and is replaced.
 int SRtfDocument::CreateEditCtrl() {
-  if (m_edit != nullptr) return 1;
+  if (m_edit->GetSafeHwnd() != nullptr) return 1;
+  DeleteEditCtrl();
   SQuietly([this] {
     auto edit = std::make_unique<SRichEditCtrl>();
-    if (edit->Create() != 0) m_edit = edit.release();
+    if (CreateHidden(*edit) != 0) m_edit = edit.release();
   });
   return m_edit != nullptr;
 }

@@ -1,9 +1,9 @@
 // The parts of a text, as SRtfDocument hands them out.
 
-#include "qxcore/graphics/rtf/document.h"
 #include "qxcore/graphics/rtf/internal/parts.h"
 #include "qxcore/graphics/rtf/internal/tag.h"
 #include "qxcore/string/string_buffer.h"
+#include "qxcore/ui/rtf/document.h"
 
 namespace {
 

@@ -1,8 +1,8 @@
 // The tag reader of SRtfDocument.
 
-#include "qxcore/graphics/rtf/document.h"
 #include "qxcore/graphics/rtf/internal/tag.h"
 #include "qxcore/platform/wide.h"
+#include "qxcore/ui/rtf/document.h"
 
 int SRtfDocument::SkipSpace(WCHAR** cursor) {
   if (cursor == nullptr || *cursor == nullptr) return 0;
