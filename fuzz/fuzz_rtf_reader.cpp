@@ -12,7 +12,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   } else {
     for (const char byte : input.Rest()) characters += static_cast<unsigned char>(byte);
   }
-  static SRtfDocument document;
+  SRtfDocument document;
   const SString rtf(characters.c_str());
   SString text, written, again;
   FUZZ_CHECK(document.RtfToText(&text, rtf) == !text.IsEmpty());

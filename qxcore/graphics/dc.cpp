@@ -46,49 +46,26 @@ bool SDC::IsMetafile() const {
   return type == OBJ_METADC || type == OBJ_ENHMETADC;
 }
 
-// --- settings that the system returns through a pointer ---
+// --- settings whose former value the system returns through a pointer ---
 
-SPoint SDC::SetBrushOrg(const POINT& origin) {
-  SPoint former;
-  ::SetBrushOrgEx(m_hDC, origin.x, origin.y, &former);
+template <class Value, class Call>
+static Value Former(Call call, HDC dc, int first, int second) {
+  Value former;
+  call(dc, first, second, &former);
   return former;
 }
 
+SPoint SDC::SetBrushOrg(const POINT& origin) { return Former<SPoint>(::SetBrushOrgEx, m_hDC, origin.x, origin.y); }
 SPoint SDC::SetViewportOrg(const POINT& origin) {
-  SPoint former;
-  ::SetViewportOrgEx(m_hDC, origin.x, origin.y, &former);
-  return former;
+  return Former<SPoint>(::SetViewportOrgEx, m_hDC, origin.x, origin.y);
 }
-
 SPoint SDC::OffsetViewportOrg(const SIZE& distance) {
-  SPoint former;
-  ::OffsetViewportOrgEx(m_hDC, distance.cx, distance.cy, &former);
-  return former;
+  return Former<SPoint>(::OffsetViewportOrgEx, m_hDC, distance.cx, distance.cy);
 }
-
-SPoint SDC::SetWindowOrg(const POINT& origin) {
-  SPoint former;
-  ::SetWindowOrgEx(m_hDC, origin.x, origin.y, &former);
-  return former;
-}
-
-SSize SDC::SetViewportExt(const SIZE& extent) {
-  SSize former;
-  ::SetViewportExtEx(m_hDC, extent.cx, extent.cy, &former);
-  return former;
-}
-
-SSize SDC::SetWindowExt(const SIZE& extent) {
-  SSize former;
-  ::SetWindowExtEx(m_hDC, extent.cx, extent.cy, &former);
-  return former;
-}
-
-SPoint SDC::MoveTo(const POINT& to) {
-  SPoint former;
-  ::MoveToEx(m_hDC, to.x, to.y, &former);
-  return former;
-}
+SPoint SDC::SetWindowOrg(const POINT& origin) { return Former<SPoint>(::SetWindowOrgEx, m_hDC, origin.x, origin.y); }
+SSize SDC::SetViewportExt(const SIZE& extent) { return Former<SSize>(::SetViewportExtEx, m_hDC, extent.cx, extent.cy); }
+SSize SDC::SetWindowExt(const SIZE& extent) { return Former<SSize>(::SetWindowExtEx, m_hDC, extent.cx, extent.cy); }
+SPoint SDC::MoveTo(const POINT& to) { return Former<SPoint>(::MoveToEx, m_hDC, to.x, to.y); }
 
 SRect SDC::GetClipBox() const {
   SRect box;

@@ -16,11 +16,12 @@
 //   gradient button  a button whose face is blended by the variant: 5 top to bottom, 6 left to right, 7 diagonally up,
 //                    8 diagonally down
 //
-// Of the other variants, bit 0 exchanges the colours; for the first four kinds bit 1 mirrors: the blend runs over half
+// In the other variants bit 0 exchanges the colours; for the first four kinds bit 1 mirrors: the blend runs over half
 // of the extent and back.
 //
 // The kinds from corner on end with a frame of the frame type. An unknown kind draws nothing, and neither does an
-// empty rectangle. Rectangles are put in order before they are used, without changing the caller's.
+// empty rectangle. Rectangles are put in order before they are used, without changing the caller's. Drawing throws
+// SEOutOfMemory where a frame with round corners finds no memory.
 // Threads: a value belongs to one thread at a time; the functions serve any thread.
 #pragma once
 

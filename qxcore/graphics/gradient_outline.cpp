@@ -8,11 +8,13 @@
 #include "qxcore/graphics/internal/gradient_ramp.h"
 
 // How far an ellipse's quarter with these radii lies inside of its rectangle, line by line from the outside.
-static std::vector<int> InsetsOf(double along, double across) {
-  std::vector<int> insets(static_cast<std::size_t>(std::floor(along)));
-  for (std::size_t i = 0; i < insets.size(); ++i) {
-    double fromMiddle = (along - (static_cast<double>(i) + 0.5)) / along;
-    insets[i] = static_cast<int>(std::lround(across * (1 - std::sqrt(1 - fromMiddle * fromMiddle))));
+static STableDumb<int> InsetsOf(double along, double across) {
+  const int count = static_cast<int>(std::floor(along));
+  STableDumb<int> insets;
+  insets.GrowTo(count);
+  for (int i = 0; i < count; ++i) {
+    double fromMiddle = (along - (i + 0.5)) / along;
+    insets.Add(static_cast<int>(std::lround(across * (1 - std::sqrt(1 - fromMiddle * fromMiddle)))));
   }
   return insets;
 }
@@ -26,9 +28,9 @@ SGradientOutline::SGradientOutline(const SRect& rect, int frameType, const SSize
   m_columnInset = InsetsOf(m_corner.cx / 2.0, m_corner.cy / 2.0);
 }
 
-static int InsetAt(const std::vector<int>& insets, int fromStart, int fromEnd) {
-  std::size_t line = static_cast<std::size_t>(std::min(fromStart, fromEnd));
-  return line < insets.size() ? insets[line] : 0;
+static int InsetAt(const STableDumb<int>& insets, int fromStart, int fromEnd) {
+  int line = std::min(fromStart, fromEnd);
+  return line < insets.GetCount() ? insets.GetConst(line) : 0;
 }
 
 SRect SGradientOutline::Row(int y) const {

@@ -18,7 +18,7 @@ class QXCORE_API SMetafile {
   // True when there is a recording.
   explicit operator bool() const { return m_old || m_enhanced; }
   // Makes the recorded calls on a context. `rect` (logical units) is where the frame of an enhanced metafile comes to
-  // lie; for the old kind it counts for nothing. Returns false without a recording or a valid context.
+  // lie; the old kind ignores it. Returns false without a recording or a valid context.
   bool Play(HDC dc, const SRect& rect = SRect()) const;
 
  private:

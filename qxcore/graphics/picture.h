@@ -9,6 +9,6 @@
 QXCORE_API HRESULT SWritePicture(const SString& file, HBITMAP bitmap);
 
 // Reads a PNG file into a bitmap as CreatePixels makes it, transparent parts laid over white. Returns 0; the error of
-// the file, or ERROR_INVALID_DATA (0x8007000D) for one that is no PNG, is damaged or larger than 256 MiB or 32767
+// the file, or ERROR_INVALID_DATA (0x8007000D) for one that is not a PNG, is damaged or larger than 256 MiB or 32767
 // pixels on a side; the bitmap is as it was then. Throws SEOutOfMemory.
 QXCORE_API HRESULT SReadPicture(const SString& file, SBitmap* bitmap);

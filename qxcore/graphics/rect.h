@@ -127,7 +127,7 @@ class SRect : public RECT {
                  std::min(bottom, rect.bottom));
     return IsEmpty() || SRect(rect).IsEmpty() || shared.IsEmpty() ? SRect() : shared;
   }
-  // The smallest rectangle around both; an empty one counts for nothing.
+  // The smallest rectangle around both; an empty one is ignored.
   constexpr SRect operator|(const RECT& rect) const {
     if (IsEmpty()) return SRect(rect).IsEmpty() ? SRect() : SRect(rect);
     if (SRect(rect).IsEmpty()) return *this;

@@ -284,6 +284,13 @@ inline void WideLines(SDC& dc) {
     dc.LineTo(120, 24 * (width - 1));
     dc.MoveTo(130 + 8 * width, 60);
     dc.LineTo(130 + 8 * width, 120 + width);
+    SPen inside(PS_INSIDEFRAME, width, RGB(0, 20 * width, 0));
+    SBrush brush(RGB(255, 240, 200));
+    SSelectObject selectBrush(dc, brush);
+    const SRect rect(SPoint(222 + width % 2 * 48, 10 + width / 2 * 46), SSize(20 + width, 34));
+    dc.Rectangle(rect);
+    SSelectObject selectInside(dc, inside);
+    dc.Rectangle(SRect(SPoint(140 + width * 9, 140 + width % 2 * 40), SSize(20, 30)));
   }
 }
 

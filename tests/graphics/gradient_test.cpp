@@ -176,8 +176,20 @@ TEST(Gradients, KindsFillTheirRectangle) {
   }
 }
 
-// In an old metafile no rectangle is visible, and everything must be drawn.
+// An enhanced metafile of the screen's size plays pixel by pixel into a rectangle of that size.
+struct ScreenFrame {
+  ScreenFrame() {
+    SDC screen(::GetDC(nullptr));
+    pixels = SRect(0, 0, screen.GetDeviceCaps(HORZRES), screen.GetDeviceCaps(VERTRES));
+    frame = SRect(0, 0, screen.GetDeviceCaps(HORZSIZE) * 100, screen.GetDeviceCaps(VERTSIZE) * 100);
+    ::ReleaseDC(nullptr, screen.Detach());
+  }
+  SRect pixels, frame;
+};
+
+// In an old metafile no rectangle is visible, and everything must be drawn; in an enhanced one all is.
 TEST(Gradients, MetafilesPlayAsDirectDrawing) {
+  const ScreenFrame screen;
   for (int mode : {0x10, 0x13, 0x20, 0x21, 0x40, 0x80, 0x100, 0x200, 0x400, 0x800, 0x1005, 0x1006, 0x1007, 0x1008}) {
     for (int frame : {SDrawGradient::FRAME_NONE, SDrawGradient::FRAME_ROUND_RECT, SDrawGradient::FRAME_ETCHED}) {
       SDrawGradient gradient;
@@ -193,6 +205,15 @@ TEST(Gradients, MetafilesPlayAsDirectDrawing) {
       SMetafile metafile = recording.Close();
       ASSERT_TRUE(metafile.Play(played.dc));
       ASSERT_EQ(direct.All(), played.All()) << std::hex << mode << ' ' << frame;
+
+      Canvas enhanced(50, 40);
+      SEnhMetafileDC enhancedRecording(screen.frame);
+      ASSERT_TRUE(enhancedRecording.IsMetafile());
+      ASSERT_TRUE(enhancedRecording.RectVisible(SRect(-5, -5, -1, -1)));
+      gradient.DrawGradient(enhancedRecording);
+      SMetafile enhancedMetafile = enhancedRecording.Close();
+      ASSERT_TRUE(enhancedMetafile.Play(enhanced.dc, screen.pixels));
+      ASSERT_EQ(direct.All(), enhanced.All()) << std::hex << mode << ' ' << frame;
     }
   }
 }

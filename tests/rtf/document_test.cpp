@@ -42,6 +42,9 @@ TEST(Parts, AreFoundInOddTexts) {
   EXPECT_EQ(SRtfDocument::ExtractFontTable(loose, part, 0), 1);
   EXPECT_EQ(part,
             WTEXT("{\\fonttbl{\\f0\\fswiss\\fcharset0 Helvetica;}{\\f1\\fnil{\\*\\panose 02;}Monaco;}{\\f2 Open;}}"));
+  SString binary(WTEXT("{\\fonttbl\\f0 A;{\\f1 B;}\\bin3 }}}\\f2 C;}"));
+  EXPECT_EQ(SRtfDocument::ExtractFontTable(binary, part, 0), 1);
+  EXPECT_EQ(part, binary) << "handed out as it is";
   SString hidden(WTEXT("{\\rtf1 \\{\\fonttbl a\\\\{ {\\bin14 {\\fonttbl{\\f0}}{ \\* \\colortbl;;}"));
   EXPECT_EQ(SRtfDocument::ExtractFontTable(hidden, part, 0), 0);
   EXPECT_EQ(SRtfDocument::ExtractColorTable(hidden, part, 0), 1);

@@ -1,14 +1,13 @@
 // The area that a gradient fills, and the frame around it.
 #pragma once
 
-#include <vector>
-
+#include "qxcore/container/table_dumb.h"
 #include "qxcore/graphics/dc.h"
 
 // A rectangle, or one with round corners.
 class SGradientOutline {
  public:
-  // Round when the frame type says so and the corners have a size.
+  // Round when the frame type says so and the corners have a size. Throws SEOutOfMemory.
   SGradientOutline(const SRect& rect, int frameType, const SSize& corner);
 
   const SRect& Rect() const { return m_rect; }
@@ -24,6 +23,6 @@ class SGradientOutline {
   SRect m_rect;
   int m_frameType;
   SSize m_corner;
-  std::vector<int> m_rowInset;     // of the rows from the top, as far as the corner goes
-  std::vector<int> m_columnInset;  // of the columns from the left
+  STableDumb<int> m_rowInset;     // of the rows from the top, as far as the corner goes
+  STableDumb<int> m_columnInset;  // of the columns from the left
 };

@@ -91,7 +91,7 @@ class EntryReader {
       while (!tag.empty() && (rtf::IsSpace(tag.back()) || tag.back() == ';')) tag.remove_suffix(1);
       if (!m_hasNumber && IsNumberWord(tag, m_number)) {
         m_hasNumber = true;
-      } else if (!IsBinary(tag)) {
+      } else if (!rtf::IsBinary(tag)) {
         m_words.Add(tag);
       }
     }
@@ -99,13 +99,8 @@ class EntryReader {
   }
   void ReadName(rtf::TagReader& tags, SStringView tag) {
     for (; !IsEnd(tag); tag = tags.Next(true)) {
-      if (!IsGroup(tag) && !IsBinary(tag)) m_name.Add(tag);
+      if (!IsGroup(tag) && !rtf::IsBinary(tag)) m_name.Add(tag);
     }
-  }
-  // Binary data has no place in an entry, and its word would swallow what is written behind it.
-  static bool IsBinary(SStringView tag) {
-    return tag[0] == '\\' &&
-           platform::ReadRtfWord(tag.data() + 1, tag.data() + tag.size()).key == platform::RtfKey("bin");
   }
 
   int m_number = 0;

@@ -17,12 +17,12 @@ struct QXCORE_API SRtfFontEntry {
 
   // The entry as text, as in "{\f2\froman\fcharset0 Times;}".
   SString GetFontEntry() const;
-  // Reads one entry, a group in braces, and returns 1; a text that is no entry clears this one and returns 0.
+  // Reads one entry, a group in braces, and returns 1; an invalid text clears this one and returns 0.
   //
   // The number is that of the entry's word \fN; what exceeds an int is clipped. The name begins at the first
   // tag that is a text, an escape or a Unicode character \uN, and runs to the end of the group; blanks are
   // trimmed, then one ";". Groups inside the entry (an alternative name, a panose number, an embedded font)
-  // are skipped. An entry without a number or a name is none. Returns 0, too, when memory runs out.
+  // are skipped. An entry without a number or a name is invalid. Returns 0 also when memory runs out.
   int SetFontEntry(const SString& text);
 
   // Entries are equal when their names are, without regard to case.
@@ -43,8 +43,8 @@ class QXCORE_API SRtfFontTable : public STableMem<SRtfFontEntry> {
   // that the same font has here. Of entries with one name the first counts, of those with one number the last.
   //
   // `text` is a font table group with each entry in a group of its own, as GetFontTable and
-  // SRtfDocument::ExtractFontTable make it. What is no entry is skipped; the table ends at the first tag that
-  // is no group. Time grows with the sizes of both tables, not with their product. On a failure
+  // SRtfDocument::ExtractFontTable make it. Invalid entries are skipped; the table ends at the first tag
+  // that is not a group. Time grows with the sizes of both tables, not with their product. On a failure
   // g_RaiseError is called with "RTF Font table: Add font table"; what was read so far is kept and returned.
   SMap<int, int> AddFontTable(const SString& text);
 };

@@ -9,7 +9,7 @@
 //
 // Operations answer with an int, 0 for failure, and let no exception out; results are unchanged then unless
 // stated otherwise. Groups may be nested to any depth. A group without its closing brace runs to the end of
-// the text. For one thread at a time; the conversions belong to a thread that may have windows.
+// the text. For one thread at a time, the conversions for the user-interface thread.
 #pragma once
 
 #include <concepts>
@@ -56,13 +56,13 @@ class QXCORE_API SRtfDocument {
 
   // --- parts of a text ---
   // Hand out a part. With `cut` not 0 the part is also removed from `rtf`. Return 1; 0 with an empty part when
-  // there is none, or when memory runs out. `rtf` and the part may not be one string.
+  // it is missing, or when memory runs out. `rtf` and the part may not be one string.
   //
-  // The header: from the opening brace up to the first thing that is no part of it, with the blanks before
+  // The header: from the opening brace up to the first thing that does not belong to it, with the blanks before
   // that; the brace stays open, so header and rest are the whole text again. Its parts are the control words
   // for version, character set, default fonts and languages, and the groups of tables and document
   // information (fonts, files, colours, styles, lists, revisions, document variables, generator, ...). Words that
-  // format pages, sections, paragraphs or characters belong to the body. 0 for a text that is no RTF.
+  // format pages, sections, paragraphs or characters belong to the body. 0 for a text that is not RTF.
   static int ExtractHeader(SString& rtf, SString& header, int cut);
   // The first \fonttbl group, with its braces. Entries that stand in it without braces of their own, as some
   // writers leave them, are handed out with braces, so that SRtfFontTable::AddFontTable reads them.
@@ -81,8 +81,10 @@ class QXCORE_API SRtfDocument {
                                 const SMap<int, int>& colorMap);
 
   // --- conversions, through a hidden rich-edit control ---
-  // Make the control if there is none, put the text in and read it back. Text ends at a NUL; lines end with
-  // CR LF. Return 1 when what was read back is not empty, or when the input is empty; 0 without a control,
+  // The control is a child of the owner window, or of the dummy window where there is no owner. It ends with its parent,
+  // and the next conversion makes another one.
+  //
+  // Make the control if it is missing, put the text in and read it back. Text ends at a NUL; lines end with CR LF. Return 1 when what was read back is not empty, or when the input is empty; 0 without a control,
   // with a null output, or when memory runs out. The output may be the input.
   //
   // RtfToText returns the text that a reader sees. Plain text comes back as it is. On Linux: tabs between cells,
@@ -92,7 +94,7 @@ class QXCORE_API SRtfDocument {
   // TextToRtf returns the text as a document; a text that begins with "{\rtf" is read as RTF and written anew.
   int TextToRtf(SString* rtf, const SString& text);
 
-  // Makes the control, if there is none. Returns 1; 0 when that fails.
+  // Makes the control if it is missing. Returns 1; 0 when that fails.
   int CreateEditCtrl();
   // Destroys the control, if there is one.
   void DeleteEditCtrl();

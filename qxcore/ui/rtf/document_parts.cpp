@@ -46,13 +46,17 @@ class EntryGrouper {
   bool m_isOpenWord = false;  // the last tag was a control word without its blank
 };
 
+// Whether braces are missing and can be put: binary data among the entries would move.
 bool HasEntriesWithoutBraces(SStringView table) {
   rtf::TagReader tags(table);
   tags.Next(false);
   tags.Next(false);
-  SStringView tag = tags.Next(true);
-  while (!tag.empty() && tag[0] == '{') tag = tags.Next(true);
-  return !tag.empty() && tag[0] != '}';
+  bool areMissing = false;
+  for (SStringView tag = tags.Next(true); !tag.empty() && tag[0] != '}'; tag = tags.Next(true)) {
+    if (rtf::IsBinary(tag)) return false;
+    areMissing = areMissing || tag[0] != '{';
+  }
+  return areMissing;
 }
 
 int ExtractGroup(SString& text, SString& part, int cut, std::uint64_t key) {

@@ -72,6 +72,13 @@ inline bool IsOpenWord(SStringView tag) {
          !IsSpace(tag.back());
 }
 
+// Whether a tag is the word \binN. Binary data has no place in an entry of a table, and the word would swallow what is
+// written behind it.
+inline bool IsBinary(SStringView tag) {
+  return tag[0] == '\\' &&
+         platform::ReadRtfWord(tag.data() + 1, tag.data() + tag.size()).key == platform::RtfKey("bin");
+}
+
 // Walks over the tags of a text that ends at an address. A backslash alone, in front of a line end, is left out.
 class TagReader {
  public:

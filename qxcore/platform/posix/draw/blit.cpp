@@ -143,7 +143,7 @@ bool RecordStretch(Context& to, const Rectangle4& target, const Surface& from, c
                    const Rectangle4& origin, int table) {
   if (!to.m_recorder) return false;
   KeptSource kept{Bitmap::Make(from.width, from.height, from.mono ? 1 : 32), fromSettings};
-  if (!kept.bitmap) return true;
+  if (!kept.bitmap) throw std::bad_alloc();
   for (int y = 0; y < from.height; ++y)
     std::memcpy(kept.bitmap->m_surface.Row(y), from.Row(y), static_cast<std::size_t>(from.width) * 4);
   to.m_recorder->Add([=](HDC handle) {
@@ -165,7 +165,7 @@ BOOL StretchFrom(Context& to, const Rectangle4& target, const Surface& from, con
 }  // namespace
 
 BOOL StretchBlt(HDC toHandle, int x, int y, int width, int height, HDC fromHandle, int fromX, int fromY, int fromWidth,
-                int fromHeight, DWORD rop) {
+                int fromHeight, DWORD rop) try {
   int table = TableOf(rop);
   if (!UsesSource(table)) return PatBlt(toHandle, x, y, width, height, rop);
   auto* to = Find<Context>(toHandle);
@@ -174,13 +174,15 @@ BOOL StretchBlt(HDC toHandle, int x, int y, int width, int height, HDC fromHandl
   int left = from->X(fromX), top = from->Y(fromY);
   Rectangle4 origin{left, top, from->X(fromX + fromWidth) - left, from->Y(fromY + fromHeight) - top};
   return StretchFrom(*to, {x, y, width, height}, from->m_surface, from->m_settings, origin, table);
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
 BOOL BitBlt(HDC to, int x, int y, int width, int height, HDC from, int fromX, int fromY, DWORD rop) {
   return StretchBlt(to, x, y, width, height, from, fromX, fromY, width, height, rop);
 }
 
-BOOL PatBlt(HDC handle, int x, int y, int width, int height, DWORD rop) {
+BOOL PatBlt(HDC handle, int x, int y, int width, int height, DWORD rop) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   int table = TableOf(rop);
@@ -191,22 +193,28 @@ BOOL PatBlt(HDC handle, int x, int y, int width, int height, DWORD rop) {
   Paint paint = UsesPattern(table) ? PaintOf(*dc, *dc->m_settings.brush) : SolidPaint(*dc, 0);
   PaintBox(*dc, dc->Map(x, y, x + width, y + height), paint, rop2);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-COLORREF GetPixel(HDC handle, int x, int y) {
+COLORREF GetPixel(HDC handle, int x, int y) try {
   auto* dc = Find<Context>(handle);
   if (!dc || dc->m_recorder) return CLR_INVALID;
   int atX = dc->X(x), atY = dc->Y(y);
   return dc->Clip().Contains(atX, atY) ? ColorOf(dc->m_surface.Row(atY)[atX]) : CLR_INVALID;
+} catch (const std::bad_alloc&) {
+  return NoMemory(COLORREF{CLR_INVALID});
 }
 
-BOOL SetPixelV(HDC handle, int x, int y, COLORREF color) {
+BOOL SetPixelV(HDC handle, int x, int y, COLORREF color) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   if (Record(*dc, [=](HDC to) { SetPixelV(to, x, y, color); })) return TRUE;
   int atX = dc->X(x), atY = dc->Y(y);
   PaintBox(*dc, {atX, atY, atX + 1, atY + 1}, SolidPaint(*dc, color), dc->m_settings.rop2);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
 COLORREF SetPixel(HDC dc, int x, int y, COLORREF color) {

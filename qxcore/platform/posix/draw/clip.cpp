@@ -12,15 +12,12 @@ Box OnDevice(const Context& dc, const RECT& rect) {
 }
 
 // Before a context has a clip region, everything belongs to it.
-void EnsureClip(Context& dc) {
-  constexpr int kFar = 1 << 27;
-  if (!dc.m_settings.clipped) dc.m_settings.clip.SetBox({-kFar, -kFar, kFar, kFar});
-  dc.m_settings.clipped = true;
-}
-
 int CombineClip(Context& dc, const Area& area, int mode) {
-  EnsureClip(dc);
-  dc.m_settings.clip.Combine(area, mode);
+  constexpr int kFar = 1 << 27;
+  Area clip = dc.m_settings.clipped ? dc.m_settings.clip : Area({-kFar, -kFar, kFar, kFar});
+  clip.Combine(area, mode);
+  dc.m_settings.clip = std::move(clip);
+  dc.m_settings.clipped = true;
   dc.UpdateClip();
   return dc.m_settings.clip.Complexity();
 }
@@ -35,7 +32,7 @@ int Unclip(Context& dc) {
 
 int SelectClipRgn(HDC dc, HRGN region) { return ExtSelectClipRgn(dc, region, RGN_COPY); }
 
-int ExtSelectClipRgn(HDC handle, HRGN regionHandle, int mode) {
+int ExtSelectClipRgn(HDC handle, HRGN regionHandle, int mode) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return RGN_ERROR;
   if (!regionHandle) {
@@ -49,20 +46,26 @@ int ExtSelectClipRgn(HDC handle, HRGN regionHandle, int mode) {
     if (auto* target = Find<Context>(to)) CombineClip(*target, area, mode);
   });
   return CombineClip(*dc, region->m_area, mode);
+} catch (const std::bad_alloc&) {
+  return NoMemory(RGN_ERROR);
 }
 
-int IntersectClipRect(HDC handle, int left, int top, int right, int bottom) {
+int IntersectClipRect(HDC handle, int left, int top, int right, int bottom) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return RGN_ERROR;
   Record(*dc, [=](HDC to) { IntersectClipRect(to, left, top, right, bottom); });
   return CombineClip(*dc, Area(OnDevice(*dc, {left, top, right, bottom})), RGN_AND);
+} catch (const std::bad_alloc&) {
+  return NoMemory(RGN_ERROR);
 }
 
-int ExcludeClipRect(HDC handle, int left, int top, int right, int bottom) {
+int ExcludeClipRect(HDC handle, int left, int top, int right, int bottom) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return RGN_ERROR;
   Record(*dc, [=](HDC to) { ExcludeClipRect(to, left, top, right, bottom); });
   return CombineClip(*dc, Area(OnDevice(*dc, {left, top, right, bottom})), RGN_DIFF);
+} catch (const std::bad_alloc&) {
+  return NoMemory(RGN_ERROR);
 }
 
 int OffsetClipRgn(HDC handle, int dx, int dy) {
@@ -75,7 +78,7 @@ int OffsetClipRgn(HDC handle, int dx, int dy) {
   return dc->m_settings.clip.Complexity();
 }
 
-int GetClipBox(HDC handle, RECT* rect) {
+int GetClipBox(HDC handle, RECT* rect) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return RGN_ERROR;
   const Area& clip = dc->Clip();
@@ -87,28 +90,36 @@ int GetClipBox(HDC handle, RECT* rect) {
   DPtoLP(handle, corners, 2);
   *rect = {corners[0].x, corners[0].y, corners[1].x, corners[1].y};
   return clip.Complexity();
+} catch (const std::bad_alloc&) {
+  return NoMemory(RGN_ERROR);
 }
 
-int GetClipRgn(HDC handle, HRGN regionHandle) {
+int GetClipRgn(HDC handle, HRGN regionHandle) try {
   auto* dc = Find<Context>(handle);
   auto* region = Find<RegionObject>(regionHandle);
   if (!dc || !region) return -1;
   if (!dc->m_settings.clipped) return 0;
   region->m_area = dc->m_settings.clip;
   return 1;
+} catch (const std::bad_alloc&) {
+  return NoMemory(-1);
 }
 
 // An enhanced metafile has no edges, an old one nothing that could be seen.
-BOOL RectVisible(HDC handle, const RECT* rect) {
+BOOL RectVisible(HDC handle, const RECT* rect) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   if (dc->m_recorder) return dc->m_type == OBJ_ENHMETADC;
   Box box = dc->Map(*rect);
   if (const Box* clip = dc->SingleClip()) return !IsEmpty(Intersect(box, *clip));
   return dc->Clip().Meets(box);
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-BOOL PtVisible(HDC handle, int x, int y) {
+BOOL PtVisible(HDC handle, int x, int y) try {
   auto* dc = Find<Context>(handle);
   return dc && !dc->m_recorder && dc->Clip().Contains(dc->X(x), dc->Y(y));
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }

@@ -3,7 +3,7 @@
 #include <string>
 #include <vector>
 
-#include "qxcore/platform/win32.h"
+#include "qxcore/platform/posix/draw/object.h"
 
 namespace {
 
@@ -209,7 +209,7 @@ int TopOf(const RECT& rect, int height, UINT format) {
 
 }  // namespace
 
-int DrawTextW(HDC dc, LPCWSTR text, int count, RECT* rect, UINT format) {
+int DrawTextW(HDC dc, LPCWSTR text, int count, RECT* rect, UINT format) try {
   if (!rect || !GetObjectType(dc)) return 0;
   if (!text) return 0;
   SStringView given = count < 0 ? SStringView(text) : SStringView(text, static_cast<std::size_t>(count));
@@ -251,4 +251,6 @@ int DrawTextW(HDC dc, LPCWSTR text, int count, RECT* rect, UINT format) {
     rect->bottom = top + height;
   }
   return top - rect->top + height;
+} catch (const std::bad_alloc&) {
+  return draw::NoMemory(0);
 }

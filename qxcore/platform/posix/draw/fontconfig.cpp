@@ -3,6 +3,7 @@
 #include <dlfcn.h>
 #include <strings.h>
 
+#include <memory>
 #include <mutex>
 
 namespace draw::fontconfig {
@@ -82,9 +83,8 @@ FontFile Match(const Library& library, void* request, F read) {
   int result = 0;
   void* found = library.match(library.config, request, &result);
   library.destroy(request);
-  FontFile file = found ? read(found) : FontFile();
-  if (found) library.destroy(found);
-  return file;
+  const std::unique_ptr<void, void (*)(void*)> end(found, library.destroy);
+  return found ? read(found) : FontFile();
 }
 
 FontFile FileOf(const Library& library, void* found) {

@@ -25,6 +25,7 @@ int AddImages(ImageList& list, const Bitmap& images, F drawn) {
   int first = static_cast<int>(list.m_images.size()), count = images.m_surface.width / list.m_width;
   int height = std::min(list.m_height, images.m_surface.height);
   if (count < 1) return Fail(-1);
+  std::vector<Ref<Bitmap>> all = list.m_images;
   for (int i = 0; i < count; ++i) {
     Ref<Bitmap> image(Bitmap::Make(list.m_width, list.m_height, 32));
     if (!image) return Fail(-1, ERROR_NOT_ENOUGH_MEMORY);
@@ -35,8 +36,9 @@ int AddImages(ImageList& list, const Bitmap& images, F drawn) {
         image->m_surface.Row(y)[x] = drawn(fromX, y) ? pixel | kDrawn : pixel;
       }
     }
-    list.m_images.push_back(image);
+    all.push_back(image);
   }
+  list.m_images.swap(all);
   return first;
 }
 
@@ -78,7 +80,7 @@ BOOL ImageList_GetIconSize(HIMAGELIST handle, int* width, int* height) {
   return TRUE;
 }
 
-int ImageList_Add(HIMAGELIST handle, HBITMAP imagesHandle, HBITMAP maskHandle) {
+int ImageList_Add(HIMAGELIST handle, HBITMAP imagesHandle, HBITMAP maskHandle) try {
   auto* list = Find<ImageList>(handle);
   auto* images = Find<Bitmap>(imagesHandle);
   auto* mask = maskHandle ? Find<Bitmap>(maskHandle) : nullptr;
@@ -87,15 +89,19 @@ int ImageList_Add(HIMAGELIST handle, HBITMAP imagesHandle, HBITMAP maskHandle) {
     return !mask || x >= mask->m_surface.width || y >= mask->m_surface.height ||
            !(mask->m_surface.Row(y)[x] & 0xFFFFFF);
   });
+} catch (const std::bad_alloc&) {
+  return NoMemory(-1);
 }
 
-int ImageList_AddMasked(HIMAGELIST handle, HBITMAP imagesHandle, COLORREF transparent) {
+int ImageList_AddMasked(HIMAGELIST handle, HBITMAP imagesHandle, COLORREF transparent) try {
   auto* list = Find<ImageList>(handle);
   auto* images = Find<Bitmap>(imagesHandle);
   if (!list || !images) return -1;
   // The default colour is that of the first pixel.
   std::uint32_t pixel = transparent == CLR_DEFAULT ? images->m_surface.Row(0)[0] & 0xFFFFFF : PixelOf(transparent);
   return AddImages(*list, *images, [=](int x, int y) { return (images->m_surface.Row(y)[x] & 0xFFFFFF) != pixel; });
+} catch (const std::bad_alloc&) {
+  return NoMemory(-1);
 }
 
 BOOL ImageList_Remove(HIMAGELIST handle, int index) {
@@ -110,13 +116,15 @@ BOOL ImageList_Remove(HIMAGELIST handle, int index) {
   return TRUE;
 }
 
-BOOL ImageList_Draw(HIMAGELIST handle, int index, HDC dcHandle, int x, int y, UINT style) {
+BOOL ImageList_Draw(HIMAGELIST handle, int index, HDC dcHandle, int x, int y, UINT style) try {
   auto* list = Find<ImageList>(handle);
   auto* dc = Find<Context>(dcHandle);
   if (!list || !dc || index < 0 || index >= static_cast<int>(list->m_images.size())) return FALSE;
   bool transparent = style & ILD_TRANSPARENT;
   DrawImage(*dc, x, y, list->m_images[static_cast<std::size_t>(index)], transparent ? CLR_NONE : list->m_background);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
 COLORREF ImageList_SetBkColor(HIMAGELIST handle, COLORREF color) {

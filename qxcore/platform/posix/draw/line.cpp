@@ -178,12 +178,6 @@ void DrawLines(const Context& dc, const POINT* points, int count, bool closed) {
 
 using namespace draw;
 
-static std::vector<POINT> Mapped(const Context& dc, const POINT* points, int count) {
-  std::vector<POINT> mapped(points, points + count);
-  for (POINT& point : mapped) point = {dc.X(point.x), dc.Y(point.y)};
-  return mapped;
-}
-
 BOOL MoveToEx(HDC handle, int x, int y, POINT* old) {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
@@ -200,7 +194,7 @@ BOOL GetCurrentPositionEx(HDC handle, POINT* position) {
   return TRUE;
 }
 
-BOOL LineTo(HDC handle, int x, int y) {
+BOOL LineTo(HDC handle, int x, int y) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   POINT from = std::exchange(dc->m_settings.position, POINT{x, y});
@@ -208,31 +202,39 @@ BOOL LineTo(HDC handle, int x, int y) {
   POINT line[2] = {{dc->X(from.x), dc->Y(from.y)}, {dc->X(x), dc->Y(y)}};
   DrawLines(*dc, line, 2, false);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-BOOL Polyline(HDC handle, const POINT* points, int count) {
+// Records a call with points, or draws with them in pixels of the surface.
+template <class Draw>
+static BOOL WithPoints(HDC handle, const POINT* points, int count, BOOL (*again)(HDC, const POINT*, int), Draw draw) {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   if (count < 2) return Fail(FALSE);
-  if (Record(*dc, [copy = std::vector<POINT>(points, points + count)](HDC to) {
-        Polyline(to, copy.data(), static_cast<int>(copy.size()));
-      }))
+  std::vector<POINT> copy(points, points + count);
+  if (!dc->m_recorder) {
+    for (POINT& point : copy) point = {dc->X(point.x), dc->Y(point.y)};
+    draw(*dc, copy.data());
     return TRUE;
-  DrawLines(*dc, Mapped(*dc, points, count).data(), count, false);
-  return TRUE;
+  }
+  return Record(*dc,
+                [copy = std::move(copy), again](HDC to) { again(to, copy.data(), static_cast<int>(copy.size())); });
 }
 
-BOOL Polygon(HDC handle, const POINT* points, int count) {
-  auto* dc = Find<Context>(handle);
-  if (!dc) return FALSE;
-  if (count < 2) return Fail(FALSE);
-  if (Record(*dc, [copy = std::vector<POINT>(points, points + count)](HDC to) {
-        Polygon(to, copy.data(), static_cast<int>(copy.size()));
-      }))
-    return TRUE;
-  std::vector<POINT> mapped = Mapped(*dc, points, count);
-  PaintArea(*dc, PolygonArea(mapped.data(), count, dc->m_settings.polyFillMode, dc->Clip().Extents()),
-            PaintOf(*dc, *dc->m_settings.brush), dc->m_settings.rop2);
-  DrawLines(*dc, mapped.data(), count, true);
-  return TRUE;
+BOOL Polyline(HDC handle, const POINT* points, int count) try {
+  return WithPoints(handle, points, count, &Polyline,
+                    [=](const Context& dc, const POINT* mapped) { DrawLines(dc, mapped, count, false); });
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
+}
+
+BOOL Polygon(HDC handle, const POINT* points, int count) try {
+  return WithPoints(handle, points, count, &Polygon, [=](const Context& dc, const POINT* mapped) {
+    const Settings& set = dc.m_settings;
+    PaintArea(dc, PolygonArea(mapped, count, set.polyFillMode, dc.Clip().Extents()), PaintOf(dc, *set.brush), set.rop2);
+    DrawLines(dc, mapped, count, true);
+  });
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }

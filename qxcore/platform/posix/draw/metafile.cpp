@@ -4,18 +4,23 @@ using namespace draw;
 
 namespace {
 
+// A frame is in 0.01 mm, by the screen's size in both units.
+RECT InPixels(HDC dc, const RECT& frame) {
+  int width = GetDeviceCaps(dc, HORZRES), height = GetDeviceCaps(dc, VERTRES);
+  int across = GetDeviceCaps(dc, HORZSIZE) * 100, down = GetDeviceCaps(dc, VERTSIZE) * 100;
+  return {MulDiv(frame.left, width, across), MulDiv(frame.top, height, down), MulDiv(frame.right, width, across),
+          MulDiv(frame.bottom, height, down)};
+}
+
 HDC BeginRecording(DWORD type, LPCWSTR file, const RECT* frame) {
   if (file) return Fail<HDC>(nullptr, ERROR_NOT_SUPPORTED);
-  auto* dc = new Context(type);
-  if (dc) {
-    dc->m_recorder = std::make_unique<Recorder>();
-    // A frame is in 0.01 mm.
-    int dpi = static_cast<int>(GetDpiForSystem());
-    if (frame)
-      dc->m_recorder->m_frame = {MulDiv(frame->left, dpi, 2540), MulDiv(frame->top, dpi, 2540),
-                                 MulDiv(frame->right, dpi, 2540), MulDiv(frame->bottom, dpi, 2540)};
-  }
-  return EnterAs<HDC>(dc);
+  auto recorder = std::make_unique<Recorder>();
+  Ref<Context> dc(new Context(type));
+  if (!dc) return NoMemory(HDC{});
+  dc->m_recorder = std::move(recorder);
+  HDC handle = EnterAs<HDC>(dc.get());
+  if (handle && frame) dc->m_recorder->m_frame = InPixels(handle, *frame);
+  return handle;
 }
 
 template <class Handle>
@@ -23,6 +28,7 @@ Handle EndRecording(HDC handle, DWORD contextType, DWORD type) {
   auto* dc = Find<Context>(handle);
   if (!dc || dc->m_type != contextType) return Fail<Handle>(nullptr, ERROR_INVALID_HANDLE);
   Ref<Object> keep = Remove(handle);
+  if (dc->m_recorder->m_isBroken) return NoMemory(Handle{});
   return EnterAs<Handle>(new Metafile(type, std::move(dc->m_recorder->m_calls), dc->m_recorder->m_frame));
 }
 
@@ -39,7 +45,11 @@ void Play(HDC dc, const Metafile& metafile) {
 
 }  // namespace
 
-HDC CreateMetaFileW(LPCWSTR file) { return BeginRecording(OBJ_METADC, file, nullptr); }
+HDC CreateMetaFileW(LPCWSTR file) try {
+  return BeginRecording(OBJ_METADC, file, nullptr);
+} catch (const std::bad_alloc&) {
+  return NoMemory(HDC{});
+}
 
 HMETAFILE CloseMetaFile(HDC dc) { return EndRecording<HMETAFILE>(dc, OBJ_METADC, OBJ_METAFILE); }
 
@@ -59,8 +69,10 @@ BOOL PlayMetaFile(HDC handle, HMETAFILE metafileHandle) {
 
 BOOL DeleteMetaFile(HMETAFILE metafile) { return DeleteMetafile(metafile, OBJ_METAFILE); }
 
-HDC CreateEnhMetaFileW(HDC, LPCWSTR file, const RECT* frame, LPCWSTR) {
+HDC CreateEnhMetaFileW(HDC, LPCWSTR file, const RECT* frame, LPCWSTR) try {
   return BeginRecording(OBJ_ENHMETADC, file, frame);
+} catch (const std::bad_alloc&) {
+  return NoMemory(HDC{});
 }
 
 HENHMETAFILE CloseEnhMetaFile(HDC dc) { return EndRecording<HENHMETAFILE>(dc, OBJ_ENHMETADC, OBJ_ENHMETAFILE); }
@@ -76,6 +88,7 @@ BOOL PlayEnhMetaFile(HDC handle, HENHMETAFILE metafileHandle, const RECT* rect) 
   double scaleX = width > 0 ? double(box.x2 - box.x1) / width : 1;
   double scaleY = height > 0 ? double(box.y2 - box.y1) / height : 1;
   int saved = SaveDC(handle);
+  if (saved == 0) return FALSE;
   SetMapMode(handle, MM_TEXT);
   SetViewportOrgEx(handle, 0, 0, nullptr);
   SetWindowOrgEx(handle, 0, 0, nullptr);

@@ -3,10 +3,13 @@
 // A handle is a number: a slot, the kind, and the slot's generation, so that a stale one finds nothing. The table
 // holds one reference to each object and every context one more to what is selected into it; so a selected object
 // outlives its handle. Looking up takes no lock; entering and removing do.
+//
+// Where memory is short, std::bad_alloc is thrown inside and leaves no call: it fails with ERROR_NOT_ENOUGH_MEMORY.
 #pragma once
 
 #include <atomic>
 #include <cstdint>
+#include <new>
 #include <utility>
 
 #include "qxcore/platform/win32.h"
@@ -96,6 +99,12 @@ template <class T>
 T Fail(T result, DWORD error = ERROR_INVALID_PARAMETER) {
   SetLastError(error);
   return result;
+}
+
+// The result of a call for which memory is short.
+template <class T>
+T NoMemory(T result) {
+  return Fail(result, ERROR_NOT_ENOUGH_MEMORY);
 }
 
 }  // namespace draw

@@ -35,10 +35,10 @@ pixman_region32_t* RegionOf(HRGN handle) {
   return region ? region->m_area.Pixman() : nullptr;
 }
 
-HRGN MakeRegion(const pixman_region32_t* content) {
-  auto* region = new RegionObject(Area());
-  if (region) pixman_region32_copy(region->m_area.Pixman(), const_cast<pixman_region32_t*>(content));
-  return EnterAs<HRGN>(region);
+HRGN MakeRegion(const pixman_region32_t* content) try {
+  return EnterAs<HRGN>(new RegionObject(Area(content)));
+} catch (const std::bad_alloc&) {
+  return NoMemory(HRGN{});
 }
 
 void FreeRegion(HRGN region) { DeleteObject(region); }

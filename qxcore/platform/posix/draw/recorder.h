@@ -12,9 +12,18 @@ using Call = std::function<void(HDC)>;
 
 class Recorder {
  public:
-  void Add(Call call) { m_calls.push_back(std::move(call)); }
+  // Keeps a call. A recording for which memory is short is not handed out.
+  template <class F>
+  void Add(F&& call) noexcept {
+    try {
+      m_calls.emplace_back(std::forward<F>(call));
+    } catch (const std::bad_alloc&) {
+      m_isBroken = true;
+    }
+  }
 
   std::vector<Call> m_calls;
+  bool m_isBroken = false;
   RECT m_frame{};  // of an enhanced metafile, in pixels; empty without one
 };
 
@@ -23,7 +32,7 @@ template <class F>
 bool Record(Context& dc, F call) {
   if (!dc.m_recorder) [[likely]]
     return false;
-  dc.m_recorder->Add(call);
+  dc.m_recorder->Add(std::move(call));
   return true;
 }
 

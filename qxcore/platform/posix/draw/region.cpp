@@ -18,7 +18,7 @@ void Area::SetBox(const Box& box) {
 
 void Area::SetBoxes(const std::vector<Box>& boxes) {
   pixman_region32_fini(&m_region);
-  pixman_region32_init_rects(&m_region, boxes.data(), static_cast<int>(boxes.size()));
+  Check(pixman_region32_init_rects(&m_region, boxes.data(), static_cast<int>(boxes.size())));
 }
 
 bool Area::Meets(const Box& box) const {
@@ -62,26 +62,32 @@ using namespace draw;
 
 static HRGN EnterRegion(Area area) { return EnterAs<HRGN>(new RegionObject(std::move(area))); }
 
-HRGN CreateRectRgn(int left, int top, int right, int bottom) {
+HRGN CreateRectRgn(int left, int top, int right, int bottom) try {
   return EnterRegion(Area(BoxOf(left, top, right, bottom)));
+} catch (const std::bad_alloc&) {
+  return NoMemory(HRGN{});
 }
 
 HRGN CreateRectRgnIndirect(const RECT* rect) { return CreateRectRgn(rect->left, rect->top, rect->right, rect->bottom); }
 
 // A region loses the last row and column of the rectangle that it is made from.
-HRGN CreateRoundRectRgn(int left, int top, int right, int bottom, int width, int height) {
+HRGN CreateRoundRectRgn(int left, int top, int right, int bottom, int width, int height) try {
   Box box = BoxOf(left, top, right, bottom);
   --box.x2, --box.y2;
   return EnterRegion(RoundRectArea(box, std::abs(width), std::abs(height)));
+} catch (const std::bad_alloc&) {
+  return NoMemory(HRGN{});
 }
 
 HRGN CreateEllipticRgn(int left, int top, int right, int bottom) {
   return CreateRoundRectRgn(left, top, right, bottom, right - left, bottom - top);
 }
 
-HRGN CreatePolygonRgn(const POINT* points, int count, int mode) {
+HRGN CreatePolygonRgn(const POINT* points, int count, int mode) try {
   if (count < 2 || (mode != ALTERNATE && mode != WINDING)) return Fail<HRGN>(nullptr);
   return EnterRegion(PolygonArea(points, count, mode));
+} catch (const std::bad_alloc&) {
+  return NoMemory(HRGN{});
 }
 
 BOOL SetRectRgn(HRGN handle, int left, int top, int right, int bottom) {
@@ -91,7 +97,7 @@ BOOL SetRectRgn(HRGN handle, int left, int top, int right, int bottom) {
   return TRUE;
 }
 
-int CombineRgn(HRGN toHandle, HRGN aHandle, HRGN bHandle, int mode) {
+int CombineRgn(HRGN toHandle, HRGN aHandle, HRGN bHandle, int mode) try {
   auto* to = Find<RegionObject>(toHandle);
   auto* a = Find<RegionObject>(aHandle);
   if (!to || !a) return RGN_ERROR;
@@ -104,8 +110,10 @@ int CombineRgn(HRGN toHandle, HRGN aHandle, HRGN bHandle, int mode) {
   if (mode < RGN_AND || mode > RGN_DIFF) return Fail(RGN_ERROR);
   Area result = a->m_area;
   result.Combine(b->m_area, mode);
-  to->m_area = result;
+  to->m_area = std::move(result);
   return to->m_area.Complexity();
+} catch (const std::bad_alloc&) {
+  return NoMemory(RGN_ERROR);
 }
 
 int OffsetRgn(HRGN handle, int dx, int dy) {

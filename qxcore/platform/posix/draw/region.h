@@ -18,14 +18,19 @@ inline Box Intersect(const Box& a, const Box& b) {
 // The box of two corners in any order.
 Box BoxOf(int left, int top, int right, int bottom);
 
-// A pixman region as a value.
+// A pixman region as a value. What needs memory throws std::bad_alloc; an operation in place then leaves an empty
+// area, an assignment leaves the former one.
 class Area {
  public:
   Area() { pixman_region32_init(&m_region); }
   explicit Area(const Box& box) : Area() { SetBox(box); }
-  Area(const Area& other) : Area() { *this = other; }
-  Area& operator=(const Area& other) {
-    pixman_region32_copy(&m_region, &other.m_region);
+  explicit Area(const pixman_region32_t* region) : Area() {
+    Check(pixman_region32_copy(&m_region, const_cast<pixman_region32_t*>(region)));
+  }
+  Area(const Area& other) : Area(&other.m_region) {}
+  Area(Area&& other) noexcept : Area() { std::swap(m_region, other.m_region); }
+  Area& operator=(Area other) noexcept {
+    std::swap(m_region, other.m_region);
     return *this;
   }
   ~Area() { pixman_region32_fini(&m_region); }
@@ -42,12 +47,12 @@ class Area {
   bool Meets(const Box& box) const;
 
   void Offset(int dx, int dy) { pixman_region32_translate(&m_region, dx, dy); }
-  void And(const Area& other) { pixman_region32_intersect(&m_region, &m_region, other.Data()); }
+  void And(const Area& other) { Check(pixman_region32_intersect(&m_region, &m_region, other.Data())); }
   void And(const Box& box) {
-    pixman_region32_intersect_rect(&m_region, &m_region, box.x1, box.y1, box.x2 - box.x1, box.y2 - box.y1);
+    Check(pixman_region32_intersect_rect(&m_region, &m_region, box.x1, box.y1, box.x2 - box.x1, box.y2 - box.y1));
   }
-  void Or(const Area& other) { pixman_region32_union(&m_region, &m_region, other.Data()); }
-  void Less(const Area& other) { pixman_region32_subtract(&m_region, &m_region, other.Data()); }
+  void Or(const Area& other) { Check(pixman_region32_union(&m_region, &m_region, other.Data())); }
+  void Less(const Area& other) { Check(pixman_region32_subtract(&m_region, &m_region, other.Data())); }
   // RGN_AND to RGN_COPY with another one.
   void Combine(const Area& other, int mode);
   // For calls that take the region itself.
@@ -56,6 +61,9 @@ class Area {
   int Complexity() const;
 
  private:
+  static void Check(pixman_bool_t hasMemory) {
+    if (!hasMemory) throw std::bad_alloc();
+  }
   pixman_region32_t* Data() const { return const_cast<pixman_region32_t*>(&m_region); }
   pixman_region32_t m_region;
 };

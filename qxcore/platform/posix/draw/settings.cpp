@@ -10,7 +10,8 @@ namespace {
 Bitmap* DefaultBitmap() {
   static Bitmap* const bitmap = [] {
     Bitmap* made = Bitmap::Make(1, 1, 1);
-    if (Enter(made)) made->m_permanent = true;
+    if (!Enter(made)) throw std::bad_alloc();
+    made->m_permanent = true;
     return made;
   }();
   return bitmap;
@@ -18,14 +19,17 @@ Bitmap* DefaultBitmap() {
 
 }  // namespace
 
-HDC CreateCompatibleDC(HDC compatible) {
+HDC CreateCompatibleDC(HDC compatible) try {
   if (compatible && !Find<Context>(compatible)) return nullptr;
+  const Ref<Bitmap> bitmap(DefaultBitmap());
   auto* dc = new Context(OBJ_MEMDC);
   if (dc) {
-    dc->m_settings.bitmap = DefaultBitmap();
-    dc->SetTarget(dc->m_settings.bitmap);
+    dc->m_settings.bitmap = bitmap;
+    dc->SetTarget(bitmap);
   }
   return EnterAs<HDC>(dc);
+} catch (const std::bad_alloc&) {
+  return NoMemory(HDC{});
 }
 
 BOOL DeleteDC(HDC handle) {
@@ -33,12 +37,14 @@ BOOL DeleteDC(HDC handle) {
   return dc && dc->m_type != OBJ_DC && Remove(handle);
 }
 
-int SaveDC(HDC handle) {
+int SaveDC(HDC handle) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return 0;
   Record(*dc, [](HDC to) { SaveDC(to); });
   dc->m_saved.push_back(dc->m_settings);
   return static_cast<int>(dc->m_saved.size());
+} catch (const std::bad_alloc&) {
+  return NoMemory(0);
 }
 
 BOOL RestoreDC(HDC handle, int saved) {
@@ -50,8 +56,8 @@ BOOL RestoreDC(HDC handle, int saved) {
   // What is played back may have saved more: count from the top.
   Record(*dc, [back = target - count - 1](HDC to) { RestoreDC(to, back); });
   Ref<Bitmap> current = dc->m_settings.bitmap;
-  dc->m_settings = dc->m_saved[static_cast<std::size_t>(target - 1)];
-  dc->m_saved.resize(static_cast<std::size_t>(target - 1));
+  dc->m_settings = std::move(dc->m_saved[static_cast<std::size_t>(target - 1)]);
+  dc->m_saved.erase(dc->m_saved.begin() + target - 1, dc->m_saved.end());
   if (dc->m_settings.bitmap.get() != current.get()) {
     if (current->m_user == dc) current->m_user = nullptr;
     if (!dc->m_settings.bitmap->m_permanent) dc->m_settings.bitmap->m_user = dc;

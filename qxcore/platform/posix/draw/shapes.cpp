@@ -56,7 +56,7 @@ void PaintRound(const Context& dc, const Box& box, int cornerWidth, int cornerHe
 
 }  // namespace
 
-BOOL Rectangle(HDC handle, int left, int top, int right, int bottom) {
+BOOL Rectangle(HDC handle, int left, int top, int right, int bottom) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   if (Record(*dc, [=](HDC to) { Rectangle(to, left, top, right, bottom); })) return TRUE;
@@ -68,36 +68,41 @@ BOOL Rectangle(HDC handle, int left, int top, int right, int bottom) {
     PaintBox(*dc, {box.x1, box.y1, box.x2 - 1, box.y2 - 1}, fill, set.rop2);
     return TRUE;
   }
-  int width = PenWidth(*dc), out = set.pen->m_style == PS_INSIDEFRAME ? 0 : width / 2;
-  if (width == 1) {
-    PaintBox(*dc, {box.x1 + 1, box.y1 + 1, box.x2 - 1, box.y2 - 1}, fill, set.rop2);
-    POINT corners[4] = {{box.x1, box.y1}, {box.x2 - 1, box.y1}, {box.x2 - 1, box.y2 - 1}, {box.x1, box.y2 - 1}};
-    DrawLines(*dc, corners, 4, true);
+  // A pen within the frame has its own four sides, any other one lies on the edges, with round corners when it is wide.
+  int width = PenWidth(*dc), out = width / 2, in = width - out;
+  if (set.pen->m_style == PS_INSIDEFRAME && width > 1) {
+    PaintBox(*dc, {box.x1 + width, box.y1 + width, box.x2 - width, box.y2 - width}, fill, set.rop2);
+    PaintFrame(*dc, box, width, width, PaintOf(*dc, *set.pen), set.rop2);
     return TRUE;
   }
-  Box outer{box.x1 - out, box.y1 - out, box.x2 - 1 + width - out, box.y2 - 1 + width - out};
-  if (set.pen->m_style == PS_INSIDEFRAME) outer = box;
-  PaintBox(*dc, {outer.x1 + width, outer.y1 + width, outer.x2 - width, outer.y2 - width}, fill, set.rop2);
-  PaintFrame(*dc, outer, width, width, PaintOf(*dc, *set.pen), set.rop2);
+  PaintBox(*dc, {box.x1 + in, box.y1 + in, box.x2 - 1 - out, box.y2 - 1 - out}, fill, set.rop2);
+  POINT corners[4] = {{box.x1, box.y1}, {box.x2 - 1, box.y1}, {box.x2 - 1, box.y2 - 1}, {box.x1, box.y2 - 1}};
+  DrawLines(*dc, corners, 4, true);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-BOOL RoundRect(HDC handle, int left, int top, int right, int bottom, int width, int height) {
+BOOL RoundRect(HDC handle, int left, int top, int right, int bottom, int width, int height) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   if (Record(*dc, [=](HDC to) { RoundRect(to, left, top, right, bottom, width, height); })) return TRUE;
   Box box = dc->Map(left, top, right, bottom);
   PaintRound(*dc, box, std::abs(dc->Map().Width(width)), std::abs(dc->Map().Height(height)));
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-BOOL Ellipse(HDC handle, int left, int top, int right, int bottom) {
+BOOL Ellipse(HDC handle, int left, int top, int right, int bottom) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   if (Record(*dc, [=](HDC to) { Ellipse(to, left, top, right, bottom); })) return TRUE;
   Box box = dc->Map(left, top, right, bottom);
   PaintRound(*dc, box, box.x2 - box.x1, box.y2 - box.y1);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
 // --- with a brush of their own ---
@@ -140,39 +145,57 @@ BOOL FillRegion(HDC handle, HRGN regionHandle, const Ref<Brush>& brush, int rop2
 
 }  // namespace
 
-int FillRect(HDC handle, const RECT* rect, HBRUSH brushHandle) {
+int FillRect(HDC handle, const RECT* rect, HBRUSH brushHandle) try {
   auto* dc = Find<Context>(handle);
   Ref<Brush> brush = FindBrush(brushHandle);
   return dc && brush ? FillWith(*dc, *rect, brush) : 0;
+} catch (const std::bad_alloc&) {
+  return NoMemory(0);
 }
 
-int FrameRect(HDC handle, const RECT* rect, HBRUSH brushHandle) {
+int FrameRect(HDC handle, const RECT* rect, HBRUSH brushHandle) try {
   auto* dc = Find<Context>(handle);
   Ref<Brush> brush = FindBrush(brushHandle);
   if (!dc || !brush || rect->right <= rect->left || rect->bottom <= rect->top) return 0;
   return FrameWith(*dc, *rect, brush);
+} catch (const std::bad_alloc&) {
+  return NoMemory(0);
 }
 
-BOOL FillRgn(HDC dc, HRGN region, HBRUSH brush) { return FillRegion(dc, region, FindBrush(brush), R2_COPYPEN); }
+BOOL FillRgn(HDC dc, HRGN region, HBRUSH brush) try {
+  return FillRegion(dc, region, FindBrush(brush), R2_COPYPEN);
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
+}
 
-BOOL FrameRgn(HDC handle, HRGN regionHandle, HBRUSH brushHandle, int width, int height) {
+BOOL FrameRgn(HDC handle, HRGN regionHandle, HBRUSH brushHandle, int width, int height) try {
   auto* dc = Find<Context>(handle);
   auto* region = Find<RegionObject>(regionHandle);
   Ref<Brush> brush = FindBrush(brushHandle);
   return dc && region && brush && FillAreaWith(*dc, OutlineOf(region->m_area, width, height), brush, R2_COPYPEN);
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-BOOL PaintRgn(HDC handle, HRGN region) {
+BOOL PaintRgn(HDC handle, HRGN region) try {
   auto* dc = Find<Context>(handle);
   return dc && FillRegion(handle, region, dc->m_settings.brush, dc->m_settings.rop2);
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-BOOL InvertRgn(HDC handle, HRGN region) { return FillRegion(handle, region, StockAs<Brush>(BLACK_BRUSH), R2_NOT); }
+BOOL InvertRgn(HDC handle, HRGN region) try {
+  return FillRegion(handle, region, StockAs<Brush>(BLACK_BRUSH), R2_NOT);
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
+}
 
-BOOL InvertRect(HDC handle, const RECT* rect) {
+BOOL InvertRect(HDC handle, const RECT* rect) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   if (Record(*dc, [rect = *rect](HDC to) { InvertRect(to, &rect); })) return TRUE;
   PaintBox(*dc, dc->Map(*rect), SolidPaint(*dc, 0), R2_NOT);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }

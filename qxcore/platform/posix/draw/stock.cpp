@@ -12,9 +12,15 @@ namespace {
 
 constexpr int kSystemColors = 31;
 
+// Throws std::bad_alloc where memory is short.
 Object* Keep(Object* object) {
-  if (Enter(object)) object->m_permanent = true;
+  if (!Enter(object)) throw std::bad_alloc();
+  object->m_permanent = true;
   return object;
+}
+
+void Discard(Object* object) {
+  if (object) Remove(object->m_handle);
 }
 
 ColorSource Fixed(COLORREF color) { return {ColorSource::kFixed, color, 0}; }
@@ -73,11 +79,19 @@ Object* Make(int index) {
 }
 
 struct Stocks {
+  // All or none: without them no context can be made.
   Stocks() {
-    for (int i = 0; i <= DC_PEN; ++i) {
-      if (Object* made = Make(i)) objects[i] = Keep(made);
+    try {
+      for (int i = 0; i <= DC_PEN; ++i) {
+        if (i != 9 && i != 15) objects[i] = Keep(Make(i));  // these numbers name nothing here
+      }
+      for (int i = 0; i < kSystemColors; ++i)
+        systemBrushes[i] = Keep(new Brush(BS_SOLID, {ColorSource::kSystem, 0, i}));
+    } catch (...) {
+      for (Object* object : objects) Discard(object);
+      for (Object* object : systemBrushes) Discard(object);
+      throw;
     }
-    for (int i = 0; i < kSystemColors; ++i) systemBrushes[i] = Keep(new Brush(BS_SOLID, {ColorSource::kSystem, 0, i}));
   }
   Object* objects[DC_PEN + 1] = {};
   Object* systemBrushes[kSystemColors] = {};
@@ -96,12 +110,16 @@ Object* Stock(int index) { return index >= 0 && index <= DC_PEN ? TheStocks().ob
 
 using namespace draw;
 
-HGDIOBJ GetStockObject(int index) {
+HGDIOBJ GetStockObject(int index) try {
   Object* object = Stock(index);
   return object ? object->m_handle : nullptr;
+} catch (const std::bad_alloc&) {
+  return NoMemory(HGDIOBJ{});
 }
 
-HBRUSH GetSysColorBrush(int index) {
+HBRUSH GetSysColorBrush(int index) try {
   if (index < 0 || index >= kSystemColors) return nullptr;
   return reinterpret_cast<HBRUSH>(TheStocks().systemBrushes[index]->m_handle);
+} catch (const std::bad_alloc&) {
+  return NoMemory(HBRUSH{});
 }

@@ -121,7 +121,7 @@ bool RecordText(Context& dc, int x, int y, UINT options, const RECT* rect, SStri
 using namespace draw;
 
 BOOL ExtTextOutW(HDC handle, int x, int y, UINT options, const RECT* rect, LPCWSTR text, UINT count,
-                 const int* advances) {
+                 const int* advances) try {
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   SStringView view(text ? text : WTEXT(""), text ? count : 0);
@@ -133,6 +133,8 @@ BOOL ExtTextOutW(HDC handle, int x, int y, UINT options, const RECT* rect, LPCWS
   POINT at = dc->m_settings.textAlign & TA_UPDATECP ? dc->m_settings.position : POINT{x, y};
   DrawLineOfText(*dc, {dc->X(at.x), dc->Y(at.y)}, options, rect ? &box : nullptr, view, advances);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
 BOOL TextOutW(HDC dc, int x, int y, LPCWSTR text, int count) {
@@ -141,7 +143,7 @@ BOOL TextOutW(HDC dc, int x, int y, LPCWSTR text, int count) {
 
 // --- measuring ---
 
-BOOL GetTextExtentPoint32W(HDC handle, LPCWSTR text, int count, SIZE* size) {
+BOOL GetTextExtentPoint32W(HDC handle, LPCWSTR text, int count, SIZE* size) try {
   auto* dc = Find<Context>(handle);
   if (!dc || count < 0) return Fail(FALSE);
   SizedFace* face = FaceOf(*dc);
@@ -149,9 +151,11 @@ BOOL GetTextExtentPoint32W(HDC handle, LPCWSTR text, int count, SIZE* size) {
   size->cx = ToLogicalX(*dc, WidthOf(*face, SStringView(text, static_cast<std::size_t>(count))));
   size->cy = ToLogicalY(*dc, face->Metrics().tmHeight);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-BOOL GetTextExtentExPointW(HDC handle, LPCWSTR text, int count, int maxExtent, int* fit, int* extents, SIZE* size) {
+BOOL GetTextExtentExPointW(HDC handle, LPCWSTR text, int count, int maxExtent, int* fit, int* extents, SIZE* size) try {
   if (!GetTextExtentPoint32W(handle, text, count, size)) return FALSE;
   auto* dc = Find<Context>(handle);
   SizedFace* face = FaceOf(*dc);
@@ -170,17 +174,21 @@ BOOL GetTextExtentExPointW(HDC handle, LPCWSTR text, int count, int maxExtent, i
   }
   if (fit) *fit = count;
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-BOOL GetCharWidth32W(HDC handle, UINT first, UINT last, int* widths) {
+BOOL GetCharWidth32W(HDC handle, UINT first, UINT last, int* widths) try {
   auto* dc = Find<Context>(handle);
   SizedFace* face = dc ? FaceOf(*dc) : nullptr;
   if (!face || last < first || last > 0x10FFFF) return Fail(FALSE);
   for (UINT character = first; character <= last; ++character) *widths++ = ToLogicalX(*dc, face->Of(character).advance);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-BOOL GetTextMetricsW(HDC handle, TEXTMETRICW* metrics) {
+BOOL GetTextMetricsW(HDC handle, TEXTMETRICW* metrics) try {
   auto* dc = Find<Context>(handle);
   SizedFace* face = dc ? FaceOf(*dc) : nullptr;
   if (!face) return Fail(FALSE, dc ? ERROR_FILE_NOT_FOUND : ERROR_INVALID_HANDLE);
@@ -194,9 +202,11 @@ BOOL GetTextMetricsW(HDC handle, TEXTMETRICW* metrics) {
     *height = ToLogicalY(*dc, *height);
   for (LONG* width : {&metrics->tmAveCharWidth, &metrics->tmMaxCharWidth}) *width = ToLogicalX(*dc, *width);
   return TRUE;
+} catch (const std::bad_alloc&) {
+  return NoMemory(FALSE);
 }
 
-int GetTextFaceW(HDC handle, int count, LPWSTR name) {
+int GetTextFaceW(HDC handle, int count, LPWSTR name) try {
   auto* dc = Find<Context>(handle);
   SizedFace* face = dc ? FaceOf(*dc) : nullptr;
   if (!face) return 0;
@@ -208,6 +218,8 @@ int GetTextFaceW(HDC handle, int count, LPWSTR name) {
   for (int i = 0; i < copied; ++i) name[i] = static_cast<unsigned char>(family[static_cast<std::size_t>(i)]);
   name[copied] = 0;
   return copied + 1;
+} catch (const std::bad_alloc&) {
+  return NoMemory(0);
 }
 
 // --- fonts ---

@@ -33,32 +33,26 @@ Ref<Bitmap> SurfaceIn(void** place, SIZE size) {
   return slot;
 }
 
-Area AreaOf(const pixman_region32_t* region) {
-  int count;
-  const Box* boxes = pixman_region32_rectangles(const_cast<pixman_region32_t*>(region), &count);
-  Area area;
-  area.SetBoxes(std::vector<Box>(boxes, boxes + count));
-  return area;
-}
-
 }  // namespace
 
 // `clip` is in the context's own coordinates; null takes all that is visible.
-HDC OpenWindow(HWND window, bool isWhole, const pixman_region32_t* clip) {
+HDC OpenWindow(HWND window, bool isWhole, const pixman_region32_t* clip) try {
   platform::model::Target target;
   if (!platform::model::FindTarget(window, isWhole, &target)) return nullptr;
   Ref<Bitmap> surface = SurfaceIn(target.surface, target.size);
-  auto* dc = surface ? new Context(OBJ_DC) : nullptr;
-  if (!dc) return Fail<HDC>(nullptr, ERROR_NOT_ENOUGH_MEMORY);
-  Area visible = AreaOf(target.visible.Pixman());
+  Ref<Context> dc(surface ? new Context(OBJ_DC) : nullptr);
+  if (!dc) return NoMemory(HDC{});
+  Area visible(target.visible.Pixman());
   if (clip) {
-    Area within = AreaOf(clip);
+    Area within(clip);
     within.Offset(target.origin.x, target.origin.y);
     visible.And(within);
   }
   dc->m_window = window;
   dc->SetTarget(surface, target.origin, visible);
-  return EnterAs<HDC>(dc);
+  return EnterAs<HDC>(dc.get());
+} catch (const std::bad_alloc&) {
+  return NoMemory(HDC{});
 }
 
 void FreeWindowSurface(void* surface) { delete static_cast<Kept*>(surface); }
@@ -73,15 +67,18 @@ const Surface* WindowSurface(void* surface) {
 namespace {
 
 // The screen: it has the screen's colours and measures text, but nothing of it can be drawn on.
-HDC ScreenContext() {
+HDC ScreenContext() try {
   static Bitmap* const pixel = [] {
     Bitmap* made = Bitmap::Make(1, 1, 32);
-    if (Enter(made)) made->m_permanent = true;
+    if (!Enter(made)) throw std::bad_alloc();
+    made->m_permanent = true;
     return made;
   }();
   auto* dc = new Context(OBJ_DC);
-  if (dc && pixel) dc->SetTarget(pixel, POINT{}, Area());
+  if (dc) dc->SetTarget(pixel, POINT{}, Area());
   return EnterAs<HDC>(dc);
+} catch (const std::bad_alloc&) {
+  return NoMemory(HDC{});
 }
 
 }  // namespace
