@@ -81,11 +81,12 @@ class QXCORE_API SRtfDocument {
                                 const SMap<int, int>& colorMap);
 
   // --- conversions, through a hidden rich-edit control ---
-  // The control is a child of the owner window, or of the dummy window where there is no owner. It ends with its parent,
-  // and the next conversion makes another one.
+  // The control is a child of the owner window, or of the dummy window where there is no owner. It ends with its
+  // parent, and the next conversion makes another one.
   //
-  // Make the control if it is missing, put the text in and read it back. Text ends at a NUL; lines end with CR LF. Return 1 when what was read back is not empty, or when the input is empty; 0 without a control,
-  // with a null output, or when memory runs out. The output may be the input.
+  // Make the control if it is missing, put the text in and read it back. Text ends at a NUL; lines end with CR LF.
+  // Return 1 when what was read back is not empty, or when the input is empty; 0 without a control, with a null
+  // output, or when memory runs out. The output may be the input.
   //
   // RtfToText returns the text that a reader sees. Plain text comes back as it is. On Linux: tabs between cells,
   // a line for each table row, a form feed for a page end; of a field its result; footnotes where they are
