@@ -106,9 +106,10 @@ TEST(ColorTable, MergesByExactText) {
             "0>0 1>1 2>2 ");
   EXPECT_EQ(table.GetColorTable(),
             WTEXT("{\\colortbl\r\n;\r\n\\red0\\green0\\blue0;\r\n\\red255\\green0\\blue0;\r\n}\r\n"));
-  EXPECT_EQ(ToString(table.AddColorTable(WTEXT(
-                " {\\colortbl \\red255\\green0\\blue0;{\\x a;}\\red9;;{\\y}\\red255\\green0\\blue0;\\red7 } \\red8;"))),
-            "0>2 1>3 2>0 3>2 4>4 ");
+  EXPECT_EQ(
+      ToString(table.AddColorTable(WTEXT(
+          " {\\colortbl \\red255\\green0\\blue0;{\\x a;}\\red9;;{\\y}\r\n\\red255\\green0\\blue0;\\red7 } \\red8;"))),
+      "0>2 1>3 2>0 3>2 4>4 ");
   EXPECT_EQ(table[4].m_number, 4);
   EXPECT_EQ(table[4].m_text, WTEXT("\\red7"));
   EXPECT_TRUE(table.AddColorTable(WTEXT("{\\colortblx;;}")).empty());

@@ -27,7 +27,8 @@ class ColorReader {
     const WCHAR* start = m_at = rtf::SkipSpace(m_at, m_end);
     while (m_at != m_end && *m_at != ';' && *m_at != '}') {
       if (*m_at == '{') {
-        start = m_at = rtf::SkipGroup(m_at, m_end);  // it has no place here, nor has what stands before it
+        // A group has no place here, nor has what stands before it.
+        start = m_at = rtf::SkipSpace(rtf::SkipGroup(m_at, m_end), m_end);
       } else {
         ++m_at;
       }
