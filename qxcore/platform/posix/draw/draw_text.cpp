@@ -45,10 +45,15 @@ Plain WithoutPrefixes(SStringView text) {
 
 Plain AsItIs(SStringView text) { return {Text(text), std::vector<bool>(text.size(), false)}; }
 
+// A call below for which memory is short is a failure of the whole; without a font there is just nothing to draw.
+void Check(BOOL done) {
+  if (!done && GetLastError() == ERROR_NOT_ENOUGH_MEMORY) throw std::bad_alloc();
+}
+
 class Drawer {
  public:
   Drawer(HDC dc, UINT format) : m_dc(dc), m_format(format) {
-    GetTextMetricsW(dc, &m_metrics);
+    Check(GetTextMetricsW(dc, &m_metrics));
     m_lineHeight = m_metrics.tmHeight + (format & DT_EXTERNALLEADING ? m_metrics.tmExternalLeading : 0);
     int stops = format & DT_TABSTOP ? static_cast<int>(format >> 8 & 0xFF) : 8;
     m_tab = std::max(1, stops * m_metrics.tmAveCharWidth);
@@ -76,7 +81,7 @@ class Drawer {
     for (std::size_t start = 0; start <= text.size();) {
       std::size_t tab = m_format & DT_EXPANDTABS ? text.find(WCHAR{'\t'}, start) : SStringView::npos;
       SStringView part = text.substr(start, tab == SStringView::npos ? tab : tab - start);
-      ExtTextOutW(m_dc, x + at, y, options, clip, part.data(), static_cast<UINT>(part.size()), nullptr);
+      Check(ExtTextOutW(m_dc, x + at, y, options, clip, part.data(), static_cast<UINT>(part.size()), nullptr));
       if (tab == SStringView::npos) return;
       at = ((at + PlainWidth(part)) / m_tab + 1) * m_tab;
       start = tab + 1;
@@ -98,7 +103,7 @@ class Drawer {
  private:
   int PlainWidth(SStringView text) const {
     SIZE size{};
-    GetTextExtentPoint32W(m_dc, text.data(), static_cast<int>(text.size()), &size);
+    Check(GetTextExtentPoint32W(m_dc, text.data(), static_cast<int>(text.size()), &size));
     return size.cx;
   }
 

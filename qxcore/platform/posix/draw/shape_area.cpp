@@ -65,7 +65,7 @@ Area PolygonArea(const POINT* points, int count, int fillMode, const Box& rows) 
     std::erase_if(active, [y](const Edge* edge) { return edge->bottom <= y; });
     crossings.clear();
     for (const Edge* edge : active) crossings.push_back({edge->At(y), edge->direction});
-    std::stable_sort(crossings.begin(), crossings.end());
+    std::sort(crossings.begin(), crossings.end());
     AddSpans(crossings, y, fillMode, boxes);
   }
   Area area;
