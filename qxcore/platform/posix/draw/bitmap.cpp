@@ -15,13 +15,13 @@ std::uint32_t Surface::Nearest(std::uint32_t pixel) const {
 
 Bitmap* Bitmap::Make(int width, int height, int bitCount, bool topDown) {
   constexpr int kLargest = 32767;
-  if (width < 1 || height < 1 || width > kLargest || height > kLargest) return nullptr;
+  if (width < 1 || height < 1 || width > kLargest || height > kLargest) return Fail<Bitmap*>(nullptr);
   auto* bitmap = new Bitmap;
-  if (!bitmap) return nullptr;
+  if (!bitmap) return NoMemory<Bitmap*>(nullptr);
   bitmap->m_memory = std::calloc(static_cast<std::size_t>(width) * height, 4);
   if (!bitmap->m_memory) {
     delete bitmap;
-    return nullptr;
+    return NoMemory<Bitmap*>(nullptr);
   }
   auto* pixels = static_cast<std::uint32_t*>(bitmap->m_memory);
   bitmap->m_surface = {topDown ? pixels : pixels + static_cast<std::ptrdiff_t>(width) * (height - 1),
@@ -95,13 +95,13 @@ HBITMAP CreateCompatibleBitmap(HDC handle, int width, int height) {
   auto* dc = Find<Context>(handle);
   if (!dc) return nullptr;
   Bitmap* bitmap = Bitmap::Make(width, height, dc->m_surface.mono ? 1 : 32);
-  return bitmap ? EnterAs<HBITMAP>(bitmap) : Fail<HBITMAP>(nullptr);
+  return bitmap ? EnterAs<HBITMAP>(bitmap) : nullptr;
 }
 
 HBITMAP CreateBitmap(int width, int height, UINT planes, UINT bitCount, const void* bits) {
   if (planes != 1 || !IsBitCount(bitCount)) return Fail<HBITMAP>(nullptr);
   Bitmap* bitmap = Bitmap::Make(width, height, static_cast<int>(bitCount));
-  if (!bitmap) return Fail<HBITMAP>(nullptr);
+  if (!bitmap) return nullptr;
   if (bits) {
     std::uint32_t colors[256];
     for (std::uint32_t i = 0; i < 256; ++i) colors[i] = bitCount == 1 ? (i ? kWhitePixel : 0) : i * 0x010101;
@@ -118,7 +118,7 @@ HBITMAP CreateDIBSection(HDC, const BITMAPINFO* info, UINT usage, void** bits, H
   const BITMAPINFOHEADER& header = info->bmiHeader;
   if (!IsPlain(header) || header.biBitCount != 32 || usage != DIB_RGB_COLORS || section) return Fail<HBITMAP>(nullptr);
   Bitmap* bitmap = Bitmap::Make(header.biWidth, std::abs(header.biHeight), 32, header.biHeight < 0);
-  if (!bitmap) return Fail<HBITMAP>(nullptr);
+  if (!bitmap) return nullptr;
   bitmap->m_section = true;
   if (bits) *bits = bitmap->m_memory;
   return EnterAs<HBITMAP>(bitmap);

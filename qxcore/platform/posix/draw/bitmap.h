@@ -29,7 +29,7 @@ struct Surface {
 class Bitmap final : public Object {
  public:
   static bool IsType(DWORD type) { return type == OBJ_BITMAP; }
-  // A black bitmap; null when there is no memory or a size is not within 1 to 32767.
+  // A black bitmap; null with the last error set when there is no memory or a size is not within 1 to 32767.
   static Bitmap* Make(int width, int height, int bitCount, bool topDown = true);
   ~Bitmap() override;
 

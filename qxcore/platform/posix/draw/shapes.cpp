@@ -68,13 +68,10 @@ BOOL Rectangle(HDC handle, int left, int top, int right, int bottom) try {
     PaintBox(*dc, {box.x1, box.y1, box.x2 - 1, box.y2 - 1}, fill, set.rop2);
     return TRUE;
   }
-  // A pen within the frame has its own four sides, any other one lies on the edges, with round corners when it is wide.
+  // The outline lies on the edges, with round corners when the pen is wide; for a pen within the frame the edges are
+  // moved inward so far that it covers no pixel outside.
   int width = PenWidth(*dc), out = width / 2, in = width - out;
-  if (set.pen->m_style == PS_INSIDEFRAME && width > 1) {
-    PaintBox(*dc, {box.x1 + width, box.y1 + width, box.x2 - width, box.y2 - width}, fill, set.rop2);
-    PaintFrame(*dc, box, width, width, PaintOf(*dc, *set.pen), set.rop2);
-    return TRUE;
-  }
+  if (set.pen->m_style == PS_INSIDEFRAME) box = {box.x1 + out, box.y1 + out, box.x2 - in + 1, box.y2 - in + 1};
   PaintBox(*dc, {box.x1 + in, box.y1 + in, box.x2 - 1 - out, box.y2 - 1 - out}, fill, set.rop2);
   POINT corners[4] = {{box.x1, box.y1}, {box.x2 - 1, box.y1}, {box.x2 - 1, box.y2 - 1}, {box.x1, box.y2 - 1}};
   DrawLines(*dc, corners, 4, true);
