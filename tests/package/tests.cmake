@@ -12,3 +12,13 @@ foreach(kind ${package_kinds})
     ${kind} ${PROJECT_SOURCE_DIR} ${PROJECT_BINARY_DIR} ${CMAKE_TOOLCHAIN_FILE})
   set_tests_properties(package.${kind} PROPERTIES TIMEOUT 300)
 endforeach()
+
+# What the library exports is what its installed headers declare.
+find_program(DOXYGEN doxygen)
+if(DOXYGEN)
+  add_test(NAME package.exports COMMAND ${Python3_EXECUTABLE} ${CMAKE_CURRENT_LIST_DIR}/exports_test.py
+    ${PROJECT_SOURCE_DIR} ${PROJECT_BINARY_DIR} $<TARGET_FILE:qxcore11e>)
+  set_tests_properties(package.exports PROPERTIES TIMEOUT 300)
+else()
+  add_test(NAME package.exports COMMAND ${CMAKE_COMMAND} -E echo "left out: the exported names, because doxygen is not installed")
+endif()
