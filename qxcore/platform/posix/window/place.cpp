@@ -288,7 +288,11 @@ HDWP DeferWindowPos(HDWP handle, HWND window, HWND after, int x, int y, int widt
   const Guard guard;
   Batch* batch = FindAs<Batch, Kind::Batch>(handle);
   if (batch == nullptr) return Fail<HDWP>(ERROR_INVALID_DWP_HANDLE);
-  if (Expect(window) == nullptr) return nullptr;
+  const auto end = [&](DWORD error) {
+    delete static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
+    return Fail<HDWP>(error);
+  };
+  if (FindWindowObject(window) == nullptr) return end(ERROR_INVALID_WINDOW_HANDLE);
   for (WINDOWPOS& place : batch->places) {
     if (place.hwnd != window) continue;
     if (!(flags & SWP_NOZORDER)) place.hwndInsertAfter = after;
@@ -303,8 +307,7 @@ HDWP DeferWindowPos(HDWP handle, HWND window, HWND after, int x, int y, int widt
     batch->places.push_back({window, after, x, y, width, height, flags});
     return handle;
   } catch (const std::bad_alloc&) {
-    delete static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
-    return Fail<HDWP>(ERROR_NOT_ENOUGH_MEMORY);
+    return end(ERROR_NOT_ENOUGH_MEMORY);
   }
 }
 

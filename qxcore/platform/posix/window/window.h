@@ -73,6 +73,7 @@ struct Window : OnModelHeap {
   bool isDialog = false;
   bool isActiveFrame = false;  // the state of the caption, by WM_NCACTIVATE
   bool isDestroyed = false;    // WM_DESTROY has been sent
+  std::uint32_t toldActivation = 0;  // the last of its thread's changes of activation that it heard of
   bool shownWhenParentOpens = false;
   HWND lastActivePopup = nullptr;
   HICON icons[2] = {};      // ICON_SMALL, ICON_BIG
