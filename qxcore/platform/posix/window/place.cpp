@@ -112,9 +112,10 @@ void Apply(Window* window, WINDOWPOS& place, const NewPlace& to) {
   window->client = to.client;
   if (place.flags & SWP_SHOWWINDOW) window->style |= WS_VISIBLE;
   if (place.flags & SWP_HIDEWINDOW) {
-    DropPaint(window);
     window->style &= ~WS_VISIBLE;
+    DropPaint(window);
   }
+  if (window->IsVisible()) ++g_scene;
   if (oldClient.left == to.client.left && oldClient.top == to.client.top) place.flags |= kNoClientMove;
   if (Width(oldClient) == Width(to.client) && Height(oldClient) == Height(to.client)) place.flags |= kNoClientSize;
   if (!(place.flags & SWP_NOREDRAW)) SpoilByMove(window, oldWindow, oldClient, wasShown, place.flags);

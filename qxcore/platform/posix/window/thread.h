@@ -95,7 +95,7 @@ struct Thread {
 
   HWND active = nullptr, focus = nullptr, capture = nullptr;
   std::uint32_t activations = 0;  // how often the thread became active or inactive
-  HWND menuOwner = nullptr;  // whose menu is being used
+  HWND menuOwner = nullptr;       // whose menu is being used
   bool inMenuLoop = false;
   Caret caret;
   HCURSOR cursor = nullptr;

@@ -2,6 +2,7 @@
 
 #include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/atom.h"
+#include "qxcore/platform/posix/window/paint.h"
 #include "qxcore/platform/posix/window/queue.h"
 
 namespace platform::model {
@@ -54,6 +55,7 @@ void Link(Window* window, Window* parent, Window* after) {
   (window->previous != nullptr ? window->previous->next : parent->firstChild) = window;
   (window->next != nullptr ? window->next->previous : parent->lastChild) = window;
   for (Window* above = parent; above != nullptr; above = above->parent) above->childPaints += window->childPaints;
+  if (window->IsVisible()) ++g_scene;
 }
 
 void Unlink(Window* window) {
