@@ -91,6 +91,74 @@ TEST(MessageList, MenuByKeyboard) {
   ExpectRecord("menu", record.Text());
 }
 
+// The mouse goes to a point of the screen, and a message of it to the window; the position goes with the message.
+void PostMouse(HWND window, UINT message, POINT screen) {
+  SetCursorPos(screen.x, screen.y);
+  POINT client = screen;
+  ScreenToClient(window, &client);
+  PostMessageW(window, message, message == WM_LBUTTONUP ? 0 : MK_LBUTTON, MAKELPARAM(client.x, client.y));
+}
+
+POINT MiddleOf(HWND owner, HMENU menu, UINT item) {
+  RECT place{};
+  EXPECT_TRUE(GetMenuItemRect(owner, menu, item, &place));
+  return {(place.left + place.right) / 2, (place.top + place.bottom) / 2};
+}
+
+// Presses the mouse on the first item of the bar; the steps say what happens then.
+void PressOnMenuBar(HWND top, std::vector<Step> then) {
+  const POINT file = MiddleOf(top, GetMenu(top), 0);
+  SetCursorPos(file.x, file.y);
+  Pump();
+  g_menuOwner = top;
+  const Steps steps(std::move(then));
+  SendMessageW(top, WM_NCLBUTTONDOWN, HTMENU, MAKELPARAM(file.x, file.y));
+  Pump();
+}
+
+TEST(MessageList, MenuByMouse) {
+  Record record;
+  const HWND top = MakeFrame();
+  record.Title("open by a press, choose by a release");
+  PressOnMenuBar(top, {{WM_ENTERIDLE, [] {
+                          const HMENU file = GetSubMenu(GetMenu(g_menuOwner), 0);
+                          PostMouse(g_menuOwner, WM_LBUTTONUP, MiddleOf(g_menuOwner, file, 2));
+                        }}});
+  record.Title("a press beside the menu");
+  PressOnMenuBar(top, {{WM_ENTERIDLE, [] { PostMouse(g_menuOwner, WM_LBUTTONDOWN, {600, 500}); }}});
+  record.Title("destroy");
+  DestroyWindow(top);
+  ExpectRecord("menu_by_mouse", record.Text());
+}
+
+TEST(MessageList, SizingByTheBorder) {
+  Record record;
+  const HWND top = Make(WTEXT("top"), WS_OVERLAPPEDWINDOW | WS_VISIBLE, nullptr, {100, 100, 400, 300});
+  Pump();
+  SetCursorPos(398, 200);
+  Pump();
+  g_menuOwner = top;
+  record.Title("drag the right border by thirty pixels");
+  const Steps steps({{WM_ENTERSIZEMOVE,
+                      [] {
+                        PostMouse(g_menuOwner, WM_MOUSEMOVE, {428, 200});
+                      }},
+                     {WM_SIZING, [] {
+                        PostMouse(g_menuOwner, WM_LBUTTONUP, {428, 200});
+                      }}});
+  SendMessageW(top, WM_NCLBUTTONDOWN, HTRIGHT, MAKELPARAM(398, 200));
+  RECT rect;
+  GetWindowRect(top, &rect);
+  EXPECT_EQ(rect.right, 430);
+  EXPECT_EQ(rect.left, 100);
+  EXPECT_EQ(rect.bottom, 300);
+  EXPECT_EQ(GetCapture(), nullptr);
+  ValidateRect(top, nullptr);
+  record.Title("destroy");
+  DestroyWindow(top);
+  ExpectRecord("sizing", record.Text());
+}
+
 TEST(MessageList, Accelerators) {
   Record record;
   const HWND top = MakeFrame();
