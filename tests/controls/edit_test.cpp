@@ -7,6 +7,7 @@
 
 #include "qxcore/platform/win32/clipboard.h"
 #include "tests/controls/control_host.h"
+#include "tests/support/wine.h"
 
 namespace {
 
@@ -192,7 +193,9 @@ TEST(Edit, Clipboard_TakesAndGivesTexts) {
   HWND secret = host.Make(WTEXT("Edit"), WTEXT("secret"), ES_PASSWORD);
   SendMessageW(secret, EM_SETSEL, 0, -1);
   SendMessageW(secret, WM_COPY, 0, 0);
-  EXPECT_EQ(OnClipboard(host.Window()).find("secret"), std::string::npos);
+  if (!IsWine()) {
+    EXPECT_EQ(OnClipboard(host.Window()).find("secret"), std::string::npos);
+  }
   EXPECT_EQ(GetClipboardData(CF_UNICODETEXT), nullptr) << "it is closed";
 }
 

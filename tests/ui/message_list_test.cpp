@@ -170,7 +170,12 @@ TEST_F(MessageLists, Command_ComesFromAMenu) {
     }
     std::string* m_list;
   };
-  auto* frame = new Listed<SFrameWnd>(Recorder("frame"));
+  HWND window = nullptr;
+  auto* frame = new Listed<SFrameWnd>(Recorder("frame", [&](UINT message, WPARAM, LPARAM, LRESULT*) {
+    if (message != WM_INITMENUPOPUP) return 0;
+    for (const WPARAM key : {VK_DOWN, VK_RETURN}) ::PostMessageW(window, WM_KEYDOWN, key, 1);
+    return 0;
+  }));
   ASSERT_TRUE(frame->Create(nullptr, WTEXT("f"), WS_OVERLAPPEDWINDOW | WS_VISIBLE, SRect(10, 20, 310, 220)));
   auto* view = new View(Recorder("view"), &m_list);
   ASSERT_TRUE(view->Create(nullptr, nullptr, WS_VISIBLE, SRect(0, 0, 50, 50), frame, kSFirstPane));
@@ -183,7 +188,7 @@ TEST_F(MessageLists, Command_ComesFromAMenu) {
   bar.AppendMenuW(MF_POPUP, reinterpret_cast<UINT_PTR>(file.Detach()), WTEXT("&File"));
   frame->SetMenu(bar.Detach());
   Start();
-  frame->PostMessageW(WM_KEYDOWN, 'G', 1);
+  window = frame->m_hWnd;
   frame->SendMessageW(WM_SYSCOMMAND, SC_KEYMENU, 'f');
   Step("the loop goes on");
   test::PumpAll();

@@ -112,18 +112,15 @@ TEST_F(Unattended, Dialogs) {
     EXPECT_EQ(In(kInteractiveShow, modal), std::to_string(IDOK));
   }
   // What the exchange of data has to say comes in a box.
-  const auto exchange = [&] {
-    Checking dialog;
-    dialog.CreateDlgIndirect(made.Data(), &m_owner);
-    const int valid = dialog.UpdateData(1);
-    dialog.DestroyWindow();
-    return valid;
-  };
+  Checking dialog;
+  ASSERT_TRUE(dialog.CreateDlgIndirect(made.Data(), &m_owner));
+  const auto exchange = [&] { return dialog.UpdateData(1); };
   EXPECT_EQ(In(kInteractiveAnswer, exchange), "0");
   EXPECT_EQ(In(kInteractiveAbort, exchange), "abort");
   Answer answer(IDOK);
   EXPECT_EQ(In(kInteractiveShow, exchange), "0");
   EXPECT_TRUE(answer.WasAsked());
+  dialog.DestroyWindow();
 }
 
 TEST_F(Unattended, PopupMenus) {
