@@ -48,10 +48,13 @@ struct Virtual {
   virtual ~Virtual() = default;
   virtual LRESULT Call(UINT message, WPARAM wParam, LPARAM lParam) = 0;
 };
+// Two, so that no compiler calls the only one directly.
+template <int>
 struct Called final : Virtual {
-  LRESULT Call(UINT, WPARAM wParam, LPARAM) override { return static_cast<LRESULT>(m_sum += wParam); }
+  [[gnu::noinline]] LRESULT Call(UINT, WPARAM wParam, LPARAM) override { return static_cast<LRESULT>(m_sum += wParam); }
   WPARAM m_sum = 0;
 };
+volatile int g_choice = 0;
 
 BENCH("a handled message, three bases down/ours") {
   Three window;
@@ -75,9 +78,9 @@ BENCH("an unhandled message/ours") {
 }
 
 void VirtualCalls(benchmark::State& state) {
-  Called called;
-  Virtual* object = &called;
-  benchmark::DoNotOptimize(object);
+  Called<0> one;
+  Called<1> two;
+  Virtual* object = g_choice == 0 ? static_cast<Virtual*>(&one) : &two;
   for (auto _ : state) benchmark::DoNotOptimize(object->Call(kHandled, 1, 0));
 }
 BENCH("a handled message, three bases down/virtual call") { VirtualCalls(state); }

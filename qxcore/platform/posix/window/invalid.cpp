@@ -177,25 +177,27 @@ void SpoilByOrder(Window* window) {
   }
 }
 
-void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
+bool SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
   const bool isShown = IsShown(window);
+  bool isExposed = false;
   if (wasShown && !IsRoot(window->parent)) {
     Region exposed(oldWindow);
     if (isShown) exposed.Subtract(window->window);
     const RECT client = ClientInWindow(window->parent);
     exposed.Move(client.left, client.top);
     exposed.Intersect(client);
-    if (!exposed.IsEmpty()) Invalidate(window->parent, exposed, Erase::Yes, Children::All);
+    isExposed = !exposed.IsEmpty();
+    if (isExposed) Invalidate(window->parent, exposed, Erase::Yes, Children::All);
   }
-  if (!isShown) return;
+  if (!isShown) return isExposed;
   const RECT whole = AtOrigin(window->window);
   if (!wasShown) {
     Invalidate(window, Region(whole), Erase::Yes, Children::All);
     if (window->wantsPaint) window->frameUpdate = true;
-    return;
+    return isExposed;
   }
   const bool sameSize = Width(oldWindow) == Width(whole) && Height(oldWindow) == Height(whole);
-  if (sameSize && !(flags & SWP_FRAMECHANGED) && !(flags & SWP_NOCOPYBITS)) return;
+  if (sameSize && !(flags & SWP_FRAMECHANGED) && !(flags & SWP_NOCOPYBITS)) return isExposed;
   Region spoiled(whole);
   const UINT classStyle = window->windowClass->style;
   const bool redraws = (flags & SWP_NOCOPYBITS) ||
@@ -208,8 +210,9 @@ void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, b
     spoiled.Subtract(kept);
   }
   const RECT oldPlace = Moved(oldClient, -oldWindow.left, -oldWindow.top);
-  if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return;
+  if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return isExposed;
   Invalidate(window, spoiled, Erase::Yes, Children::Unclipped);
+  return isExposed;
 }
 
 // A parent that does not leave its children out paints first; they would be painted over.

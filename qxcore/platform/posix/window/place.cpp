@@ -103,8 +103,8 @@ void Reorder(Window* window, HWND after) {
   if (parent == Desktop() && after == HWND_TOP) RaiseTopLevel(window);
 }
 
-// Under the lock: the change itself, and what of the screen it spoils.
-void Apply(Window* window, WINDOWPOS& place, const NewPlace& to) {
+// Under the lock: the change itself, and what of the screen it spoils. Returns whether that is anything of the parent.
+bool Apply(Window* window, WINDOWPOS& place, const NewPlace& to) {
   const RECT oldWindow = window->window, oldClient = window->client;
   const bool wasShown = IsShown(window);
   if (!(place.flags & SWP_NOZORDER)) Reorder(window, place.hwndInsertAfter);
@@ -118,7 +118,7 @@ void Apply(Window* window, WINDOWPOS& place, const NewPlace& to) {
   if (window->IsVisible()) ++g_scene;
   if (oldClient.left == to.client.left && oldClient.top == to.client.top) place.flags |= kNoClientMove;
   if (Width(oldClient) == Width(to.client) && Height(oldClient) == Height(to.client)) place.flags |= kNoClientSize;
-  if (!(place.flags & SWP_NOREDRAW)) SpoilByMove(window, oldWindow, oldClient, wasShown, place.flags);
+  return !(place.flags & SWP_NOREDRAW) && SpoilByMove(window, oldWindow, oldClient, wasShown, place.flags);
 }
 
 HWND ParentHandle(HWND handle) {
@@ -175,12 +175,13 @@ BOOL Place(WINDOWPOS& place) {
   }
   const NewPlace to = Measure(handle, place);
   NewPlace from{};
+  bool spoilsParent = false;
   {
     const Guard guard;
     Window* window = Expect(handle);
     if (window == nullptr) return FALSE;
     from = {window->window, window->client};
-    Apply(window, place, to);
+    spoilsParent = Apply(window, place, to);
   }
   KeepPixels(handle, from, to, place.flags);
   ShowOnDisplay(handle);
@@ -192,7 +193,7 @@ BOOL Place(WINDOWPOS& place) {
     }
   }
   if (!(place.flags & (SWP_NOREDRAW | SWP_DEFERERASE))) {
-    if (const HWND parent = ParentHandle(handle)) EraseNow(parent);
+    if (const HWND parent = spoilsParent ? ParentHandle(handle) : nullptr) EraseNow(parent);
     EraseNow(handle);
   }
   if ((place.flags & kAnyChange) != kNoChange && IsWindow(handle)) {

@@ -188,6 +188,7 @@ bool Matches(const Window* window, ATOM className, LPCWSTR name) {
 }  // namespace
 
 BOOL IsWindow(HWND handle) {
+  if (FindOwnWindow(handle, CurrentThread()) != nullptr) return TRUE;
   const Guard guard;
   return FindWindowObject(handle) != nullptr;
 }
@@ -280,7 +281,10 @@ BOOL EnumThreadWindows(DWORD thread, WNDENUMPROC callback, LPARAM data) {
   });
 }
 
+// The thread's own windows are found without the lock: every message that is sent asks this.
 DWORD GetWindowThreadProcessId(HWND handle, LPDWORD process) {
+  const Thread* thread = CurrentThread();
+  if (process == nullptr && FindOwnWindow(handle, thread) != nullptr) return thread->id;
   const Guard guard;
   const Window* window = Expect(handle);
   if (window == nullptr) return 0;
