@@ -8,6 +8,7 @@
 #include <map>
 #include <sstream>
 
+#include "tests/support/wine.h"
 #include "tests/ui/dialog_template.h"
 #include "tests/ui/ui_fixture.h"
 
@@ -161,6 +162,9 @@ class PlainView : public SView {
 };
 
 TEST_F(MessageLists, Command_ComesFromAMenu) {
+  if (IsWine() && std::getenv("QXCORE_EXPECTED") == nullptr) {
+    GTEST_SKIP() << "SKIPPED: on a busy machine Wine's menu now and then waits for keys that were posted to it";
+  }
   class View : public Listed<PlainView> {
    public:
     View(test::Window::Handler handler, std::string* list) : Listed(std::move(handler)), m_list(list) {}
