@@ -1,7 +1,6 @@
 // Laying out a status bar of 20 panes in a shown window, beside Qt's with 20 widgets.
 
 #if BENCH_PEERS
-#include <QApplication>
 #include <QLabel>
 #include <QStatusBar>
 #include <memory>
@@ -9,6 +8,9 @@
 #endif
 
 #include "bench/bench.h"
+#if BENCH_PEERS
+#include "bench/qt_application.h"
+#endif
 #include "qxcore/ui/bar/status_bar.h"
 #include "qxcore/ui/frame/dock_site_frame.h"
 
@@ -40,11 +42,7 @@ BENCH("lay out a status bar of 20 panes/ours") {
 
 #if BENCH_PEERS
 BENCH("lay out a status bar of 20 panes/QStatusBar") {
-  qputenv("QT_QPA_PLATFORM", "offscreen");
-  static int count = 1;
-  static char name[] = "bench";
-  static char* arguments[] = {name, nullptr};
-  if (qApp == nullptr) new QApplication(count, arguments);
+  StartQt();
   QWidget window;
   window.resize(1400, 800);
   QStatusBar bar(&window);

@@ -5,6 +5,9 @@
 #include <vector>
 
 #include "bench/bench.h"
+#if BENCH_PEERS
+#include "bench/qt_application.h"
+#endif
 #include "qxcore/graphics/bitmap.h"
 #include "qxcore/graphics/dc.h"
 #include "qxcore/graphics/font.h"
@@ -13,7 +16,6 @@
 #if BENCH_PEERS
 #include <QFontDatabase>
 #include <QFontMetrics>
-#include <QGuiApplication>
 #include <QImage>
 #include <QPainter>
 #endif
@@ -97,14 +99,6 @@ BENCH("100,000 text extents/ours") {
 
 #if BENCH_PEERS
 namespace {
-
-// Qt needs an application before it can draw text.
-void StartQt() {
-  static char name[] = "qxbench", option[] = "-platform", platform[] = "offscreen";
-  static char* arguments[] = {name, option, platform, nullptr};
-  static int count = 3;
-  static QGuiApplication application(count, arguments);
-}
 
 QFont TheirFont() {
   StartQt();

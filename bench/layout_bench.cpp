@@ -2,7 +2,6 @@
 // so that a change of its size is laid out inside the call.
 
 #if BENCH_PEERS
-#include <QApplication>
 #include <QSplitter>
 #include <QTabBar>
 #include <QVBoxLayout>
@@ -12,6 +11,9 @@
 #include <vector>
 
 #include "bench/bench.h"
+#if BENCH_PEERS
+#include "bench/qt_application.h"
+#endif
 #include "qxcore/qxcore.h"
 
 namespace {
@@ -99,18 +101,8 @@ BENCH("make the last of 1,000 tabs visible/ours") {
 }
 
 #if BENCH_PEERS
-// One application object for all of the process.
-void NeedApplication() {
-  if (QCoreApplication::instance() != nullptr) return;
-  qputenv("QT_QPA_PLATFORM", "offscreen");
-  static int argc = 1;
-  static char name[] = "qxbench";
-  static char* argv[] = {name, nullptr};
-  static QApplication application(argc, argv);
-}
-
 BENCH("resize a splitter of 16 x 16 panes/QSplitter") {
-  NeedApplication();
+  StartQt();
   QWidget window;
   window.resize(1700, 1300);
   auto* rows = new QSplitter(Qt::Vertical, &window);
@@ -126,7 +118,7 @@ BENCH("resize a splitter of 16 x 16 panes/QSplitter") {
 }
 
 BENCH("make the last of 1,000 tabs visible/QTabBar") {
-  NeedApplication();
+  StartQt();
   QWidget window;
   window.resize(700, 100);
   auto* bar = new QTabBar(&window);

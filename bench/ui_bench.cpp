@@ -1,9 +1,10 @@
 // Messages and commands, beside virtual calls, events of Qt and of wxWidgets.
 
+#include <ctime>
+
 #if BENCH_PEERS
-#include <QCoreApplication>
 #include <QEvent>
-#include <QObject>
+#include <QWidget>
 #endif
 #if defined(BENCH_WX)
 #include <wx/app.h>
@@ -11,6 +12,9 @@
 #endif
 
 #include "bench/bench.h"
+#if BENCH_PEERS
+#include "bench/qt_application.h"
+#endif
 #include "qxcore/ui/app/application.h"
 #include "qxcore/ui/frame/frame.h"
 #include "qxcore/ui/frame/view.h"
@@ -44,10 +48,13 @@ struct Virtual {
   virtual ~Virtual() = default;
   virtual LRESULT Call(UINT message, WPARAM wParam, LPARAM lParam) = 0;
 };
+// Two, so that no compiler calls the only one directly.
+template <int>
 struct Called final : Virtual {
-  LRESULT Call(UINT, WPARAM wParam, LPARAM) override { return static_cast<LRESULT>(m_sum += wParam); }
+  [[gnu::noinline]] LRESULT Call(UINT, WPARAM wParam, LPARAM) override { return static_cast<LRESULT>(m_sum += wParam); }
   WPARAM m_sum = 0;
 };
+volatile int g_choice = 0;
 
 BENCH("a handled message, three bases down/ours") {
   Three window;
@@ -71,9 +78,9 @@ BENCH("an unhandled message/ours") {
 }
 
 void VirtualCalls(benchmark::State& state) {
-  Called called;
-  Virtual* object = &called;
-  benchmark::DoNotOptimize(object);
+  Called<0> one;
+  Called<1> two;
+  Virtual* object = g_choice == 0 ? static_cast<Virtual*>(&one) : &two;
   for (auto _ : state) benchmark::DoNotOptimize(object->Call(kHandled, 1, 0));
 }
 BENCH("a handled message, three bases down/virtual call") { VirtualCalls(state); }
@@ -135,56 +142,95 @@ BENCH("a command through view, frame and application/ours") {
 }
 
 #if BENCH_PEERS
-class QtReceiver : public QObject {
+// The loop of a program whose windows wait; the processor time of the whole process.
+class IdleApp : public SWinApp {
+ public:
+  void Idle() {
+    SWnd window;
+    window.CreateEx(0, nullptr, WTEXT("idle"), WS_OVERLAPPEDWINDOW | WS_VISIBLE, 0, 0, 200, 100, nullptr, nullptr);
+    m_mainWnd = &window;
+    window.SetTimer(1, 10000);
+    window.PostMessageW(WM_USER);
+    MSG waiting;
+    while (PumpMessage() && m_message.message != WM_TIMER) {
+      if (!::PeekMessageW(&waiting, nullptr, 0, 0, PM_NOREMOVE)) DoIdle();
+    }
+    m_mainWnd = nullptr;
+    window.DestroyWindow();
+  }
+};
+
+void IdleForTenSeconds(benchmark::State& state) {
+  const std::clock_t before = std::clock();
+  for (auto _ : state) IdleApp().Idle();
+  state.counters["processor_ns"] = static_cast<double>(std::clock() - before) * 1e9 / CLOCKS_PER_SEC;
+}
+const auto g_idle = benchmark::RegisterBenchmark("an idle program, ten seconds/ours", IdleForTenSeconds)
+                        -> Iterations(1) -> Repetitions(1);
+
+template <class Base>
+class QtReceiver : public Base {
  public:
   bool event(QEvent* event) override {
     if (event->type() == QEvent::User) return ++m_count, true;
-    return QObject::event(event);
+    return Base::event(event);
   }
   long m_count = 0;
 };
 
+template <class Base>
 void QtSends(benchmark::State& state) {
-  int argc = 0;
-  QCoreApplication app(argc, nullptr);
-  QtReceiver receiver;
+  StartQt();
+  QtReceiver<Base> receiver;
   QEvent event(QEvent::User);
   for (auto _ : state) benchmark::DoNotOptimize(QCoreApplication::sendEvent(&receiver, &event));
 }
-BENCH("a handled message, three bases down/Qt sendEvent") { QtSends(state); }
-BENCH("SendMessage to a handler/Qt sendEvent") { QtSends(state); }
+BENCH("a handled message, three bases down/Qt sendEvent") { QtSends<QObject>(state); }
+BENCH("SendMessage to a handler/Qt sendEvent") { QtSends<QWidget>(state); }
 #endif
 
 #if defined(BENCH_WX)
+// clang-format off
 wxDEFINE_EVENT(kWxHandled, wxCommandEvent);
 class WxHandling : public wxEvtHandler {
  public:
   void OnHandled(wxCommandEvent&) { ++m_count; }
-  void OnOther(wxCommandEvent&) {}
   long m_count = 0;
   wxDECLARE_EVENT_TABLE();
 };
-wxBEGIN_EVENT_TABLE(WxHandling, wxEvtHandler) EVT_COMMAND(wxID_ANY, kWxHandled, WxHandling::OnHandled)
-    wxEND_EVENT_TABLE() class WxOne : public WxHandling {
-  wxDECLARE_EVENT_TABLE();
-};
-wxBEGIN_EVENT_TABLE(WxOne, WxHandling) wxEND_EVENT_TABLE() class WxTwo : public WxOne { wxDECLARE_EVENT_TABLE(); };
-wxBEGIN_EVENT_TABLE(WxTwo, WxOne) wxEND_EVENT_TABLE()
+wxBEGIN_EVENT_TABLE(WxHandling, wxEvtHandler)
+  EVT_COMMAND(wxID_ANY, kWxHandled, WxHandling::OnHandled)
+wxEND_EVENT_TABLE()
 
-    class WxOther : public wxEvtHandler {
+class WxOne : public WxHandling { wxDECLARE_EVENT_TABLE(); };
+wxBEGIN_EVENT_TABLE(WxOne, WxHandling)
+wxEND_EVENT_TABLE()
+
+class WxTwo : public WxOne { wxDECLARE_EVENT_TABLE(); };
+wxBEGIN_EVENT_TABLE(WxTwo, WxOne)
+wxEND_EVENT_TABLE()
+
+// A table as long as a view's with those of its bases, without the command that is sent.
+#define WX_ENTRY(number) EVT_COMMAND(number, kWxHandled, WxOther::OnOther)
+#define WX_TEN(first) \
+  WX_ENTRY(first) WX_ENTRY(first + 1) WX_ENTRY(first + 2) WX_ENTRY(first + 3) WX_ENTRY(first + 4) \
+  WX_ENTRY(first + 5) WX_ENTRY(first + 6) WX_ENTRY(first + 7) WX_ENTRY(first + 8) WX_ENTRY(first + 9)
+class WxOther : public wxEvtHandler {
  public:
   void OnOther(wxCommandEvent&) {}
   wxDECLARE_EVENT_TABLE();
 };
-wxBEGIN_EVENT_TABLE(WxOther, wxEvtHandler) EVT_COMMAND(1, kWxHandled, WxOther::OnOther)
-    EVT_COMMAND(2, kWxHandled, WxOther::OnOther) EVT_COMMAND(3, kWxHandled, WxOther::OnOther)
-        EVT_COMMAND(4, kWxHandled, WxOther::OnOther) wxEND_EVENT_TABLE()
+wxBEGIN_EVENT_TABLE(WxOther, wxEvtHandler)
+  WX_TEN(100) WX_TEN(110) WX_TEN(120) WX_TEN(130) WX_TEN(140) WX_ENTRY(1) WX_ENTRY(2) WX_ENTRY(3) WX_ENTRY(4)
+wxEND_EVENT_TABLE()
+    // clang-format on
 
-            BENCH("a handled message, three bases down/wxWidgets") {
+    BENCH("a handled message, three bases down/wxWidgets") {
   WxTwo handler;
   wxCommandEvent event(kWxHandled, 7);
   for (auto _ : state) benchmark::DoNotOptimize(handler.ProcessEvent(event));
 }
+
 BENCH("a command through view, frame and application/wxWidgets") {
   WxOther view, frame;
   WxTwo app;

@@ -1,12 +1,14 @@
 // Windows: sending, posting, making and destroying, beside Qt's events and widgets.
 
 #if BENCH_PEERS
-#include <QApplication>
 #include <QEvent>
 #include <QWidget>
 #endif
 
 #include "bench/bench.h"
+#if BENCH_PEERS
+#include "bench/qt_application.h"
+#endif
 #include "qxcore/platform/win32.h"
 
 namespace {
@@ -67,16 +69,6 @@ BENCH("make and destroy 1000 children/ours") {
 }
 
 #if BENCH_PEERS
-QApplication& Application() {
-  static int count = 1;
-  static char name[] = "qxbench";
-  static char* arguments[] = {name, nullptr};
-  static const bool isOffscreen = qputenv("QT_QPA_PLATFORM", "offscreen");
-  (void)isOffscreen;
-  static QApplication* application = new QApplication(count, arguments);
-  return *application;
-}
-
 class CountingWidget final : public QWidget {
  public:
   using QWidget::QWidget;
@@ -89,14 +81,14 @@ class CountingWidget final : public QWidget {
 };
 
 BENCH("send a message to a plain procedure/Qt sendEvent") {
-  Application();
+  StartQt();
   CountingWidget widget;
   QEvent event(QEvent::User);
   for (auto _ : state) benchmark::DoNotOptimize(QCoreApplication::sendEvent(&widget, &event));
 }
 
 BENCH("post, get and dispatch 1000 messages/Qt postEvent") {
-  Application();
+  StartQt();
   CountingWidget widget;
   for (auto _ : state) {
     for (int i = 0; i < kBatch; ++i) QCoreApplication::postEvent(&widget, new QEvent(QEvent::User));
@@ -105,7 +97,7 @@ BENCH("post, get and dispatch 1000 messages/Qt postEvent") {
 }
 
 BENCH("make and destroy 1000 children/Qt widgets") {
-  Application();
+  StartQt();
   CountingWidget frame;
   frame.show();
   for (auto _ : state) {

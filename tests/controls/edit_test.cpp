@@ -2,9 +2,12 @@
 
 #include <gtest/gtest.h>
 
+#include <cstring>
 #include <random>
 
+#include "qxcore/platform/win32/clipboard.h"
 #include "tests/controls/control_host.h"
+#include "tests/support/wine.h"
 
 namespace {
 
@@ -134,6 +137,66 @@ TEST(Edit, PlacesAndPoints_AreInverse) {
     former = x;
     EXPECT_EQ(LOWORD(SendMessageW(edit, EM_CHARFROMPOS, 0, MAKELPARAM(x, 5))), place);
   }
+}
+
+// A text that others put on the clipboard, and one that they find there.
+void PutOnClipboard(HWND owner, LPCWSTR text) {
+  ASSERT_TRUE(OpenClipboard(owner));
+  EXPECT_TRUE(EmptyClipboard());
+  const SIZE_T size = (SStringView(text).size() + 1) * sizeof(WCHAR);
+  const HGLOBAL block = GlobalAlloc(GMEM_MOVEABLE, size);
+  std::memcpy(GlobalLock(block), text, size);
+  GlobalUnlock(block);
+  EXPECT_EQ(SetClipboardData(CF_UNICODETEXT, block), block);
+  EXPECT_EQ(GetClipboardOwner(), owner);
+  EXPECT_TRUE(CloseClipboard());
+}
+
+std::string OnClipboard(HWND reader) {
+  if (!OpenClipboard(reader)) return "closed";
+  std::string text;
+  if (const HGLOBAL block = GetClipboardData(CF_UNICODETEXT)) {
+    for (auto* c = static_cast<const WCHAR*>(GlobalLock(block)); *c != 0; ++c) text += static_cast<char>(*c);
+    GlobalUnlock(block);
+  }
+  CloseClipboard();
+  return text;
+}
+
+TEST(Edit, Clipboard_TakesAndGivesTexts) {
+  ControlHost host;
+  HWND from = host.Make(WTEXT("Edit"), WTEXT("one two"), ES_AUTOHSCROLL);
+  HWND to = host.Make(WTEXT("Edit"), WTEXT("<>"), ES_AUTOHSCROLL);
+  Select(from, 4, 7);
+  SendMessageW(from, WM_COPY, 0, 0);
+  EXPECT_EQ(OnClipboard(host.Window()), "two");
+  Select(to, 1, 1);
+  SendMessageW(to, WM_PASTE, 0, 0);
+  EXPECT_EQ(TextOf(to), "<two>");
+  Select(from, 0, 4);
+  SendMessageW(from, WM_CHAR, 'X' - '@', 1);
+  EXPECT_EQ(TextOf(from), "two");
+  EXPECT_EQ(OnClipboard(host.Window()), "one ");
+  EXPECT_TRUE(SendMessageW(from, EM_CANUNDO, 0, 0));
+  SendMessageW(to, WM_CHAR, 'V' - '@', 1);
+  EXPECT_EQ(TextOf(to), "<twoone >");
+
+  PutOnClipboard(host.Window(), WTEXT("two\r\nlines"));
+  SendMessageW(from, EM_SETSEL, 0, -1);
+  SendMessageW(from, WM_PASTE, 0, 0);
+  EXPECT_EQ(TextOf(from), "two") << "a control of one line takes one";
+  SendMessageW(from, EM_SETREADONLY, TRUE, 0);
+  SendMessageW(from, EM_SETSEL, 0, -1);
+  SendMessageW(from, WM_CUT, 0, 0);
+  SendMessageW(from, WM_PASTE, 0, 0);
+  EXPECT_EQ(TextOf(from), "two");
+  HWND secret = host.Make(WTEXT("Edit"), WTEXT("secret"), ES_PASSWORD);
+  SendMessageW(secret, EM_SETSEL, 0, -1);
+  SendMessageW(secret, WM_COPY, 0, 0);
+  if (!IsWine()) {
+    EXPECT_EQ(OnClipboard(host.Window()).find("secret"), std::string::npos);
+  }
+  EXPECT_EQ(GetClipboardData(CF_UNICODETEXT), nullptr) << "it is closed";
 }
 
 }  // namespace

@@ -223,7 +223,6 @@ TEST_F(Commands, SystemMenuItems_AreFoundByTheirCommand) {
 }
 
 TEST_F(Commands, CommandUiOfAWindow_SetsTheWindow) {
-  SKIP_WITHOUT("Button");
   SButton button;
   ASSERT_TRUE(button.Create(WTEXT("a"), WS_CHILD | BS_CHECKBOX, SRect(0, 0, 50, 20), m_frame, kPaste));
   SCmdUI ui;

@@ -65,8 +65,6 @@ class Dialogs : public test::UiTest {
  protected:
   void SetUp() override {
     test::UiTest::SetUp();
-    SKIP_WITHOUT("Button");
-    SKIP_WITHOUT("Edit");
     ASSERT_TRUE(m_owner.Popup(WS_VISIBLE));
     m_app.m_mainWnd = &m_owner;
   }

@@ -166,11 +166,6 @@ TEST_F(Frames, ScrollLimit_AllowsForThePage) {
 }
 
 TEST_F(Frames, Controls_DoWhatTheirMessagesSay) {
-  SKIP_WITHOUT("Edit");
-  SKIP_WITHOUT("Button");
-  SKIP_WITHOUT("Static");
-  SKIP_WITHOUT("ScrollBar");
-  SKIP_WITHOUT("msctls_progress32");
   test::Window parent;
   ASSERT_TRUE(parent.Popup());
   SEdit edit;
@@ -248,11 +243,6 @@ int CountWindows() {
 
 // With each allocation failing, there is a whole frame or none.
 TEST_F(Frames, FailingAllocations_LeaveNoHalfFrame) {
-#ifndef _WIN32
-  GTEST_SKIP() << "known fault: from the 19th allocation on, a shortage while the frame is shown is not reported";
-#endif
-  SKIP_WITHOUT("Edit");
-  SKIP_WITHOUT("Button");
   SWnd::FromHandle(::GetDesktopWindow());
   const int permanent = SWnd::HandleMap().GetPermanentCount();
   const int windows = CountWindows();

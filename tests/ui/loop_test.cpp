@@ -327,7 +327,9 @@ TEST_F(Loop, Exception_ThatReachesRun_IsReportedAndTheLoopGoesOn) {
   m_app.m_mainWnd = &window;
   window.PostMessageW(WM_USER);
   window.PostMessageW(WM_CLOSE);
+  EXPECT_FALSE(SWinApp::IsExiting());
   EXPECT_EQ(m_app.Run(), 0);
+  EXPECT_TRUE(SWinApp::IsExiting());
   EXPECT_EQ(reports.List(), std::vector<SString>{WTEXT("first")});
 }
 

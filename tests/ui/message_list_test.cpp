@@ -8,6 +8,7 @@
 #include <map>
 #include <sstream>
 
+#include "tests/support/wine.h"
 #include "tests/ui/dialog_template.h"
 #include "tests/ui/ui_fixture.h"
 
@@ -16,42 +17,16 @@ namespace {
 const std::map<UINT, const char*> kNames = {
 #define NAME(message) \
   { message, #message }
-    NAME(WM_ACTIVATE),
-    NAME(WM_ACTIVATEAPP),
-    NAME(WM_CANCELMODE),
-    NAME(WM_CAPTURECHANGED),
-    NAME(WM_CLOSE),
-    NAME(WM_COMMAND),
-    NAME(WM_CREATE),
-    NAME(WM_DESTROY),
-    NAME(WM_ENABLE),
-    NAME(WM_ENTERMENULOOP),
-    NAME(WM_EXITMENULOOP),
-    NAME(WM_ERASEBKGND),
-    NAME(WM_GETMINMAXINFO),
-    NAME(WM_INITDIALOG),
-    NAME(WM_INITMENU),
-    NAME(WM_INITMENUPOPUP),
-    NAME(WM_KILLFOCUS),
-    NAME(WM_MOVE),
-    NAME(WM_NCACTIVATE),
-    NAME(WM_NCCALCSIZE),
-    NAME(WM_NCCREATE),
-    NAME(WM_NCDESTROY),
-    NAME(WM_NCPAINT),
-    NAME(WM_PAINT),
-    NAME(WM_PARENTNOTIFY),
-    NAME(WM_SETFOCUS),
-    NAME(WM_SHOWWINDOW),
-    NAME(WM_SIZE),
-    NAME(WM_STYLECHANGED),
-    NAME(WM_STYLECHANGING),
-    NAME(WM_SYSCOMMAND),
-    NAME(WM_TIMER),
-    NAME(WM_WINDOWPOSCHANGED),
-    NAME(WM_WINDOWPOSCHANGING),
-    NAME(WM_SETREDRAW),
-    NAME(WM_HSCROLL),
+    NAME(WM_ACTIVATE),     NAME(WM_ACTIVATEAPP),   NAME(WM_CANCELMODE),       NAME(WM_CAPTURECHANGED),
+    NAME(WM_CLOSE),        NAME(WM_COMMAND),       NAME(WM_CREATE),           NAME(WM_DESTROY),
+    NAME(WM_ENABLE),       NAME(WM_ENTERMENULOOP), NAME(WM_MENUSELECT),       NAME(WM_UNINITMENUPOPUP),
+    NAME(WM_EXITMENULOOP), NAME(WM_ERASEBKGND),    NAME(WM_GETMINMAXINFO),    NAME(WM_INITDIALOG),
+    NAME(WM_INITMENU),     NAME(WM_INITMENUPOPUP), NAME(WM_KILLFOCUS),        NAME(WM_MOVE),
+    NAME(WM_NCACTIVATE),   NAME(WM_NCCALCSIZE),    NAME(WM_NCCREATE),         NAME(WM_NCDESTROY),
+    NAME(WM_NCPAINT),      NAME(WM_PAINT),         NAME(WM_PARENTNOTIFY),     NAME(WM_SETFOCUS),
+    NAME(WM_SHOWWINDOW),   NAME(WM_SIZE),          NAME(WM_STYLECHANGED),     NAME(WM_STYLECHANGING),
+    NAME(WM_SYSCOMMAND),   NAME(WM_TIMER),         NAME(WM_WINDOWPOSCHANGED), NAME(WM_WINDOWPOSCHANGING),
+    NAME(WM_SETREDRAW),    NAME(WM_HSCROLL),
 #undef NAME
 };
 
@@ -166,6 +141,98 @@ TEST_F(MessageLists, Command_ComesFromAnAccelerator) {
   Check("accelerator");
   ::DestroyAcceleratorTable(table);
   window.DestroyWindow();
+}
+
+// A class of the framework whose messages go into the list.
+template <class Base>
+class Listed : public Base {
+ public:
+  explicit Listed(test::Window::Handler handler) : m_handler(std::move(handler)) {}
+  int OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* result) override {
+    m_handler(message, wParam, lParam, result);
+    return Base::OnWndMsg(message, wParam, lParam, result);
+  }
+
+ private:
+  test::Window::Handler m_handler;
+};
+
+class PlainView : public SView {
+  void OnDraw(SDC*) override {}
+};
+
+TEST_F(MessageLists, Command_ComesFromAMenu) {
+  if (IsWine() && std::getenv("QXCORE_EXPECTED") == nullptr) {
+    GTEST_SKIP() << "SKIPPED: on a busy machine Wine's menu now and then waits for keys that were posted to it";
+  }
+  class View : public Listed<PlainView> {
+   public:
+    View(test::Window::Handler handler, std::string* list) : Listed(std::move(handler)), m_list(list) {}
+    int OnCmdMsg(UINT id, int code, void*, S_CMDHANDLERINFO* info) override {
+      if (info == nullptr) *m_list += code == kSMsgUpdate ? "view is asked for the state\n" : "view gets the command\n";
+      return id == 0x8002 && (code != kSMsgUpdate);
+    }
+    std::string* m_list;
+  };
+  HWND window = nullptr;
+  auto* frame = new Listed<SFrameWnd>(Recorder("frame", [&](UINT message, WPARAM, LPARAM, LRESULT*) {
+    if (message != WM_INITMENUPOPUP) return 0;
+    for (const WPARAM key : {VK_DOWN, VK_RETURN}) ::PostMessageW(window, WM_KEYDOWN, key, 1);
+    return 0;
+  }));
+  ASSERT_TRUE(frame->Create(nullptr, WTEXT("f"), WS_OVERLAPPEDWINDOW | WS_VISIBLE, SRect(10, 20, 310, 220)));
+  auto* view = new View(Recorder("view"), &m_list);
+  ASSERT_TRUE(view->Create(nullptr, nullptr, WS_VISIBLE, SRect(0, 0, 50, 50), frame, kSFirstPane));
+  frame->SetActiveView(view);
+  SMenu file, bar;
+  file.CreatePopupMenu();
+  file.AppendMenuW(MF_STRING, 0x8001, WTEXT("&Nothing"));
+  file.AppendMenuW(MF_STRING, 0x8002, WTEXT("&Go"));
+  bar.CreateMenu();
+  bar.AppendMenuW(MF_POPUP, reinterpret_cast<UINT_PTR>(file.Detach()), WTEXT("&File"));
+  frame->SetMenu(bar.Detach());
+  Start();
+  window = frame->m_hWnd;
+  frame->SendMessageW(WM_SYSCOMMAND, SC_KEYMENU, 'f');
+  Step("the loop goes on");
+  test::PumpAll();
+  Check("menu_command");
+  m_isOn = false;
+  frame->DestroyWindow();
+}
+
+TEST_F(MessageLists, ModalDialog_OpensIsAnsweredAndCloses) {
+  class Box : public Listed<SDlg> {
+   public:
+    Box(test::Window::Handler handler, std::string* list) : Listed(std::move(handler)), m_list(list) {}
+    void PreInitDialog() override { *m_list += "PreInitDialog\n"; }
+    int OnInitDialog() override {
+      *m_list += "OnInitDialog\n";
+      PostMessageW(WM_COMMAND, IDOK);
+      return SDlg::OnInitDialog();
+    }
+    void OnOK() override {
+      *m_list += "OnOK\n";
+      SDlg::OnOK();
+    }
+    void PostNcDestroy() override { *m_list += "PostNcDestroy\n"; }
+    std::string* m_list;
+  };
+  SetInteractiveMode shown(kInteractiveShow);
+  test::Window owner(Recorder("owner"));
+  ASSERT_TRUE(owner.Popup(WS_VISIBLE));
+  m_app.m_mainWnd = &owner;
+  const test::DialogTemplate made =
+      test::DialogTemplate(WTEXT("box")).Button(WTEXT("OK"), BS_DEFPUSHBUTTON, IDOK).Edit(101);
+  Box box(Recorder("box"), &m_list);
+  box.SetTemplate(made.Data());
+  Start();
+  EXPECT_EQ(box.DoModal(), IDOK);
+  Check("modal_dialog");
+  m_isOn = false;
+  m_app.m_mainWnd = nullptr;
+  owner.m_handler = nullptr;
+  owner.DestroyWindow();
 }
 
 TEST_F(MessageLists, Timer_IsDispatched) {

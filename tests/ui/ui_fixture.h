@@ -76,15 +76,6 @@ class App : public SWinApp {
   std::function<void(long)> m_onIdle;
 };
 
-// Leaves a test out while the portable layer has no such class of controls.
-inline bool HasClass(LPCWSTR name) {
-  WNDCLASSEXW known = {};
-  known.cbSize = sizeof(known);
-  return ::GetClassInfoExW(nullptr, name, &known) != 0;
-}
-#define SKIP_WITHOUT(name) \
-  if (!test::HasClass(WTEXT(name))) GTEST_SKIP() << "there is no class " name
-
 // Handles what is in the queue without waiting.
 inline void PumpAll() {
   MSG message;

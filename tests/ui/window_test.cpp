@@ -114,7 +114,6 @@ TEST_F(Windows, Temporary_ObjectsAreSharedUntilTheyAreDeleted) {
 }
 
 TEST_F(Windows, ScrollBars_AreGivenToHandlersAsSuch) {
-  SKIP_WITHOUT("ScrollBar");
   Window parent;
   ASSERT_TRUE(parent.Popup());
   const HWND bar = ::CreateWindowExW(0, WTEXT("ScrollBar"), nullptr, WS_CHILD, 0, 0, 10, 50, parent.m_hWnd, nullptr,
@@ -127,7 +126,6 @@ TEST_F(Windows, ScrollBars_AreGivenToHandlersAsSuch) {
 }
 
 TEST_F(Windows, Attach_DetachAndSubclass_KeepTheWindowsProcedure) {
-  SKIP_WITHOUT("Edit");
   const HWND handle =
       ::CreateWindowExW(0, WTEXT("Edit"), nullptr, WS_POPUP, 0, 0, 99, 20, nullptr, nullptr, SGetInstance(), nullptr);
   const LONG_PTR procedure = ::GetWindowLongPtrW(handle, GWLP_WNDPROC);

@@ -91,6 +91,65 @@ TEST(MessageList, MenuByKeyboard) {
   ExpectRecord("menu", record.Text());
 }
 
+// A message of the mouse at a point of the screen; the loops of the system read the message's own point.
+void PostMouse(HWND window, UINT message, POINT screen) {
+  SetCursorPos(screen.x, screen.y);
+  PostMessageW(window, message, message == WM_LBUTTONUP ? 0 : MK_LBUTTON, MAKELPARAM(screen.x, screen.y));
+}
+
+#ifndef _WIN32
+POINT MiddleOf(HWND owner, HMENU menu, UINT item) {
+  RECT place{};
+  EXPECT_TRUE(GetMenuItemRect(owner, menu, item, &place));
+  return {(place.left + place.right) / 2, (place.top + place.bottom) / 2};
+}
+
+// Under Wine the mouse takes the activation along when it moves from the bar to the popup, which ends the menu.
+TEST(Input, AMenuIsOpenedByAPressAndChosenByARelease) {
+  Record record;
+  const HWND top = MakeFrame();
+  const POINT file = MiddleOf(top, GetMenu(top), 0);
+  g_menuOwner = top;
+  const Steps steps({{WM_ENTERIDLE, [] {
+                        const HMENU popup = GetSubMenu(GetMenu(g_menuOwner), 0);
+                        PostMouse(g_menuOwner, WM_LBUTTONUP, MiddleOf(g_menuOwner, popup, 2));
+                      }}});
+  SendMessageW(top, WM_NCLBUTTONDOWN, HTMENU, MAKELPARAM(file.x, file.y));
+  Pump();
+  DestroyWindow(top);
+  for (const char* line : {"top WM_INITMENUPOPUP", "top WM_MENUSELECT 80800065", "top WM_COMMAND 65 none"})
+    EXPECT_NE(record.Text().find(line), std::string::npos) << line << " in\n" << record.Text();
+}
+#endif
+
+TEST(MessageList, SizingByTheBorder) {
+  Record record;
+  const HWND top = Make(WTEXT("top"), WS_OVERLAPPEDWINDOW | WS_VISIBLE, nullptr, {100, 100, 400, 300});
+  Pump();
+  SetCursorPos(398, 200);
+  Pump();
+  g_menuOwner = top;
+  record.Title("drag the right border by thirty pixels");
+  const Steps steps({{WM_ENTERSIZEMOVE,
+                      [] {
+                        PostMouse(g_menuOwner, WM_MOUSEMOVE, {428, 200});
+                      }},
+                     {WM_SIZING, [] {
+                        PostMouse(g_menuOwner, WM_LBUTTONUP, {428, 200});
+                      }}});
+  SendMessageW(top, WM_NCLBUTTONDOWN, HTRIGHT, MAKELPARAM(398, 200));
+  RECT rect;
+  GetWindowRect(top, &rect);
+  EXPECT_EQ(rect.right, 430);
+  EXPECT_EQ(rect.left, 100);
+  EXPECT_EQ(rect.bottom, 300);
+  EXPECT_EQ(GetCapture(), nullptr);
+  ValidateRect(top, nullptr);
+  record.Title("destroy");
+  DestroyWindow(top);
+  ExpectRecord("sizing", record.Text());
+}
+
 TEST(MessageList, Accelerators) {
   Record record;
   const HWND top = MakeFrame();

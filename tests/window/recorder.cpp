@@ -165,6 +165,8 @@ LRESULT CALLBACK Hook(int code, WPARAM wParam, LPARAM lParam) {
   const std::string who =
       code == HCBT_SYSCOMMAND ? Format("%x", static_cast<unsigned>(wParam)) : Who(reinterpret_cast<HWND>(wParam));
   const bool isOwn = who.find("IME") == std::string::npos && who.find("OleMain") == std::string::npos;
+  // Documented as coming before the window follows the mouse; Wine calls it when that is over.
+  if (code == HCBT_MOVESIZE) return CallNextHookEx(nullptr, code, wParam, lParam);
   if (code >= 0 && code <= HCBT_SETFOCUS && isOwn) {
     std::string text = std::string("hook ") + kCodes[code] + " " + who;
     if (code == HCBT_SETFOCUS) text += " from " + Who(reinterpret_cast<HWND>(lParam));

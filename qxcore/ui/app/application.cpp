@@ -26,7 +26,9 @@ HINSTANCE SGetResInstance() { return SCoreGetModuleState()->GetResInstance(); }
 SWnd* SGetOwnerWnd() { return g_app != nullptr ? g_app->GetOwnerWnd() : nullptr; }
 
 SWinApp::SWinApp(LPCWSTR name) : m_appName(name) {
-  if (g_app == nullptr) g_app = this;
+  if (g_app != nullptr) return;
+  g_app = this;
+  SetExiting(0);
 }
 
 SWinApp::~SWinApp() {

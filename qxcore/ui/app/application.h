@@ -44,7 +44,8 @@ class QXCORE_API SWinApp : public SCmdTarget {
   virtual int Run();
   // Sees a message before it is dispatched; nonzero takes it. Here: the main window's tree is asked.
   virtual int PreTranslateMessage(MSG* message);
-  // Takes one message, waiting for it, and dispatches it; 0 for WM_QUIT. Throws what a handler threw.
+  // Takes one message, waiting for it, and dispatches it; 0 for WM_QUIT. Throws what a handler threw, and
+  // SEOutOfMemory.
   virtual int PumpMessage();
   // One step of idle work. Nonzero asks for another one at once. Here: with 0 the notifications, with 1 the
   // temporary objects are destroyed; nonzero for 0 only.
@@ -81,7 +82,7 @@ class QXCORE_API SWinApp : public SCmdTarget {
   const SString& GetExeFullFileName() const { return m_exeFullFileName; }  // the whole path
   int GetShowCommand() const { return m_show; }                            // for the main window's ShowWindow
   void SetCurrentHandles();                                                // reads the names above
-  static int IsExiting() { return m_isExiting; }                           // nonzero once the program is ending
+  static int IsExiting() { return m_isExiting; }                           // nonzero once Run has seen WM_QUIT
   static void SetExiting(int exiting) { m_isExiting = exiting; }
 
   // --- not supported ---

@@ -2,6 +2,7 @@
 
 #include <utility>
 
+#include "qxcore/core/exception.h"
 #include "qxcore/system/notification_manager.h"
 #include "qxcore/ui/app/application.h"
 #include "qxcore/ui/app/error_report.h"
@@ -50,6 +51,7 @@ int SWinApp::Run() {
       SReportException(std::current_exception());
     }
   }
+  SetExiting(1);
   return ExitInstance();
 }
 
@@ -155,7 +157,9 @@ int SWinApp::DropsInput(const MSG& message) {
 
 // The message is handled as a copy: a nested loop takes others into the field.
 int SWinApp::PumpMessage() {
-  if (::GetMessageW(&m_message, nullptr, 0, 0) <= 0) return 0;
+  const BOOL taken = ::GetMessageW(&m_message, nullptr, 0, 0);
+  if (taken == 0) return 0;
+  if (taken < 0) throw SEOutOfMemory();  // without a window to name wrongly, it cannot fail for another reason
   MSG message = m_message;
   if (DropsInput(message)) return 1;
   if (!IsOfIdleWork(message) && IsIdleMessage(&message)) {

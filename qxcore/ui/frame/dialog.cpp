@@ -7,6 +7,7 @@
 #include "qxcore/ui/frame/internal/dialog_template.h"
 #include "qxcore/ui/window/internal/creation.h"
 #include "qxcore/ui/window/internal/resources.h"
+#include "qxcore/ui/window/internal/route_up.h"
 #include "qxcore/ui/window/message_entries.h"
 #include "qxcore/ui/window/thread_state.h"
 
@@ -116,13 +117,5 @@ int SDlg::DoModal() {
 int SDlg::PreTranslateMessage(MSG* message) { return m_hWnd != nullptr && SSent(::IsDialogMessageW(m_hWnd, message)); }
 
 int SDlg::OnCmdMsg(UINT id, int code, void* extra, S_CMDHANDLERINFO* info) {
-  if (SWnd::OnCmdMsg(id, code, extra, info)) return 1;
-  const bool isCommand = code == 0 || code == kSMsgUpdate;
-  if (!isCommand || id < 0x8000 || id >= 0xF000) return 0;
-  if (SWnd* owner = FromHandlePermanent(::GetParent(m_hWnd));
-      owner != nullptr && owner->OnCmdMsg(id, code, extra, info)) {
-    return 1;
-  }
-  SWinApp* app = SGetApp();
-  return app != nullptr && app->OnCmdMsg(id, code, extra, info);
+  return SWnd::OnCmdMsg(id, code, extra, info) || SRouteUp(*this, id, code, extra, info);
 }

@@ -2,6 +2,7 @@
 
 #include <utility>
 
+#include "qxcore/core/exception.h"
 #include "qxcore/ui/app/application.h"
 #include "qxcore/ui/frame/view.h"
 #include "qxcore/ui/window/internal/resources.h"
@@ -174,6 +175,7 @@ void SFrameWnd::RecalcLayout() {
     ~Running() { flag = false; }
   } running{m_isInLayout};
   SSizeParent layout{::BeginDeferWindowPos(8), GetClientRect(), SSize(), 1};
+  if (layout.m_batch == nullptr) throw SEOutOfMemory();
   HWND client = nullptr;
   for (HWND child = ::GetWindow(m_hWnd, GW_CHILD); child != nullptr; child = ::GetWindow(child, GW_HWNDNEXT)) {
     if (::GetWindowLongPtrW(child, GWLP_ID) == static_cast<LONG_PTR>(kSFirstPane)) {
@@ -187,8 +189,10 @@ void SFrameWnd::RecalcLayout() {
                                       std::max(layout.m_rect.Width(), 0), std::max(layout.m_rect.Height(), 0),
                                       SWP_NOZORDER | SWP_NOACTIVATE);
   }
+  const bool isShort = layout.m_batch == nullptr && ::GetLastError() == ERROR_NOT_ENOUGH_MEMORY;
   if (layout.m_batch != nullptr) ::EndDeferWindowPos(layout.m_batch);
   SWndThreadState::Get().ThrowException();
+  if (isShort) throw SEOutOfMemory();
 }
 
 // --- accelerators, activation, routing ---

@@ -4,8 +4,8 @@
 
 #include "qxcore/ui/frame/frame.h"
 #include "qxcore/ui/frame/view.h"
-#include "qxcore/ui/layout/internal/route_up.h"
 #include "qxcore/ui/layout/internal/size_box.h"
+#include "qxcore/ui/window/internal/route_up.h"
 #include "qxcore/ui/window/message_entries.h"
 #include "qxcore/ui/window/thread_state.h"
 

@@ -6,9 +6,9 @@
 #include "qxcore/ui/frame/frame.h"
 #include "qxcore/ui/frame/view.h"
 #include "qxcore/ui/layout/internal/pane_focus.h"
-#include "qxcore/ui/layout/internal/route_up.h"
 #include "qxcore/ui/layout/internal/size_box.h"
 #include "qxcore/ui/layout/internal/state_text.h"
+#include "qxcore/ui/window/internal/route_up.h"
 #include "qxcore/ui/window/message_entries.h"
 #include "qxcore/ui/window/thread_state.h"
 

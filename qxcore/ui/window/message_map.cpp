@@ -1,5 +1,7 @@
 #include "qxcore/ui/window/message_map.h"
 
+#include "qxcore/ui/window/internal/message_cache.h"
+
 namespace {
 
 constexpr std::uintptr_t kNoAddress = 0xFFFF;  // what a signature holds up to here is a number
@@ -22,15 +24,9 @@ const SMsgEntry* FindEntry(const SMsgMap* map, Fits fits) {
   return nullptr;
 }
 
-// One slot of the cache: what the last lookup that fell on it found, a missing entry included.
-struct CacheSlot {
-  UINT m_message;
-  const SMsgEntry* m_entry;
-  const SMsgMap* m_map;  // null while the slot was never used
-};
-constinit CacheSlot g_cache[256] = {};
-
 }  // namespace
+
+constinit SMsgCacheSlot g_msgCache[256] = {};
 
 const SMsgEntry* SFindMessageEntry(const SMsgMap* map, UINT message) {
   if (message >= kSMsgRegistered) {
@@ -44,12 +40,7 @@ const SMsgEntry* SFindMessageEntry(const SMsgMap* map, UINT message) {
   });
 }
 
-const SMsgEntry* SFindMessageEntryCached(const SMsgMap* map, UINT message) {
-  CacheSlot& slot = g_cache[(reinterpret_cast<std::uintptr_t>(map) ^ message) & 0xFF];
-  if (slot.m_message != message || slot.m_map != map) [[unlikely]]
-    slot = {message, SFindMessageEntry(map, message), map};
-  return slot.m_entry;
-}
+const SMsgEntry* SFindMessageEntryCached(const SMsgMap* map, UINT message) { return SFindInCache(map, message); }
 
 const SMsgEntry* SFindCommandEntry(const SMsgMap* map, UINT message, UINT code, UINT id) {
   return FindEntry(map, [=](const SMsgEntry& entry) {

@@ -5,8 +5,9 @@
 
 #include "qxcore/ui/app/error_report.h"
 
-// Constant-initialised and without a destructor, so that reaching it costs no guard.
-static constinit thread_local SWndThreadState t_state;
+// Constant-initialised and without a destructor, so that reaching it costs no guard; and placed where the loader puts
+// it, so that it costs no call.
+[[gnu::tls_model("initial-exec")]] static constinit thread_local SWndThreadState t_state;
 
 SWndThreadState& SWndThreadState::Get() { return t_state; }
 

@@ -1,6 +1,7 @@
 #include "qxcore/ui/window/window.h"
 
 #include "qxcore/core/handle_map.h"
+#include "qxcore/platform/wide.h"
 #include "qxcore/ui/app/modal_state.h"
 #include "qxcore/ui/control/scroll_bar.h"
 #include "qxcore/ui/window/thread_state.h"
@@ -89,7 +90,7 @@ int SWnd::DestroyWindow() {
   if (window == nullptr) return 0;
   WCHAR name[80] = {};
   ::GetClassNameW(window, name, 80);
-  const bool isEditor = SString(name).CompareNoCase(WTEXT("SEditor")) == 0;
+  const bool isEditor = platform::WideCompareNoCase(name, WTEXT("SEditor")) == 0;
   if (FromHandlePermanent(window) == nullptr) return SSent(DestroyUnowned(window));
   const int result = ::DestroyWindow(window);
   if (isEditor && FromHandlePermanent(window) == this) LeaveHandleMap();

@@ -4,6 +4,7 @@
 #include "qxcore/ui/frame/dialog.h"
 #include "qxcore/ui/window/internal/cross_thread.h"
 #include "qxcore/ui/window/internal/guard.h"
+#include "qxcore/ui/window/internal/message_cache.h"
 #include "qxcore/ui/window/window.h"
 
 namespace {
@@ -59,7 +60,7 @@ int SWnd::OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* result) 
     return handled;
   }
   if (message == WM_NOTIFY) return OnNotify(wParam, lParam, result);
-  const SMsgEntry* entry = SFindMessageEntryCached(GetMessageMap(), message);
+  const SMsgEntry* entry = SFindInCache(GetMessageMap(), message);
   if (entry == nullptr) return 0;
   return CallMapped(*entry, wParam, lParam, result);
 }

@@ -14,7 +14,6 @@ struct Button : model::OnModelHeap {
   HFONT font = nullptr;
 };
 
-DWORD StyleOf(HWND window) { return static_cast<DWORD>(GetWindowLongW(window, GWL_STYLE)); }
 DWORD TypeOf(HWND window) { return StyleOf(window) & BS_TYPEMASK; }
 bool IsRadio(DWORD type) { return type == BS_RADIOBUTTON || type == BS_AUTORADIOBUTTON; }
 bool IsPush(DWORD type) { return type == BS_PUSHBUTTON || type == BS_DEFPUSHBUTTON; }
@@ -73,8 +72,7 @@ void Click(HWND window) {
 }
 
 bool IsInside(HWND window, LPARAM lParam) {
-  RECT rect;
-  GetClientRect(window, &rect);
+  RECT rect = ClientOf(window);
   return model::Contains(rect, model::PointOf(lParam));
 }
 
@@ -154,8 +152,7 @@ void Paint(HWND window, const Button* button, HDC dc) {
     DrawByOwner(window, button, dc, ODA_DRAWENTIRE);
     return;
   }
-  RECT rect;
-  GetClientRect(window, &rect);
+  RECT rect = ClientOf(window);
   const UINT message = IsPush(type) ? WM_CTLCOLORBTN : WM_CTLCOLORSTATIC;
   const auto brush = reinterpret_cast<HBRUSH>(
       Send(GetParent(window), message, reinterpret_cast<WPARAM>(dc), reinterpret_cast<LPARAM>(window)));
@@ -197,32 +194,10 @@ void Press(HWND window, Button* button) {
   SetPushed(window, button, true);
 }
 
-}  // namespace
-
-LRESULT CALLBACK ButtonProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
-  Button* button = StateOf<Button>(window);
-  if (button == nullptr && message != WM_NCCREATE) return DefWindowProcW(window, message, wParam, lParam);
+LRESULT Handle(HWND window, Button* button, UINT message, WPARAM wParam, LPARAM lParam) {
   switch (message) {
-    case WM_NCCREATE:
-      if (!MakeState<Button>(window)) return FALSE;
-      break;
-    case WM_NCDESTROY:
-      FreeState<Button>(window);
-      break;
     case WM_GETDLGCODE:
       return DialogCode(TypeOf(window));
-    case WM_ERASEBKGND:
-      return TRUE;
-    case WM_PAINT: {
-      PAINTSTRUCT paint;
-      const HDC dc = BeginPaint(window, &paint);
-      if (dc != nullptr) Paint(window, button, dc);
-      EndPaint(window, &paint);
-      return 0;
-    }
-    case WM_PRINTCLIENT:
-      Paint(window, button, reinterpret_cast<HDC>(wParam));
-      return 0;
     case WM_ENABLE:
       InvalidateRect(window, nullptr, FALSE);
       return 0;
@@ -258,15 +233,7 @@ LRESULT CALLBACK ButtonProcedure(HWND window, UINT message, WPARAM wParam, LPARA
       SetFocused(window, button, message == WM_SETFOCUS);
       return 0;
     case WM_SETTEXT:
-      DefWindowProcW(window, message, wParam, lParam);
-      InvalidateRect(window, nullptr, TRUE);
-      return TRUE;
-    case WM_SETFONT:
-      button->font = reinterpret_cast<HFONT>(wParam);
-      if (LOWORD(lParam)) InvalidateRect(window, nullptr, TRUE);
-      return 0;
-    case WM_GETFONT:
-      return reinterpret_cast<LRESULT>(button->font);
+      return TakeText(window, wParam, lParam);
     case BM_CLICK:
       Send(window, WM_LBUTTONDOWN);
       Send(window, WM_LBUTTONUP);
@@ -292,6 +259,12 @@ LRESULT CALLBACK ButtonProcedure(HWND window, UINT message, WPARAM wParam, LPARA
       break;
   }
   return DefWindowProcW(window, message, wParam, lParam);
+}
+
+}  // namespace
+
+LRESULT CALLBACK ButtonProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
+  return ControlMessage<Button, &Paint, &Handle>(window, message, wParam, lParam);
 }
 
 }  // namespace platform::controls

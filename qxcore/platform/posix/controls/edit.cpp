@@ -3,9 +3,10 @@
 #include <utility>
 
 #include "qxcore/platform/bmp.h"
-#include "qxcore/platform/posix/controls/edit_text.h"
-#include "qxcore/platform/posix/controls/painting.h"
+#include "qxcore/platform/posix/controls/clipboard_text.h"
+#include "qxcore/platform/posix/controls/edit_view.h"
 #include "qxcore/platform/posix/window/send.h"
+#include "qxcore/platform/win32/clipboard.h"
 
 namespace platform::controls {
 namespace {
@@ -13,92 +14,6 @@ namespace {
 using model::OrNoMemory;
 using model::Send;
 using model::Text;
-
-constexpr int kUsualLimit = 30000, kHighestLimit = 0x7FFFFFFE;
-
-struct Edit : model::OnModelHeap {
-  EditText text;
-  HFONT font = nullptr;
-  int limit = kUsualLimit;
-  int firstLine = 0, scrolled = 0;  // what is at the top left, in lines and pixels
-  int leftMargin = 0, rightMargin = 0;
-  WCHAR password = 0;
-  bool isModified = false, hasFocus = false;
-};
-
-DWORD StyleOf(HWND window) { return static_cast<DWORD>(GetWindowLongW(window, GWL_STYLE)); }
-bool IsMultiline(HWND window) { return StyleOf(window) & ES_MULTILINE; }
-bool IsReadOnly(HWND window) { return StyleOf(window) & ES_READONLY; }
-
-// --- measuring ---
-
-// A context with the control's font, for as long as it is needed.
-class Measure {
- public:
-  explicit Measure(const Edit* edit)
-      : m_dc(GetDC(nullptr)), m_old(SelectObject(m_dc, edit->font != nullptr ? edit->font : InterfaceFont())) {
-    GetTextMetricsW(m_dc, &m_metrics);
-  }
-  ~Measure() {
-    SelectObject(m_dc, m_old);
-    ReleaseDC(nullptr, m_dc);
-  }
-  int LineHeight() const { return m_metrics.tmHeight; }
-  int Width(const WCHAR* text, int count) const {
-    SIZE size{};
-    GetTextExtentPoint32W(m_dc, text, count, &size);
-    return size.cx;
-  }
-
- private:
-  HDC m_dc;
-  HGDIOBJ m_old;
-  TEXTMETRICW m_metrics{};
-};
-
-// What is seen of a line.
-Text Shown(const Edit* edit, int line) {
-  const Text part = edit->text.All().substr(static_cast<std::size_t>(std::max(edit->text.LineStart(line), 0)),
-                                            static_cast<std::size_t>(edit->text.LineLength(line)));
-  return edit->password != 0 ? Text(part.size(), edit->password) : part;
-}
-
-RECT TextRect(HWND window, const Edit* edit) {
-  RECT rect;
-  GetClientRect(window, &rect);
-  rect.left += edit->leftMargin + 1;
-  rect.right -= edit->rightMargin + 1;
-  rect.top += 1;
-  return rect;
-}
-
-POINT PointOf(HWND window, const Edit* edit, int position) {
-  const Measure measure(edit);
-  const RECT rect = TextRect(window, edit);
-  const int line = edit->text.LineOf(position);
-  const Text shown = Shown(edit, line);
-  const int column = std::min(position - edit->text.LineStart(line), static_cast<int>(shown.size()));
-  return {rect.left - edit->scrolled + measure.Width(shown.data(), column),
-          rect.top + (line - edit->firstLine) * measure.LineHeight()};
-}
-
-// The position whose left edge is nearest.
-int PositionAt(HWND window, const Edit* edit, POINT point) {
-  const Measure measure(edit);
-  const RECT rect = TextRect(window, edit);
-  const int height = std::max(measure.LineHeight(), 1);
-  const int offset = point.y - rect.top;
-  const int line = std::clamp(edit->firstLine + (offset >= 0 ? offset / height : -1), 0, edit->text.LineCount() - 1);
-  const Text shown = Shown(edit, IsMultiline(window) ? line : 0);
-  const int x = point.x - rect.left + edit->scrolled;
-  int before = 0;
-  for (int column = 0; column < static_cast<int>(shown.size()); ++column) {
-    const int after = measure.Width(shown.data(), column + 1);
-    if (x < (before + after) / 2) return edit->text.LineStart(line) + column;
-    before = after;
-  }
-  return edit->text.LineStart(line) + static_cast<int>(shown.size());
-}
 
 void PlaceCaret(HWND window, const Edit* edit) {
   if (!edit->hasFocus) return;
@@ -163,10 +78,38 @@ void Erase(HWND window, Edit* edit, int to) {
   Changed(window, edit);
 }
 
+// A password stays where it is.
+bool Copy(HWND window, const Edit* edit) {
+  if (edit->password != 0 || !edit->text.HasSelection()) return false;
+  return CopyToClipboard(window, edit->text.Selection());
+}
+
+void Cut(HWND window, Edit* edit) {
+  if (!IsReadOnly(window) && Copy(window, edit)) Erase(window, edit, edit->text.Caret());
+}
+
+void Paste(HWND window, Edit* edit) {
+  if (IsReadOnly(window) || !IsClipboardFormatAvailable(CF_UNICODETEXT)) return;
+  Insert(window, edit, TextOfClipboard(window), true);
+}
+
 void Type(HWND window, Edit* edit, WCHAR c) {
-  if (c == 8) {
-    Erase(window, edit, edit->text.Before(edit->text.Caret()));
-    return;
+  constexpr WCHAR kCopy = 'C' - '@', kBackspace = 'H' - '@', kPaste = 'V' - '@', kCut = 'X' - '@';
+  switch (c) {
+    case kBackspace:
+      Erase(window, edit, edit->text.Before(edit->text.Caret()));
+      return;
+    case kCopy:
+      Copy(window, edit);
+      return;
+    case kCut:
+      Cut(window, edit);
+      return;
+    case kPaste:
+      Paste(window, edit);
+      return;
+    default:
+      break;
   }
   if (IsReadOnly(window) || (GetKeyState(VK_CONTROL) < 0 && c < ' ' && c != '\t')) return;
   if (c == '\r' || c == '\n') {
@@ -218,7 +161,15 @@ void Key(HWND window, Edit* edit, WPARAM key) {
       to = control ? text.Length() : LineEnd(edit, to);
       break;
     case VK_DELETE:
-      Erase(window, edit, text.Next(to));
+      if (shift && text.HasSelection()) {
+        Cut(window, edit);
+      } else {
+        Erase(window, edit, text.Next(to));
+      }
+      return;
+    case VK_INSERT:
+      if (shift) Paste(window, edit);
+      if (control) Copy(window, edit);
       return;
     case 'A':
       if (control) Send(window, EM_SETSEL, 0, -1);
@@ -244,49 +195,6 @@ void SelectWord(HWND window, Edit* edit) {
   ShowCaretLine(window, edit);
 }
 
-// --- painting ---
-
-void PaintLine(HDC dc, const Edit* edit, const Measure& measure, int line, int x, int y) {
-  const Text shown = Shown(edit, line);
-  const int start = edit->text.LineStart(line), length = static_cast<int>(shown.size());
-  TextOutW(dc, x, y, shown.data(), length);
-  if (!edit->hasFocus || !edit->text.HasSelection()) return;
-  const int first = std::clamp(edit->text.First() - start, 0, length);
-  const int last = std::clamp(edit->text.Last() - start, 0, length);
-  if (first >= last) return;
-  const COLORREF oldText = SetTextColor(dc, GetSysColor(COLOR_HIGHLIGHTTEXT));
-  const COLORREF oldBack = SetBkColor(dc, GetSysColor(COLOR_HIGHLIGHT));
-  const int oldMode = SetBkMode(dc, OPAQUE);
-  TextOutW(dc, x + measure.Width(shown.data(), first), y, shown.data() + first, last - first);
-  SetBkMode(dc, oldMode);
-  SetBkColor(dc, oldBack);
-  SetTextColor(dc, oldText);
-}
-
-void Paint(HWND window, const Edit* edit, HDC dc) {
-  OrNoMemory<int>(0, [&] {
-    const bool isField = IsWindowEnabled(window) && !IsReadOnly(window);
-    const auto brush = reinterpret_cast<HBRUSH>(Send(GetParent(window), isField ? WM_CTLCOLOREDIT : WM_CTLCOLORSTATIC,
-                                                     reinterpret_cast<WPARAM>(dc), reinterpret_cast<LPARAM>(window)));
-    RECT client;
-    GetClientRect(window, &client);
-    if (brush != nullptr) FillRect(dc, &client, brush);
-    const RECT rect = TextRect(window, edit);
-    const HGDIOBJ old = SelectObject(dc, edit->font != nullptr ? edit->font : InterfaceFont());
-    if (!IsWindowEnabled(window)) SetTextColor(dc, GetSysColor(COLOR_GRAYTEXT));
-    const int oldMode = SetBkMode(dc, TRANSPARENT);
-    const Measure measure(edit);
-    int y = rect.top;
-    for (int line = edit->firstLine; line < edit->text.LineCount() && y < rect.bottom; ++line) {
-      PaintLine(dc, edit, measure, line, rect.left - edit->scrolled, y);
-      y += measure.LineHeight();
-    }
-    SetBkMode(dc, oldMode);
-    SelectObject(dc, old);
-    return 0;
-  });
-}
-
 // --- messages ---
 
 void SetAll(HWND window, Edit* edit, LPCWSTR text) {
@@ -298,23 +206,6 @@ void SetAll(HWND window, Edit* edit, LPCWSTR text) {
   if (!IsMultiline(window)) return;
   NotifyCommand(window, EN_UPDATE);
   NotifyCommand(window, EN_CHANGE);
-}
-
-LRESULT CopyAll(const Edit* edit, WPARAM capacity, LPWSTR buffer) {
-  if (capacity == 0 || buffer == nullptr) return 0;
-  const Text& text = edit->text.All();
-  const std::size_t count = std::min<std::size_t>(text.size(), capacity - 1);
-  std::copy_n(text.data(), count, buffer);
-  buffer[count] = 0;
-  return static_cast<LRESULT>(count);
-}
-
-LRESULT CopyLine(const Edit* edit, int line, WCHAR* buffer) {
-  const std::size_t capacity = static_cast<WORD>(buffer[0]);
-  if (line >= edit->text.LineCount()) return 0;
-  const std::size_t count = std::min<std::size_t>(capacity, static_cast<std::size_t>(edit->text.LineLength(line)));
-  std::copy_n(edit->text.All().data() + edit->text.LineStart(line), count, buffer);
-  return static_cast<LRESULT>(count);
 }
 
 void Focus(HWND window, Edit* edit, bool gained) {
@@ -373,7 +264,7 @@ LRESULT EditMessage(HWND window, Edit* edit, UINT message, WPARAM wParam, LPARAM
     case EM_LINELENGTH:
       return text.LineLength(text.LineOf(static_cast<int>(wParam) < 0 ? text.Caret() : static_cast<int>(wParam)));
     case EM_GETLINE:
-      return CopyLine(edit, IsMultiline(window) ? static_cast<int>(wParam) : 0, reinterpret_cast<WCHAR*>(lParam));
+      return text.CopyLine(IsMultiline(window) ? static_cast<int>(wParam) : 0, reinterpret_cast<WCHAR*>(lParam));
     case EM_SETLIMITTEXT:
       edit->limit = wParam == 0 || wParam > kHighestLimit ? kHighestLimit : static_cast<int>(wParam);
       return 0;
@@ -427,6 +318,14 @@ LRESULT EditMessage(HWND window, Edit* edit, UINT message, WPARAM wParam, LPARAM
       const int position = PositionAt(window, edit, model::PointOf(lParam));
       return MAKELRESULT(position, text.LineOf(position));
     }
+    case WM_COPY:
+      return Copy(window, edit);
+    case WM_CUT:
+      Cut(window, edit);
+      return 0;
+    case WM_PASTE:
+      Paste(window, edit);
+      return 0;
     case WM_CLEAR:
       if (text.HasSelection()) Erase(window, edit, text.Caret());
       return 0;
@@ -450,7 +349,7 @@ LRESULT Handle(HWND window, Edit* edit, UINT message, WPARAM wParam, LPARAM lPar
       SetAll(window, edit, reinterpret_cast<LPCWSTR>(lParam));
       return TRUE;
     case WM_GETTEXT:
-      return CopyAll(edit, wParam, reinterpret_cast<LPWSTR>(lParam));
+      return edit->text.CopyAll(wParam, reinterpret_cast<LPWSTR>(lParam));
     case WM_GETTEXTLENGTH:
       return edit->text.Length();
     case WM_CHAR:
@@ -480,24 +379,6 @@ LRESULT Handle(HWND window, Edit* edit, UINT message, WPARAM wParam, LPARAM lPar
     case WM_ENABLE:
       InvalidateRect(window, nullptr, TRUE);
       return 0;
-    case WM_ERASEBKGND:
-      return TRUE;
-    case WM_PAINT: {
-      PAINTSTRUCT paint;
-      const HDC dc = BeginPaint(window, &paint);
-      if (dc != nullptr) Paint(window, edit, dc);
-      EndPaint(window, &paint);
-      return 0;
-    }
-    case WM_PRINTCLIENT:
-      Paint(window, edit, reinterpret_cast<HDC>(wParam));
-      return 0;
-    case WM_SETFONT:
-      edit->font = reinterpret_cast<HFONT>(wParam);
-      if (LOWORD(lParam)) InvalidateRect(window, nullptr, TRUE);
-      return 0;
-    case WM_GETFONT:
-      return reinterpret_cast<LRESULT>(edit->font);
     default:
       return EditMessage(window, edit, message, wParam, lParam);
   }
@@ -506,13 +387,7 @@ LRESULT Handle(HWND window, Edit* edit, UINT message, WPARAM wParam, LPARAM lPar
 }  // namespace
 
 LRESULT CALLBACK EditProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
-  Edit* edit = StateOf<Edit>(window);
-  if (message == WM_NCCREATE) {
-    return MakeState<Edit>(window) ? DefWindowProcW(window, message, wParam, lParam) : FALSE;
-  }
-  if (message == WM_NCDESTROY) FreeState<Edit>(window);
-  if (edit == nullptr || message == WM_NCDESTROY) return DefWindowProcW(window, message, wParam, lParam);
-  return OrNoMemory<LRESULT>(0, [&] { return Handle(window, edit, message, wParam, lParam); });
+  return ControlMessage<Edit, &PaintEdit, &Handle>(window, message, wParam, lParam);
 }
 
 }  // namespace platform::controls

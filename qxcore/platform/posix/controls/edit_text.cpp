@@ -104,4 +104,20 @@ int EditText::WordBefore(int position) const {
   return position;
 }
 
+LRESULT EditText::CopyAll(std::size_t capacity, WCHAR* buffer) const {
+  if (capacity == 0 || buffer == nullptr) return 0;
+  const std::size_t count = std::min(m_text.size(), capacity - 1);
+  std::copy_n(m_text.data(), count, buffer);
+  buffer[count] = 0;
+  return static_cast<LRESULT>(count);
+}
+
+LRESULT EditText::CopyLine(int line, WCHAR* buffer) const {
+  const std::size_t capacity = static_cast<WORD>(buffer[0]);
+  if (line >= LineCount()) return 0;
+  const std::size_t count = std::min(capacity, static_cast<std::size_t>(LineLength(line)));
+  std::copy_n(m_text.data() + LineStart(line), count, buffer);
+  return static_cast<LRESULT>(count);
+}
+
 }  // namespace platform::controls

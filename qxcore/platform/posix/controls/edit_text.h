@@ -17,8 +17,16 @@ class EditText {
   int Last() const { return std::max(m_anchor, m_caret); }
   int Caret() const { return m_caret; }
   bool HasSelection() const { return m_anchor != m_caret; }
+  model::Text Selection() const {
+    return m_text.substr(static_cast<std::size_t>(First()), static_cast<std::size_t>(Last() - First()));
+  }
   void Select(int anchor, int caret);
   void MoveTo(int caret, bool keepsAnchor) { Select(keepsAnchor ? m_anchor : caret, caret); }
+
+  // WM_GETTEXT: as much as the buffer holds, with a NUL. Returns the number of characters.
+  LRESULT CopyAll(std::size_t capacity, WCHAR* buffer) const;
+  // EM_GETLINE: without a NUL; the buffer begins with its capacity.
+  LRESULT CopyLine(int line, WCHAR* buffer) const;
 
   // All throw std::bad_alloc and then change nothing.
   void Set(model::Text text);

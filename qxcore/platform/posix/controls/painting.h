@@ -1,6 +1,7 @@
 // What the painting of frames and of the control classes shares.
 #pragma once
 
+#include "qxcore/platform/posix/controls/control.h"
 #include "qxcore/platform/posix/window/scroll.h"
 
 namespace platform::controls {
@@ -21,29 +22,7 @@ LRESULT CALLBACK ButtonProcedure(HWND window, UINT message, WPARAM wParam, LPARA
 LRESULT CALLBACK StaticProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
 LRESULT CALLBACK EditProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
 LRESULT CALLBACK ScrollBarProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
-
-// The state of a control: an object of its class behind the first extra bytes of the window, made with
-// WM_NCCREATE and freed with WM_NCDESTROY. Null before and after.
-template <class State>
-State* StateOf(HWND window) {
-  return reinterpret_cast<State*>(GetWindowLongPtrW(window, 0));
-}
-
-template <class State>
-bool MakeState(HWND window) {
-  return model::OrNoMemory<bool>(false, [&] {
-    SetWindowLongPtrW(window, 0, reinterpret_cast<LONG_PTR>(new State));
-    return true;
-  });
-}
-
-template <class State>
-void FreeState(HWND window) {
-  delete StateOf<State>(window);
-  SetWindowLongPtrW(window, 0, 0);
-}
-
-// Sends WM_COMMAND with a notification to the control's parent.
-void NotifyCommand(HWND control, UINT code);
+LRESULT CALLBACK StatusBarProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
+LRESULT CALLBACK ProgressProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam);
 
 }  // namespace platform::controls

@@ -4,7 +4,7 @@
 #include <cstdint>
 #include <utility>
 
-#include "qxcore/platform/posix/controls/control.h"
+#include "qxcore/platform/posix/controls/painting.h"
 
 namespace platform::controls {
 
@@ -57,7 +57,8 @@ void Fill(HDC dc, const RECT& rect, COLORREF color, int otherwise) {
 }
 
 // The filled part grows to the right, or upward; the rest is painted beside it, nothing twice.
-void Draw(HWND window, HDC dc, const Progress& progress) {
+void Paint(HWND window, const Progress* state, HDC dc) {
+  const Progress& progress = *state;
   RECT area = ClientOf(window);
   DrawEdge(dc, &area, BDR_SUNKENOUTER, BF_RECT | BF_ADJUST);
   const bool isVertical = (StyleOf(window) & PBS_VERTICAL) != 0;
@@ -75,13 +76,8 @@ void Draw(HWND window, HDC dc, const Progress& progress) {
   Fill(dc, rest, progress.background, COLOR_WINDOW);
 }
 
-LRESULT OnPaint(HWND window, const Progress& progress, WPARAM wParam) {
-  const Painting dc(window, wParam, nullptr);
-  Draw(window, dc, progress);
-  return 0;
-}
-
-LRESULT Handle(HWND window, Progress& progress, UINT message, WPARAM wParam, LPARAM lParam) {
+LRESULT Handle(HWND window, Progress* state, UINT message, WPARAM wParam, LPARAM lParam) {
+  Progress& progress = *state;
   const int number = static_cast<int>(wParam);
   switch (message) {
     case PBM_SETRANGE:
@@ -110,11 +106,6 @@ LRESULT Handle(HWND window, Progress& progress, UINT message, WPARAM wParam, LPA
       return static_cast<LRESULT>(progress.bar);
     case PBM_GETBKCOLOR:
       return static_cast<LRESULT>(progress.background);
-    case WM_PAINT:
-    case WM_PRINTCLIENT:
-      return OnPaint(window, progress, wParam);
-    case WM_ERASEBKGND:
-      return TRUE;
     case WM_SYSCOLORCHANGE:
       return InvalidateRect(window, nullptr, FALSE), 0;
     default:
@@ -125,12 +116,7 @@ LRESULT Handle(HWND window, Progress& progress, UINT message, WPARAM wParam, LPA
 }  // namespace
 
 LRESULT CALLBACK ProgressProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
-  if (message == WM_CREATE) return MakeRecord<Progress>(window) ? 0 : -1;
-  Progress* progress = RecordOf<Progress>(window);
-  if (progress == nullptr) return DefWindowProcW(window, message, wParam, lParam);
-  if (message != WM_NCDESTROY) return Handle(window, *progress, message, wParam, lParam);
-  EndRecord<Progress>(window);
-  return DefWindowProcW(window, message, wParam, lParam);
+  return ControlMessage<Progress, &Paint, &Handle>(window, message, wParam, lParam);
 }
 
 }  // namespace platform::controls

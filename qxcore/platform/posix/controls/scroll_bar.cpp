@@ -13,7 +13,6 @@ struct Control : model::OnModelHeap {
   Control() { bar.highest = 0; }
 };
 
-DWORD StyleOf(HWND window) { return static_cast<DWORD>(GetWindowLongW(window, GWL_STYLE)); }
 bool IsVertical(HWND window) { return StyleOf(window) & SBS_VERT; }
 bool IsBox(HWND window) { return StyleOf(window) & (SBS_SIZEBOX | SBS_SIZEGRIP); }
 
@@ -59,8 +58,7 @@ void Press(HWND window, const Control* control, LPARAM lParam) {
 }
 
 void Paint(HWND window, const Control* control, HDC dc) {
-  RECT rect;
-  GetClientRect(window, &rect);
+  RECT rect = ClientOf(window);
   if (!IsBox(window)) {
     PaintScrollBar(dc, rect, control->bar, IsVertical(window));
     return;
@@ -69,18 +67,8 @@ void Paint(HWND window, const Control* control, HDC dc) {
   if (StyleOf(window) & SBS_SIZEGRIP) DrawFrameControl(dc, &rect, DFC_SCROLL, DFCS_SCROLLSIZEGRIP);
 }
 
-}  // namespace
-
-LRESULT CALLBACK ScrollBarProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
-  Control* control = StateOf<Control>(window);
-  if (control == nullptr && message != WM_NCCREATE) return DefWindowProcW(window, message, wParam, lParam);
+LRESULT Handle(HWND window, Control* control, UINT message, WPARAM wParam, LPARAM lParam) {
   switch (message) {
-    case WM_NCCREATE:
-      if (!MakeState<Control>(window)) return FALSE;
-      break;
-    case WM_NCDESTROY:
-      FreeState<Control>(window);
-      break;
     case WM_NCHITTEST:
       if (StyleOf(window) & SBS_SIZEGRIP && IsWindowEnabled(window)) return HTBOTTOMRIGHT;
       break;
@@ -91,21 +79,9 @@ LRESULT CALLBACK ScrollBarProcedure(HWND window, UINT message, WPARAM wParam, LP
     case WM_KEYDOWN:
       Key(window, wParam);
       return 0;
-    case WM_ERASEBKGND:
-      return TRUE;
     case WM_ENABLE:
       control->bar.arrows = wParam ? ESB_ENABLE_BOTH : ESB_DISABLE_BOTH;
       InvalidateRect(window, nullptr, FALSE);
-      return 0;
-    case WM_PAINT: {
-      PAINTSTRUCT paint;
-      const HDC dc = BeginPaint(window, &paint);
-      if (dc != nullptr) Paint(window, control, dc);
-      EndPaint(window, &paint);
-      return 0;
-    }
-    case WM_PRINTCLIENT:
-      Paint(window, control, reinterpret_cast<HDC>(wParam));
       return 0;
     case SBM_SETPOS: {
       const int old = control->bar.position;
@@ -140,6 +116,12 @@ LRESULT CALLBACK ScrollBarProcedure(HWND window, UINT message, WPARAM wParam, LP
       break;
   }
   return DefWindowProcW(window, message, wParam, lParam);
+}
+
+}  // namespace
+
+LRESULT CALLBACK ScrollBarProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
+  return ControlMessage<Control, &Paint, &Handle>(window, message, wParam, lParam);
 }
 
 }  // namespace platform::controls

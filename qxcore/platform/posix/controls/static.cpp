@@ -10,8 +10,6 @@ struct Static : model::OnModelHeap {
   HFONT font = nullptr;
 };
 
-DWORD StyleOf(HWND window) { return static_cast<DWORD>(GetWindowLongW(window, GWL_STYLE)); }
-
 UINT TextFormat(DWORD style) {
   UINT format = style & SS_NOPREFIX ? DT_NOPREFIX : 0u;
   switch (style & SS_TYPEMASK) {
@@ -58,8 +56,7 @@ void DrawByOwner(HWND window, HDC dc, const RECT& rect) {
 }
 
 void Paint(HWND window, const Static* control, HDC dc) {
-  RECT rect;
-  GetClientRect(window, &rect);
+  RECT rect = ClientOf(window);
   switch (StyleOf(window) & SS_TYPEMASK) {
     case SS_BLACKRECT:
       FillRect(dc, &rect, GetSysColorBrush(COLOR_3DDKSHADOW));
@@ -99,18 +96,8 @@ void Paint(HWND window, const Static* control, HDC dc) {
   }
 }
 
-}  // namespace
-
-LRESULT CALLBACK StaticProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
-  Static* control = StateOf<Static>(window);
-  if (control == nullptr && message != WM_NCCREATE) return DefWindowProcW(window, message, wParam, lParam);
+LRESULT Handle(HWND window, Static*, UINT message, WPARAM wParam, LPARAM lParam) {
   switch (message) {
-    case WM_NCCREATE:
-      if (!MakeState<Static>(window)) return FALSE;
-      break;
-    case WM_NCDESTROY:
-      FreeState<Static>(window);
-      break;
     case WM_GETDLGCODE:
       return DLGC_STATIC;
     case WM_NCHITTEST:
@@ -121,36 +108,22 @@ LRESULT CALLBACK StaticProcedure(HWND window, UINT message, WPARAM wParam, LPARA
     case WM_LBUTTONDBLCLK:
       if (StyleOf(window) & SS_NOTIFY) NotifyCommand(window, STN_DBLCLK);
       return 0;
-    case WM_ERASEBKGND:
-      return TRUE;
-    case WM_PAINT: {
-      PAINTSTRUCT paint;
-      const HDC dc = BeginPaint(window, &paint);
-      if (dc != nullptr) Paint(window, control, dc);
-      EndPaint(window, &paint);
-      return 0;
-    }
-    case WM_PRINTCLIENT:
-      Paint(window, control, reinterpret_cast<HDC>(wParam));
-      return 0;
     case WM_ENABLE:
       InvalidateRect(window, nullptr, FALSE);
-      if (GetWindowLongPtrW(window, GWL_STYLE) & SS_NOTIFY) NotifyCommand(window, wParam ? STN_ENABLE : STN_DISABLE);
+      if (StyleOf(window) & SS_NOTIFY) NotifyCommand(window, wParam ? STN_ENABLE : STN_DISABLE);
       return 0;
     case WM_SETTEXT:
-      DefWindowProcW(window, message, wParam, lParam);
-      InvalidateRect(window, nullptr, TRUE);
-      return TRUE;
-    case WM_SETFONT:
-      control->font = reinterpret_cast<HFONT>(wParam);
-      if (LOWORD(lParam)) InvalidateRect(window, nullptr, TRUE);
-      return 0;
-    case WM_GETFONT:
-      return reinterpret_cast<LRESULT>(control->font);
+      return TakeText(window, wParam, lParam);
     default:
       break;
   }
   return DefWindowProcW(window, message, wParam, lParam);
+}
+
+}  // namespace
+
+LRESULT CALLBACK StaticProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
+  return ControlMessage<Static, &Paint, &Handle>(window, message, wParam, lParam);
 }
 
 }  // namespace platform::controls

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "qxcore/platform/posix/controls/control.h"
+#include "qxcore/platform/posix/controls/painting.h"
 #include "qxcore/platform/posix/controls/status_bar_paint.h"
 #include "qxcore/platform/posix/controls/status_bar_parts.h"
 
@@ -154,14 +154,14 @@ LRESULT OnSetBackground(HWND window, StatusBar& bar, COLORREF color) {
 
 LRESULT OnMouse(HWND window, const StatusBar& bar, UINT code, LPARAM lParam) {
   NMMOUSE mouse{};
-  mouse.pt = PointOf(lParam);
+  mouse.pt = model::PointOf(lParam);
   const int part = bar.isSimple ? SB_SIMPLEID : bar.PartAt(mouse.pt, ClientOf(window));
   mouse.dwItemSpec = static_cast<DWORD_PTR>(part);
   return SendNotify(window, &mouse.hdr, code);
 }
 
 LRESULT OnHitTest(HWND window, LPARAM lParam) {
-  POINT point = PointOf(lParam);
+  POINT point = model::PointOf(lParam);
   const RECT client = ClientOf(window);
   ScreenToClient(window, &point);
   const bool isOnGrip = PtInRect(&client, point) && point.x >= client.right - GetSystemMetrics(SM_CXVSCROLL);
@@ -244,10 +244,10 @@ LRESULT CALLBACK StatusBarProcedure(HWND window, UINT message, WPARAM wParam, LP
   if (message == WM_CREATE) {
     return model::OrNoMemory(kRefused, [=] { return OnCreate(window, *reinterpret_cast<CREATESTRUCTW*>(lParam)); });
   }
-  StatusBar* bar = RecordOf<StatusBar>(window);
+  StatusBar* bar = StateOf<StatusBar>(window);
   if (bar == nullptr) return DefWindowProcW(window, message, wParam, lParam);
   if (message == WM_NCDESTROY) {
-    EndRecord<StatusBar>(window);
+    FreeState<StatusBar>(window);
     return DefWindowProcW(window, message, wParam, lParam);
   }
   return model::OrNoMemory(LRESULT{0}, [=] { return Handle(window, *bar, message, wParam, lParam); });

@@ -13,17 +13,22 @@ bool CanBeActive(const Window* window, const Thread* thread) {
 
 WPARAM WithMinimised(HWND handle, UINT how) { return MAKEWPARAM(how, IsIconic(handle) ? 1 : 0); }
 
-void TellApplication(BOOL active) {
-  List<HWND> handles;
-  Thread* thread = CurrentThread();
-  try {
-    const Guard guard;
-    for (const Window* window = Desktop()->firstChild; window != nullptr; window = window->next)
-      if (window->thread == thread && !(window->style & WS_CHILD)) handles.push_back(window->handle);
-  } catch (const std::bad_alloc&) {
-    return;  // nobody hears of it; the activation itself goes on
+// The thread's next top-level window that has not heard of this change of the activation or of a later one.
+HWND NextToTell(const Thread* thread, std::uint32_t change) {
+  const Guard guard;
+  for (Window* window = Desktop()->firstChild; window != nullptr; window = window->next) {
+    if (window->thread != thread || (window->style & WS_CHILD) || window->toldActivation >= change) continue;
+    window->toldActivation = change;
+    return window->handle;
   }
-  for (const HWND handle : handles) Send(handle, WM_ACTIVATEAPP, active != 0, thread->id);
+  return nullptr;
+}
+
+// Handlers may make, destroy and reorder windows; marks take no memory, where a list of them could be short of it.
+void TellApplication(BOOL active) {
+  Thread* thread = CurrentThread();
+  const std::uint32_t change = ++thread->activations;
+  while (const HWND handle = NextToTell(thread, change)) Send(handle, WM_ACTIVATEAPP, active != 0, thread->id);
 }
 
 void Remember(Thread* thread, HWND handle) {

@@ -82,18 +82,16 @@ ATOM InternName(LPCWSTR name) {
   }
 }
 
-Text NameOf(ATOM atom) {
+SStringView NameOf(ATOM atom, NumberText& digits) {
   const Names& names = TheNames();
   if (atom >= kFirstName) {
     const std::size_t index = atom - kFirstName;
-    return index < names.texts.size() ? *names.texts[index] : Text();
+    return index < names.texts.size() ? SStringView(*names.texts[index]) : SStringView();
   }
-  WCHAR digits[6];
-  int count = 0;
-  for (unsigned int rest = atom; rest != 0; rest /= 10) digits[count++] = static_cast<WCHAR>('0' + rest % 10);
-  Text text(1, '#');
-  while (count > 0) text += digits[--count];
-  return text;
+  WCHAR* first = std::end(digits);
+  for (unsigned int rest = atom; rest != 0; rest /= 10) *--first = static_cast<WCHAR>('0' + rest % 10);
+  *--first = '#';
+  return SStringView(first, std::end(digits));
 }
 
 }  // namespace platform::model

@@ -10,7 +10,8 @@ namespace platform::model {
 ATOM InternName(LPCWSTR name);
 // The same, but 0 for a name that nobody has used yet.
 ATOM FindName(LPCWSTR name);
-// The name as it was spelled first; "#123" for a number.
-Text NameOf(ATOM atom);
+// The name as it was spelled first; "#123", written to `digits`, for a number. Takes no memory.
+using NumberText = WCHAR[8];
+SStringView NameOf(ATOM atom, NumberText& digits);
 
 }  // namespace platform::model

@@ -209,17 +209,16 @@ BOOL GetClassInfoW(HINSTANCE instance, LPCWSTR name, WNDCLASSW* description) {
 }
 
 int GetClassNameW(HWND handle, LPWSTR buffer, int capacity) {
-  return OrNoMemory<int>(0, [&]() -> int {
-    const Guard guard;
-    const Window* window = Expect(handle);
-    if (window == nullptr) return 0;
-    if (buffer == nullptr || capacity <= 0) return Fail<int>(ERROR_INSUFFICIENT_BUFFER);
-    const Text name = NameOf(window->windowClass->name);
-    const std::size_t count = std::min(name.size(), static_cast<std::size_t>(capacity - 1));
-    std::copy_n(name.data(), count, buffer);
-    buffer[count] = 0;
-    return static_cast<int>(count);
-  });
+  const Guard guard;
+  const Window* window = Expect(handle);
+  if (window == nullptr) return 0;
+  if (buffer == nullptr || capacity <= 0) return Fail<int>(ERROR_INSUFFICIENT_BUFFER);
+  NumberText digits;
+  const SStringView name = NameOf(window->windowClass->name, digits);
+  const std::size_t count = std::min(name.size(), static_cast<std::size_t>(capacity - 1));
+  std::copy_n(name.data(), count, buffer);
+  buffer[count] = 0;
+  return static_cast<int>(count);
 }
 
 DWORD GetClassLongW(HWND window, int index) { return static_cast<DWORD>(Access<LONG>(window, index, nullptr)); }

@@ -204,10 +204,8 @@ RECT PlaceOf(const Header& header, DWORD style, DWORD exStyle, Units units, HWND
   return {place.x, place.y, place.x + width, place.y + height};
 }
 
-enum class Modality { Modeless, Modal };
-
 HWND CreateDialogFrom(HINSTANCE instance, LPCDLGTEMPLATEW dialogTemplate, HWND owner, DLGPROC procedure,
-                      LPARAM parameter, Modality kind) {
+                      LPARAM parameter) {
   if (dialogTemplate == nullptr) return Fail<HWND>(ERROR_INVALID_PARAMETER);
   Reader reader(dialogTemplate);
   const Header header = ReadHeader(reader);
@@ -248,7 +246,7 @@ HWND CreateDialogFrom(HINSTANCE instance, LPCDLGTEMPLATEW dialogTemplate, HWND o
   if (focus == nullptr) focus = GetNextDlgGroupItem(dialog, nullptr, FALSE);
   const bool takesFocus = Send(dialog, WM_INITDIALOG, reinterpret_cast<WPARAM>(focus), parameter) && IsWindow(dialog);
   if (!IsWindow(dialog)) return nullptr;
-  if (takesFocus && !(style & DS_CONTROL) && (header.style & WS_VISIBLE || kind == Modality::Modal)) {
+  if (takesFocus && (!(style & DS_CONTROL) || header.style & WS_VISIBLE)) {
     focus = GetNextDlgTabItem(dialog, nullptr, FALSE);
     if (focus != nullptr) {
       FocusControl(focus);
@@ -311,7 +309,7 @@ using namespace platform::model;
 
 HWND CreateDialogIndirectParamW(HINSTANCE instance, LPCDLGTEMPLATEW dialogTemplate, HWND owner, DLGPROC procedure,
                                 LPARAM parameter) {
-  return CreateDialogFrom(instance, dialogTemplate, owner, procedure, parameter, Modality::Modeless);
+  return CreateDialogFrom(instance, dialogTemplate, owner, procedure, parameter);
 }
 
 HWND CreateDialogParamW(HINSTANCE instance, LPCWSTR name, HWND owner, DLGPROC procedure, LPARAM parameter) {
@@ -326,7 +324,7 @@ INT_PTR DialogBoxIndirectParamW(HINSTANCE instance, LPCDLGTEMPLATEW dialogTempla
   const HWND top = owner != nullptr ? GetAncestor(owner, GA_ROOT) : nullptr;
   const bool disables = top != nullptr && IsWindowEnabled(top);
   if (disables) EnableWindow(top, FALSE);
-  const HWND dialog = CreateDialogFrom(instance, dialogTemplate, top, procedure, parameter, Modality::Modal);
+  const HWND dialog = CreateDialogFrom(instance, dialogTemplate, top, procedure, parameter);
   if (dialog == nullptr) {
     if (disables && IsWindow(top)) EnableWindow(top, TRUE);
     return -1;

@@ -30,24 +30,40 @@ RECT ChildInWindow(const Window* parent, const Window* child) {
   return Moved(child->window, client.left, client.top);
 }
 
-// Whether nothing can be added to what is to be painted. Many siblings at one place are asked this often.
-bool IsAllInvalid(const Window* window) {
-  if (!window->wantsPaint || !window->eraseUpdate || !window->frameUpdate || window->firstChild != nullptr)
-    return false;
+// Whether nothing can be added to what is to be painted of a window of which `shown` shows.
+bool IsAllInvalid(const Window* window, const RECT& shown) {
+  if (!window->wantsPaint || !window->eraseUpdate || !window->frameUpdate) return false;
+  if (window->firstChild != nullptr && window->childrenInvalidAt != g_scene) return false;
   pixman_region32_t* update = const_cast<pixman_region32_t*>(window->update.Pixman());
-  return pixman_region32_n_rects(update) == 1 && Same(window->update.Bounds(), AtOrigin(window->window));
+  return pixman_region32_n_rects(update) == 1 && Same(window->update.Bounds(), shown);
 }
 
 void InvalidateChildren(Window* window, const Region& region, Erase erase, Children children) {
+  if (window->childrenInvalidAt == g_scene) return;
+  const RECT bounds = region.Bounds(), clip = Common(ClipByParents(window), ClientInWindow(window));
+  bool areAllInvalid = true;
   for (Window* child = window->firstChild; child != nullptr; child = child->next) {
-    if (!child->IsVisible() || IsAllInvalid(child)) continue;
-    const RECT place = ChildInWindow(window, child);
+    if (!child->IsVisible()) continue;
+    const RECT place = ChildInWindow(window, child), shown = Common(place, clip);
+    if (IsEmpty(shown) || IsAllInvalid(child, Moved(shown, -place.left, -place.top))) continue;
+    areAllInvalid = false;
+    if (IsEmpty(Common(shown, bounds))) continue;
     Region part = region;
     part.Intersect(place);
     if (part.IsEmpty()) continue;
     part.Move(-place.left, -place.top);
     Invalidate(child, part, erase, children);
     if (child->wantsPaint) child->frameUpdate = true;
+  }
+  if (areAllInvalid) window->childrenInvalidAt = g_scene;
+}
+
+// Takes the children's places away, as long as anything is left to take from.
+void SubtractChildren(const Window* window, Region* region) {
+  for (const Window* child = window->firstChild; child != nullptr && !region->IsEmpty(); child = child->next) {
+    if (!child->IsVisible()) continue;
+    const RECT place = ChildInWindow(window, child);
+    if (!IsEmpty(Common(place, region->Bounds()))) region->Subtract(place);
   }
 }
 
@@ -66,11 +82,14 @@ void MarkInvalid(Window* window, const Region& region, Erase erase) {
 Region SiblingsAbove(const Window* window) {
   Region region;
   for (const Window* other = window->previous; other != nullptr; other = other->previous)
-    if (other->IsVisible()) region.Add(Moved(other->window, -window->window.left, -window->window.top));
+    if (other->IsVisible() && !IsEmpty(Common(other->window, window->window)))
+      region.Add(Moved(other->window, -window->window.left, -window->window.top));
   return region;
 }
 
 }  // namespace
+
+std::uint64_t g_scene = 1;
 
 void SetWantsPaint(Window* window, bool wants) {
   if (window->wantsPaint == wants) return;
@@ -98,9 +117,7 @@ void VisibleRegion(const Window* window, bool withoutChildren, Region* region) {
     dx -= place.left;
     dy -= place.top;
   }
-  if (!withoutChildren) return;
-  for (const Window* child = window->firstChild; child != nullptr; child = child->next)
-    if (child->IsVisible()) region->Subtract(ChildInWindow(window, child));
+  if (withoutChildren) SubtractChildren(window, region);
 }
 
 void Invalidate(Window* window, const Region& region, Erase erase, Children children) {
@@ -111,13 +128,12 @@ void Invalidate(Window* window, const Region& region, Erase erase, Children chil
   const bool clips = window->style & WS_CLIPCHILDREN;
   if (children == Children::All || (children == Children::Unclipped && !clips))
     InvalidateChildren(window, part, erase, children);
-  if (clips)
-    for (const Window* child = window->firstChild; child != nullptr; child = child->next)
-      if (child->IsVisible()) part.Subtract(ChildInWindow(window, child));
+  if (clips) SubtractChildren(window, &part);
   if (!part.IsEmpty()) MarkInvalid(window, part, erase);
 }
 
 void Validate(Window* window, const Region* region, Children children) {
+  if (window->IsVisible()) ForgetAllInvalid(window);
   if (region != nullptr) {
     window->update.Subtract(*region);
   } else {
@@ -140,6 +156,10 @@ void Validate(Window* window, const Region* region, Children children) {
   }
 }
 
+void ForgetAllInvalid(Window* window) {
+  if (window->parent != nullptr) window->parent->childrenInvalidAt = 0;
+}
+
 void DropPaint(Window* window) {
   if (window->childPaints == 0) return;
   window->internalPaint = false;
@@ -151,30 +171,33 @@ void SpoilByOrder(Window* window) {
   for (Window* other = window->parent->firstChild; other != nullptr; other = other->next) {
     if (other == window || !other->IsVisible()) continue;
     const RECT both = Common(window->window, other->window);
+    if (IsEmpty(both)) continue;
     for (Window* each : {window, other})
       Invalidate(each, Region(Moved(both, -each->window.left, -each->window.top)), Erase::Yes, Children::All);
   }
 }
 
-void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
+bool SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
   const bool isShown = IsShown(window);
+  bool isExposed = false;
   if (wasShown && !IsRoot(window->parent)) {
     Region exposed(oldWindow);
     if (isShown) exposed.Subtract(window->window);
     const RECT client = ClientInWindow(window->parent);
     exposed.Move(client.left, client.top);
     exposed.Intersect(client);
-    if (!exposed.IsEmpty()) Invalidate(window->parent, exposed, Erase::Yes, Children::All);
+    isExposed = !exposed.IsEmpty();
+    if (isExposed) Invalidate(window->parent, exposed, Erase::Yes, Children::All);
   }
-  if (!isShown) return;
+  if (!isShown) return isExposed;
   const RECT whole = AtOrigin(window->window);
   if (!wasShown) {
     Invalidate(window, Region(whole), Erase::Yes, Children::All);
     if (window->wantsPaint) window->frameUpdate = true;
-    return;
+    return isExposed;
   }
   const bool sameSize = Width(oldWindow) == Width(whole) && Height(oldWindow) == Height(whole);
-  if (sameSize && !(flags & SWP_FRAMECHANGED) && !(flags & SWP_NOCOPYBITS)) return;
+  if (sameSize && !(flags & SWP_FRAMECHANGED) && !(flags & SWP_NOCOPYBITS)) return isExposed;
   Region spoiled(whole);
   const UINT classStyle = window->windowClass->style;
   const bool redraws = (flags & SWP_NOCOPYBITS) ||
@@ -187,8 +210,9 @@ void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, b
     spoiled.Subtract(kept);
   }
   const RECT oldPlace = Moved(oldClient, -oldWindow.left, -oldWindow.top);
-  if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return;
+  if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return isExposed;
   Invalidate(window, spoiled, Erase::Yes, Children::Unclipped);
+  return isExposed;
 }
 
 // A parent that does not leave its children out paints first; they would be painted over.

@@ -1,5 +1,7 @@
 // Menus of windows: the bar, the system menu, and how much room they take.
 
+#include <cstring>
+
 #include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/default_proc.h"
 #include "qxcore/platform/posix/window/frame.h"
@@ -145,13 +147,31 @@ HMENU GetSystemMenu(HWND handle, BOOL revert) {
   return menu;
 }
 
+// The window that shows a menu as a popup; null while it is closed. Under the lock.
+static const Window* PopupOf(HMENU menu) {
+  for (const Window* window = Desktop()->firstChild; window != nullptr; window = window->next) {
+    if (window->windowClass->procedure != &MenuWindowProcedure || window->extra.size() < sizeof menu) continue;
+    HMENU shown;
+    std::memcpy(&shown, window->extra.data(), sizeof shown);
+    if (shown == menu) return window;
+  }
+  return nullptr;
+}
+
+// Items lie relative to the popup that shows them, or to the bar.
 BOOL GetMenuItemRect(HWND handle, HMENU menuHandle, UINT position, LPRECT rect) {
   const Guard guard;
   const Menu* menu = FindMenu(menuHandle);
-  const Window* window = FindWindowObject(handle);
-  if (menu == nullptr || window == nullptr || position >= menu->items.size()) return FALSE;
-  const RECT place = menu->items[position].place;
-  const RECT bar = MenuBarRect(window), whole = ScreenRect(window);
-  *rect = Moved(place, whole.left + bar.left, whole.top + bar.top);
+  if (menu == nullptr || position >= menu->items.size()) return FALSE;
+  POINT origin{};
+  if (const Window* popup = PopupOf(menuHandle)) {
+    origin = {popup->window.left, popup->window.top};
+  } else {
+    const Window* window = FindWindowObject(handle);
+    if (window == nullptr || window->IsChild() || reinterpret_cast<HMENU>(window->idOrMenu) != menuHandle) return FALSE;
+    const RECT bar = MenuBarRect(window), whole = ScreenRect(window);
+    origin = {whole.left + bar.left, whole.top + bar.top};
+  }
+  *rect = Moved(menu->items[position].place, origin.x, origin.y);
   return TRUE;
 }

@@ -33,6 +33,7 @@ Due TakeDue(HWND handle) {
   due.frame = window->frameUpdate;
   due.erase = window->eraseUpdate;
   window->frameUpdate = false;
+  ForgetAllInvalid(window);
   const RECT client = ClientInWindow(window);
   window->update.Intersect(client);
   due.client = window->update;
@@ -43,7 +44,10 @@ Due TakeDue(HWND handle) {
 
 void SetErase(HWND handle, bool erase) {
   const Guard guard;
-  if (Window* window = FindWindowObject(handle)) window->eraseUpdate = erase;
+  Window* window = FindWindowObject(handle);
+  if (window == nullptr) return;
+  window->eraseUpdate = erase;
+  ForgetAllInvalid(window);
 }
 
 }  // namespace
@@ -90,9 +94,10 @@ LRESULT DefaultSetRedraw(HWND handle, BOOL redraw) {
   if (window == nullptr) return 0;
   if (redraw) {
     window->style |= WS_VISIBLE;
+    ++g_scene;
   } else {
-    DropPaint(window);
     window->style &= ~WS_VISIBLE;
+    DropPaint(window);
   }
   return 0;
 }

@@ -7,6 +7,11 @@ namespace platform::model {
 
 // All under the lock, up to EraseNow.
 
+// The number of the scene: it changes whenever a window comes to light, moves or gets another size. While it is the
+// same, a window remembers that all its children are invalid as a whole; validating one of them makes it forget.
+// Without that, every one of many siblings that goes would ask all the others.
+extern std::uint64_t g_scene;
+
 enum class Erase { No, Yes };
 enum class Children { No, Unclipped, All };
 // Adds to what must be painted of a window, and of the children that lie there: none, those that the style
@@ -14,12 +19,15 @@ enum class Children { No, Unclipped, All };
 void Invalidate(Window* window, const Region& region, Erase erase, Children children);
 // Takes away, the children's as well if asked.
 void Validate(Window* window, const Region* region, Children children);
-// Forgets all that is to be painted of the window and what is below it.
+// Something was taken from what is to be painted of the window.
+void ForgetAllInvalid(Window* window);
+// Forgets all that is to be painted of a window that does not show any more, and of what is below it.
 void DropPaint(Window* window);
 // Counts the window among those that want WM_PAINT, or no longer.
 void SetWantsPaint(Window* window, bool wants);
-// After a change of place: what comes to light of the parent, and what of the window itself.
-void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags);
+// After a change of place: what comes to light of the parent, and what of the window itself. Returns whether anything
+// of the parent did.
+bool SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags);
 // After a change in the Z order: where the window and its siblings overlap.
 void SpoilByOrder(Window* window);
 // Whether erasing must wait until a parent has been painted.

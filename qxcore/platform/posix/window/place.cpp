@@ -103,8 +103,8 @@ void Reorder(Window* window, HWND after) {
   if (parent == Desktop() && after == HWND_TOP) RaiseTopLevel(window);
 }
 
-// Under the lock: the change itself, and what of the screen it spoils.
-void Apply(Window* window, WINDOWPOS& place, const NewPlace& to) {
+// Under the lock: the change itself, and what of the screen it spoils. Returns whether that is anything of the parent.
+bool Apply(Window* window, WINDOWPOS& place, const NewPlace& to) {
   const RECT oldWindow = window->window, oldClient = window->client;
   const bool wasShown = IsShown(window);
   if (!(place.flags & SWP_NOZORDER)) Reorder(window, place.hwndInsertAfter);
@@ -112,12 +112,13 @@ void Apply(Window* window, WINDOWPOS& place, const NewPlace& to) {
   window->client = to.client;
   if (place.flags & SWP_SHOWWINDOW) window->style |= WS_VISIBLE;
   if (place.flags & SWP_HIDEWINDOW) {
-    DropPaint(window);
     window->style &= ~WS_VISIBLE;
+    DropPaint(window);
   }
+  if (window->IsVisible()) ++g_scene;
   if (oldClient.left == to.client.left && oldClient.top == to.client.top) place.flags |= kNoClientMove;
   if (Width(oldClient) == Width(to.client) && Height(oldClient) == Height(to.client)) place.flags |= kNoClientSize;
-  if (!(place.flags & SWP_NOREDRAW)) SpoilByMove(window, oldWindow, oldClient, wasShown, place.flags);
+  return !(place.flags & SWP_NOREDRAW) && SpoilByMove(window, oldWindow, oldClient, wasShown, place.flags);
 }
 
 HWND ParentHandle(HWND handle) {
@@ -174,12 +175,13 @@ BOOL Place(WINDOWPOS& place) {
   }
   const NewPlace to = Measure(handle, place);
   NewPlace from{};
+  bool spoilsParent = false;
   {
     const Guard guard;
     Window* window = Expect(handle);
     if (window == nullptr) return FALSE;
     from = {window->window, window->client};
-    Apply(window, place, to);
+    spoilsParent = Apply(window, place, to);
   }
   KeepPixels(handle, from, to, place.flags);
   ShowOnDisplay(handle);
@@ -191,7 +193,7 @@ BOOL Place(WINDOWPOS& place) {
     }
   }
   if (!(place.flags & (SWP_NOREDRAW | SWP_DEFERERASE))) {
-    if (const HWND parent = ParentHandle(handle)) EraseNow(parent);
+    if (const HWND parent = spoilsParent ? ParentHandle(handle) : nullptr) EraseNow(parent);
     EraseNow(handle);
   }
   if ((place.flags & kAnyChange) != kNoChange && IsWindow(handle)) {
@@ -288,7 +290,11 @@ HDWP DeferWindowPos(HDWP handle, HWND window, HWND after, int x, int y, int widt
   const Guard guard;
   Batch* batch = FindAs<Batch, Kind::Batch>(handle);
   if (batch == nullptr) return Fail<HDWP>(ERROR_INVALID_DWP_HANDLE);
-  if (Expect(window) == nullptr) return nullptr;
+  const auto end = [&](DWORD error) {
+    delete static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
+    return Fail<HDWP>(error);
+  };
+  if (FindWindowObject(window) == nullptr) return end(ERROR_INVALID_WINDOW_HANDLE);
   for (WINDOWPOS& place : batch->places) {
     if (place.hwnd != window) continue;
     if (!(flags & SWP_NOZORDER)) place.hwndInsertAfter = after;
@@ -303,8 +309,7 @@ HDWP DeferWindowPos(HDWP handle, HWND window, HWND after, int x, int y, int widt
     batch->places.push_back({window, after, x, y, width, height, flags});
     return handle;
   } catch (const std::bad_alloc&) {
-    delete static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
-    return Fail<HDWP>(ERROR_NOT_ENOUGH_MEMORY);
+    return end(ERROR_NOT_ENOUGH_MEMORY);
   }
 }
 

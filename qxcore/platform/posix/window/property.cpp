@@ -58,7 +58,9 @@ int EnumPropsExW(HWND handle, PROPENUMPROCEXW callback, LPARAM data) {
       const Guard guard;
       const Window* window = Expect(handle);
       if (window == nullptr) return -1;
-      for (const Property& property : window->properties) properties.push_back({NameOf(property.name), property.value});
+      NumberText digits;
+      for (const Property& property : window->properties)
+        properties.push_back({Text(NameOf(property.name, digits)), property.value});
     }
     int result = -1;
     for (auto& [name, value] : properties) {

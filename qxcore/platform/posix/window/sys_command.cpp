@@ -60,7 +60,6 @@ void DragWindow(HWND handle, UINT edge, POINT start, bool byMouse) {
     Send(handle, edge != 0 ? WM_SIZING : WM_MOVING, edge, reinterpret_cast<LPARAM>(&wanted));
     now = wanted;
     SetWindowPos(handle, nullptr, now.left, now.top, Width(now), Height(now), edge == 0 ? SWP_NOSIZE : 0u);
-    UpdateWindow(handle);
   };
   MSG message;
   bool wasCancelled = false;

@@ -94,7 +94,8 @@ struct Thread {
   int sendDepth = 0;  // messages of other threads that are being handled
 
   HWND active = nullptr, focus = nullptr, capture = nullptr;
-  HWND menuOwner = nullptr;  // whose menu is being used
+  std::uint32_t activations = 0;  // how often the thread became active or inactive
+  HWND menuOwner = nullptr;       // whose menu is being used
   bool inMenuLoop = false;
   Caret caret;
   HCURSOR cursor = nullptr;

@@ -2,6 +2,7 @@
 
 #include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/atom.h"
+#include "qxcore/platform/posix/window/paint.h"
 #include "qxcore/platform/posix/window/queue.h"
 
 namespace platform::model {
@@ -54,6 +55,7 @@ void Link(Window* window, Window* parent, Window* after) {
   (window->previous != nullptr ? window->previous->next : parent->firstChild) = window;
   (window->next != nullptr ? window->next->previous : parent->lastChild) = window;
   for (Window* above = parent; above != nullptr; above = above->parent) above->childPaints += window->childPaints;
+  if (window->IsVisible()) ++g_scene;
 }
 
 void Unlink(Window* window) {
@@ -186,6 +188,7 @@ bool Matches(const Window* window, ATOM className, LPCWSTR name) {
 }  // namespace
 
 BOOL IsWindow(HWND handle) {
+  if (FindOwnWindow(handle, CurrentThread()) != nullptr) return TRUE;
   const Guard guard;
   return FindWindowObject(handle) != nullptr;
 }
@@ -278,7 +281,10 @@ BOOL EnumThreadWindows(DWORD thread, WNDENUMPROC callback, LPARAM data) {
   });
 }
 
+// The thread's own windows are found without the lock: every message that is sent asks this.
 DWORD GetWindowThreadProcessId(HWND handle, LPDWORD process) {
+  const Thread* thread = CurrentThread();
+  if (process == nullptr && FindOwnWindow(handle, thread) != nullptr) return thread->id;
   const Guard guard;
   const Window* window = Expect(handle);
   if (window == nullptr) return 0;

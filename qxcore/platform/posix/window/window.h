@@ -68,11 +68,13 @@ struct Window : OnModelHeap {
   Region update;
   bool eraseUpdate = false, frameUpdate = false, internalPaint = false;
   bool wantsPaint = false;
-  int childPaints = 0;  // windows below this one, itself included, that want WM_PAINT
+  int childPaints = 0;                  // windows below this one, itself included, that want WM_PAINT
+  std::uint64_t childrenInvalidAt = 0;  // the scene (paint.h) in which nothing could be added to what is below
 
   bool isDialog = false;
-  bool isActiveFrame = false;  // the state of the caption, by WM_NCACTIVATE
-  bool isDestroyed = false;    // WM_DESTROY has been sent
+  bool isActiveFrame = false;        // the state of the caption, by WM_NCACTIVATE
+  bool isDestroyed = false;          // WM_DESTROY has been sent
+  std::uint32_t toldActivation = 0;  // the last of its thread's changes of activation that it heard of
   bool shownWhenParentOpens = false;
   HWND lastActivePopup = nullptr;
   HICON icons[2] = {};      // ICON_SMALL, ICON_BIG

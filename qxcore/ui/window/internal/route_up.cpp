@@ -1,4 +1,4 @@
-#include "qxcore/ui/layout/internal/route_up.h"
+#include "qxcore/ui/window/internal/route_up.h"
 
 #include "qxcore/ui/app/application.h"
 #include "qxcore/ui/window/window.h"
