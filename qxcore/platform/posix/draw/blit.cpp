@@ -92,16 +92,22 @@ void CopyBox(const Context& to, const Box& part, const Surface& from, int dx, in
     std::memcpy(to.m_surface.Row(y) + known.x1, from.Row(y + dy) + known.x1 + dx, bytes);
 }
 
-// Reads from a copy where source and target are the same surface.
-Source SourceOf(const Context& to, const Surface& from) {
+// Where source and target are the same surface, the part that is read is copied first; `x` and `y` then count from
+// the copy's corner.
+Source SourceOf(const Context& to, const Surface& from, Extent& x, Extent& y) {
   Source source{from, {}};
   if (to.m_surface.pixels != from.pixels) return source;
-  source.copied.resize(static_cast<std::size_t>(from.width) * from.height);
-  for (int y = 0; y < from.height; ++y)
-    std::memcpy(&source.copied[static_cast<std::size_t>(from.width) * y], from.Row(y),
-                static_cast<std::size_t>(from.width) * 4);
+  const Box read = Intersect({x.start, y.start, x.start + x.size, y.start + y.size}, {0, 0, from.width, from.height});
+  if (IsEmpty(read)) return source;
+  const int width = read.x2 - read.x1;
+  source.copied.reserve(static_cast<std::size_t>(width) * (read.y2 - read.y1));
+  for (int row = read.y1; row < read.y2; ++row)
+    source.copied.insert(source.copied.end(), from.Row(row) + read.x1, from.Row(row) + read.x2);
   source.surface.pixels = source.copied.data();
-  source.surface.stride = from.width;
+  source.surface.stride = source.surface.width = width;
+  source.surface.height = read.y2 - read.y1;
+  x.start -= read.x1;
+  y.start -= read.y1;
   return source;
 }
 
@@ -112,11 +118,11 @@ struct Rectangle4 {
 void Stretch(Context& to, const Rectangle4& target, const Surface& from, const Settings& fromSettings,
              const Rectangle4& origin, int table) {
   if (target.width == 0 || target.height == 0 || origin.width == 0 || origin.height == 0) return;
-  Source source = SourceOf(to, from);
   Conversion convert(to, fromSettings, from.mono);
   Paint pattern = UsesPattern(table) ? PaintOf(to, *to.m_settings.brush) : Paint();
   Extent toX(target.x, target.width), toY(target.y, target.height);
   Extent fromX(origin.x, origin.width), fromY(origin.y, origin.height);
+  const Source source = SourceOf(to, from, fromX, fromY);
   Box box{toX.start, toY.start, toX.start + toX.size, toY.start + toY.size};
   Axis axisX{toX.start, toX.size, fromX.start, fromX.size, (target.width < 0) != (origin.width < 0), false};
   Axis axisY{toY.start, toY.size, fromY.start, fromY.size, (target.height < 0) != (origin.height < 0), true};

@@ -91,6 +91,10 @@ Region SiblingsAbove(const Window* window) {
 
 std::uint64_t g_scene = 1;
 
+bool IsUnpainted(const Window* window) {
+  return window->firstChild == nullptr && window->wantsPaint && IsAllInvalid(window, ClipByParents(window));
+}
+
 void SetWantsPaint(Window* window, bool wants) {
   if (window->wantsPaint == wants) return;
   window->wantsPaint = wants;

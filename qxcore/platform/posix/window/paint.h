@@ -21,6 +21,9 @@ void Invalidate(Window* window, const Region& region, Erase erase, Children chil
 void Validate(Window* window, const Region* region, Children children);
 // Something was taken from what is to be painted of the window.
 void ForgetAllInvalid(Window* window);
+// Whether a window without children has nothing on the screen that is worth keeping: all that shows of it is yet to be
+// erased and painted.
+bool IsUnpainted(const Window* window);
 // Forgets all that is to be painted of a window that does not show any more, and of what is below it.
 void DropPaint(Window* window);
 // Counts the window among those that want WM_PAINT, or no longer.

@@ -175,15 +175,16 @@ BOOL Place(WINDOWPOS& place) {
   }
   const NewPlace to = Measure(handle, place);
   NewPlace from{};
-  bool spoilsParent = false;
+  bool spoilsParent = false, isUnpainted = false;
   {
     const Guard guard;
     Window* window = Expect(handle);
     if (window == nullptr) return FALSE;
     from = {window->window, window->client};
+    isUnpainted = IsUnpainted(window);
     spoilsParent = Apply(window, place, to);
   }
-  KeepPixels(handle, from, to, place.flags);
+  if (!isUnpainted) KeepPixels(handle, from, to, place.flags);
   ShowOnDisplay(handle);
   if (!(place.flags & (SWP_NOACTIVATE | SWP_HIDEWINDOW))) {
     if (ParentHandle(handle) != nullptr) {
