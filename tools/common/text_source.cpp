@@ -7,6 +7,7 @@
 
 #include "qxcore/core/error_cause.h"
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/system/file/file.h"
 #include "tools/common/console.h"
 #include "tools/common/failure.h"
 #include "tools/common/utf8.h"
@@ -52,6 +53,13 @@ std::string WhyNotOpened(const std::string& name, int error) {
   return error != 0 ? std::strerror(error) : "";
 }
 
+// The size that the file reports; 0 for none. Available would stop at 4 GiB where a long has 32 bits.
+unsigned long long SizeOf(const std::string& name) {
+  unsigned long low = 0, high = 0;
+  if (SFile::GetSize(console::NameOf(name), low, high) < 0) return 0;
+  return static_cast<unsigned long long>(high) << 32 | low;
+}
+
 }  // namespace
 
 std::unique_ptr<SInputFile> OpenInput(const std::string& name, SProgressIndicatorEx& progress) {
@@ -74,7 +82,7 @@ TextSource::TextSource(const std::string& name, Encoding request, SProgressIndic
     inner = m_standardInput.get();
   } else {
     m_file = OpenInput(name, *progress);
-    m_size = m_file->Available();
+    m_size = SizeOf(name);
     inner = m_file.get();
   }
   m_bytes = std::make_unique<CountingInput>(*inner);

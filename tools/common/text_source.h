@@ -64,5 +64,5 @@ class TextSource {
   std::unique_ptr<StandardInput> m_standardInput;
   std::unique_ptr<CountingInput> m_bytes;
   std::unique_ptr<SMultiFormatReaderUnicode> m_reader;
-  unsigned long m_size = 0;
+  unsigned long long m_size = 0;
 };
