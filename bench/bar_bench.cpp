@@ -32,6 +32,9 @@ BENCH("lay out a status bar of 20 panes/ours") {
   for (int i = 0; i < kPanes; ++i) bar.InsertPane(i, 40, i % 5 == 0 ? DWORD{kSPaneStretch} : 0);
   const SString text(WTEXT("text"));
   for (int i = 0; i < kPanes; ++i) bar.SetPaneText(i, &text);
+  // A window that waits for its first paint message would be erased as a whole each time.
+  frame->UpdateWindow();
+  bar.UpdateWindow();
   int width = 1200;
   for (auto _ : state) {
     width = NextWidth(width);

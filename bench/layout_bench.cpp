@@ -35,6 +35,7 @@ class ShownSplitter {
       m_splitter.AddPane(i / kPanes, i % kPanes, pane, SSize(90, 70));
     }
     m_splitter.SetKeepPaneRatio(1);
+    ::RedrawWindow(m_frame.m_hWnd, nullptr, nullptr, RDW_UPDATENOW | RDW_ALLCHILDREN);
   }
   void Resize(int width, int height) {
     m_splitter.SetWindowPos(nullptr, 0, 0, width, height, SWP_NOZORDER | SWP_NOACTIVATE);
