@@ -15,8 +15,11 @@
 #include "qxcore/graphics/metafile.h"
 
 // The standard containers' memory fails by the same orders as the library's.
+void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
+  return SMemMustFail() ? nullptr : std::malloc(size != 0 ? size : 1);
+}
 void* operator new(std::size_t size) {
-  void* block = SMemMustFail() ? nullptr : std::malloc(size != 0 ? size : 1);
+  void* block = operator new(size, std::nothrow);
   if (block == nullptr) throw std::bad_alloc();
   return block;
 }

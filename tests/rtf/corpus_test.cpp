@@ -126,11 +126,9 @@ TEST(Corpus, TagsMakeUpTheWholeText) {
     for (const int wholeGroup : {0, 1}) {
       const WCHAR* at = document.text;
       const WCHAR* start;
-      long length, depth = 0;
-      for (; SRtfDocument::GetNextTag(&start, &length, at, wholeGroup) != 0; at = start + length) {
+      long length;
+      for (; SRtfDocument::GetNextTag(&start, &length, at, wholeGroup) != 0; at = start + length)
         for (; at < start; ++at) ASSERT_LE(*at, ' ') << document.name;
-        depth += length == 1 && *start == '{' ? 1 : length == 1 && *start == '}' ? -1 : 0;
-      }
       EXPECT_EQ(*start, 0) << document.name;
     }
   }

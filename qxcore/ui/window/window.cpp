@@ -78,6 +78,9 @@ SWnd::~SWnd() {
   if (m_hWnd == nullptr || FromHandlePermanent(m_hWnd) != this) return;
   const HWND window = m_hWnd;
   LeaveHandleMap();
+  // Without an object nothing passes messages on to the control that the window was; it frees what it has with its
+  // last.
+  if (m_superWndProc != nullptr) ::SetWindowLongPtrW(window, GWLP_WNDPROC, reinterpret_cast<LONG_PTR>(m_superWndProc));
   ::DestroyWindow(window);
   SModalState::WindowsChanged();
 }

@@ -35,9 +35,9 @@ class SStateReader {
     const SStringView digits = Next();
     long long value = 0;
     m_isValid = m_isValid && !digits.empty() && digits.size() <= 10;
-    for (WCHAR digit : digits) {
-      m_isValid = m_isValid && digit >= '0' && digit <= '9';
-      value = value * 10 + (digit - '0');
+    for (std::size_t i = 0; m_isValid && i < digits.size(); ++i) {
+      m_isValid = digits[i] >= '0' && digits[i] <= '9';
+      value = value * 10 + (digits[i] - '0');
     }
     m_isValid = m_isValid && value <= limit;
     if (m_isValid) *number = static_cast<int>(value);
