@@ -32,8 +32,8 @@ class QXCORE_API SHandleMap {
   void SetPermanent(void* handle, SObject* object);
   // Takes the handle out of the permanent map; nothing happens when it is not there.
   void RemovePermanent(void* handle);
-  // Makes the handle's temporary object unknown without destroying it before the others; nothing happens when
-  // there is none. Throws SEOutOfMemory and then changes nothing.
+  // Makes the handle's temporary object unknown without destroying it before the others; does nothing for
+  // a handle without one. Throws SEOutOfMemory and then changes nothing.
   void DiscardTemporary(void* handle);
 
   // Destroys all temporary objects, in the order of their handles, then the discarded ones.

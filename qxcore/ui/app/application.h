@@ -126,13 +126,13 @@ class QXCORE_API SWinApp : public SCmdTarget {
   friend QXCORE_API HINSTANCE SGetInstance();
 };
 
-// The one application object; null when there is none.
+// The one application object; null before it is made and after its end.
 QXCORE_API SWinApp* SGetApp();
 // The module instance that windows are created with: the program's, else the library's.
 QXCORE_API HINSTANCE SGetInstance();
 // The module where resources are looked up.
 QXCORE_API HINSTANCE SGetResInstance();
-// The application's owner window; null when there is none.
+// The application's owner window; null without an application or main window.
 QXCORE_API SWnd* SGetOwnerWnd();
 // A hidden window for code that needs one; made on the first call, null when that fails. It lives until the
 // program ends or it is destroyed, and is then made anew.

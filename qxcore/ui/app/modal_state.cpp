@@ -61,8 +61,8 @@ void StartRecord(SModalState* state, bool ownerOnly, bool tellFrames, const IOle
   if (tellFrames) TellFrames(0, asking);
 }
 
-// What this record disabled goes to one that remains and was started later, which found it disabled already; if
-// there is none, it is enabled.
+// What this record disabled goes to one that remains and was started later, which found it disabled already;
+// without such a record it is enabled.
 void StopRecord(SModalState* state, const IOleInPlaceFrame* asking) {
   SModalRecord** found = AllRecords().Retrieve(state);
   if (found == nullptr) return;

@@ -29,7 +29,7 @@ class QXCORE_API SModalState {
   void Stop();
   int IsActive() const { return (m_flags & kStarted) != 0; }  // nonzero between Start and Stop
 
-  // The enabled flag of the innermost state that disables windows: 0, or 1 when there is none.
+  // The enabled flag of the innermost state that disables windows: 0, or 1 without such a state.
   static int State();
 
   // For in-place frames of embedded documents: Enable(0) disables the windows, as a state of its own, when windows

@@ -1,5 +1,5 @@
 // SRichEditCtrl: a rich-edit control of the system. It holds formatted text, and takes and returns it as plain text and
-// as RTF, version 1.9.1 of the published specification.
+// as RTF 1.9.1, as Microsoft has published it.
 //
 // Positions count characters, the end of a paragraph as one, and begin with 0. Texts that are returned end their
 // lines with CR LF. On Linux the control holds, formats and converts a document but shows nothing and takes no

@@ -1,4 +1,4 @@
-// Renumbering of font and colour references. The words are those of the Rich Text Format specification 1.9.1.
+// Renumbering of font and colour references. The words are those of RTF 1.9.1, as Microsoft has published it.
 
 #include "qxcore/graphics/rtf/internal/tag.h"
 #include "qxcore/string/string_buffer.h"

@@ -13,7 +13,7 @@ struct CharsetPage {
   UINT page;
 };
 
-// Character sets of fonts and their code pages, as the RTF specification pairs them. Symbol fonts (2) have
+// Character sets of fonts and their code pages, as RTF 1.9.1 pairs them. Symbol fonts (2) have
 // pictures of their own in place of characters; their bytes are shown as those of windows-1252.
 constexpr CharsetPage kPages[] = {
     {2, kLatin}, {77, 10000}, {78, 10001}, {79, 10003}, {80, 10008}, {81, 10002}, {83, 10005}, {84, 10004},

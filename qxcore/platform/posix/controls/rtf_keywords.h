@@ -1,5 +1,5 @@
 // What the control words of an RTF text do. Words that are not listed do nothing; a group that begins with an
-// unlisted word behind "\*" is skipped. The words are those of the published specification, version 1.9.1.
+// unlisted word behind "\*" is skipped. The words are those of RTF 1.9.1, as Microsoft has published it.
 #pragma once
 
 #include <cstdint>

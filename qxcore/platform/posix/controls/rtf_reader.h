@@ -1,4 +1,4 @@
-// Reads RTF, version 1.9.1 of the published specification, into a document.
+// Reads RTF 1.9.1, as Microsoft has published it, into a document.
 //
 // Bad input is read as far as it makes sense; nothing is refused. Groups may be nested to any depth: what is
 // kept for open groups is a list on the heap, with one entry for any number of groups without formats of their

@@ -1,4 +1,4 @@
-// Writes a document as RTF, version 1.9.1 of the published specification: ASCII alone, characters above it as
+// Writes a document as RTF 1.9.1, as Microsoft has published it: ASCII alone, characters above it as
 // \u with the substitute "?".
 #pragma once
 

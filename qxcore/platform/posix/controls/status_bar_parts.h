@@ -38,7 +38,7 @@ struct StatusBar : model::OnModelHeap {
   const BarPart* ShownPart(UINT index) const;
   // Its place; `client` is the bar's client area.
   RECT PartRect(UINT index, const RECT& client) const;
-  // The index of the part at a point; -1 when there is none.
+  // The index of the part at a point; -1 outside of all parts.
   int PartAt(POINT point, const RECT& client) const;
   // Returns false, and changes nothing, for a number of parts that is not from 1 to kMostParts.
   bool SetParts(int count, const int* edges);

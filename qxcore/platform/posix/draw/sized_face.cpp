@@ -31,8 +31,8 @@ FT_Library TheLibrary() {
 
 int Scale(long units, LONG em, const FT_Face face) { return MulDiv(static_cast<int>(units), em, face->units_per_EM); }
 
-// What the face's tables say of its line, in units of the em. The Windows ascent and descent are the line's, as the
-// OpenType specification describes them; a face without that table has the general ones.
+// What the face's tables say of its line, in units of the em. The Windows ascent and descent are the line's, as
+// OpenType (ISO/IEC 14496-22, table OS/2) describes them; a face without that table has the general ones.
 struct Line {
   long ascent, descent, leading;
 };
