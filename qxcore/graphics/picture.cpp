@@ -34,16 +34,69 @@ class OpenedFile {
   HANDLE m_handle;
 };
 
-HRESULT WriteBytes(const SString& name, const std::vector<BYTE>& bytes) {
-  OpenedFile file(name, GENERIC_WRITE, CREATE_ALWAYS);
+HRESULT WriteInto(const SString& name, DWORD disposition, const std::vector<BYTE>& bytes) {
+  OpenedFile file(name, GENERIC_WRITE, disposition);
   if (!file.IsOpen()) return LastError();
   DWORD written = 0;
   bool whole = ::WriteFile(file.Handle(), bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) &&
                written == bytes.size();
   HRESULT result = whole ? S_OK : LastError();
   if (!file.Close() && whole) result = LastError();
-  if (result != S_OK) ::DeleteFileW(name);
   return result;
+}
+
+HRESULT WriteNew(const SString& name, const std::vector<BYTE>& bytes) {
+  HRESULT result = WriteInto(name, CREATE_NEW, bytes);
+  if (result != S_OK && result != static_cast<HRESULT>(0x80070000u | ERROR_FILE_EXISTS)) ::DeleteFileW(name);
+  return result;
+}
+
+// A copy of a file beside it, under a name that was free, which is deleted unless it takes the file's place. It is a
+// copy so that it has the rights and attributes of the file.
+class Draft {
+ public:
+  explicit Draft(const SString& file) : m_file(file) {
+    constexpr int kMostNames = 100;
+    for (int i = 0; i < kMostNames; ++i) {
+      m_name.Format(WTEXT("%s.%d.new"), static_cast<LPCWSTR>(file), i);
+      m_isThere = ::CopyFileW(file, m_name, TRUE);
+      if (m_isThere || ::GetLastError() != ERROR_FILE_EXISTS) return;
+    }
+  }
+  ~Draft() {
+    if (m_isThere) ::DeleteFileW(m_name);
+  }
+  Draft(const Draft&) = delete;
+  Draft& operator=(const Draft&) = delete;
+
+  bool IsThere() const { return m_isThere; }
+  const SString& Name() const { return m_name; }
+  bool TakePlace() {
+    bool taken = ::MoveFileExW(m_name, m_file, MOVEFILE_REPLACE_EXISTING);
+    m_isThere = !taken;
+    return taken;
+  }
+
+ private:
+  const SString& m_file;
+  SString m_name;
+  bool m_isThere = false;
+};
+
+HRESULT Replace(const SString& name, const std::vector<BYTE>& bytes) {
+  Draft draft(name);
+  if (!draft.IsThere()) return LastError();
+  HRESULT result = WriteInto(draft.Name(), TRUNCATE_EXISTING, bytes);
+  return result != S_OK || draft.TakePlace() ? result : LastError();
+}
+
+HRESULT WriteBytes(const SString& name, const std::vector<BYTE>& bytes) {
+  DWORD attributes = ::GetFileAttributesW(name);
+  if (attributes == INVALID_FILE_ATTRIBUTES) return WriteNew(name, bytes);
+  if (attributes & FILE_ATTRIBUTE_DEVICE) return WriteInto(name, OPEN_EXISTING, bytes);
+  // Who may not write the file may not replace it, either.
+  if (!OpenedFile(name, GENERIC_WRITE, OPEN_EXISTING).IsOpen()) return LastError();
+  return Replace(name, bytes);
 }
 
 HRESULT ReadBytes(const SString& name, std::vector<BYTE>* bytes) {

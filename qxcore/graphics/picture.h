@@ -3,9 +3,11 @@
 
 #include "qxcore/graphics/bitmap.h"
 
-// Writes a bitmap as a PNG file of 24 bits a pixel; a file that is there is replaced. Returns 0; E_INVALIDARG for an
-// invalid bitmap, the error of the file as an HRESULT, or E_FAIL where the encoder fails. A file that could not be
-// written whole is deleted. Throws SEOutOfMemory.
+// Writes a bitmap as a PNG file of 24 bits a pixel. A file that is there is replaced when the new one is whole, and
+// keeps its rights; until then the new one stands beside it as NAME.0.new (or the next number that is free). A
+// symbolic link is replaced by the file; a device is written to. Returns 0; E_INVALIDARG for an invalid bitmap, the
+// error of the file as an HRESULT, or E_FAIL where the encoder fails; what was there before stays then, and nothing
+// else is left. Throws SEOutOfMemory.
 QXCORE_API HRESULT SWritePicture(const SString& file, HBITMAP bitmap);
 
 // Reads a PNG file into a bitmap as CreatePixels makes it, transparent parts laid over white. Returns 0; the error of

@@ -4,12 +4,19 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdlib>
+#include <filesystem>
 #include <random>
 
 #include "tests/graphics/drawing_program.h"
+#include "tests/support/file_size_limit.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"
+
+#ifndef _WIN32
+#include <sys/stat.h>
+#endif
 
 namespace {
 
@@ -104,5 +111,40 @@ TEST(PictureFiles, RefuseWhatIsNoPicture) {
   EXPECT_EQ(SReadPicture(file, &kept), static_cast<HRESULT>(0x8007000D));
   EXPECT_EQ(kept.GetSafeHandle(), handle) << "as it was";
 }
+
+#ifndef _WIN32
+
+TEST(PictureFiles, KeepTheFormerFileWhereTheNewOneIsCut) {
+  test::TempFolder folder;
+  SString file = SString(folder.Path().c_str()) + WTEXT("\\picture.png");
+  SBitmap small, noise, again;
+  small.CreatePixels(3, 3);
+  noise.CreatePixels(200, 200);
+  std::mt19937 random(2);
+  for (int i = 0; i < 200 * 200; ++i) noise.GetBits()[i] = random() & 0xFFFFFF;
+  std::string native = test::Narrow(folder.Path()).substr(2);
+  std::replace(native.begin(), native.end(), '\\', '/');
+  const std::string name = native + "/picture.png";
+  auto entries = [&] {
+    return std::distance(std::filesystem::directory_iterator(native), std::filesystem::directory_iterator());
+  };
+  {
+    test::FileSizeLimit limit(4096);
+    EXPECT_NE(SWritePicture(file, noise), S_OK);
+    EXPECT_EQ(entries(), 0) << "half a picture";
+    ASSERT_EQ(SWritePicture(file, small), S_OK);
+    ASSERT_EQ(chmod(name.c_str(), 0640), 0);
+    EXPECT_NE(SWritePicture(file, noise), S_OK);
+  }
+  EXPECT_EQ(SReadPicture(file, &again), S_OK);
+  EXPECT_EQ(again.GetSize(), SSize(3, 3));
+  EXPECT_EQ(SWritePicture(file, noise), S_OK);
+  EXPECT_EQ(entries(), 1);
+  struct stat info;
+  ASSERT_EQ(stat(name.c_str(), &info), 0);
+  EXPECT_EQ(info.st_mode & 07777, 0640u);
+}
+
+#endif
 
 }  // namespace
