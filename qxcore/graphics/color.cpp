@@ -7,10 +7,12 @@ unsigned long SColor::GetMediumColor(unsigned long from, unsigned long to, int s
   if (steps == 0 || step == 0) return from;
   if (step == steps) return to;
   if (from == to) return from;
+  constexpr int kShort = 1 << 23;  // a difference of channels times less than that fits into an int
+  bool isShort = -kShort < step && step < kShort;
   auto channel = [&](int shift) {
-    long long first = from >> shift & 0xFF, last = to >> shift & 0xFF;
-    int moved = static_cast<int>((last - first) * step / steps);
-    int rounded = static_cast<int>(moved + 0.5);
+    int first = from >> shift & 0xFF, last = to >> shift & 0xFF, way = last - first;
+    int moved = isShort ? way * step / steps : static_cast<int>(static_cast<long long>(way) * step / steps);
+    int rounded = moved + (moved < 0);  // adding 0.5 and truncating leaves what rises and shortens what falls by one
     return static_cast<unsigned long>((first + rounded) & 0xFF) << shift;
   };
   return channel(0) | channel(8) | channel(16);

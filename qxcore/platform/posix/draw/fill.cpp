@@ -2,13 +2,58 @@
 
 #include <algorithm>
 
+#if defined(__x86_64__)
+#include <immintrin.h>
+#endif
+
 namespace draw {
+namespace {
+
+constexpr int kNarrow = 16;  // pixels of a row below which setting a call up costs more than it saves
+
+#if defined(__x86_64__)
+
+// Twice as wide as pixman's own fill, which most of the time of a gradient goes into.
+__attribute__((target("avx2"))) void FillRow(std::uint32_t* row, int width, std::uint32_t pixel) {
+  constexpr int kBlock = 8;
+  static_assert(kNarrow >= kBlock, "a row holds a block");
+  const __m256i block = _mm256_set1_epi32(static_cast<int>(pixel));
+  auto store = [&](std::uint32_t * at) __attribute__((target("avx2"))) {
+    _mm256_storeu_si256(reinterpret_cast<__m256i*>(at), block);
+  };
+  std::uint32_t* last = row + width - kBlock;
+  store(row);  // up to where blocks lie within lines of the cache
+  row += kBlock - (reinterpret_cast<std::uintptr_t>(row) / sizeof *row) % kBlock;
+  for (; row + 3 * kBlock <= last; row += 4 * kBlock) {
+    store(row);
+    store(row + kBlock);
+    store(row + 2 * kBlock);
+    store(row + 3 * kBlock);
+  }
+  for (; row < last; row += kBlock) store(row);
+  store(last);  // over what is filled already, so that no rest is left
+}
+
+bool FillWide(const Surface& surface, const Box& box, std::uint32_t pixel) {
+  static const bool canUse = __builtin_cpu_supports("avx2");
+  if (!canUse) return false;
+  for (int y = box.y1; y < box.y2; ++y) FillRow(surface.Row(y) + box.x1, box.x2 - box.x1, pixel);
+  return true;
+}
+
+#else
+
+bool FillWide(const Surface&, const Box&, std::uint32_t) { return false; }
+
+#endif
+
+}  // namespace
 
 void FillSolid(const Surface& surface, const Box& box, std::uint32_t pixel) {
-  constexpr int kNarrow = 16;  // where setting a call up costs more than it saves
   int width = box.x2 - box.x1;
   if (width >= kNarrow) {
-    pixman_fill(surface.pixels, surface.stride, 32, box.x1, box.y1, width, box.y2 - box.y1, pixel);
+    if (!FillWide(surface, box, pixel))
+      pixman_fill(surface.pixels, surface.stride, 32, box.x1, box.y1, width, box.y2 - box.y1, pixel);
     return;
   }
   std::uint32_t* row = surface.Row(box.y1) + box.x1;
