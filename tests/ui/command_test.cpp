@@ -86,6 +86,15 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(Control, SWnd, reflected_command<0, &Control::OnCli
                              reflected<WM_DRAWITEM, &Control::DrawItem>(),
                              reflected<WM_MEASUREITEM, &Control::OnMeasure>())
 
+class Document : public SCmdTarget {
+ public:
+  void OnOpen() { g_notes("document:open"); }
+  void OnPaste() { g_notes("document:paste"); }
+  QXCORE_DECLARE_MESSAGE_MAP()
+};
+QXCORE_IMPLEMENT_MESSAGE_MAP(Document, SCmdTarget, command<kOpen, &Document::OnOpen>(),
+                             command<kPaste, &Document::OnPaste>())
+
 class Commands : public test::UiTest {
  protected:
   void SetUp() override {
@@ -130,6 +139,23 @@ TEST_F(Commands, AskingForAHandler_CallsNothing) {
   EXPECT_NE(info.m_handler, nullptr);
   EXPECT_EQ(m_frame->OnCmdMsg(0x8031, 0, nullptr, &info), 0);
   EXPECT_EQ(g_notes.Take(), "");
+}
+
+// What a view shows handles commands behind the view and before the frame.
+TEST_F(Commands, Routing_GoesFromTheViewToItsDocument) {
+  Document document;
+  m_frame->GetActiveView()->DestroyWindow();
+  SCreateContext context;
+  context.m_viewClass = &View::classView;
+  context.m_document = &document;
+  SView* view = SObjectCast<SView>(m_frame->CreateView(&context), &SView::classSView);
+  EXPECT_EQ(m_frame->GetActiveView(), view);
+  EXPECT_EQ(view->GetDocument(), &document);
+  m_frame->SendMessageW(WM_COMMAND, kPaste);
+  m_frame->SendMessageW(WM_COMMAND, kOpen);
+  view->SetDocument(nullptr);
+  m_frame->SendMessageW(WM_COMMAND, kOpen);
+  EXPECT_EQ(g_notes.Take(), "view:paste document:open frame:open");
 }
 
 TEST_F(Commands, ADestroyedActiveView_IsForgotten) {

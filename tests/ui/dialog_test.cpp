@@ -39,6 +39,10 @@ class Dialog : public SDlg {
     SDlg::OnCancel();
   }
   void PostNcDestroy() override { ++m_ends; }
+  int OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* result) override {
+    if (m_onMessage) m_onMessage(message);
+    return SDlg::OnWndMsg(message, wParam, lParam, result);
+  }
   void DoDataExchange(SDataExchange* exchange) override {
     exchange->Text(kName, &m_name);
     exchange->MaxLength(m_name, 8);
@@ -53,6 +57,7 @@ class Dialog : public SDlg {
     return text;
   }
   std::function<void()> m_onInit;
+  std::function<void(UINT)> m_onMessage;
   std::string m_calls;
   SString m_name = WTEXT("model");
   std::int32_t m_count = 7;
@@ -61,22 +66,10 @@ class Dialog : public SDlg {
   int m_ends = 0;
 };
 
-class Dialogs : public test::UiTest {
+class Dialogs : public test::OwnerTest {
  protected:
-  void SetUp() override {
-    test::UiTest::SetUp();
-    ASSERT_TRUE(m_owner.Popup(WS_VISIBLE));
-    m_app.m_mainWnd = &m_owner;
-  }
-  void TearDown() override {
-    m_app.m_mainWnd = nullptr;
-    if (m_owner.m_hWnd != nullptr) m_owner.DestroyWindow();
-    test::UiTest::TearDown();
-  }
   // The dialogs are shown; what answers them stands in the queue.
   SetInteractiveMode m_shown{kInteractiveShow};
-  test::App m_app;
-  test::Window m_owner;
 };
 
 TEST_F(Dialogs, Modal_IsAnsweredByItsButtons) {
@@ -130,6 +123,27 @@ TEST_F(Dialogs, Modal_EndsWithItsWindowOrAQuit) {
   quit.m_onInit = [] { ::PostQuitMessage(4); };
   EXPECT_EQ(quit.DoModal(), -1);
   EXPECT_EQ(m_app.Run(), 4);
+}
+
+// A box whose answer is known before anybody sees it.
+TEST_F(Dialogs, Modal_EndedByOnInitDialog_ReturnsTheResultUnshown) {
+  Dialog dialog;
+  dialog.m_onInit = [&] {
+    dialog.EndDialog(37);
+    EXPECT_NE(dialog.m_hWnd, nullptr) << "the box lives until its loop would have ended";
+    dialog.EndDialog(38);
+  };
+  bool wasShown = false;
+  dialog.m_onMessage = [&](UINT message) { wasShown = wasShown || message == WM_SHOWWINDOW; };
+  EXPECT_EQ(dialog.DoModal(), 37);
+  EXPECT_FALSE(wasShown);
+  EXPECT_EQ(dialog.m_calls, "pre init ");
+  EXPECT_EQ(dialog.m_ends, 1);
+  EXPECT_TRUE(m_owner.IsWindowEnabled());
+
+  dialog.m_onInit = [&] { dialog.DestroyWindow(); };
+  EXPECT_EQ(dialog.DoModal(), -1);
+  EXPECT_EQ(dialog.m_ends, 2);
 }
 
 TEST_F(Dialogs, Modeless_LivesUntilItIsAnswered) {

@@ -117,4 +117,22 @@ class UiTest : public testing::Test {
   int m_permanent = 0;
 };
 
+// With an application whose main window owns the boxes and dialogs.
+class OwnerTest : public UiTest {
+ protected:
+  void SetUp() override {
+    UiTest::SetUp();
+    ASSERT_TRUE(m_owner.Popup(WS_VISIBLE));
+    m_app.m_mainWnd = &m_owner;
+  }
+  void TearDown() override {
+    m_app.m_mainWnd = nullptr;
+    m_owner.m_handler = nullptr;
+    m_owner.DestroyWindow();
+    UiTest::TearDown();
+  }
+  App m_app;
+  Window m_owner;
+};
+
 }  // namespace test

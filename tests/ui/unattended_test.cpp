@@ -33,19 +33,8 @@ class Answer {
   HHOOK m_hook;
 };
 
-class Unattended : public test::UiTest {
+class Unattended : public test::OwnerTest {
  protected:
-  void SetUp() override {
-    test::UiTest::SetUp();
-    ASSERT_TRUE(m_owner.Popup(WS_VISIBLE));
-    m_app.m_mainWnd = &m_owner;
-  }
-  void TearDown() override {
-    m_app.m_mainWnd = nullptr;
-    m_owner.m_handler = nullptr;
-    m_owner.DestroyWindow();
-    test::UiTest::TearDown();
-  }
   // What the call does in a mode: its result as a text, or "abort".
   template <class Call>
   std::string In(InteractiveMode mode, Call call) {
@@ -58,8 +47,6 @@ class Unattended : public test::UiTest {
     }
   }
   test::Reports m_reports;
-  test::App m_app;
-  test::Window m_owner;
 };
 
 TEST_F(Unattended, MessageBoxes) {

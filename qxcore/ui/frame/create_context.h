@@ -4,10 +4,11 @@
 
 #include "qxcore/core/object.h"
 
+class SCmdTarget;
 class SFrameWnd;
 
 struct SCreateContext {
   SClassInfo* m_viewClass = nullptr;    // the class of the view that fills the frame; null for no view
-  void* m_document = nullptr;           // what the view shows; its meaning is the program's
+  SCmdTarget* m_document = nullptr;     // what the view shows, or null; not owned
   SFrameWnd* m_currentFrame = nullptr;  // the frame on which a new one is modelled, or null
 };

@@ -6,6 +6,7 @@
 #include "qxcore/ui/frame/data_exchange.h"
 #include "qxcore/ui/frame/internal/dialog_template.h"
 #include "qxcore/ui/window/internal/creation.h"
+#include "qxcore/ui/window/internal/modal_loop.h"
 #include "qxcore/ui/window/internal/resources.h"
 #include "qxcore/ui/window/internal/route_up.h"
 #include "qxcore/ui/window/message_entries.h"
@@ -32,8 +33,9 @@ void SDlg::OnOK() {
 
 void SDlg::OnCancel() { EndDialog(IDCANCEL); }
 
+// A second answer to a modal box changes nothing: its loop destroys it.
 void SDlg::EndDialog(int result) {
-  if (IsRunningModalLoop()) {
+  if (SModalLoop::Exists(this)) {
     EndModalLoop(result);
   } else {
     DestroyWindow();
@@ -96,7 +98,8 @@ struct ModalBox {
 
 }  // namespace
 
-// The owner is enabled before the box goes, so that it gets the activation.
+// The loop is announced before the box is made, so that OnInitDialog can end it. The owner is enabled before the box
+// goes, so that it gets the activation.
 int SDlg::DoModal() {
   const void* dialogTemplate = m_template != nullptr ? m_template : FindTemplate(m_templateName);
   if (dialogTemplate == nullptr) return -1;
@@ -105,9 +108,10 @@ int SDlg::DoModal() {
   {
     ModalBox box;
     SModalState modal(1);
+    SModalLoop loop(this);
     if (!CreateDlgIndirect(dialogTemplate, m_parent)) return -1;
     box.window = m_hWnd;
-    result = RunModalLoop(kSModalShowOnIdle);
+    result = loop.Run(kSModalShowOnIdle);
     modal.Stop();
   }
   SWndThreadState::Get().ThrowException();

@@ -44,7 +44,8 @@ class QXCORE_API SDlg : public SWnd {
   // Makes a modeless box, which is shown if its template says so. Nonzero on success.
   int CreateDlg(LPCWSTR templateName, SWnd* parent = nullptr);
   int CreateDlgIndirect(const void* dialogTemplate, SWnd* parent = nullptr);
-  // Ends DoModal with a result; a modeless box is destroyed.
+  // Ends DoModal with a result, also from OnInitDialog, when the box is not shown at all. The first call counts. A
+  // modeless box is destroyed.
   void EndDialog(int result);
 
   int UpdateData(int saveAndValidate = 1) override;

@@ -16,6 +16,17 @@ SView::~SView() {
 
 void SView::PostNcDestroy() { delete this; }
 
+int SView::Create(LPCWSTR className, LPCWSTR windowName, DWORD style, const SRect& rect, SWnd* parent, UINT id,
+                  SCreateContext* context) {
+  if (context != nullptr) m_document = context->m_document;
+  return SWnd::Create(className, windowName, style, rect, parent, id, context);
+}
+
+int SView::OnCmdMsg(UINT id, int code, void* extra, S_CMDHANDLERINFO* info) {
+  if (SWnd::OnCmdMsg(id, code, extra, info)) return 1;
+  return m_document != nullptr && m_document->OnCmdMsg(id, code, extra, info);
+}
+
 int SView::PreCreateWindow(CREATESTRUCTW* create) {
   if (create->lpszClass == nullptr) {
     create->lpszClass = SRegisterWindowClass(CS_DBLCLKS | CS_HREDRAW | CS_VREDRAW, ::LoadCursorW(nullptr, IDC_ARROW),

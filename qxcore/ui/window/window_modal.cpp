@@ -1,37 +1,34 @@
-// Modal loops. Each running loop has a record on the stack, so that loops nest and survive their window.
+// Modal loops. Each one has a record on the stack, so that loops nest and survive their window.
 
 #include "qxcore/ui/app/application.h"
-#include "qxcore/ui/window/thread_state.h"
+#include "qxcore/ui/window/internal/modal_loop.h"
 #include "qxcore/ui/window/window.h"
 
-namespace {
+SModalLoop::SModalLoop(SWnd* window)
+    : m_state(SWndThreadState::Get()), m_record{window, -1, false, m_state.m_modalLoops} {
+  m_state.m_modalLoops = &m_record;
+}
 
-class RunningLoop {
- public:
-  explicit RunningLoop(SWnd* window)
-      : m_state(SWndThreadState::Get()), m_record{window, -1, false, m_state.m_modalLoops} {
-    m_state.m_modalLoops = &m_record;
-  }
-  RunningLoop(const RunningLoop&) = delete;
-  RunningLoop& operator=(const RunningLoop&) = delete;
-  ~RunningLoop() { m_state.m_modalLoops = m_record.m_outer; }
+SModalLoop::~SModalLoop() { m_state.m_modalLoops = m_record.m_outer; }
 
-  // The object is touched only while it exists.
-  bool Continues() const {
-    return !m_record.m_hasEnded && m_record.m_window != nullptr && m_record.m_window->ContinueModal();
-  }
-  int Result() const { return m_record.m_result; }
-
- private:
-  SWndThreadState& m_state;
-  SWndThreadState::ModalLoop m_record;
-};
-
-SWndThreadState::ModalLoop* InnermostOf(const SWnd* window) {
+SWndThreadState::ModalLoop* SModalLoop::InnermostOf(const SWnd* window) {
   SWndThreadState::ModalLoop* loop = SWndThreadState::Get().m_modalLoops;
   while (loop != nullptr && (loop->m_window != window || loop->m_hasEnded)) loop = loop->m_outer;
   return loop;
 }
+
+bool SModalLoop::Exists(const SWnd* window) {
+  SWndThreadState::ModalLoop* loop = SWndThreadState::Get().m_modalLoops;
+  while (loop != nullptr && loop->m_window != window) loop = loop->m_outer;
+  return loop != nullptr;
+}
+
+// The object is touched only while it exists.
+bool SModalLoop::Continues() const {
+  return !m_record.m_hasEnded && m_record.m_window != nullptr && m_record.m_window->ContinueModal();
+}
+
+namespace {
 
 bool IsQueueEmpty() {
   MSG message;
@@ -51,31 +48,33 @@ int PumpWithoutApp() {
 
 }  // namespace
 
-int SWnd::IsRunningModalLoop() const { return InnermostOf(this) != nullptr; }
+int SWnd::IsRunningModalLoop() const { return SModalLoop::InnermostOf(this) != nullptr; }
 
-int SWnd::ContinueModal() { return InnermostOf(this) != nullptr && m_hWnd != nullptr; }
+int SWnd::ContinueModal() { return SModalLoop::InnermostOf(this) != nullptr && m_hWnd != nullptr; }
 
 // The loop may wait for a message, perhaps on behalf of an inner one.
 void SWnd::EndModalLoop(int result) {
-  SWndThreadState::ModalLoop* loop = InnermostOf(this);
+  SWndThreadState::ModalLoop* loop = SModalLoop::InnermostOf(this);
   if (loop == nullptr) return;
   loop->m_result = result;
   loop->m_hasEnded = true;
   ::PostMessageW(m_hWnd, WM_NULL, 0, 0);
 }
 
-int SWnd::RunModalLoop(DWORD flags) {
-  RunningLoop loop(this);
+int SWnd::RunModalLoop(DWORD flags) { return SModalLoop(this).Run(flags); }
+
+int SModalLoop::Run(DWORD flags) {
+  SWnd* window = m_record.m_window;
   SWinApp* app = SGetApp();
-  bool mustShow = (flags & kSModalShowOnIdle) != 0 && !IsWindowVisible();
+  bool mustShow = (flags & kSModalShowOnIdle) != 0 && !window->IsWindowVisible();
   bool mayIdle = true;
-  while (loop.Continues()) {
+  while (Continues()) {
     if (mayIdle && IsQueueEmpty()) {
       mayIdle = false;
       if (mustShow) {
         mustShow = false;
-        ShowWindow(SW_SHOWNORMAL);
-        UpdateWindow();
+        window->ShowWindow(SW_SHOWNORMAL);
+        if (m_record.m_window != nullptr) window->UpdateWindow();
       } else if (app != nullptr && (flags & kSModalNoIdle) == 0) {
         app->DoIdle();
       }
@@ -88,5 +87,5 @@ int SWnd::RunModalLoop(DWORD flags) {
     }
     mayIdle = true;
   }
-  return loop.Result();
+  return m_record.m_result;
 }
