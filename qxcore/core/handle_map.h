@@ -17,7 +17,6 @@ class QXCORE_API SHandleMap {
   SHandleMap() noexcept = default;
   SHandleMap(const SHandleMap&) = delete;
   SHandleMap& operator=(const SHandleMap&) = delete;
-  virtual ~SHandleMap();  // the derived class deletes its temporary objects before
 
   // The permanent object of the handle, else its temporary one, else a new temporary one; null for a null
   // handle. Throws SEOutOfMemory.
@@ -43,6 +42,9 @@ class QXCORE_API SHandleMap {
   int GetTemporaryCount() const { return m_temporary.GetCount(); }  // entries of the temporary map
 
  protected:
+  // Not virtual: a map is never deleted through this class. The derived class deletes its temporary objects before.
+  ~SHandleMap();
+
   // Makes a wrapper that does not own the handle. Throws SEOutOfMemory.
   virtual SObject* MakeTemporary(void* handle) = 0;
   // Destroys one; the handle stays as it is.

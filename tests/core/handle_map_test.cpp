@@ -11,6 +11,7 @@
 #include "qxcore/core/exception.h"
 #include "qxcore/core/object.h"
 #include "tests/support/failing_allocations.h"
+#include "tests/support/slots.h"
 
 namespace {
 
@@ -20,9 +21,9 @@ class Wrapper : public SObject {
   void* m_handle;
 };
 
-class WrapperMap : public SHandleMap {
+class WrapperMap final : public SHandleMap {
  public:
-  ~WrapperMap() override { DeleteTempMap(); }
+  ~WrapperMap() { DeleteTempMap(); }
   std::set<Wrapper*> living;
 
  protected:
@@ -40,6 +41,16 @@ class WrapperMap : public SHandleMap {
 };
 
 void* HandleOf(int number) { return reinterpret_cast<void*>(static_cast<std::uintptr_t>(number)); }
+
+// Derived classes outside the library are called through these two slots.
+TEST(HandleMap, VirtualFunctions_AreTheTwoThatMakeAndDestroy) {
+  struct Probe final : SHandleMap {
+    SObject* MakeTemporary(void*) override { return nullptr; }
+    void DestroyTemporary(SObject*) override {}
+  };
+  EXPECT_EQ(SlotOf(&Probe::MakeTemporary), 0);
+  EXPECT_EQ(SlotOf(&Probe::DestroyTemporary), 1);
+}
 
 TEST(HandleMap, RandomUse_FindsWhatTwoPlainMapsFind) {
   std::mt19937 random(4);

@@ -131,6 +131,21 @@ TEST_F(ModalStates, Start_DisablesAndStopEnablesAgain) {
   EXPECT_EQ(Enabled(), "010") << "the owner alone";
 }
 
+// What a program does while its windows are disabled finds the state in force already.
+TEST_F(ModalStates, Handlers_OfTheDisabling_FindTheApplicationDisabled) {
+  std::string states;
+  m_owner.m_handler = [&](UINT message, WPARAM, LPARAM, LRESULT*) {
+    if (message == WM_ENABLE) states += SModalState::State() ? '1' : '0';
+    return 0;
+  };
+  {
+    SModalState modal(1);
+    EXPECT_EQ(states, "0");
+  }
+  EXPECT_EQ(states, "01");
+  m_owner.m_handler = nullptr;
+}
+
 TEST_F(ModalStates, StopOutOfOrder_KeepsTheWindowsForTheStatesThatRemain) {
   SModalState outer(1), middle(1), inner(1);
   outer.Stop();
@@ -195,7 +210,11 @@ struct Frame final : IOleInPlaceFrame {
 };
 #pragma GCC diagnostic pop
 
+// Asked before the program has any window object: there is nothing to disable.
+const int g_enabledAtStart = SModalState::Enable(0, nullptr);
+
 TEST_F(ModalStates, InPlaceFrames_AreDisabledWithTheApplication) {
+  EXPECT_EQ(g_enabledAtStart, 1);
   Frame frame, asking;
   EXPECT_TRUE(SModalState::Register(&frame));
   EXPECT_TRUE(SModalState::Register(&asking));

@@ -1,5 +1,6 @@
 // Message maps: what is published about their layout, the lookup, the cache, and the shapes of handlers.
 
+#include "tests/support/slots.h"
 #include "tests/ui/ui_fixture.h"
 
 namespace {
@@ -21,15 +22,6 @@ class FrameProbe : public SFrameWnd {
  public:
   static const SMsgMap& FrameMap() { return SFrameWnd::msgMap; }
 };
-
-// The number of a virtual function, as a pointer to it holds it.
-template <class Function>
-std::ptrdiff_t SlotOf(Function function) {
-  std::ptrdiff_t parts[2];
-  static_assert(sizeof(function) == sizeof(parts));
-  std::memcpy(parts, &function, sizeof(parts));
-  return (parts[0] - 1) / static_cast<std::ptrdiff_t>(sizeof(void*));
-}
 
 // Under this ABI the destructor takes two slots.
 constexpr int kDestructor = 1;

@@ -105,12 +105,30 @@ TEST_F(Windows, Temporary_ObjectsAreSharedUntilTheyAreDeleted) {
   EXPECT_EQ(SWnd::HandleMap().GetTemporaryCount(), 0);
   EXPECT_TRUE(::IsWindow(handle)) << "a temporary object never destroys its window";
 
-  // Destroying by one takes it out of the map at once, and leaves it valid.
-  object = SWnd::FromHandle(handle);
+  ::DestroyWindow(handle);
+}
+
+TEST_F(Windows, Temporary_ObjectThatDestroysItsWindow_IsFoundUntilThen) {
+  Window parent;
+  ASSERT_TRUE(parent.Popup());
+  const HWND handle = ::CreateWindowExW(0, WTEXT("Static"), nullptr, WS_CHILD, 0, 0, 9, 9, parent.m_hWnd, nullptr,
+                                        SGetInstance(), nullptr);
+  SWnd* object = SWnd::FromHandle(handle);
+  SWnd* found = nullptr;
+  parent.m_handler = [&](UINT message, WPARAM wParam, LPARAM lParam, LRESULT*) {
+    if (message == WM_PARENTNOTIFY && LOWORD(wParam) == WM_DESTROY) {
+      found = SWnd::FromHandle(reinterpret_cast<HWND>(lParam));
+      SLockTempMaps();
+      SUnlockTempMaps();  // idle work of a loop inside keeps it
+    }
+    return 0;
+  };
   EXPECT_TRUE(object->DestroyWindow());
+  EXPECT_EQ(found, object);
   EXPECT_EQ(object->m_hWnd, nullptr);
   EXPECT_EQ(SWnd::HandleMap().FromHandleTemporary(handle), nullptr);
   EXPECT_FALSE(::IsWindow(handle));
+  parent.DestroyWindow();
 }
 
 TEST_F(Windows, ScrollBars_AreGivenToHandlersAsSuch) {

@@ -23,15 +23,17 @@ InteractiveMode SInteractionModeInForce() {
   return mode != kInteractiveDefault ? mode : kInteractiveShow;
 }
 
-SetInteractiveMode::SetInteractiveMode() : m_former(g_mode) {}
-SetInteractiveMode::SetInteractiveMode(InteractiveMode mode) : m_former(g_mode) { g_mode = mode; }
-SetInteractiveMode::~SetInteractiveMode() { g_mode = m_former; }
-void SetInteractiveMode::Set(InteractiveMode mode) { g_mode = mode; }
+SModeSetter::SModeSetter(InteractiveMode& mode) : m_mode(mode), m_former(mode) {}
+SModeSetter::~SModeSetter() { m_mode = m_former; }
+void SModeSetter::Set(InteractiveMode mode) { m_mode = mode; }
 
-SetDeftInteractiveMode::SetDeftInteractiveMode() : m_former(g_defaultMode) {}
-SetDeftInteractiveMode::SetDeftInteractiveMode(InteractiveMode mode) : m_former(g_defaultMode) { g_defaultMode = mode; }
-SetDeftInteractiveMode::~SetDeftInteractiveMode() { g_defaultMode = m_former; }
-void SetDeftInteractiveMode::Set(InteractiveMode mode) { g_defaultMode = mode; }
+SetInteractiveMode::SetInteractiveMode() : SModeSetter(g_mode) {}
+SetInteractiveMode::SetInteractiveMode(InteractiveMode mode) : SModeSetter(g_mode) { g_mode = mode; }
+
+SetDeftInteractiveMode::SetDeftInteractiveMode() : SModeSetter(g_defaultMode) {}
+SetDeftInteractiveMode::SetDeftInteractiveMode(InteractiveMode mode) : SModeSetter(g_defaultMode) {
+  g_defaultMode = mode;
+}
 
 void g_ThrowAbort(const SString& text) {
   g_RaiseError(text);

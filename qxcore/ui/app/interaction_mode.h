@@ -27,32 +27,34 @@ QXCORE_API InteractiveMode SInteractionModeInForce();
 // True when message boxes and dialogs are shown.
 inline bool SIsInteractive() { return SInteractionModeInForce() == kInteractiveShow; }
 
-// Sets the current mode and puts the former one back when it ends.
-class QXCORE_API SetInteractiveMode {
+// Sets a mode and puts the former one back when it ends. The two classes below say which mode it is.
+class QXCORE_API SModeSetter {
  public:
-  SetInteractiveMode();                               // changes nothing yet
-  explicit SetInteractiveMode(InteractiveMode mode);  // sets the mode
-  SetInteractiveMode(const SetInteractiveMode&) = delete;
-  SetInteractiveMode& operator=(const SetInteractiveMode&) = delete;
-  virtual ~SetInteractiveMode();
+  SModeSetter(const SModeSetter&) = delete;
+  SModeSetter& operator=(const SModeSetter&) = delete;
+  virtual ~SModeSetter();
   virtual void Set(InteractiveMode mode);  // sets another mode
 
+ protected:
+  explicit SModeSetter(InteractiveMode& mode);
+
  private:
+  InteractiveMode& m_mode;
   InteractiveMode m_former;  // at construction
 };
 
-// The same for the default mode.
-class QXCORE_API SetDeftInteractiveMode {
+// For the current mode.
+class QXCORE_API SetInteractiveMode : public SModeSetter {
+ public:
+  SetInteractiveMode();                               // changes nothing yet
+  explicit SetInteractiveMode(InteractiveMode mode);  // sets the mode
+};
+
+// For the default mode.
+class QXCORE_API SetDeftInteractiveMode : public SModeSetter {
  public:
   SetDeftInteractiveMode();                               // changes nothing yet
   explicit SetDeftInteractiveMode(InteractiveMode mode);  // sets the mode
-  SetDeftInteractiveMode(const SetDeftInteractiveMode&) = delete;
-  SetDeftInteractiveMode& operator=(const SetDeftInteractiveMode&) = delete;
-  virtual ~SetDeftInteractiveMode();
-  virtual void Set(InteractiveMode mode);  // sets another mode
-
- private:
-  InteractiveMode m_former;  // at construction
 };
 
 // Passes the text to g_RaiseError and throws an STargetedException with it, for the targets "Scripting,DlgAbort".

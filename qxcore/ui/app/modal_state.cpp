@@ -19,7 +19,7 @@ Records& AllRecords() {
   return records;
 }
 constinit SModalRecord* g_innermost = nullptr;
-constinit bool g_windowsChanged = true;
+constinit bool g_windowsChanged = false;
 
 using Frames = SMap<IOleInPlaceFrame*, int>;
 Frames& AllFrames() {
@@ -45,19 +45,21 @@ void Unlink(SModalRecord* record) {
   (record->m_inner != nullptr ? record->m_inner->m_outer : g_innermost) = record->m_outer;
 }
 
-// Makes the innermost record of a state; null when the state has one already.
+// Makes the innermost record of a state. The record stands in the list before windows are disabled, so that what is
+// called for them finds the application disabled.
 void StartRecord(SModalState* state, bool ownerOnly, bool tellFrames, const IOleInPlaceFrame* asking) {
   auto record = std::make_unique<SModalRecord>(state);
   AllRecords().Add(state, record.get());
+  Link(record.get());
   try {
     record->DisableWindows(SGetOwnerWnd()->GetSafeHwnd(), ownerOnly);
   } catch (...) {
-    record->EnableWindows();
     AllRecords().Remove(state);
+    Unlink(record.get());
+    record->EnableWindows();
     throw;
   }
-  record->m_tellsFrames = tellFrames;
-  Link(record.release());
+  record.release()->m_tellsFrames = tellFrames;
   if (tellFrames) TellFrames(0, asking);
 }
 

@@ -40,7 +40,7 @@ class QXCORE_API SModalState {
   static int Register(IOleInPlaceFrame* frame);
   static int Unregister(IOleInPlaceFrame* frame);
 
-  // Notes that windows have come or gone; called when a window is attached to an object.
+  // Notes that a window has come; called when one is attached to an object.
   static void WindowsChanged() noexcept;
 
  private:

@@ -3,6 +3,7 @@
 #include "qxcore/core/handle_map.h"
 #include "qxcore/platform/wide.h"
 #include "qxcore/ui/app/modal_state.h"
+#include "qxcore/ui/app/temp_maps.h"
 #include "qxcore/ui/control/scroll_bar.h"
 #include "qxcore/ui/window/thread_state.h"
 
@@ -82,7 +83,6 @@ SWnd::~SWnd() {
   // last.
   if (m_superWndProc != nullptr) ::SetWindowLongPtrW(window, GWLP_WNDPROC, reinterpret_cast<LONG_PTR>(m_superWndProc));
   ::DestroyWindow(window);
-  SModalState::WindowsChanged();
 }
 
 // A window that has a permanent object leaves the map with its last message. One of the class "SEditor" does not
@@ -100,12 +100,17 @@ int SWnd::DestroyWindow() {
   return SSent(result);
 }
 
-// A temporary object stays alive until the temporary objects go, but is found no more: the handle may be given out
-// again.
+// While the window goes, handlers around it still find this object under its handle. Afterwards it is found no more,
+// for the handle may be given out again; a temporary object stays alive until all of them go.
 int SWnd::DestroyUnowned(HWND window) {
-  HandleMap().DiscardTemporary(window);
+  const bool isTemporary = HandleMap().FromHandleTemporary(window) == this;
+  SLockTempMaps();
+  const int result = ::DestroyWindow(window);
+  SUnlockTempMaps(0);
+  if (isTemporary && HandleMap().FromHandleTemporary(window) != this) return result;
   m_hWnd = nullptr;
-  return ::DestroyWindow(window);
+  HandleMap().DiscardTemporary(window);
+  return result;
 }
 
 void SWnd::PostNcDestroy() {}
