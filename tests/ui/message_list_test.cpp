@@ -162,9 +162,6 @@ class PlainView : public SView {
 };
 
 TEST_F(MessageLists, Command_ComesFromAMenu) {
-  if (IsWine() && std::getenv("QXCORE_EXPECTED") == nullptr) {
-    GTEST_SKIP() << "SKIPPED: on a busy machine Wine's menu now and then waits for keys that were posted to it";
-  }
   class View : public Listed<PlainView> {
    public:
     View(test::Window::Handler handler, std::string* list) : Listed(std::move(handler)), m_list(list) {}

@@ -286,7 +286,6 @@ TEST(Dialog, KeyboardWalksAndChooses) {
   DestroyWindow(dialog);
 }
 
-#ifndef _WIN32
 void Mouse(DWORD flags, int dx = 0, int dy = 0) {
   INPUT input{};
   input.type = INPUT_MOUSE;
@@ -312,6 +311,33 @@ bool PumpUntil(UINT wanted) {
   return false;
 }
 
+// The press ends the menu, and is one in the window that it meets.
+TEST(Input, APressBesideAnOpenMenu_ClosesItAndReachesTheWindowThere) {
+  Record record;
+  const HWND top = MakeFrame();
+  const HWND other = Make(WTEXT("other"), WS_POPUP | WS_VISIBLE, nullptr, {400, 300, 500, 400});
+  SetForegroundWindow(top);
+  Pump();
+  {
+    const Steps steps({{WM_ENTERIDLE, [] {
+                          SetCursorPos(450, 350);
+                          Mouse(MOUSEEVENTF_LEFTDOWN);
+                          Mouse(MOUSEEVENTF_LEFTUP);
+                        }}});
+    EXPECT_EQ(TrackPopupMenu(GetSubMenu(GetMenu(top), 0), TPM_RETURNCMD, 50, 60, 0, top, nullptr), 0);
+  }
+  EXPECT_EQ(GetCapture(), nullptr);
+  EXPECT_TRUE(PumpUntil(WM_LBUTTONUP));
+  std::size_t at = 0;
+  for (const char* line : {"top WM_EXITMENULOOP", "other WM_LBUTTONDOWN 1 50,50", "other WM_LBUTTONUP 0 50,50"}) {
+    at = record.Text().find(line, at);
+    EXPECT_NE(at, std::string::npos) << line << " in\n" << record.Text();
+  }
+  DestroyWindow(other);
+  DestroyWindow(top);
+}
+
+#ifndef _WIN32
 // Under Wine input that is sent while the loop of sizing begins can be lost, and the loop waits for ever.
 TEST(Input, TheBorderSizesTheWindow) {
   const HWND top = Make(WTEXT("top"), WS_OVERLAPPEDWINDOW | WS_VISIBLE, nullptr, {100, 100, 400, 300});

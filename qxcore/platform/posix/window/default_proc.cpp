@@ -21,8 +21,8 @@ LRESULT AskParent(HWND handle, UINT message, WPARAM wParam, LPARAM lParam) {
 }
 
 LRESULT NcCreate(HWND handle, const CREATESTRUCTW* create) {
-  const bool hasName = create->lpszName != nullptr && !IS_INTRESOURCE(create->lpszName);
-  return create == nullptr || !hasName || SetText(handle, create->lpszName);
+  const bool hasName = create != nullptr && create->lpszName != nullptr && !IS_INTRESOURCE(create->lpszName);
+  return !hasName || SetText(handle, create->lpszName);
 }
 
 LRESULT Activated(HWND handle, WPARAM wParam) {

@@ -44,11 +44,13 @@ void MenuLoop::Leave() {
 UINT MenuLoop::Run() {
   MSG message;
   while (!m_isOver && Continues()) {
-    if (!PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE)) {
+    if (!PeekMessageW(&message, nullptr, 0, 0, PM_NOREMOVE)) {
       Send(m_owner, WM_ENTERIDLE, MSGF_MENU, reinterpret_cast<LPARAM>(Deepest().popup));
       if (!m_isOver && Continues()) WaitForAny();
       continue;
     }
+    if (IsPressBeside(message)) break;
+    if (!PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE)) continue;
     if (message.message == WM_QUIT) {
       PostQuitMessage(static_cast<int>(message.wParam));
       break;

@@ -25,9 +25,9 @@ class MenuLoop {
   void End();
   // Shows the menu itself as a popup.
   void ShowTop(POINT point) { Top().popup = Show(Top().menu, point); }
-  // Selects an item of the deepest menu, and says so; -1 for none.
+  // Selects an item of the deepest menu, and says so; -1 deselects.
   void Select(int position);
-  // Opens or chooses the item with the mnemonic; false without one.
+  // Opens or chooses the item with the mnemonic; false when no item has it.
   bool ChooseMnemonic(WCHAR key);
   void SelectNext(int step) { Move(step); }
   bool PressAt(POINT point) { return Press(point); }
@@ -67,6 +67,9 @@ class MenuLoop {
   // The level and item at a point of the screen; the deepest popup first.
   bool ItemUnder(POINT point, std::size_t* at, int* position);
   bool Press(POINT point);
+  // Whether the message is a press outside of the menu. It ends the menu and stays in the queue, for the window that
+  // lies there.
+  bool IsPressBeside(const MSG& message);
   bool TakeMouse(const MSG& message);
 
   const HWND m_owner;

@@ -6,6 +6,10 @@
 
 namespace platform::model {
 
+static bool IsPress(UINT message) {
+  return message == WM_LBUTTONDOWN || message == WM_LBUTTONDBLCLK || message == WM_RBUTTONDOWN;
+}
+
 // The level and item at a point of the screen; the deepest popup first.
 bool MenuLoop::ItemUnder(POINT point, std::size_t* at, int* position) {
   for (std::size_t i = m_levels.size(); i-- > 0;) {
@@ -50,18 +54,23 @@ bool MenuLoop::Press(POINT point) {
   return true;
 }
 
+bool MenuLoop::IsPressBeside(const MSG& message) {
+  std::size_t at;
+  int position;
+  return IsPress(message.message) && !ItemUnder(message.pt, &at, &position);
+}
+
 bool MenuLoop::TakeMouse(const MSG& message) {
   const bool isMouse = message.message >= WM_MOUSEFIRST && message.message <= WM_MOUSELAST;
   if (!isMouse) return message.message >= WM_NCMOUSEMOVE && message.message <= WM_NCMBUTTONDBLCLK;
   m_byMouse = true;
   std::size_t at;
   int position;
+  if (IsPress(message.message)) {
+    Press(message.pt);
+    return true;
+  }
   switch (message.message) {
-    case WM_LBUTTONDOWN:
-    case WM_LBUTTONDBLCLK:
-    case WM_RBUTTONDOWN:
-      if (!Press(message.pt)) m_isOver = true;
-      return true;
     case WM_MOUSEMOVE:
       if (ItemUnder(message.pt, &at, &position) && position >= 0 && position != m_levels[at].selected) {
         const bool opens = at == 0 && m_isBar && m_levels.size() > 1;
