@@ -21,7 +21,7 @@ class QXCORE_API SCmdTarget : public SObject {
   // Handles the command or notification `id` by this object's message maps, the most derived map first.
   // `code` is the notification code; with a message other than WM_COMMAND in its high word; or kSMsgUpdate to
   // update the command's user interface. `extra` is the SCmdUI of an update or the SMsgNotify of a
-  // notification, else null. Returns nonzero when a handler was called, 0 when there is none or an update
+  // notification, else null. Returns nonzero when a handler was called, 0 when no map has a handler or an update
   // handler passed the question on (see SCmdUI::ContinueRouting). With `info` nothing is called: it is filled
   // with what would be, and 1 is returned.
   virtual int OnCmdMsg(UINT id, int code, void* extra, S_CMDHANDLERINFO* info);

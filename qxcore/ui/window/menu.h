@@ -23,7 +23,7 @@ class QXCORE_API SMenu : public SObject {
 
   int CreateMenu();       // an empty menu bar; nonzero on success
   int CreatePopupMenu();  // an empty menu that opens
-  // A menu from the resources, by name or MAKEINTRESOURCEW number; 0 when there is none.
+  // A menu from the resources, by name or MAKEINTRESOURCEW number; 0 when the resources have none of this name.
   int LoadMenuW(LPCWSTR name);
   // Loads one from the published binary template.
   int LoadMenuIndirectW(const void* menuTemplate);

@@ -13,7 +13,7 @@ bool IsRegisteredAs(const SMsgEntry& entry, UINT message) {
   return entry.m_signature.m_number > kNoAddress && *entry.m_signature.m_registered == message;
 }
 
-// The first entry of the chain of maps that fits; null when there is none.
+// The first entry of the chain of maps that fits, or null.
 template <class Fits>
 const SMsgEntry* FindEntry(const SMsgMap* map, Fits fits) {
   for (; map != nullptr; map = map->m_getBase()) {

@@ -53,14 +53,14 @@ inline constexpr UINT kSMsgReflected = 0xBC00;
 inline constexpr UINT kSMsgIdleKick = 0x036A;
 
 // Finds the entry that handles a window message in the map or in those of its base classes, without the
-// cache; null when there is none. A message of kSMsgRegistered or more is matched by its registered number.
+// cache; null when no map handles it. A message of kSMsgRegistered or more is matched by its registered number.
 QXCORE_API const SMsgEntry* SFindMessageEntry(const SMsgMap* map, UINT message);
 
 // The same through the process-wide cache of 256 entries, for the user-interface thread.
 QXCORE_API const SMsgEntry* SFindMessageEntryCached(const SMsgMap* map, UINT message);
 
 // Finds the entry that handles a command or notification: equal message and code, and a range of identifiers
-// that holds `id`; null when there is none.
+// that holds `id`; null when no map handles it.
 QXCORE_API const SMsgEntry* SFindCommandEntry(const SMsgMap* map, UINT message, UINT code, UINT id);
 
 // Declares a class's message map in its body. Leaves the access at protected.

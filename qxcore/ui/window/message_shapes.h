@@ -165,7 +165,7 @@ LRESULT SMsgCallNotify(Call call, const SMsgArguments& a) {
   }
 }
 
-// The shape that a message has whose handlers may have any: the one with these types; 0 when there is none.
+// The shape that a message has whose handlers may have any: the one with these types; 0 when no shape has them.
 template <class Handler>
 inline constexpr unsigned kSMsgShapeOf = 0;
 //! @cond

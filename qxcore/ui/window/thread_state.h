@@ -47,7 +47,7 @@ class QXCORE_API SWndThreadState {
   SCurrentMessage m_current = {};     // the innermost message that is being handled
   HHOOK m_creationHook = nullptr;     // installed while m_pending waits for its window
   HHOOK m_secondHook = nullptr;       // a hook of a derived class's creation; CreateEx removes it
-  DLGPROC m_dialogHook = nullptr;     // called after OnInitDialog with WM_INITDIALOG; null for none
+  DLGPROC m_dialogHook = nullptr;     // called after OnInitDialog with WM_INITDIALOG; may be null
   Creation* m_creations = nullptr;    // windows that are being created
   ModalLoop* m_modalLoops = nullptr;  // loops of RunModalLoop
 
@@ -66,7 +66,7 @@ class QXCORE_API SWndThreadState {
     if (m_exception != nullptr) [[unlikely]]
       ThrowKept();
   }
-  // Takes the kept exception out; null when there is none.
+  // Takes the kept exception out; null when nothing is kept.
   std::exception_ptr TakeException() noexcept;
 
  private:

@@ -152,11 +152,11 @@ class QXCORE_API SWnd : public SCmdTarget {
 
   // --- the tree ---
 
-  SWnd* GetParent() const;                      // the parent or owner; null for none
+  SWnd* GetParent() const;                      // the parent, else the owner, else null
   SWnd* GetTopLevelParent() const;              // the outermost window above this one, owners included
   SWnd* GetTopLevelOwner() const;               // the end of the chain of owners
   SFrameWnd* GetParentFrame() const;            // the nearest frame above this one, or null
-  SDockSiteFrameWnd* GetTopLevelFrame() const;  // the outermost frame that is one of these; null for none
+  SDockSiteFrameWnd* GetTopLevelFrame() const;  // the outermost such frame, or null
   SWnd* GetDlgItem(int id) const;               // the child with this identifier; may be temporary
   int GetDlgCtrlID() const;                     // this window's identifier
   int SetDlgCtrlID(int id);                     // sets it; returns the old one
@@ -197,7 +197,7 @@ class QXCORE_API SWnd : public SCmdTarget {
   int KillTimer(UINT_PTR id);
   void SetFont(HFONT font, int redraw = 1);
   HFONT GetFont() const;
-  HMENU GetMenuHandle() const;  // the window's menu; null for none
+  HMENU GetMenuHandle() const;  // the window's menu, or null
   int SetMenu(HMENU menu);      // the former menu is not destroyed
   // A message box over this window, by the interaction mode; see SMessageBox.
   int MessageBoxW(LPCWSTR text, LPCWSTR caption = nullptr, UINT type = 0);

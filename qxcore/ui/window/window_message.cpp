@@ -1,5 +1,6 @@
 // The road of a message: from the window procedure through the object to its handler.
 
+#include "qxcore/platform/internal/own_window.h"
 #include "qxcore/ui/app/temp_maps.h"
 #include "qxcore/ui/frame/dialog.h"
 #include "qxcore/ui/window/internal/cross_thread.h"
@@ -34,16 +35,18 @@ LRESULT RefusalOf(UINT message) { return message == WM_CREATE ? -1 : 0; }
 }  // namespace
 
 LRESULT CALLBACK SWindowProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
-  const LRESULT result = SGuarded(RefusalOf(message), [=] {
+  SWndThreadState& state = SWndThreadState::Get();
+  const LRESULT result = SGuarded(state, RefusalOf(message), [&] {
     SWnd* object = SWnd::FromHandlePermanent(window);
     if (object == nullptr) return ::DefWindowProcW(window, message, wParam, lParam);
-    const CurrentMessage current(SWndThreadState::Get(), {window, message, wParam, lParam});
+    const CurrentMessage current(state, {window, message, wParam, lParam});
     if (message == WM_INITDIALOG && object->IsKindOf(&SDlg::classSDlg)) {
       return static_cast<SDlg*>(object)->HandleInitDialog(wParam, lParam);
     }
     return object->WindowProc(message, wParam, lParam);
   });
-  SCrossThreadSend::Deliver(window, message, wParam, lParam);
+  if (state.HasException()) [[unlikely]]
+    SCrossThreadSend::Deliver(window, message, wParam, lParam);
   return result;
 }
 
@@ -91,6 +94,8 @@ LRESULT SWnd::Default() {
 }
 
 LRESULT SWnd::SendMessageW(UINT message, WPARAM wParam, LPARAM lParam) const {
+  if (platform::IsOwnWindow(m_hWnd)) [[likely]]
+    return SSent(::SendMessageW(m_hWnd, message, wParam, lParam));
   const SCrossThreadSend send(m_hWnd, message, wParam, lParam);
   const LRESULT result = ::SendMessageW(m_hWnd, message, wParam, lParam);
   send.ThrowException();

@@ -19,7 +19,7 @@ Dialog* FindDialog(HWND window);
 HWND FindItemById(HWND dialog, UINT id);  // the first child with the number; null without
 void FreeDialog(Window* window);
 
-// Makes a window a dialog, if it is none yet. Without the lock; false when memory is out.
+// Makes a window a dialog, if it is not one yet. Without the lock; false when memory is out.
 bool MakeDialog(HWND window);
 
 // Gives the focus to a control of the dialog as a user's tab does: the text of an edit control is selected.

@@ -24,7 +24,7 @@ constexpr char kShiftedDigits[] = ")!@#$%^&*(";
 
 bool IsDown(const BYTE* keys, int key) { return keys[key] & 0x80; }
 
-// The character that a key makes; 0 for none.
+// The character that a key makes; 0 for a key that makes no character.
 WCHAR CharacterOf(WPARAM key, const BYTE* keys) {
   const bool shift = IsDown(keys, VK_SHIFT), control = IsDown(keys, VK_CONTROL);
   if (key >= 'A' && key <= 'Z') {
@@ -49,7 +49,7 @@ bool IsSystemKey(const Thread* thread, const MSG& message) {
 
 }  // namespace
 
-// To the window with the focus; without one to the active window, as a system key.
+// To the window with the focus; while no window has it, to the active window as a system key.
 bool RouteKey(MSG* message, bool) {
   Thread* thread = CurrentThread();
   const HWND focus = GetFocus(), active = GetActiveWindow();

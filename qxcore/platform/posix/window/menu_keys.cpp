@@ -27,7 +27,7 @@ int MenuLoop::FindMnemonic(WCHAR key) {
   return -1;
 }
 
-// Opens or chooses the item with the mnemonic; false without one.
+// Opens or chooses the item with the mnemonic; false when no item has it.
 bool MenuLoop::ChooseMnemonic(WCHAR key) {
   const int position = FindMnemonic(key);
   if (position < 0) return false;

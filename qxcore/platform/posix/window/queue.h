@@ -22,7 +22,7 @@ void Post(Thread* thread, HWND window, UINT message, WPARAM wParam, LPARAM lPara
 // Under the lock: forgets everything that waits for the window.
 void ForgetMessages(Thread* thread, HWND window);
 
-// Takes the next message of the thread, or looks at it; false when there is none. With the lock held; gives it
+// Takes the next message of the thread, or looks at it; false when no message waits. With the lock held; gives it
 // back while messages are sent. Throws std::bad_alloc.
 bool TakeMessage(Thread* thread, MSG* message, const Filter& filter, bool remove);
 // Waits until there may be a message. With the lock held.

@@ -14,14 +14,14 @@ namespace {
 
 Thread* g_threads = nullptr;  // all that have a queue
 
-[[gnu::tls_model("initial-exec")]] thread_local Thread* t_thread = nullptr;
+}  // namespace
+
+[[gnu::tls_model("initial-exec")]] constinit thread_local Thread* t_thread = nullptr;
 
 Thread* MakeThread() {
   thread_local Thread thread;
   return &thread;
 }
-
-}  // namespace
 
 Thread::Thread() : id(static_cast<DWORD>(syscall(SYS_gettid))) {
   const Guard guard;
@@ -46,8 +46,6 @@ Thread::~Thread() {
   *link = next;
   t_thread = nullptr;
 }
-
-Thread* CurrentThread() { return t_thread != nullptr ? t_thread : MakeThread(); }
 
 Thread* FindThread(DWORD id) {
   for (Thread* thread = g_threads; thread != nullptr; thread = thread->next)

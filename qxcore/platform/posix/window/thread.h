@@ -110,8 +110,11 @@ struct Thread {
   LPARAM messageExtra = 0;
 };
 
-// The calling thread's own. Never null.
-Thread* CurrentThread();
+// The calling thread's own. Never null. Constant-initialised, and placed where the loader puts it, so that reaching it
+// costs neither a guard nor a call.
+[[gnu::tls_model("initial-exec")]] extern constinit thread_local Thread* t_thread;
+Thread* MakeThread();
+inline Thread* CurrentThread() { return t_thread != nullptr ? t_thread : MakeThread(); }
 // Under the lock: the thread with this number; null without.
 Thread* FindThread(DWORD id);
 // Under the lock: lets the thread look at its queue again.

@@ -1,5 +1,6 @@
 #include "qxcore/platform/posix/window/tree.h"
 
+#include "qxcore/platform/internal/own_window.h"
 #include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/atom.h"
 #include "qxcore/platform/posix/window/paint.h"
@@ -187,6 +188,8 @@ bool Matches(const Window* window, ATOM className, LPCWSTR name) {
 
 }  // namespace
 
+bool platform::IsOwnWindow(HWND handle) noexcept { return FindOwnWindow(handle, CurrentThread()) != nullptr; }
+
 BOOL IsWindow(HWND handle) {
   if (FindOwnWindow(handle, CurrentThread()) != nullptr) return TRUE;
   const Guard guard;
@@ -281,10 +284,8 @@ BOOL EnumThreadWindows(DWORD thread, WNDENUMPROC callback, LPARAM data) {
   });
 }
 
-// The thread's own windows are found without the lock: every message that is sent asks this.
 DWORD GetWindowThreadProcessId(HWND handle, LPDWORD process) {
-  const Thread* thread = CurrentThread();
-  if (process == nullptr && FindOwnWindow(handle, thread) != nullptr) return thread->id;
+  CurrentThread();
   const Guard guard;
   const Window* window = Expect(handle);
   if (window == nullptr) return 0;

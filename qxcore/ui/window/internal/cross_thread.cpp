@@ -15,15 +15,12 @@ constinit SCrossThreadSend* g_sends = nullptr;
 SCrossThreadSend::SCrossThreadSend(HWND window, UINT message, WPARAM wParam, LPARAM lParam) noexcept
     : m_window(window), m_message(message), m_wParam(wParam), m_lParam(lParam) {
   m_receiver = ::GetWindowThreadProcessId(window, nullptr);
-  if (m_receiver == ::GetCurrentThreadId()) m_receiver = 0;
-  if (m_receiver == 0) return;
   const std::lock_guard lock(g_mutex);
   m_next = g_sends;
   g_sends = this;
 }
 
 SCrossThreadSend::~SCrossThreadSend() {
-  if (m_receiver == 0) return;
   const std::lock_guard lock(g_mutex);
   SCrossThreadSend** link = &g_sends;
   while (*link != this) link = &(*link)->m_next;
@@ -37,7 +34,6 @@ bool SCrossThreadSend::IsOf(HWND window, UINT message, WPARAM wParam, LPARAM lPa
 
 void SCrossThreadSend::Deliver(HWND window, UINT message, WPARAM wParam, LPARAM lParam) noexcept {
   SWndThreadState& state = SWndThreadState::Get();
-  if (!state.HasException()) return;
   const std::lock_guard lock(g_mutex);
   for (SCrossThreadSend* send = g_sends; send != nullptr; send = send->m_next) {
     if (send->IsOf(window, message, wParam, lParam, ::GetCurrentThreadId())) {

@@ -5,7 +5,7 @@
 
 #include "qxcore/platform/win32.h"
 
-// Stands around a sending call. The receiver finds it by the message; a send on the window's own thread needs none.
+// Stands around a call that sends to another thread. The receiver finds it by the message.
 class SCrossThreadSend {
  public:
   SCrossThreadSend(HWND window, UINT message, WPARAM wParam, LPARAM lParam) noexcept;
@@ -18,7 +18,7 @@ class SCrossThreadSend {
     if (m_exception != nullptr) std::rethrow_exception(m_exception);
   }
 
-  // On the receiver's thread, after the message was handled: hands an exception that its thread keeps to the
+  // On the receiver's thread, after the message was handled: hands the exception that its thread keeps to the
   // sender of this message, when that is another thread.
   static void Deliver(HWND window, UINT message, WPARAM wParam, LPARAM lParam) noexcept;
 
@@ -29,7 +29,7 @@ class SCrossThreadSend {
   UINT m_message;
   WPARAM m_wParam;
   LPARAM m_lParam;
-  DWORD m_receiver;  // the thread of the window; 0 when that is the sender
+  DWORD m_receiver;  // the thread of the window; 0 for an unknown window
   std::exception_ptr m_exception;
   SCrossThreadSend* m_next = nullptr;
 };

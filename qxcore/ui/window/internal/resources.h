@@ -4,9 +4,9 @@
 
 #include "qxcore/platform/win32.h"
 
-// The resource's bytes in the published binary layout; null when there is none of this name.
+// The resource's bytes in the published binary layout; null when neither has this name.
 const void* SFindResource(LPCWSTR name, LPCWSTR type);
-// A menu that the caller owns; null when there is none of this name.
+// A menu that the caller owns; null when neither has this name.
 HMENU SLoadMenu(LPCWSTR name);
-// An accelerator table that the caller owns; null when there is none of this name.
+// An accelerator table that the caller owns; null when neither has this name.
 HACCEL SLoadAccelerators(LPCWSTR name);
