@@ -41,7 +41,7 @@ class QXCORE_API SMetafileDC : public SDC {
 class QXCORE_API SEnhMetafileDC : public SDC {
   QXCORE_DECLARE_CREATABLE_CLASS(SEnhMetafileDC)
 
-  // With a frame in 0.01 mm, or, for null, without one.
+  // With a frame in 0.01 mm; null leaves the frame out.
   explicit SEnhMetafileDC(const RECT* frame = nullptr) {
     Attach(::CreateEnhMetaFileW(nullptr, nullptr, frame, nullptr));
   }

@@ -59,7 +59,7 @@ class QXCORE_API SAccessible {
 
   // The child at a point of the screen: 0 for the window itself, -1 outside of it.
   int ChildAt(const POINT& point) const;
-  // The child that has the keyboard: 0 for the window itself, -1 for none.
+  // The child that has the keyboard: 0 for the window itself, -1 when it is elsewhere.
   int GetFocusedChild() const;
 
  protected:

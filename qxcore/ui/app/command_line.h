@@ -31,7 +31,7 @@ class QXCORE_API SCommandLine {
 
   // True when the switch is there, with or without a value.
   bool HasSwitch(LPCWSTR name) const;
-  // The value of the switch's last occurrence; empty without one.
+  // The value of the switch's last occurrence; empty when the switch is missing or has no value.
   SString GetSwitchValue(LPCWSTR name) const;
 
  private:

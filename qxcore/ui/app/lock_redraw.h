@@ -27,6 +27,6 @@ class QXCORE_API SLockRedraw {
   static int LockCount(SWnd* window);
 
  private:
-  HWND m_window = nullptr;  // the locked window; null for none
+  HWND m_window = nullptr;  // null while nothing is locked
   int m_redraw = 1;
 };

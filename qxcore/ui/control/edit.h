@@ -32,6 +32,6 @@ class QXCORE_API SEdit : public SWnd {
   void Paste();                                    // replaces it by the clipboard's text
   void Clear();                                    // deletes the selection
   int GetLineCount() const;                        // at least 1
-  WCHAR GetPasswordChar() const;                   // 0 for none
+  WCHAR GetPasswordChar() const;                   // 0 while the text is shown as it is
   void SetPasswordChar(WCHAR character);           // shows it in place of every character
 };

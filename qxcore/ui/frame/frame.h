@@ -24,7 +24,7 @@ class QXCORE_API SFrameWnd : public SWnd {
 
   // --- virtual functions; they continue the list of SWnd ---
 
-  // Loads the accelerators of the frame from the resources; 0 when there are none of this name.
+  // Loads the accelerators of the frame from the resources; 0 when the resources have none of this name.
   virtual int LoadAccelTable(LPCWSTR name);
   // The frame that is active; here this one.
   virtual SFrameWnd* GetActiveFrame();
@@ -39,8 +39,8 @@ class QXCORE_API SFrameWnd : public SWnd {
 
   using SWnd::Create;
   // Creates the frame. A null class name is the framework's own class; `rect` may be m_rcDefault; the menu is loaded
-  // by name from the resources, null for none. Returns nonzero on success; else PostNcDestroy has been called, which
-  // deletes the object.
+  // by name from the resources; with a null name the frame has no menu. Returns nonzero on success; else PostNcDestroy
+  // has been called, which deletes the object.
   int Create(LPCWSTR className, LPCWSTR title, DWORD style = WS_OVERLAPPEDWINDOW, const SRect& rect = m_rcDefault,
              SWnd* parent = nullptr, LPCWSTR menuName = nullptr, DWORD exStyle = 0, SCreateContext* context = nullptr);
   // Makes a view of the context's class as a child; null on failure. The first view becomes the active one.
@@ -48,7 +48,7 @@ class QXCORE_API SFrameWnd : public SWnd {
   // The work of OnCreate: -1 ends the creation.
   int OnCreateHelper(CREATESTRUCTW* create, SCreateContext* context);
 
-  SView* GetActiveView() const { return m_activeView; }  // null for none
+  SView* GetActiveView() const { return m_activeView; }  // null while no view is active
   // Makes a view of this frame, or null, the active one; with `notify` both views are told.
   void SetActiveView(SView* view, int notify = 1);
   // Takes over an accelerator table instead of loading one; the former one is destroyed.

@@ -11,7 +11,7 @@ namespace {
 
 constexpr long kNoLimit = 0x7FFFFFFE;
 
-// The window that the hidden control is a child of: the owner window, or where there is none, the dummy window.
+// The window that the hidden control is a child of: the owner window, or in a program without one the dummy window.
 HWND ParentOfHidden() {
   const HWND owner = SGetOwnerWnd()->GetSafeHwnd();
   return owner != nullptr ? owner : SDummyWindow()->GetSafeHwnd();

@@ -7,7 +7,7 @@
 
 namespace rtf {
 
-// The first group whose destination has that key (see RtfKey), braces included; empty when there is none.
+// The first group whose destination has that key (see RtfKey), braces included; empty when no group has it.
 SStringView FindGroup(SStringView text, std::uint64_t key);
 
 // The header, from the text's first character; empty when the text is no RTF. `fallback` is set to the number of

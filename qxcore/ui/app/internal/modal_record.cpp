@@ -22,7 +22,7 @@ static STableDumb<HWND> EnabledTopLevelWindows() {
   return windows;
 }
 
-// The entry comes first, so that a window is never disabled without one.
+// The entry comes first, so that every window that was disabled stands in the record.
 void SModalRecord::Disable(HWND window) {
   SWnd* object = SWnd::FromHandlePermanent(window);
   if (object != nullptr && !object->OnModalDisable(1)) return;

@@ -3,5 +3,5 @@
 
 #include "qxcore/string/string.h"
 
-// The caption of the box; empty when there is none.
+// The caption of the box; empty for a box without a caption.
 SString SDialogTemplateCaption(const void* dialogTemplate);
