@@ -6,8 +6,10 @@
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/stream/encoding/multi_format_reader_unicode.h"
 #include "qxcore/stream/input_buffer.h"
+#include "qxcore/stream/input_file.h"
 #include "tests/stream/reader_fixture.h"
 #include "tests/support/steps.h"
+#include "tests/support/temp_folder.h"
 #include "tests/support/wine.h"
 
 namespace {
@@ -270,6 +272,51 @@ TEST(LongInputs, AreLookedAtWholeWithoutBeingKept) {
     EXPECT_EQ(second.Skip(length), length);
     EXPECT_EQ(second.ReadAll(), ReadBytes(tail, second.GetFormat() & Support::kValueMask).text);
     EXPECT_LT(second.Held(), 64ul << 20);
+  }
+}
+
+std::string Repeated(const std::string& unit, std::size_t size) {
+  std::string bytes;
+  for (bytes.reserve(size + unit.size()); bytes.size() < size;) bytes += unit;
+  return bytes;
+}
+
+// Zero bytes are judged over all of the text, wherever the pieces are cut in which it is looked at.
+TEST(LongInputs, ZeroBytesBehindTheBeginning_MakeNo16BitText) {
+  constexpr std::size_t kMega = 1u << 20;
+  const struct {
+    const char* line;
+    Encoding expected;
+  } kTexts[] = {{"plain text, and more of it\n", Support::kASCII},
+                {"caf\xC3\xA9 au lait, \xE2\x82\xAC 4\n", Support::kUTF8},
+                {"caf\xE9 au lait, \xA3 4 all in one byte each\n", kAnsi}};
+  const test::TempFolder folder;
+  const test::Text path = folder.File(WTEXT("zeros.txt"));
+  for (const auto& one : kTexts) {
+    std::string run = Repeated(one.line, 24 * kMega), few = run;
+    if (run.size() % 2 != 0) run += '\n', few += '\n';
+    // The beginnings of pieces lie in the run; the few are at even and at odd offsets.
+    const std::size_t from = run.find('\n', 15 * kMega);
+    std::fill_n(run.begin() + static_cast<std::ptrdiff_t>(from), run.find('\n', 21 * kMega) - from, '\0');
+    for (std::size_t mega = 17; mega < 24; ++mega) {
+      std::size_t at = few.find('\n', mega * kMega);
+      while (at % 2 != mega % 2) at = few.find('\n', at + 1);
+      few[at] = '\0';
+    }
+    for (const std::string* bytes : {&run, &few}) {
+      test::WriteAll(path, *bytes);
+      for (Encoding policy : {kGuess, kGuess | Support::kFullUnicode}) {
+        SInputFile file(SString(path.c_str()));
+        OpenReader fromFile(file, kAnsi | kFull | policy);
+        fromFile.CheckFormat();
+        EXPECT_EQ(fromFile.GetFormat() & Support::kValueMask, one.expected) << one.line << (bytes == &few);
+        EXPECT_LT(fromFile.Held(), 20 * kMega) << "it was kept";
+        PiecewiseInput stream(*bytes);
+        OpenReader fromStream(stream, kAnsi | kFull | policy);
+        fromStream.CheckFormat();
+        EXPECT_EQ(fromStream.GetFormat() & Support::kValueMask, one.expected) << one.line << (bytes == &few);
+      }
+    }
   }
 }
 

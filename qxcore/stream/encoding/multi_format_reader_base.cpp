@@ -34,6 +34,18 @@ bool Detects(Encoding requested) {
   return (level & Support::kWholeInOnce) != 0 || level == Support::kQuickDetect || level == Support::kDetect;
 }
 
+// While it lives, the samples that are scored lie behind others.
+class Behind {
+ public:
+  explicit Behind(SReaderState& state) : m_state(state) { m_state.samplePlace = SSamplePlace::kBehind; }
+  Behind(const Behind&) = delete;
+  Behind& operator=(const Behind&) = delete;
+  ~Behind() { m_state.samplePlace = SSamplePlace::kBeginning; }
+
+ private:
+  SReaderState& m_state;
+};
+
 }  // namespace
 
 // Lets derived readers score and choose.
@@ -45,6 +57,12 @@ class SMultiFormatReaderBase::Scorer final : public SFormatScorer {
                        unsigned short codePage) override {
     return m_reader.DataAffinity(begin, end, counters.ascii, counters.utf8, counters.active, counters.utf16,
                                  counters.littleZeros, counters.bigZeros, counters.specified, codePage);
+  }
+
+  void ScorePiece(const unsigned char* begin, const unsigned char* end, SDetectionCounters& counters,
+                  unsigned short codePage) override {
+    const Behind others(*m_reader.m_state);
+    ScoreSample(begin, end, counters, codePage);
   }
 
   bool ScoreRest(SDetectionCounters& counters, unsigned short codePage) override {
@@ -220,7 +238,7 @@ Encoding Reader::DataAffinity(const unsigned char* begin, const unsigned char* e
                               std::int32_t& bigZeros, std::int32_t& specified, unsigned short codePage) {
   SDetectionCounters counters{ascii, utf8, active, utf16, littleZeros, bigZeros, specified};
   const auto rules = (m_requested & Support::kFullUnicode) != 0 ? SUnicodeRules::kFull : SUnicodeRules::kBasic;
-  const Encoding settled = SScanAffinity(begin, end, counters, codePage, rules);
+  const Encoding settled = SScanAffinity(begin, end, counters, codePage, rules, m_state->samplePlace);
   ascii = counters.ascii;
   utf8 = counters.utf8;
   active = counters.active;
@@ -265,7 +283,8 @@ void Reader::ScorePieces(const unsigned char* begin, SDetectionCounters& counter
   unsigned long held = static_cast<unsigned long>(m_raw.end - begin);
   std::memcpy(start, begin, held);
   std::uint64_t total = static_cast<std::uint64_t>(begin - m_raw.start);
-  SAffinitySum sum(counters);
+  SAffinitySum sum(counters, begin - m_raw.start);
+  const Behind others(*m_state);
   for (bool isLast = false; !isLast;) {
     while (held < kPiece && !isLast) {
       const unsigned long got = ReadRawData(start + held, kPiece - held);
@@ -276,7 +295,7 @@ void Reader::ScorePieces(const unsigned char* begin, SDetectionCounters& counter
     SDetectionCounters fresh = sum.Fresh();
     DataAffinity(start, end, fresh.ascii, fresh.utf8, fresh.active, fresh.utf16, fresh.littleZeros, fresh.bigZeros,
                  fresh.specified, codePage);
-    sum.Add(fresh);
+    sum.Add(fresh, end - start);
     total += static_cast<std::uint64_t>(end - start);
     held -= static_cast<unsigned long>(end - start);
     std::memmove(start, end, held);
@@ -284,7 +303,7 @@ void Reader::ScorePieces(const unsigned char* begin, SDetectionCounters& counter
   if (total % 2 != 0) {  // odd lengths are no 16-bit text
     SDetectionCounters rejected = sum.Fresh();
     rejected.utf16 = rejected.littleZeros = rejected.bigZeros = SDetectionCounters::kRejected;
-    sum.Add(rejected);
+    sum.Add(rejected, 0);
   }
   counters = sum.Total();
 }

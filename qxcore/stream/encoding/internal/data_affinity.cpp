@@ -22,6 +22,13 @@ void Add(std::int32_t& counter, std::int64_t amount) {
   counter = static_cast<std::int32_t>(std::clamp<std::int64_t>(counter + amount, INT_MIN, INT_MAX));
 }
 
+// Zeros of both orders are evidence only when one of them clearly prevails among `size` bytes.
+void DropUnclearZeros(std::int64_t& little, std::int64_t& big, std::int64_t size) {
+  if (little <= 0 || big <= 0) return;
+  const bool isClear = std::max(little, big) >= size >> 2 && std::min(little, big) <= size >> 5;
+  if (!isClear) little = big = 0;
+}
+
 // Moves over bytes that say nothing: 0x01 to 0x7F.
 const unsigned char* SkipPlain(const unsigned char* at, const unsigned char* end) {
 #ifdef __SSE2__
@@ -77,10 +84,7 @@ class Walk {
     }
     std::int64_t little = m_zeros[1];
     std::int64_t big = m_zeros[0];
-    if (little > 0 && big > 0) {
-      bool isClear = std::max(little, big) >= m_walked >> 2 && std::min(little, big) <= m_walked >> 5;
-      if (!isClear) little = big = 0;
-    }
+    DropUnclearZeros(little, big, m_walked);
     Add(counters.littleZeros, little);
     Add(counters.bigZeros, big);
   }
@@ -235,11 +239,11 @@ void TestPage(std::int32_t& counter, unsigned page, std::int32_t ascii, const un
   }
 }
 
-// The platform's own opinion on 16-bit text.
+// The platform's own opinion on 16-bit text. Its tests for illegal characters and NULs decide nothing here, and
+// would read all of the sample once more.
 Support::Encoding TestUtf16(Counters& counters, const unsigned char* begin, const unsigned char* end) {
   int verdict = IS_TEXT_UNICODE_ASCII16 | IS_TEXT_UNICODE_STATISTICS | IS_TEXT_UNICODE_CONTROLS |
-                IS_TEXT_UNICODE_REVERSE_ASCII16 | IS_TEXT_UNICODE_REVERSE_STATISTICS |
-                IS_TEXT_UNICODE_REVERSE_CONTROLS | IS_TEXT_UNICODE_ILLEGAL_CHARS | IS_TEXT_UNICODE_NULL_BYTES;
+                IS_TEXT_UNICODE_REVERSE_ASCII16 | IS_TEXT_UNICODE_REVERSE_STATISTICS | IS_TEXT_UNICODE_REVERSE_CONTROLS;
   IsTextUnicode(begin, static_cast<int>(end - begin), &verdict);
 
   counters.utf16 = std::max(counters.littleZeros, counters.bigZeros);
@@ -299,7 +303,7 @@ Support::Encoding TestPlainUtf16(Counters& counters, const unsigned char* begin,
 }  // namespace
 
 Support::Encoding SScanAffinity(const unsigned char* begin, const unsigned char* end, Counters& counters,
-                                unsigned int codePage, SUnicodeRules rules) {
+                                unsigned int codePage, SUnicodeRules rules, SSamplePlace place) {
   if (begin == end) return 0;
   Walk walk(begin, end, counters, rules);
   walk.Run();
@@ -312,6 +316,10 @@ Support::Encoding SScanAffinity(const unsigned char* begin, const unsigned char*
     if (counters.utf8 >= 0) Add(counters.utf8, -static_cast<std::int64_t>(counters.ascii));
   }
   if (counters.utf16 < 0) return 0;
+  if (place == SSamplePlace::kBehind) {
+    counters.utf16 = std::max(counters.littleZeros, counters.bigZeros);
+    return 0;
+  }
   if (rules == SUnicodeRules::kFull && counters.ascii == 0 && walk.SawZeros()) {
     if (Support::Encoding settled = TestPlainUtf16(counters, begin, end)) return settled;
   }
@@ -335,8 +343,9 @@ static constexpr std::int32_t Counters::*kMembers[] = {&Counters::ascii,    &Cou
                                                        &Counters::utf16,    &Counters::littleZeros, &Counters::bigZeros,
                                                        &Counters::specified};
 static constexpr int kAscii = 0;  // its negative values are evidence, not a rejection
+static constexpr int kUtf16 = 3, kLittleZeros = 4, kBigZeros = 5;
 
-SAffinitySum::SAffinitySum(const Counters& first) {
+SAffinitySum::SAffinitySum(const Counters& first, std::int64_t size) : m_size(size) {
   for (int i = 0; i < kCounters; ++i) m_sums[i] = first.*kMembers[i];
 }
 
@@ -346,7 +355,8 @@ Counters SAffinitySum::Fresh() const {
   return fresh;
 }
 
-void SAffinitySum::Add(const Counters& sample) {
+void SAffinitySum::Add(const Counters& sample, std::int64_t size) {
+  m_size += size;
   for (int i = 0; i < kCounters; ++i) {
     const std::int32_t value = sample.*kMembers[i];
     if (i == kAscii || (m_sums[i] >= 0 && value >= 0)) {
@@ -358,14 +368,21 @@ void SAffinitySum::Add(const Counters& sample) {
 }
 
 Counters SAffinitySum::Total() const {
-  std::int64_t largest = -m_sums[kAscii];
-  for (std::int64_t sum : m_sums) largest = std::max(largest, sum);
+  std::int64_t sums[kCounters];
+  std::copy(std::begin(m_sums), std::end(m_sums), sums);
+  // The platform's verdict on the beginning stands, whatever zeros follow.
+  if (sums[kUtf16] >= 0 && sums[kUtf16] < Counters::kControls) {
+    DropUnclearZeros(sums[kLittleZeros], sums[kBigZeros], m_size);
+    sums[kUtf16] = std::max(sums[kLittleZeros], sums[kBigZeros]);
+  }
+  std::int64_t largest = -sums[kAscii];
+  for (std::int64_t sum : sums) largest = std::max(largest, sum);
   int shift = 0;
   while (largest >> shift > INT_MAX) ++shift;
   Counters total;
   for (int i = 0; i < kCounters; ++i) {
     // What was found at all stays found, and rejected stays rejected.
-    const std::int64_t sum = m_sums[i], scaled = (sum < 0 ? -sum : sum) >> shift;
+    const std::int64_t sum = sums[i], scaled = (sum < 0 ? -sum : sum) >> shift;
     const std::int64_t kept = sum != 0 && scaled == 0 ? 1 : scaled;
     total.*kMembers[i] = static_cast<std::int32_t>(sum < 0 ? -kept : kept);
   }

@@ -156,13 +156,13 @@ class Check {
   // What lies in memory beyond the longest sample.
   void ScoreBehind(const unsigned char* at, unsigned short page) {
     constexpr unsigned long kPiece = 0x40000000;
-    SAffinitySum sum(m_choice.counters);
+    SAffinitySum sum(m_choice.counters, kLongestSample);
     while (at != m_sample.end) {
       const unsigned char* end = at + std::min(static_cast<unsigned long>(m_sample.end - at), kPiece);
       if (end != m_sample.end) end = SEndOfPiece(at, end);
       Counters piece = sum.Fresh();
-      m_scorer.ScoreSample(at, end, piece, page);
-      sum.Add(piece);
+      m_scorer.ScorePiece(at, end, piece, page);
+      sum.Add(piece, end - at);
       at = end;
     }
     m_choice.counters = sum.Total();

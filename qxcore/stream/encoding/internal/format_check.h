@@ -54,6 +54,9 @@ class SFormatScorer {
   // Scores a sample; an encoding when that settles it, else 0.
   virtual Encoding ScoreSample(const unsigned char* begin, const unsigned char* end, SDetectionCounters& counters,
                                unsigned short codePage) = 0;
+  // Adds the evidence of a piece that others precede, with counters of its own.
+  virtual void ScorePiece(const unsigned char* begin, const unsigned char* end, SDetectionCounters& counters,
+                          unsigned short codePage) = 0;
   // Scores what follows the sample, where it can be looked at without keeping it; true when that was up to
   // the end of the input.
   virtual bool ScoreRest(SDetectionCounters& counters, unsigned short codePage) = 0;

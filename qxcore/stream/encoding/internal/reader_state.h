@@ -4,6 +4,7 @@
 #include <cstdint>
 
 #include "qxcore/core/memory.h"
+#include "qxcore/stream/encoding/internal/data_affinity.h"
 #include "qxcore/stream/encoding/internal/format_check.h"
 #include "qxcore/stream/encoding/internal/raw_input.h"
 #include "qxcore/stream/encoding/internal/text_decoder.h"
@@ -20,6 +21,7 @@ struct SReaderState {
   STextDecoder decoder;     // of the selected encoding; counts the losses
   SEncodingGuess guess;     // what the library's own GuessEncoding made of the evidence last
   bool isComplete = false;  // the evidence is that of the whole input
+  SSamplePlace samplePlace = SSamplePlace::kBeginning;  // of the sample that is scored
 
   // Where a lossless decoder that needs the whole input met what it cannot map: it keeps a state, and so cannot be
   // asked again from there.
