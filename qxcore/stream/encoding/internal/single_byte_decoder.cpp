@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "qxcore/platform/internal/processor.h"
 #include "qxcore/platform/internal/widen.h"
 
 #if defined(__x86_64__) || defined(__i386__)
@@ -9,10 +10,6 @@
 
 // The upper half of the table lies in four registers; 32 bytes at a time are looked up in all of them.
 #define QXCORE_TARGET __attribute__((target("avx512f,avx512bw,avx512vl")))
-
-static bool CanUseAvx512() {
-  return __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512bw") && __builtin_cpu_supports("avx512vl");
-}
 
 QXCORE_TARGET static SSingleByteRun DecodeBlocks(const WCHAR* table, WCHAR none, const unsigned char* in,
                                                  const unsigned char* end, WCHAR* out) {
@@ -44,7 +41,7 @@ QXCORE_TARGET static SSingleByteRun DecodeBlocks(const WCHAR* table, WCHAR none,
 SSingleByteRun SDecodeSingleByte(const WCHAR* table, WCHAR none, bool keepsASCII, const unsigned char* in,
                                  const unsigned char* end, WCHAR* out) {
 #if defined(__x86_64__) || defined(__i386__)
-  static const bool usesAvx512 = CanUseAvx512();
+  static const bool usesAvx512 = platform::CanUse(platform::Instructions::kAvx512);
   if (usesAvx512 && keepsASCII) {
     SSingleByteRun run = DecodeBlocks(table, none, in, end, out);
     in = run.in;

@@ -1,5 +1,7 @@
 #include "qxcore/stream/encoding/internal/utf8_blocks.h"
 
+#include "qxcore/platform/internal/processor.h"
+
 #if defined(__x86_64__) || defined(__i386__)
 #include <immintrin.h>
 #endif
@@ -67,11 +69,6 @@ const unsigned char* WalkPlain(const unsigned char* at, const unsigned char* end
 #if defined(__x86_64__) || defined(__i386__)
 #define QXCORE_TARGET __attribute__((target("avx512f,avx512bw,avx512vl,popcnt,bmi,bmi2")))
 
-bool CanUseAvx512() {
-  return __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512bw") &&
-         __builtin_cpu_supports("avx512vl") && __builtin_cpu_supports("popcnt") && __builtin_cpu_supports("bmi2");
-}
-
 template <bool kFull>
 QXCORE_TARGET const unsigned char* WalkAvx512(const unsigned char* at, const unsigned char* end, SUtf8BlockWalk& walked,
                                               SUtf8BlockCounts& counted) {
@@ -119,7 +116,7 @@ QXCORE_TARGET const unsigned char* WalkAvx512(const unsigned char* at, const uns
 const unsigned char* SWalkUtf8Blocks(const unsigned char* at, const unsigned char* end, bool full, SUtf8BlockWalk& walk,
                                      SUtf8BlockCounts& counts) {
 #if defined(__x86_64__) || defined(__i386__)
-  static const bool usesAvx512 = CanUseAvx512();
+  static const bool usesAvx512 = platform::CanUse(platform::Instructions::kAvx512);
   if (usesAvx512) return full ? WalkAvx512<true>(at, end, walk, counts) : WalkAvx512<false>(at, end, walk, counts);
 #endif
 #ifdef __SSE2__

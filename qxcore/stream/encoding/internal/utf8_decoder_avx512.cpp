@@ -11,12 +11,10 @@
 
 #include <cstdint>
 
+#include "qxcore/platform/internal/processor.h"
 #include "qxcore/platform/internal/utf.h"
 
-bool SCanDecodeUtf8Avx512() {
-  return __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512bw") &&
-         __builtin_cpu_supports("avx512vl") && __builtin_cpu_supports("avx512vbmi2");
-}
+bool SCanDecodeUtf8Avx512() { return platform::CanUse(platform::Instructions::kAvx512Vbmi); }
 
 #define QXCORE_TARGET __attribute__((target("avx512f,avx512bw,avx512vl,avx512vbmi2,bmi2,popcnt")))
 
