@@ -413,7 +413,9 @@ class QXCORE_API SString {
   int CompareBy(int start, const WCHAR* text, Order order) const;
 
   // Buffers: string_memory.cpp.
-  static WCHAR* AllocBuffer(int n);  // count 1, length n, terminated
+  static WCHAR* AllocBuffer(int n);              // count 1, length n, terminated
+  static bool IsLarge(const SStringData* data);  // of the heap, not of a pool
+  void GrowLarge(int n);                         // room for n characters in a large buffer that nobody shares
   static void FreeData(SStringData* data) noexcept;
 
   WCHAR* m_text;

@@ -1,6 +1,7 @@
 #include "qxcore/string/string_buffer.h"
 
 #include <algorithm>
+#include <functional>
 
 #include "qxcore/core/exception.h"
 #include "qxcore/platform/wide.h"
@@ -57,12 +58,22 @@ void SStringBuffer::AppendGrown(const WCHAR* text, std::ptrdiff_t count) {
   int capacity = isFirst ? static_cast<int>(std::min(m_capacity, 0x7FFFFFFFu)) : m_text.GetAllocLength();
   while (capacity < length + n) capacity = Grown(capacity, m_numerator, m_denominator);
 
+  if (m_text.Data()->m_refs == 1 && SString::IsLarge(m_text.Data())) return AppendResized(text, n, capacity);
   SString room(SString::Adopt{}, SString::AllocBuffer(capacity));
   std::copy_n(m_text.GetSafePointer(), length, room.m_text);
   std::copy_n(text, n, room.m_text + length);
   room.m_text[length + n] = 0;
   room.Data()->m_length = length + n;
   m_text.Swap(room);
+}
+
+// In the same buffer, made larger: the system moves a large one without copying it.
+void SStringBuffer::AppendResized(const WCHAR* text, int n, int capacity) {
+  const SStringView content = m_text.View();
+  const bool isOwn = !std::less<>()(text, content.data()) && std::less<>()(text, content.data() + content.size());
+  const std::ptrdiff_t from = isOwn ? text - content.data() : 0;
+  m_text.GrowLarge(capacity);
+  SString::AppendInPlace(m_text.Data(), n, isOwn ? m_text.m_text + from : text);
 }
 
 SStringBuffer& SStringBuffer::operator+=(char character) {

@@ -75,6 +75,7 @@ class QXCORE_API SStringBuffer {
     }
   }
   void AppendGrown(const WCHAR* text, std::ptrdiff_t n);
+  void AppendResized(const WCHAR* text, int n, int capacity);
 
   SString m_text;  // its allocated length is the capacity
   std::uint32_t m_capacity;

@@ -71,9 +71,13 @@ SStringData* AllocPooled(int length, int& allocLength) {
   }
 }
 
-SStringData* AllocLarge(int length, int& allocLength) {
+int LargeAllocLength(int length) {
   if (length > kLongest) throw SEOutOfMemory();
-  allocLength = (length + kLargeStep - 1) / kLargeStep * kLargeStep;
+  return (length + kLargeStep - 1) / kLargeStep * kLargeStep;
+}
+
+SStringData* AllocLarge(int length, int& allocLength) {
+  allocLength = LargeAllocLength(length);
   std::size_t bytes = BufferBytes(allocLength);
   void* block = SMemTryAlloc(bytes);
   if (block == nullptr) {
@@ -99,9 +103,26 @@ WCHAR* SString::AllocBuffer(int n) {
   return text;
 }
 
+bool SString::IsLarge(const SStringData* data) { return data->m_allocLength > kLargestClass; }
+
+void SString::GrowLarge(int n) {
+  SStringData* data = Data();
+  const int allocLength = LargeAllocLength(n);
+  const std::size_t before = BufferBytes(data->m_allocLength), bytes = BufferBytes(allocLength);
+  try {
+    data = static_cast<SStringData*>(SMemRealloc(data, bytes));
+  } catch (const SEOutOfMemory&) {
+    FreeUnused();
+    data = static_cast<SStringData*>(SMemRealloc(data, bytes));
+  }
+  g_largeBytes += static_cast<long>(bytes) - static_cast<long>(before);
+  data->m_allocLength = allocLength;
+  m_text = data->Text();
+}
+
 void SString::FreeData(SStringData* data) noexcept {
   if (data == nullptr || data->m_refs == SStringData::kStatic) return;
-  if (data->m_allocLength <= kLargestClass) {
+  if (!IsLarge(data)) {
     g_pools[PoolOf(data->m_allocLength)]->Free(data);
     return;
   }

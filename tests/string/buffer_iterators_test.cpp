@@ -79,6 +79,29 @@ TEST(StringBuffer, RandomAppends_AgreeWithPlainString) {
   }
 }
 
+// Large buffers grow where they are; what is appended may lie in them.
+TEST(StringBuffer, LargeContent_AppendsPartsOfItself) {
+  const long before = SString::GetLargeBufferBytes();
+  {
+    RandomText random(23);
+    SStringBuffer buffer(100);
+    WideString expected = random.Make(90, WTEXT("abc"));
+    buffer += SStringView(expected);
+    while (expected.size() < 2'000'000) {
+      const int from = random.Number(static_cast<int>(expected.size()));
+      const int n = 1 + random.Number(static_cast<int>(expected.size()) - from);
+      const WCHAR* text = buffer.View().data() + from;
+      buffer.Concat(text, text + n);
+      expected += expected.substr(static_cast<std::size_t>(from), static_cast<std::size_t>(n));
+      ASSERT_TRUE(buffer.View() == expected) << expected.size();
+      ASSERT_EQ(buffer.View().data()[buffer.Length()], 0) << "it ends with a NUL";
+    }
+    EXPECT_GE(SString::GetLargeBufferBytes() - before, 2 * buffer.GetCapacity());
+    EXPECT_LE(SString::GetLargeBufferBytes() - before, 2 * buffer.GetCapacity() + 100);
+  }
+  EXPECT_EQ(SString::GetLargeBufferBytes(), before);
+}
+
 TEST(StringBuffer, FailedGrowth_KeepsTheContent) {
   SStringBuffer buffer(3000, 5, 3);
   buffer += SString(SStringView(WideString(2999, WTEXT('a'))));
