@@ -74,17 +74,29 @@ class Blocks {
 };
 
 // False when there is no memory; the block then stays as it was.
+bool Reserve(Block& block, SIZE_T capacity) {
+  void* data = std::realloc(block.data, capacity);
+  if (data == nullptr) return false;
+  block.data = data;
+  block.capacity = capacity;
+  return true;
+}
+
+// The same. What grows once will grow again: programs add a little at a time.
 bool Resize(Block& block, SIZE_T size, bool zero) {
   if (size == 0) {
     std::free(block.data);
     block.data = nullptr;
-  } else {
-    void* data = std::realloc(block.data, size);
-    if (data == nullptr) return false;
-    if (zero && size > block.size) std::memset(static_cast<char*>(data) + block.size, 0, size - block.size);
-    block.data = data;
+    block.capacity = 0;
+  } else if (size > block.capacity) {
+    const SIZE_T spare = block.capacity / 4;
+    if (!(size < block.capacity + spare && Reserve(block, block.capacity + spare)) && !Reserve(block, size))
+      return false;
+  } else if (size < block.size && !Reserve(block, size)) {
+    return false;
   }
-  block.size = block.capacity = size;
+  if (zero && size > block.size) std::memset(static_cast<char*>(block.data) + block.size, 0, size - block.size);
+  block.size = size;
   return true;
 }
 
