@@ -26,6 +26,13 @@ using test::WriteAll;
 constexpr bool kUnderWine = true;
 #else
 constexpr bool kUnderWine = false;
+
+std::string NativePath(const Text& path) {
+  std::string native = test::Narrow(path).substr(2);
+  for (char& c : native)
+    if (c == '\\') c = '/';
+  return native;
+}
 #endif
 
 constexpr DWORD kShareAll = FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE;
@@ -164,6 +171,38 @@ TEST(Files, Searching) {
   EXPECT_EQ(GetLastError(), DWORD(ERROR_INVALID_HANDLE));
 }
 
+// What the limit leaves out is neither a folder nor a link to one; it may leave out nothing.
+TEST(FindFiles, LimitedToFolders) {
+  TempFolder folder;
+  ASSERT_TRUE(CreateDirectoryW(folder.File(WTEXT("inner")).c_str(), nullptr));
+  WriteAll(folder.File(WTEXT("file")), "x");
+#ifndef _WIN32
+  const std::string native = NativePath(folder.Path());
+  ASSERT_EQ(symlink("inner", (native + "/linked").c_str()), 0);
+  ASSERT_EQ(mkfifo((native + "/pipe").c_str(), 0600), 0);
+#endif
+  const auto names = [&](FINDEX_SEARCH_OPS limit) {
+    std::set<Text> found;
+    WIN32_FIND_DATAW data;
+    const HANDLE search = FindFirstFileExW(folder.File(WTEXT("*")).c_str(), FindExInfoBasic, &data, limit, nullptr, 0);
+    for (BOOL more = search != INVALID_HANDLE_VALUE; more; more = FindNextFileW(search, &data))
+      if ((data.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) != 0 || limit != FindExSearchNameMatch)
+        found.insert(data.cFileName);
+    EXPECT_EQ(GetLastError(), DWORD(ERROR_NO_MORE_FILES));
+    FindClose(search);
+    return found;
+  };
+  const std::set<Text> folders = names(FindExSearchNameMatch);
+  std::set<Text> limited = names(FindExSearchLimitToDirectories);
+  EXPECT_EQ(folders.count(WTEXT("inner")), 1u);
+#ifdef _WIN32
+  limited.erase(WTEXT("file"));  // the limit is a hint
+#else
+  EXPECT_EQ(folders.count(WTEXT("linked")), 1u);
+#endif
+  EXPECT_EQ(limited, folders);
+}
+
 TEST(Files, CurrentDirectoryAndFullPaths) {
   TempFolder folder;
   WCHAR before[MAX_PATH], now[MAX_PATH], full[MAX_PATH];
@@ -202,13 +241,6 @@ TEST(Files, RuntimeStreams) {
 }
 
 #ifndef _WIN32
-
-std::string NativePath(const Text& path) {
-  std::string native = test::Narrow(path).substr(2);
-  for (char& c : native)
-    if (c == '\\') c = '/';
-  return native;
-}
 
 // Names that Windows cannot hold come mapped, and every one can be opened and renamed under its mapped name.
 TEST(FilesOnLinux, ForeignNamesMapBothWays) {

@@ -27,12 +27,12 @@ class FolderReader {
   ~FolderReader() { close(m_descriptor); }
 
   int Descriptor() const { return m_descriptor; }
-  // The next name, valid until the next call; null at the end and, with errno, on failure.
-  const char* Next() {
+  // The next entry, valid until the next call; null at the end and, with errno, on failure.
+  const dirent64* Next() {
     if (m_at == m_end && !Fill()) return nullptr;
     const auto* entry = reinterpret_cast<const dirent64*>(m_buffer + m_at);
     m_at += entry->d_reclen;
-    return entry->d_name;
+    return entry;
   }
 
  private:
@@ -50,23 +50,28 @@ class FolderReader {
   alignas(dirent64) char m_buffer[32768];
 };
 
+// Whether the listing alone says that this is neither a folder nor a link, which may lead to one.
+bool IsPlainFile(const dirent64& entry) {
+  return entry.d_type != DT_DIR && entry.d_type != DT_LNK && entry.d_type != DT_UNKNOWN;
+}
+
 class Search final : public HandleObject {
  public:
-  Search(int folder, std::u16string pattern, bool isRoot)
-      : m_entries(folder), m_pattern(std::move(pattern)), m_isRoot(isRoot) {}
+  Search(int folder, std::u16string pattern, bool isRoot, bool foldersOnly)
+      : m_entries(folder), m_pattern(std::move(pattern)), m_isRoot(isRoot), m_foldersOnly(foldersOnly) {}
 
   // The next entry that fits the pattern; otherwise the error, ERROR_NO_MORE_FILES at the end.
   DWORD Next(WIN32_FIND_DATAW& data) {
     for (;;) {
-      const char* entry = m_entries.Next();
+      const dirent64* const entry = m_entries.Next();
       if (entry == nullptr) return errno == 0 ? ERROR_NO_MORE_FILES : ErrorFromErrno(errno);
-      if (m_isRoot && IsDotName(entry)) continue;
-      const std::string_view native(entry);
+      if ((m_isRoot && IsDotName(entry->d_name)) || (m_foldersOnly && IsPlainFile(*entry))) continue;
+      const std::string_view native(entry->d_name);
       WCHAR name[NAME_MAX + 1];
       if (native.size() >= MAX_PATH || native.size() > NAME_MAX) continue;
       const std::size_t length = ToWindowsName(native, name);
       if (!MatchesWildcard(m_pattern, {name, length})) continue;
-      if (Describe(entry, {name, length}, data)) return ERROR_SUCCESS;
+      if (Describe(entry->d_name, {name, length}, data)) return ERROR_SUCCESS;
       // Gone between the two looks.
       if (errno != ENOENT) return ErrorFromErrno(errno);
     }
@@ -93,6 +98,7 @@ class Search final : public HandleObject {
   FolderReader m_entries;
   std::u16string m_pattern;
   bool m_isRoot;
+  bool m_foldersOnly;
 };
 
 HANDLE FailsWith(DWORD error) { return FailWith(error, INVALID_HANDLE_VALUE); }
@@ -126,7 +132,7 @@ int OpenFolder(std::u16string_view folder, bool& isRoot, DWORD& error) {
   return descriptor;
 }
 
-HANDLE StartSearch(LPCWSTR path, WIN32_FIND_DATAW* data) {
+HANDLE StartSearch(LPCWSTR path, WIN32_FIND_DATAW* data, bool foldersOnly) {
   Pattern pattern = SplitPattern(path);
   // "folder\." is the entry of the folder itself.
   const FullPath full(path);
@@ -138,7 +144,7 @@ HANDLE StartSearch(LPCWSTR path, WIN32_FIND_DATAW* data) {
   if (folder < 0) return FailsWith(error);
   std::shared_ptr<Search> search;
   try {
-    search = std::make_shared<Search>(folder, CompileWildcard(pattern.mask), isRoot);
+    search = std::make_shared<Search>(folder, CompileWildcard(pattern.mask), isRoot, foldersOnly);
   } catch (...) {
     close(folder);
     throw;
@@ -151,8 +157,16 @@ HANDLE StartSearch(LPCWSTR path, WIN32_FIND_DATAW* data) {
 }  // namespace
 
 HANDLE FindFirstFileW(LPCWSTR pattern, WIN32_FIND_DATAW* data) {
+  return FindFirstFileExW(pattern, FindExInfoStandard, data, FindExSearchNameMatch, nullptr, 0);
+}
+
+HANDLE FindFirstFileExW(LPCWSTR pattern, FINDEX_INFO_LEVELS, LPVOID data, FINDEX_SEARCH_OPS search, LPVOID filter,
+                        DWORD) {
   if (pattern == nullptr || *pattern == 0) return FailsWith(ERROR_PATH_NOT_FOUND);
-  return Guarded(INVALID_HANDLE_VALUE, [&] { return StartSearch(pattern, data); });
+  if (filter != nullptr) return FailsWith(ERROR_INVALID_PARAMETER);
+  return Guarded(INVALID_HANDLE_VALUE, [&] {
+    return StartSearch(pattern, static_cast<WIN32_FIND_DATAW*>(data), search == FindExSearchLimitToDirectories);
+  });
 }
 
 BOOL FindNextFileW(HANDLE handle, WIN32_FIND_DATAW* data) {

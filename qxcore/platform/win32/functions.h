@@ -84,6 +84,8 @@ struct WIN32_FIND_DATAW {
   WCHAR cFileName[MAX_PATH];
   WCHAR cAlternateFileName[14];
 };
+enum FINDEX_INFO_LEVELS { FindExInfoStandard, FindExInfoBasic };
+enum FINDEX_SEARCH_OPS { FindExSearchNameMatch, FindExSearchLimitToDirectories };
 
 struct WIN32_FILE_ATTRIBUTE_DATA {
   DWORD dwFileAttributes;
@@ -242,6 +244,9 @@ QXCORE_API DWORD GetTempPathW(DWORD size, LPWSTR buffer);
 QXCORE_API UINT GetTempFileNameW(LPCWSTR directory, LPCWSTR prefix, UINT unique, LPWSTR name);
 
 QXCORE_API HANDLE FindFirstFileW(LPCWSTR pattern, WIN32_FIND_DATAW* data);
+// The level changes nothing, for there are no short names; `filter` must be null and the flags are not used.
+QXCORE_API HANDLE FindFirstFileExW(LPCWSTR pattern, FINDEX_INFO_LEVELS level, LPVOID data, FINDEX_SEARCH_OPS search,
+                                   LPVOID filter, DWORD flags);
 QXCORE_API BOOL FindNextFileW(HANDLE search, WIN32_FIND_DATAW* data);
 QXCORE_API BOOL FindClose(HANDLE search);
 

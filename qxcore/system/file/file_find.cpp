@@ -54,12 +54,17 @@ int SFileFind::Close() {
   return 1;
 }
 
-int SFileFind::FindFile(const WCHAR* mask, unsigned long) {
+int SFileFind::FindFile(const WCHAR* mask, unsigned long) { return Search(mask, false); }
+int SFileFind::FindFolders(const WCHAR* mask) { return Search(mask, true); }
+
+int SFileFind::Search(const WCHAR* mask, bool foldersOnly) {
   const SString wanted(mask != nullptr ? mask : WTEXT("*.*"));  // it may be this object's own
   // Only this search: a derived class calls this for one folder after the other.
   SFileFind::Close();
   m_mask = wanted;
-  const HANDLE search = ::FindFirstFileW(m_mask, &m_data);
+  const HANDLE search =
+      ::FindFirstFileExW(m_mask, FindExInfoStandard, &m_data,
+                         foldersOnly ? FindExSearchLimitToDirectories : FindExSearchNameMatch, nullptr, 0);
   if (search == INVALID_HANDLE_VALUE) {
     m_data.cFileName[0] = 0;
     m_data.dwFileAttributes = 0;

@@ -38,7 +38,13 @@ class QXCORE_API SFileFind : public SBaseFind {
   // As it was given to FindFile.
   const SString& GetMask() const { return m_mask; }
 
+ protected:
+  // FindFile for a caller that looks at folders only: the platform may leave out what is none, where it knows that
+  // without looking at each entry.
+  int FindFolders(const WCHAR* mask);
+
  private:
+  int Search(const WCHAR* mask, bool foldersOnly);
   int GiveTime(const FILETIME& from, STime* time) const;
 
   WIN32_FIND_DATAW m_data = {};  // of the current entry; no name without an entry

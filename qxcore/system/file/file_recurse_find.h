@@ -6,7 +6,7 @@
 
 class QXCORE_API SFileRecurseFind : public SFileFind {
  public:
-  SFileRecurseFind() = default;
+  SFileRecurseFind() { m_folders.m_foldersOnly = true; }
 
   int Close() override;
   // Takes the mask apart into folder and file mask: a mask without "*" that names a folder stands for all in

@@ -39,7 +39,8 @@ int SFolderRecurse::FindFile(const WCHAR* mask, unsigned long) {
 
 int SFolderRecurse::Enter(const SString& mask) {
   m_current = new SFolderFinderNode(m_current);
-  if (m_current->FindFile(mask, FILE_ATTRIBUTE_DIRECTORY) && m_current->SkipDots()) return 1;
+  const int found = m_foldersOnly ? m_current->FindFolders(mask) : m_current->FindFile(mask, 0);
+  if (found && m_current->SkipDots()) return 1;
   const DWORD error = ::GetLastError();
   m_current = m_current->SelfDestroy();
   m_failures.AddSearch(mask, error);

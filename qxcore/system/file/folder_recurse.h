@@ -26,6 +26,8 @@ class QXCORE_API SFolderRecurse : public SBaseFind {
     int SkipDots();
 
    private:
+    friend class SFolderRecurse;
+
     SFolderFinderNode* m_parent;
   };
 
@@ -53,6 +55,7 @@ class QXCORE_API SFolderRecurse : public SBaseFind {
 
  private:
   friend class SFileRecurseFind;
+  friend class SRecurseFindFolders;
 
   // Puts a node on top and searches; without an entry it is taken away again and the failure noted.
   int Enter(const SString& mask);
@@ -61,4 +64,5 @@ class QXCORE_API SFolderRecurse : public SBaseFind {
 
   SFolderFinderNode* m_current = nullptr;  // owned, with all above it
   SFindFailures m_failures;
+  bool m_foldersOnly = false;  // files need not be visited
 };

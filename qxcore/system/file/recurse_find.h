@@ -33,7 +33,7 @@ class QXCORE_API SRecurseFindFiles : public SAttrRejectFindFilter {
 // Folders only, links to folders among them.
 class QXCORE_API SRecurseFindFolders : public SAttrMatchFindFilter {
  public:
-  SRecurseFindFolders() : SAttrMatchFindFilter(m_folders) {}
+  SRecurseFindFolders() : SAttrMatchFindFilter(m_folders) { m_folders.m_foldersOnly = true; }
 
   // The mask is SFolderRecurse's: it holds for the first folder only. The attributes are not used.
   int FindFile(const WCHAR* mask = nullptr, unsigned long attributes = 0) override;
