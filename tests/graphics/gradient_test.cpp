@@ -4,6 +4,8 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cstdlib>
+#include <functional>
 #include <vector>
 
 #include "qxcore/graphics/background.h"
@@ -174,6 +176,66 @@ TEST(Gradients, KindsFillTheirRectangle) {
       ASSERT_EQ(up.At(x, y), down.At(x, 29 - y));
     }
   }
+}
+
+// The members of the kinds do what the mode orders, and nothing for a mode without their bit; they use the rectangle
+// and the colours that they are given, not those of the object.
+TEST(Gradients, EachKindAloneIsTheKindOfTheMode) {
+  using Gradient = SDrawGradient;
+  const SRect rect(5, 4, 34, 25);
+  constexpr int kFrame = Gradient::FRAME_RAISED;
+  const struct {
+    int mode;
+    std::function<void(const Gradient&, SDC&, int)> draw;
+  } kKinds[] = {
+      {Gradient::CORNER, [&](const Gradient& gradient, SDC& dc,
+                             int mode) { gradient.DrawCornerGradient(dc, rect, kFrom, kTo, mode, kFrame); }},
+      {Gradient::CENTER_REVERSED, [&](const Gradient& gradient, SDC& dc,
+                                      int mode) { gradient.DrawCenterGradient(dc, rect, kFrom, kTo, mode, kFrame); }},
+      {Gradient::BUTTON, [&](const Gradient& gradient, SDC& dc,
+                             int mode) { gradient.DrawButtonGradient(dc, rect, kFrom, mode, kFrame); }},
+      {Gradient::PANEL_3D, [&](const Gradient& gradient, SDC& dc,
+                               int mode) { gradient.Draw3DGradient(dc, rect, kFrom, kTo, mode, kFrame); }},
+      {Gradient::GRAD_BUTTON_DIAG_UP, [&](const Gradient& gradient, SDC& dc, int mode) {
+         gradient.DrawGradButtonGradient(dc, rect, kFrom, kTo, mode, kFrame);
+       }}};
+  for (const auto& kind : kKinds) {
+    Canvas byMode(40, 30), alone(40, 30), blank(40, 30);
+    Gradient gradient, other;
+    gradient.SetGradient(kind.mode, kFrom, kTo, rect);
+    gradient.SetFrameType(kFrame);
+    gradient.DrawGradient(byMode.dc);
+    kind.draw(other, alone.dc, kind.mode);
+    EXPECT_EQ(alone.All(), byMode.All()) << std::hex << kind.mode;
+    EXPECT_NE(alone.All(), blank.All()) << std::hex << kind.mode;
+    Canvas nothing(40, 30);
+    kind.draw(other, nothing.dc, Gradient::HORZ);
+    EXPECT_EQ(nothing.All(), blank.All()) << std::hex << kind.mode;
+  }
+}
+
+// The point has the start colour; one outside counts as the nearest place of the rectangle.
+TEST(Gradients, CentresMayLieAnywhere) {
+  const SRect rect(5, 4, 34, 25);
+  const SDrawGradient gradient;
+  const auto draw = [&](const SPoint& center) {
+    Canvas canvas(40, 30);
+    gradient.DrawCenterGradientEx(canvas.dc, rect, center, 0xFF0000, 0x0000FF, SDrawGradient::CENTER,
+                                  SDrawGradient::FRAME_NONE);
+    return canvas.All();
+  };
+  const auto blueAt = [](const std::vector<COLORREF>& pixels, int x, int y) {
+    return static_cast<int>(pixels[static_cast<std::size_t>(y * 40 + x)] >> 16 & 255);
+  };
+  const std::vector<COLORREF> pixels = draw(SPoint(10, 20));
+  SPoint bluest(5, 4);
+  for (int y = 4; y < 25; ++y)
+    for (int x = 5; x < 34; ++x)
+      if (blueAt(pixels, x, y) > blueAt(pixels, bluest.x, bluest.y)) bluest = SPoint(x, y);
+  EXPECT_LE(std::max(std::abs(bluest.x - 10), std::abs(bluest.y - 20)), 2) << "the middle lies between pixels";
+  EXPECT_GT(blueAt(pixels, 10, 20), blueAt(pixels, 33, 4));
+  EXPECT_EQ(draw(SPoint(-100, 12)), draw(SPoint(5, 12)));
+  EXPECT_EQ(draw(SPoint(20, 500)), draw(SPoint(20, 25)));
 }
 
 // An enhanced metafile of the screen's size plays pixel by pixel into a rectangle of that size.

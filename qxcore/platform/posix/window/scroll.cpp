@@ -175,8 +175,10 @@ BOOL ShowScrollBar(HWND window, int which, BOOL show) {
 
 BOOL EnableScrollBar(HWND handle, UINT which, UINT arrows) {
   if (which == SB_CTL) {
-    EnableWindow(handle, arrows == ESB_ENABLE_BOTH);
-    return Send(handle, SBM_ENABLE_ARROWS, arrows) != 0;
+    // First the arrows: a control that is enabled or disabled changes them by itself.
+    const BOOL changed = Send(handle, SBM_ENABLE_ARROWS, arrows) != 0;
+    if (arrows == ESB_ENABLE_BOTH || arrows == ESB_DISABLE_BOTH) EnableWindow(handle, arrows == ESB_ENABLE_BOTH);
+    return changed;
   }
   return OrNoMemory<BOOL>(FALSE, [&]() -> BOOL {
     BOOL changed = FALSE;
