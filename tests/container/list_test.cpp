@@ -217,6 +217,42 @@ TEST(DList, Iterator_WalksSkipsAndDeletes) {
   EXPECT_EQ(ValueOf(place.Last()), 5);
 }
 
+// Nothing is done for items that are not there, and nothing is lost.
+TEST(XDList, AbsentItems_ChangeNothing) {
+  SXDList list;
+  for (int i = 0; i < 4; ++i) list.AddAtTail(new Item(i));
+  Item* const other = new Item(9);
+  list.AddAtTail(nullptr);
+  list.AddAt(nullptr, 1);
+  list.AddBefore(nullptr, other);
+  list.AddAfter(nullptr, other);
+  list.AddBefore(list.GetHead(), nullptr);
+  list.AddAfter(list.GetHead(), nullptr);
+  list.Swap(nullptr, list.GetHead());
+  list.Swap(list.GetHead(), nullptr);
+  list.Swap(list.GetTail(), list.GetTail());
+  list.Swap(0L, -1L);
+  list.Swap(7L, 8L);
+  list.Delete(nullptr);
+  list.DeleteBefore(list.GetHead());
+  list.DeleteAfter(list.GetTail());
+  EXPECT_EQ(list.GetBefore(nullptr), nullptr);
+  list.QuickSort(CompareItems, 2, 1);
+  list.QuickSort(CompareItems, -1, 2);
+  list.QuickSort(CompareItems, 0, 4);
+  EXPECT_EQ(Values(list), (std::vector<int>{0, 1, 2, 3}));
+  EXPECT_EQ(Item::living, 5) << "the one that found no place is still its maker's";
+  SDListIterator place(list, 9);
+  EXPECT_EQ(place.GetCurrent(), nullptr);
+  EXPECT_EQ(place.Skip(2), nullptr);
+  EXPECT_EQ(place.Skip(-2), nullptr);
+  EXPECT_EQ(place.DeleteCurrent(), nullptr);
+  EXPECT_EQ(ValueOf(place.First()), 0);
+  EXPECT_EQ(place.Skip(-1), nullptr) << "before the beginning";
+  EXPECT_EQ(place.Next(), nullptr);
+  delete other;
+}
+
 TEST(XDList, OperationsRelativeToAnItem) {
   SXDList list;
   Item* middle = new Item(2);

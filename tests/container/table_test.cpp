@@ -326,6 +326,73 @@ TEST(TableShared, Copies_ShareUntilOneIsWritten) {
   EXPECT_EQ(table.ElemSize(), 4);
 }
 
+// May move as bytes, and its n-th copy fails.
+class FailingMovable : public Movable {
+ public:
+  static inline long failAt = 0;
+  using Movable::Movable;
+  FailingMovable(const FailingMovable& other) : Movable(other) {
+    if (failAt != 0 && --failAt == 0) throw CopyFailed();
+  }
+  FailingMovable& operator=(const FailingMovable& other) = default;
+};
+
+// While another table holds the same block, a change copies it first; when that fails, both keep what they had.
+TEST(TableShared, CopiesThatFailInADetachingChange_LeaveBothTables) {
+  using Table = STableMem<FailingMovable>;
+  const std::function<void(Table&)> kChanges[] = {
+      [](Table& table) { table.Remove(2); },     [](Table& table) { table.MoveTo(0, 3); },
+      [](Table& table) { table.Swap(1, 2); },    [](Table& table) { table.Reverse(); },
+      [](Table& table) { table.GrowTo(50); },    [](Table& table) { table.Insert(1, FailingMovable(9)); },
+      [](Table& table) { table.Add(table[3]); }, [](Table& table) { table.At(0); }};
+  for (const auto& change : kChanges) {
+    int failures = 0;
+    for (long n = 1;; ++n, ++failures) {
+      Table table{FailingMovable(1), FailingMovable(2), FailingMovable(3), FailingMovable(4)};
+      const Table other(table);
+      FailingMovable::failAt = n;
+      bool hasFailed = false;
+      try {
+        change(table);
+      } catch (const CopyFailed&) {
+        hasFailed = true;
+      }
+      FailingMovable::failAt = 0;
+      EXPECT_EQ(Values(other), (std::vector<int>{1, 2, 3, 4}));
+      if (!hasFailed) break;
+      EXPECT_EQ(Values(table), (std::vector<int>{1, 2, 3, 4}));
+      EXPECT_TRUE(table.IsShared());
+      EXPECT_EQ(Movable::living.size(), 4u);
+    }
+    EXPECT_GE(failures, 4) << "each element was copied";
+  }
+  EXPECT_TRUE(Movable::living.empty());
+}
+
+// A capacity below the number of elements is no order, shared or not; neither is an empty array to copy.
+TYPED_TEST(TableTest, Capacities_NeverCutElements) {
+  using T = typename TypeParam::value_type;
+  TypeParam table{T(1), T(2), T(3)}, copy(table);
+  for (int n : {0, 1, 2}) {
+    copy.GrowTo(n);
+    table.GrowTo(n);
+    EXPECT_EQ(Values(copy), (std::vector<int>{1, 2, 3}));
+    EXPECT_GE(copy.GetCapacity(), 3);
+  }
+  copy.GrowTo(9);
+  EXPECT_EQ(copy.GetCapacity(), 9);
+  EXPECT_EQ(Values(copy), Values(table));
+  if constexpr (requires { copy.CopyArray(nullptr, 0); }) {
+    const T source[] = {T(7), T(8)};
+    copy.CopyArray(source, 2);
+    EXPECT_EQ(Values(copy), (std::vector<int>{7, 8}));
+    copy.CopyArray(source, 0);
+    EXPECT_TRUE(copy.IsEmpty());
+    copy.CopyArray(source, -1);
+    EXPECT_TRUE(copy.IsEmpty());
+  }
+}
+
 TEST(TableShared, GrowToTheSameCapacity_ChangesNothing) {
   STableDumb<int> table{1, 2, 3};
   const int* before = std::as_const(table).GetArray();
