@@ -7,6 +7,7 @@ namespace platform {
 
 #if defined(__x86_64__) || defined(__i386__)
 static bool Has(Instructions instructions) {
+  if (instructions == Instructions::kAvx2) return __builtin_cpu_supports("avx2");
   const bool hasAvx512 = __builtin_cpu_supports("avx512f") && __builtin_cpu_supports("avx512bw") &&
                          __builtin_cpu_supports("avx512vl") && __builtin_cpu_supports("popcnt") &&
                          __builtin_cpu_supports("bmi") && __builtin_cpu_supports("bmi2");

@@ -9,6 +9,7 @@ namespace platform {
 
 // Sets of instructions that are used together.
 enum class Instructions {
+  kAvx2,       // AVX2 alone
   kAvx512,     // AVX-512 F, BW and VL, with POPCNT, BMI1 and BMI2
   kAvx512Vbmi  // the same and VBMI2
 };

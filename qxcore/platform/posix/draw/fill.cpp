@@ -6,6 +6,8 @@
 #include <immintrin.h>
 #endif
 
+#include "qxcore/platform/internal/processor.h"
+
 namespace draw {
 namespace {
 
@@ -35,7 +37,7 @@ __attribute__((target("avx2"))) void FillRow(std::uint32_t* row, int width, std:
 }
 
 bool FillWide(const Surface& surface, const Box& box, std::uint32_t pixel) {
-  static const bool canUse = __builtin_cpu_supports("avx2");
+  static const bool canUse = platform::CanUse(platform::Instructions::kAvx2);
   if (!canUse) return false;
   for (int y = box.y1; y < box.y2; ++y) FillRow(surface.Row(y) + box.x1, box.x2 - box.x1, pixel);
   return true;
