@@ -7,6 +7,7 @@
 #include <regex>
 #include <string>
 
+#include "qxcore/core/exception.h"
 #include "qxcore/string/ansi_string.h"
 #include "qxcore/string/natural_compare.h"
 #include "qxcore/string/string.h"
@@ -257,6 +258,35 @@ TEST(Orders, StartsAndCountsCutTheTexts) {
   const WCHAR* const same = WTEXT("same");
   EXPECT_EQ(_tcsncmpi(same, same, 3), 0);
   EXPECT_EQ(_tcsnicmpi(same, same, 3), 0);
+}
+
+// Numbers of any length: by their digits, and then by their leading zeros.
+TEST(Orders, NaturalOrderOfLongNumbers) {
+  RandomText random(71);
+  const auto sign = [](const WideString& a, const WideString& b) {
+    const std::size_t zerosA = std::min(a.find_first_not_of(WTEXT('0')), a.size());
+    const std::size_t zerosB = std::min(b.find_first_not_of(WTEXT('0')), b.size());
+    const WideString digitsA = a.substr(zerosA), digitsB = b.substr(zerosB);
+    if (digitsA.size() != digitsB.size()) return digitsA.size() < digitsB.size() ? -1 : 1;
+    if (digitsA != digitsB) return digitsA < digitsB ? -1 : 1;
+    return zerosA == zerosB ? 0 : zerosA < zerosB ? -1 : 1;
+  };
+  for (int round = 0; round < 20000; ++round) {
+    WideString a = WTEXT("1") + random.Make(40, WTEXT("0019")), b = a;
+    for (int changes = random.Number(4); changes > 0; --changes) {
+      const auto at = static_cast<std::size_t>(random.Number(static_cast<int>(b.size()) + 1));
+      if (at == b.size()) {
+        b += WTEXT('7');
+      } else if (random.Number(3) == 0 && b.size() > 1) {
+        b.erase(at, 1);
+      } else {
+        b[at] = static_cast<WCHAR>('0' + random.Number(10));
+      }
+    }
+    if (random.Number(4) == 0) a.insert(0, 2, WTEXT('0'));
+    ASSERT_EQ(Sign(_tcscmpi(a.c_str(), b.c_str())), sign(a, b)) << Narrow(a) << ' ' << Narrow(b);
+    ASSERT_EQ(Sign(_tcsicmpi((a + WTEXT("X")).c_str(), (b + WTEXT("x")).c_str())), sign(a, b));
+  }
 }
 
 // --- other active code pages; the environment chooses them before the first question, on Linux ---
