@@ -9,6 +9,7 @@
 #include <string>
 
 #include "qxcore/system/file/file.h"
+#include "qxcore/system/file/find_failures.h"
 #include "qxcore/system/file/mapped_file.h"
 #include "qxcore/system/time/ole_date_time.h"
 #include "qxcore/system/time/time.h"
@@ -135,6 +136,34 @@ TEST(FileNamesAtEdges, FoldersAreMadeFromTheTop) {
   EXPECT_FALSE(SFile::IsFile(base));
   EXPECT_FALSE(SFile::IsFile(WTEXT("")));
   EXPECT_FALSE(SFile::IsDirectory(base + WTEXT("\\a\\file")));
+}
+
+// The folders of masks, each said once in a row; ends and empty folders are no failures.
+TEST(FindFailures, AreListedByTheFolderOfTheirMask) {
+  class Sink final : public SFindFailureSink {
+   public:
+    void OnFolderNotRead(const SString& folder, unsigned long error) override {
+      all += folder + WTEXT(" ") + SString(static_cast<long>(error)) + WTEXT(";");
+    }
+    SString all;
+  } sink;
+  SFindFailures failures;
+  failures.SetSink(&sink);
+  for (unsigned long none : {DWORD(ERROR_SUCCESS), DWORD(ERROR_FILE_NOT_FOUND), DWORD(ERROR_NO_MORE_FILES)})
+    failures.AddSearch(WTEXT("C:\\dir\\*.*"), none);
+  EXPECT_TRUE(failures.IsEmpty());
+  failures.AddSearch(WTEXT("C:\\dir\\*.*"), ERROR_ACCESS_DENIED);
+  failures.AddSearch(WTEXT("C:\\dir\\*.txt"), ERROR_ACCESS_DENIED);
+  failures.AddSearch(WTEXT("C:\\*.*"), ERROR_ACCESS_DENIED);
+  failures.AddSearch(WTEXT("*.*"), ERROR_ACCESS_DENIED);
+  failures.AddSearch(WTEXT("C:*.*"), ERROR_ACCESS_DENIED);
+  failures.AddSearch(WTEXT("\\*.*"), ERROR_ACCESS_DENIED);
+  const SString deep = SString(WTEXT("C:\\")) + SString(test::Text(300, 'x').c_str());
+  failures.AddSearch(deep + WTEXT("\\*.*"), ERROR_PATH_NOT_FOUND);
+  EXPECT_EQ(sink.all, WTEXT("C:\\dir 5;C:\\ 5;. 5;C: 5;\\ 5;") + deep + WTEXT(" 123;"));
+  EXPECT_EQ(failures.GetFirstError(), DWORD(ERROR_ACCESS_DENIED));
+  failures.Clear();
+  EXPECT_TRUE(failures.IsEmpty());
 }
 
 TEST(FileStates, WhoMayWrite) {
@@ -275,10 +304,10 @@ TEST(DatesAtEdges, RecordsAreBroughtIntoOrder) {
     ASSERT_EQ(time.GetGmtMonth(), fields.tm_mon + 1);
   }
   for (int year : {-500, -1, 0, 200, 5000}) {
-    std::tm far = {};
-    far.tm_year = year, far.tm_mon = -5, far.tm_mday = 1;
+    std::tm distant = {};
+    distant.tm_year = year, distant.tm_mon = -5, distant.tm_mday = 1;
     STime time;
-    EXPECT_EQ(time.SetGmtTm(&far), 0) << year;
+    EXPECT_EQ(time.SetGmtTm(&distant), 0) << year;
     EXPECT_EQ(time.GetTime(), -1);
   }
 }
