@@ -43,6 +43,7 @@ class QXCORE_API SWndThreadState {
   // The state of the calling thread.
   static SWndThreadState& Get();
 
+  HWND m_lastOwn = nullptr;           // the window of this thread that got a message last, until its end
   SWnd* m_pending = nullptr;          // the object whose window is being created, until the hook has seen it
   SCurrentMessage m_current = {};     // the innermost message that is being handled
   HHOOK m_creationHook = nullptr;     // installed while m_pending waits for its window

@@ -29,6 +29,11 @@ class CurrentMessage {
   const SCurrentMessage m_outer;
 };
 
+// The shapes that handle messages, a bit each: 1 to 52 without those of commands.
+constexpr std::uint64_t Bit(int shape) { return std::uint64_t{1} << shape; }
+constexpr std::uint64_t kMessageShapes = (Bit(53) - Bit(1)) & ~(Bit(2) | Bit(4) | Bit(47) | Bit(49) | Bit(50));
+bool HandlesMessages(std::uintptr_t shape) { return shape <= 52 && (kMessageShapes >> shape & 1) != 0; }
+
 // What a message returns whose handler threw.
 LRESULT RefusalOf(UINT message) { return message == WM_CREATE ? -1 : 0; }
 
@@ -36,6 +41,7 @@ LRESULT RefusalOf(UINT message) { return message == WM_CREATE ? -1 : 0; }
 
 LRESULT CALLBACK SWindowProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
   SWndThreadState& state = SWndThreadState::Get();
+  state.m_lastOwn = window;
   const LRESULT result = SGuarded(state, RefusalOf(message), [&] {
     SWnd* object = SWnd::FromHandlePermanent(window);
     if (object == nullptr) return ::DefWindowProcW(window, message, wParam, lParam);
@@ -45,6 +51,7 @@ LRESULT CALLBACK SWindowProcedure(HWND window, UINT message, WPARAM wParam, LPAR
     }
     return object->WindowProc(message, wParam, lParam);
   });
+  if (message == WM_NCDESTROY) state.m_lastOwn = nullptr;
   if (state.HasException()) [[unlikely]]
     SCrossThreadSend::Deliver(window, message, wParam, lParam);
   return result;
@@ -71,10 +78,7 @@ int SWnd::OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* result) 
 // Shapes that are no shapes, and those of commands, handle no message. A registered entry's shape is fixed; its
 // signature is an address.
 int SWnd::CallMapped(const SMsgEntry& entry, WPARAM wParam, LPARAM lParam, LRESULT* result) {
-  const std::uintptr_t shape = entry.m_signature.m_number;
-  if (entry.m_message != kSMsgRegistered) {
-    if (shape > 52 || shape == 2 || shape == 4 || shape == 47 || shape == 49 || shape == 50) return 0;
-  }
+  if (entry.m_message != kSMsgRegistered && !HandlesMessages(entry.m_signature.m_number)) return 0;
   const LRESULT returned = entry.m_handler(this, wParam, lParam);
   if (result != nullptr) *result = returned;
   return 1;
@@ -93,13 +97,19 @@ LRESULT SWnd::Default() {
   return DefWindowProcW(current.m_message, current.m_wParam, current.m_lParam);
 }
 
+// The system is asked whose window it is only where the thread does not remember it.
 LRESULT SWnd::SendMessageW(UINT message, WPARAM wParam, LPARAM lParam) const {
-  if (platform::IsOwnWindow(m_hWnd)) [[likely]]
-    return SSent(::SendMessageW(m_hWnd, message, wParam, lParam));
-  const SCrossThreadSend send(m_hWnd, message, wParam, lParam);
-  const LRESULT result = ::SendMessageW(m_hWnd, message, wParam, lParam);
-  send.ThrowException();
-  return SSent(result);
+  SWndThreadState& state = SWndThreadState::Get();
+  LRESULT result = 0;
+  if (m_hWnd == state.m_lastOwn || platform::IsOwnWindow(m_hWnd)) [[likely]] {
+    result = ::SendMessageW(m_hWnd, message, wParam, lParam);
+  } else {
+    const SCrossThreadSend send(m_hWnd, message, wParam, lParam);
+    result = ::SendMessageW(m_hWnd, message, wParam, lParam);
+    send.ThrowException();
+  }
+  state.ThrowException();
+  return result;
 }
 
 int SWnd::PostMessageW(UINT message, WPARAM wParam, LPARAM lParam) const {
