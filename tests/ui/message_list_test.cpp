@@ -172,9 +172,13 @@ TEST_F(MessageLists, Command_ComesFromAMenu) {
     std::string* m_list;
   };
   HWND window = nullptr;
+  bool isOpening = false;
+  // The keys come when the open menu waits for them.
   auto* frame = new Listed<SFrameWnd>(Recorder("frame", [&](UINT message, WPARAM, LPARAM, LRESULT*) {
-    if (message != WM_INITMENUPOPUP) return 0;
-    for (const WPARAM key : {VK_DOWN, VK_RETURN}) ::PostMessageW(window, WM_KEYDOWN, key, 1);
+    if (message == WM_INITMENUPOPUP) isOpening = true;
+    if (message == WM_ENTERIDLE && std::exchange(isOpening, false)) {
+      for (const WPARAM key : {VK_DOWN, VK_RETURN}) ::PostMessageW(window, WM_KEYDOWN, key, 1);
+    }
     return 0;
   }));
   ASSERT_TRUE(frame->Create(nullptr, WTEXT("f"), WS_OVERLAPPEDWINDOW | WS_VISIBLE, SRect(10, 20, 310, 220)));
