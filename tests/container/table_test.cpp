@@ -7,6 +7,7 @@
 #include <functional>
 #include <numeric>
 #include <random>
+#include <utility>
 #include <vector>
 
 #include "counted.h"
@@ -340,11 +341,14 @@ class FailingMovable : public Movable {
 // While another table holds the same block, a change copies it first; when that fails, both keep what they had.
 TEST(TableShared, CopiesThatFailInADetachingChange_LeaveBothTables) {
   using Table = STableMem<FailingMovable>;
-  const std::function<void(Table&)> kChanges[] = {
-      [](Table& table) { table.Remove(2); },     [](Table& table) { table.MoveTo(0, 3); },
-      [](Table& table) { table.Swap(1, 2); },    [](Table& table) { table.Reverse(); },
-      [](Table& table) { table.GrowTo(50); },    [](Table& table) { table.Insert(1, FailingMovable(9)); },
-      [](Table& table) { table.Add(table[3]); }, [](Table& table) { table.At(0); }};
+  const std::function<void(Table&)> kChanges[] = {[](Table& table) { table.Remove(2); },
+                                                  [](Table& table) { table.MoveTo(0, 3); },
+                                                  [](Table& table) { table.Swap(1, 2); },
+                                                  [](Table& table) { table.Reverse(); },
+                                                  [](Table& table) { table.GrowTo(50); },
+                                                  [](Table& table) { table.Insert(1, FailingMovable(9)); },
+                                                  [](Table& table) { table.Add(std::as_const(table)[3]); },
+                                                  [](Table& table) { table.At(0); }};
   for (const auto& change : kChanges) {
     int failures = 0;
     for (long n = 1;; ++n, ++failures) {

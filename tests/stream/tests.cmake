@@ -5,3 +5,9 @@ target_link_libraries(test_stream PRIVATE ZLIB::ZLIB)
 add_test(NAME stream.base_processor COMMAND test_stream
   --gtest_filter=Selection.*:Reading.*:Losses.*:CodePages.*:ProvisionalChoice.*:Positions.*:LongInputs.*:FullUnicode.*:RoundTrips.*)
 set_tests_properties(stream.base_processor PROPERTIES ENVIRONMENT QXCORE_PROCESSOR=base)
+
+# An active code page of two bytes, which a process keeps once it has asked for it.
+if(NOT WIN32)
+  add_test(NAME stream.page.932 COMMAND test_stream --gtest_filter=DoubleByteFiles.*)
+  set_tests_properties(stream.page.932 PROPERTIES ENVIRONMENT QXCORE_ACP=932)
+endif()

@@ -1,0 +1,258 @@
+// The choice of an encoding by a second reading of its rules, hints of every code page, texts in double-byte active
+// pages, and the base streams.
+
+#include <random>
+
+#include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/output_string_stream.h"
+#include "qxcore/stream/seekable_input_ansi_file.h"
+#include "tests/stream/reader_fixture.h"
+#include "tests/support/temp_folder.h"
+#include "tests/support/wine.h"
+
+namespace {
+
+// --- the choice among the candidates ---
+
+// Finds the evidence that it is told to find.
+class EvidenceReader : public SMultiFormatReaderUnicode {
+ public:
+  using SMultiFormatReaderUnicode::SMultiFormatReaderUnicode;
+  SDetectionCounters evidence;
+
+ protected:
+  Encoding DataAffinity(const unsigned char*, const unsigned char*, std::int32_t& ascii, std::int32_t& utf8,
+                        std::int32_t& active, std::int32_t& utf16, std::int32_t& littleZeros, std::int32_t& bigZeros,
+                        std::int32_t& specified, unsigned short) override {
+    ascii = evidence.ascii, utf8 = evidence.utf8, active = evidence.active, utf16 = evidence.utf16;
+    littleZeros = evidence.littleZeros, bigZeros = evidence.bigZeros, specified = evidence.specified;
+    return 0;
+  }
+};
+
+struct Expected {
+  Encoding selected;
+  bool warns;
+  bool operator==(const Expected& other) const = default;
+};
+
+// The rules one after the other, as the guide to text encodings has them.
+Expected SecondReading(Encoding requested, const SDetectionCounters& c, bool isComplete) {
+  const Encoding policy = requested & Support::kFlagsMask, value = requested & Support::kValueMask;
+  if (c.ascii >= 0) return {policy | Support::kASCII, false};
+  const bool favours = (policy & (Support::kFavorHint | Support::kFavorGuess)) != 0;
+  if (c.utf8 < 0 && c.active < 0 && c.utf16 < 0 && c.specified < 0) {
+    if (value == Support::kOEM || favours) return {requested, false};
+    return {policy | Support::kOEM, true};
+  }
+  const Encoding order = c.littleZeros > c.bigZeros ? Support::kUTF16LE : Support::kUTF16BE;
+  Encoding best = 0;
+  if (c.utf8 > c.active && c.utf8 > c.utf16 && c.utf8 > c.specified) best = Support::kUTF8;
+  if (c.active > c.utf8 && c.active > c.utf16 && c.active > c.specified) best = Support::kANSI;
+  if (c.specified > c.utf8 && c.specified > c.utf16 && c.specified > c.active) best = value;
+  if (c.utf16 > c.utf8 && c.utf16 > c.active && c.utf16 > c.specified) best = order;
+  const int acceptable = (c.utf8 >= 0) + (c.active >= 0) + (c.utf16 >= 0) + (c.specified >= 0);
+  const bool isSure = isComplete && best != 0 && acceptable == 1;
+  if (best != 0 && (policy & Support::kFavorGuess) != 0) return {policy | best, false};
+  const bool fitsHint = ((requested & 0xFFFE7) == Support::kUTF8 && c.utf8 > 0) ||
+                        (value == Support::kANSI && c.active > 0) || ((requested & 0xFFFE7) == order && c.utf16 > 0);
+  if (fitsHint) return {requested, !isSure && (policy & Support::kFavorHint) == 0 && best != value};
+  if (best != 0) return {policy | best, !isSure};
+  if (c.active == c.utf8 && c.active > c.specified) return {policy | Support::kANSI, true};
+  if (c.utf8 > c.active && c.utf8 > c.specified && c.utf8 == c.utf16) return {policy | Support::kUTF8, true};
+  if (c.active > c.utf8 && c.active > c.specified && c.active == c.utf16) return {policy | Support::kANSI, true};
+  return {requested, true};
+}
+
+TEST(Choices, AreThoseOfASecondReading) {
+  std::mt19937 random(29);
+  const Encoding kHints[] = {Support::kANSI,
+                             Support::kANSI | 1251,
+                             Support::kUTF8,
+                             Support::kUTF16LE,
+                             Support::kUTF16BE | Support::kOptionalBOM,
+                             Support::kOEM,
+                             Support::kASCII,
+                             Support::kUTF8 | Support::kOptionalBOM};
+  const Encoding kFavours[] = {0, Support::kFavorHint, Support::kFavorGuess};
+  const std::string whole = "abcdef", part(6000, 'a');
+  int warned = 0;
+  for (int round = 0; round < 60000; ++round) {
+    const bool isComplete = random() % 2 != 0;
+    const Encoding requested = kHints[random() % std::size(kHints)] | kFavours[random() % 3] |
+                               (isComplete ? Support::kFullDetect : Support::kQuickDetect);
+    PiecewiseInput in(isComplete ? whole : part);
+    EvidenceReader reader(in, requested);
+    const auto few = [&] { return static_cast<std::int32_t>(random() % 4) - 1; };
+    reader.evidence = {random() % 5 == 0 ? 0 : -3, few(), few(), few(), few(), few(), few()};
+    reader.CheckFormat();
+    const Expected expected = SecondReading(requested, reader.evidence, isComplete);
+    const bool warns = (reader.GetStatus() & SMultiFormatReaderUnicode::kWarning) != 0;
+    ASSERT_EQ((Expected{reader.GetFormat(), warns}), expected)
+        << std::hex << requested << std::dec << ' ' << reader.evidence.utf8 << ' ' << reader.evidence.active << ' '
+        << reader.evidence.utf16 << ' ' << reader.evidence.specified << ' ' << reader.evidence.littleZeros << ' '
+        << reader.evidence.bigZeros << ' ' << isComplete;
+    ASSERT_EQ(!reader.GetDetectionWarning().IsEmpty(), warns);
+    ASSERT_FALSE(reader.GetDetectionReport().IsEmpty());
+    const bool isProvisional = reader.evidence.ascii >= 0 && !isComplete;
+    ASSERT_EQ((reader.GetStatus() & SMultiFormatReaderUnicode::kProvisional) != 0, isProvisional);
+    ASSERT_EQ((reader.GetStatus() & SMultiFormatReaderUnicode::kSelected) != 0, !isProvisional);
+    warned += warns;
+  }
+  EXPECT_GT(warned, 1000);
+}
+
+// Whether the platform converts the bytes as a page, by its published flags; a lead byte at the end may be cut.
+bool Converts(unsigned page, std::string bytes) {
+  const bool forbidsFlags = page == 42 || (page >= 50220 && page <= 50222) || page == 50225 || page == 50227 ||
+                            page == 50229 || page == 52936 || page == 54936 || (page >= 57002 && page <= 57011);
+  const DWORD flags = forbidsFlags ? 0 : MB_PRECOMPOSED | MB_ERR_INVALID_CHARS;
+  for (int attempt = 0; attempt < 2; ++attempt) {
+    const int size = static_cast<int>(bytes.size());
+    if (size == 0 || MultiByteToWideChar(page, flags, bytes.data(), size, nullptr, 0) > 0) return true;
+    if (!IsDBCSLeadByteEx(page, static_cast<BYTE>(bytes.back()))) return false;
+    bytes.pop_back();
+  }
+  return false;
+}
+
+TEST(Hints, OfEveryPageAreTestedByThePlatform) {
+  int accepted = 0, rejected = 0;
+  for (unsigned page = 1; page < 0x10000; ++page) {
+    if (page > 3 && page != 42 && !IsValidCodePage(page)) continue;
+    if (page == 65000 || page == 65001) continue;
+    unsigned resolved = page;
+    CPINFOEXW info;
+    if (page == CP_OEMCP) resolved = GetOEMCP();
+    if ((page == CP_MACCP || page == CP_THREAD_ACP) && GetCPInfoExW(page, 0, &info)) resolved = info.CodePage;
+    for (const char* bytes : {"caf\xE9 \xE9t\xE9s", "\x83\x65\x83\x58\x83\x67z", "a\xB4\xEB\xC7\xD1z",
+                              "lead \x83\x65\x83", "\x81 \x8D \x8F \x90", "plain\xFF", "\xA1\xFE\xA1\xFE\xA1"}) {
+      const std::string sample = bytes;
+      PiecewiseInput in(sample);
+      SMultiFormatReaderUnicode reader(in, Support::kANSI | page | Support::kFullDetect | Support::kFavorGuess);
+      try {
+        reader.CheckFormat();
+      } catch (const SException&) {
+        continue;  // the page is selected and not installed
+      }
+      const bool converts = Converts(resolved, sample);
+      ASSERT_EQ(reader.GetCounters().specified >= 0, converts) << page << ' ' << testing::PrintToString(sample);
+      if (converts) {
+        ASSERT_EQ(reader.GetCounters().specified, -reader.GetCounters().ascii) << page;
+      }
+      accepted += converts, rejected += !converts;
+    }
+  }
+  EXPECT_GT(accepted, 100);
+  EXPECT_GT(rejected, 10);
+}
+
+// --- active pages of two bytes; the environment chooses the page, on Linux ---
+
+TEST(DoubleByteFiles, AreReadCharacterByCharacter) {
+  if (GetACP() != 932) GTEST_SKIP() << "the active page is " << GetACP();
+  const test::TempFolder folder;
+  const test::Text path = folder.File(WTEXT("text"));
+  ASSERT_TRUE(test::WriteAll(path, "a\x83\x65\x83\x58\xB1\r\nz\x83"));  // the last character is cut
+  SSeekableInputANSIFile file(SString(path.c_str()));
+  SString text;
+  for (int c; (c = file.ReadChar()) >= 0;) text += static_cast<WCHAR>(c);
+  EXPECT_EQ(text.Left(6), WTEXT("a\u30C6\u30B9\uFF71\r\n"));
+  EXPECT_EQ(text.Length(), 8);
+  EXPECT_FALSE(file.SeekPos(0));
+  EXPECT_EQ(file.ReadLn(), WTEXT("a\u30C6\u30B9\uFF71"));
+  EXPECT_EQ(file.ReadLn().Left(1), WTEXT("z"));
+}
+
+// --- the base streams ---
+
+class OneByOne : public SInputStream {
+ public:
+  explicit OneByOne(std::string bytes) : m_bytes(std::move(bytes)) {}
+  using SInputStream::Read;
+  int Read() override { return m_at < m_bytes.size() ? static_cast<unsigned char>(m_bytes[m_at++]) : -1; }
+  int IsEOF() override { return m_at == m_bytes.size(); }
+
+ private:
+  std::string m_bytes;
+  std::size_t m_at = 0;
+};
+
+class OneByOneOutput : public SOutputStream {
+ public:
+  using SOutputStream::Write;
+  void Write(int byte) override { bytes += static_cast<char>(byte); }
+  std::string bytes;
+};
+
+// A stream that has nothing but its single byte has all the rest by that.
+TEST(BaseStreams, ComeFromTheSingleByte) {
+  OneByOne in("0123456789");
+  char bytes[20] = {};
+  EXPECT_EQ(in.Read(bytes, 4), 4u);
+  EXPECT_EQ(in.Skip(3), 3u);
+  EXPECT_EQ(in.Read(bytes + 4, 10), 3u);
+  EXPECT_STREQ(bytes, "0123789");
+  EXPECT_EQ(in.Skip(3), 0u);
+  EXPECT_EQ(in.Read(bytes, 1), 0u);
+  in.Mark(9);
+  EXPECT_THROW(in.Reset(), SEIOResetInvalid);
+  EXPECT_EQ(in.Available(), 0u);
+  EXPECT_EQ(in.TakeRest(nullptr), nullptr);
+  std::uint64_t place = 0;
+  EXPECT_FALSE(in.GetPlace(&place));
+  EXPECT_FALSE(in.GoToPlace(0));
+  OneByOne wide("ab");
+  WCHAR characters[4];
+  EXPECT_EQ(wide.ReadCharacters(characters, 4), 1u);
+  EXPECT_EQ(characters[0], WTEXT('a'));
+  EXPECT_EQ(wide.ReadCharacters(characters, 4), 1u);
+  EXPECT_EQ(wide.ReadCharacters(characters, 4), 0u);
+  OneByOneOutput out;
+  EXPECT_EQ(out.Write(bytes, 7), 7u);
+  EXPECT_EQ(out.bytes, "0123789");
+  out.Flush();
+  out.Close();
+}
+
+// Into a text without a stream below, and with characters that the encoding lacks.
+TEST(TextOutputForms, WithoutATargetAndWithoutARepresentation) {
+  SOutputStringStream text;
+  text.Flush();
+  EXPECT_EQ(text.Write(WTEXT("one"), 3u), 3u);
+  EXPECT_EQ(text.Write(static_cast<const WCHAR*>(nullptr), 3u), 0u);
+  EXPECT_EQ(text.Write(WTEXT("none"), 0u), 0u);
+  text.WriteLn(WTEXT("two"), 3u);
+  text.Close();
+  SString content;
+  EXPECT_EQ(text.GetString(nullptr), 0);
+  EXPECT_EQ(text.GetString(&content), 1);
+  EXPECT_EQ(content, WTEXT("onetwo\r\n"));
+
+  for (const WCHAR replacement : {WTEXT('?'), WCHAR{0}}) {
+    CollectingOutput target;
+    SOutputStringStream out(target, Support::kANSI | 1252);
+    out.SetReplacement(replacement);
+    EXPECT_TRUE(out.GetEncodingWarning().IsEmpty());
+    out.Write(WTEXT("a\u0416b"), 3u);
+    out.Close();
+    EXPECT_EQ(target.bytes, replacement != 0 ? "a?b" : "ab");
+    EXPECT_EQ(out.GetDroppedCount(), replacement != 0 ? 0u : 1u);
+    EXPECT_FALSE(out.GetEncodingWarning().IsEmpty());
+    EXPECT_EQ(out.GetString(&content), 0) << "it went elsewhere";
+    EXPECT_TRUE(content.IsEmpty());
+  }
+  // Halves of pairs in writes of their own.
+  CollectingOutput target;
+  SOutputStringStream out(target, Support::kUTF8 | Support::kFullUnicode);
+  out.Write(0xD83D);
+  out.Write(0xDE00);
+  out.Write(0xD83D);
+  out.Write(WTEXT('x'));
+  out.Write(0xD83D);
+  out.Close();
+  EXPECT_EQ(target.bytes.substr(0, 4), "\xF0\x9F\x98\x80");
+  EXPECT_EQ(out.GetReplacedCount(), 2u) << "two halves stayed alone";
+}
+
+}  // namespace
