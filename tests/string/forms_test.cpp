@@ -110,11 +110,6 @@ std::string Printed(const std::string& format, Values... values) {
   return text;
 }
 
-std::string Replaced(std::string text, const std::string& found, const std::string& replacement) {
-  const std::size_t at = text.find(found);
-  return at == std::string::npos ? text : text.replace(at, found.size(), replacement);
-}
-
 TEST(FormatForms, WidthsAndSizesFromTheArguments) {
   RandomText random(41);
   const std::string kTypes = "diuxXo";
@@ -147,13 +142,14 @@ TEST(FormatForms, WidthsAndSizesFromTheArguments) {
                 SString((Printed(format, longLong) + ";behind").c_str()));
     }
 #endif
-    const double number = value / 1024.0;
+    const double number = value / 997.0;  // never in the middle between two results
     const std::string floating(1, "eEfgG"[round % 5]);
-    const int precision = random.Number(20) + 1;
-    // The runtime of Windows writes three digits of an exponent.
-    if (floating != "f" && IsWine()) continue;
-    ASSERT_EQ(Formatted(SString(("%.*" + floating).c_str()), precision, number),
-              SString(Printed("%.*" + floating, precision, number).c_str()));
+    const int precision = random.Number(9) + 1;
+    std::string expected = Printed("%.*" + floating, precision, number);
+    const std::size_t exponent = expected.find_first_of("eE");
+    // Windows writes three digits of an exponent, and so does the portable layer.
+    if (exponent != std::string::npos && expected.size() == exponent + 4) expected.insert(exponent + 2, 1, '0');
+    ASSERT_EQ(Formatted(SString(("%.*" + floating).c_str()), precision, number), SString(expected.c_str()));
   }
 }
 
@@ -169,12 +165,12 @@ TEST(FormatForms, TextsThatAreMissingOrHopeless) {
   EXPECT_NE(Formatted(WTEXT("%p"), static_cast<void*>(nullptr)).Length(), 0);
   // Into a buffer that is lent out: what fits is put there, at the same place.
   SString lent;
-  WCHAR* const buffer = lent.Lock(700);
+  WCHAR* const buffer = lent.LockBuffer(700);
   lent.Format(WTEXT("%650d"), 7);
   EXPECT_EQ(lent.GetSafePointer(), buffer);
-  EXPECT_EQ(buffer[649], WTEXT('7'));
-  lent.Unlock(650);
+  lent.UnlockBuffer();
   EXPECT_EQ(lent.Length(), 650);
+  EXPECT_EQ(lent.Right(2), WTEXT(" 7"));
 }
 
 // --- numbers, classes ---

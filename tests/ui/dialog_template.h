@@ -1,6 +1,7 @@
 // Builds dialog templates in the published binary layout.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <vector>
 
@@ -33,6 +34,7 @@ class DialogTemplate {
   }
   DialogTemplate& Edit(WORD id, int y = 20) { return Item(0x0081, SStringView(), WS_TABSTOP | WS_BORDER, id, y); }
   const void* Data() const { return m_words.data(); }
+  std::size_t Size() const { return m_words.size() * sizeof(m_words[0]); }  // in bytes
 
  private:
   void Put16(int number) { m_words.push_back(static_cast<std::uint16_t>(number)); }

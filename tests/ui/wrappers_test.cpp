@@ -1,10 +1,12 @@
 // Menus, styles, scroll bars, carets and controls through their objects: a random menu against a model, and what the
 // members of a window change in the window.
 
-#include <map>
+#include <exception>
 #include <random>
+#include <stdexcept>
 
 #include "qxcore/platform/resource_table.h"
+#include "tests/ui/dialog_template.h"
 #include "tests/ui/ui_fixture.h"
 
 namespace {
@@ -309,6 +311,46 @@ TEST_F(WindowMembers, Caret_BelongsToOneWindow) {
   EXPECT_FALSE(::ShowCaret(m_parent.m_hWnd));
   EXPECT_TRUE(::DestroyCaret());
   EXPECT_FALSE(::ShowCaret(m_child.m_hWnd));
+}
+
+// --- dialogs by name, and what nobody catches ---
+
+TEST_F(WindowMembers, DialogsAreFoundByTheirNames) {
+  static const test::DialogTemplate box = [] {
+    test::DialogTemplate made(WTEXT("Named"));
+    made.Button(WTEXT("OK"), BS_DEFPUSHBUTTON, IDOK);
+    return made;
+  }();
+  ASSERT_TRUE(platform::RegisterResource(nullptr, RT_DIALOG, WTEXT("WrappersBox"), box.Data(), box.Size()));
+  SDlg dialog, missing;
+  ASSERT_TRUE(dialog.CreateDlg(WTEXT("WrappersBox"), &m_parent));
+  SString caption;
+  dialog.GetWindowTextW(&caption);
+  EXPECT_EQ(caption, WTEXT("Named"));
+  EXPECT_NE(dialog.GetDlgItem(IDOK), nullptr);
+  dialog.EndDialog(IDOK);
+  EXPECT_EQ(dialog.m_hWnd, nullptr);
+  EXPECT_FALSE(missing.CreateDlg(WTEXT("NoSuchBox"), &m_parent));
+}
+
+TEST_F(WindowMembers, ExceptionsThatNobodyCatches_AreReportedWithTheirTexts) {
+  const test::Reports reports;
+  SReportException(std::make_exception_ptr(SEOutOfMemory()));
+  SReportException(std::make_exception_ptr(std::runtime_error("of the runtime")));
+  SReportException(std::make_exception_ptr(42));
+  ASSERT_EQ(test::Reports::List().size(), 3u);
+  EXPECT_EQ(test::Reports::List()[0], SEOutOfMemory().GetText());
+  EXPECT_NE(test::Reports::List()[1].Find(WTEXT("of the runtime")), nullptr);
+  EXPECT_FALSE(test::Reports::List()[2].IsEmpty());
+  // The first exception is kept, later ones are reported.
+  SWndThreadState& state = SWndThreadState::Get();
+  state.KeepException(std::make_exception_ptr(1));
+  state.KeepException(std::make_exception_ptr(std::runtime_error("later")));
+  EXPECT_EQ(test::Reports::List().size(), 4u);
+  EXPECT_TRUE(state.HasException());
+  EXPECT_THROW(std::rethrow_exception(state.TakeException()), int);
+  EXPECT_FALSE(state.HasException());
+  EXPECT_EQ(state.TakeException(), nullptr);
 }
 
 // --- controls ---
