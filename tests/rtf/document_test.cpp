@@ -42,6 +42,9 @@ TEST(Parts, AreFoundInOddTexts) {
   EXPECT_EQ(SRtfDocument::ExtractFontTable(loose, part, 0), 1);
   EXPECT_EQ(part,
             WTEXT("{\\fonttbl{\\f0\\fswiss\\fcharset0 Helvetica;}{\\f1\\fnil{\\*\\panose 02;}Monaco;}{\\f2 Open;}}"));
+  SString starred(WTEXT("{ \\* \\fonttbl{\\f0 A;}}"));
+  EXPECT_EQ(SRtfDocument::ExtractFontTable(starred, part, 0), 1);
+  EXPECT_EQ(part, WTEXT("{\\fonttbl{\\f0 A;}}")) << "as merging reads it";
   SString binary(WTEXT("{\\fonttbl\\f0 A;{\\f1 B;}\\bin3 }}}\\f2 C;}"));
   EXPECT_EQ(SRtfDocument::ExtractFontTable(binary, part, 0), 1);
   EXPECT_EQ(part, binary) << "handed out as it is";

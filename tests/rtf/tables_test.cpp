@@ -38,6 +38,7 @@ TEST(FontEntry, ReadsWhatWritersWrite) {
       {WTEXT("{\\f-5 X}"), -5, WTEXT(""), WTEXT("X")},
       {WTEXT("{\\f1 Two;;}"), 1, WTEXT(""), WTEXT("Two;")},
       {WTEXT("{\\f99999999999 Big;}"), 2147483647, WTEXT(""), WTEXT("Big")},
+      {WTEXT("{\\;\\f3\\ Lone;}"), 3, WTEXT(""), WTEXT("Lone")},
       {WTEXT("{\\f1 Open;"), 1, WTEXT(""), WTEXT("Open")},
       {WTEXT("{\\f1\\fnil;}"), 0, WTEXT(""), nullptr},
       {WTEXT("{\\f1 ;}"), 0, WTEXT(""), nullptr},

@@ -91,7 +91,7 @@ class EntryReader {
       while (!tag.empty() && (rtf::IsSpace(tag.back()) || tag.back() == ';')) tag.remove_suffix(1);
       if (!m_hasNumber && IsNumberWord(tag, m_number)) {
         m_hasNumber = true;
-      } else if (!rtf::IsBinary(tag)) {
+      } else if (tag.size() > 1 && !rtf::IsBinary(tag)) {  // a lone backslash would make an escape with the next word
         m_words.Add(tag);
       }
     }

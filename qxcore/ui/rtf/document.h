@@ -65,7 +65,8 @@ class QXCORE_API SRtfDocument {
   // format pages, sections, paragraphs or characters belong to the body. 0 for a text that is not RTF.
   static int ExtractHeader(SString& rtf, SString& header, int cut);
   // The first \fonttbl group, with its braces. Entries that stand in it without braces of their own, as some
-  // writers leave them, are handed out with braces, so that SRtfFontTable::AddFontTable reads them.
+  // writers leave them, are handed out with braces, and a table behind "\*" without that, so that
+  // SRtfFontTable::AddFontTable reads them.
   static int ExtractFontTable(SString& rtf, SString& table, int cut);
   // The first \colortbl group and the first \stylesheet group, with their braces.
   static int ExtractColorTable(SString& rtf, SString& table, int cut);

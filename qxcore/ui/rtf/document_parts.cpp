@@ -11,14 +11,25 @@ void Cut(SString& text, SStringView part) {
   text.Delete(static_cast<int>(part.data() - text.GetSafePointer()), static_cast<int>(part.size()));
 }
 
-// Puts braces around the entries of a font table that have none.
+// Goes over the brace and the word of a table, without the "\*" that may stand between them. Returns whether it does.
+bool ReadHead(rtf::TagReader& tags, SStringView& brace, SStringView& word) {
+  brace = tags.Next(false);
+  word = tags.Next(false);
+  const bool isStarred = rtf::TrimRight(word) == WTEXT("\\*");
+  if (isStarred) word = tags.Next(false);
+  return isStarred;
+}
+
+// Puts braces around the entries of a font table that have none, and leaves out a "\*" of the table.
 class EntryGrouper {
  public:
   explicit EntryGrouper(SStringView table) : m_text(static_cast<unsigned>(table.size()) + 64), m_tags(table) {}
 
   SString Run() {
-    m_text += m_tags.Next(false);
-    m_text += m_tags.Next(false);
+    SStringView brace, word;
+    ReadHead(m_tags, brace, word);
+    m_text += brace;
+    m_text += word;
     for (SStringView tag = m_tags.Next(true); !tag.empty() && tag[0] != '}'; tag = m_tags.Next(true)) Take(tag);
     if (m_isInEntry) m_text += WTEXT(";}");
     m_text += static_cast<WCHAR>('}');
@@ -46,17 +57,16 @@ class EntryGrouper {
   bool m_isOpenWord = false;  // the last tag was a control word without its blank
 };
 
-// Whether braces are missing and can be put: binary data among the entries would move.
-bool HasEntriesWithoutBraces(SStringView table) {
+// Whether a table has to be written anew so that merging reads it, and can be: binary data among the entries would move.
+bool NeedsGrouping(SStringView table) {
   rtf::TagReader tags(table);
-  tags.Next(false);
-  tags.Next(false);
-  bool areMissing = false;
+  SStringView brace, word;
+  bool isNeeded = ReadHead(tags, brace, word);
   for (SStringView tag = tags.Next(true); !tag.empty() && tag[0] != '}'; tag = tags.Next(true)) {
     if (rtf::IsBinary(tag)) return false;
-    areMissing = areMissing || tag[0] != '{';
+    isNeeded = isNeeded || tag[0] != '{';
   }
-  return areMissing;
+  return isNeeded;
 }
 
 int ExtractGroup(SString& text, SString& part, int cut, std::uint64_t key) {
@@ -64,7 +74,7 @@ int ExtractGroup(SString& text, SString& part, int cut, std::uint64_t key) {
   try {
     const SStringView group = rtf::FindGroup(text, key);
     if (group.empty()) return 0;
-    const bool isRegrouped = key == platform::RtfKey("fonttbl") && HasEntriesWithoutBraces(group);
+    const bool isRegrouped = key == platform::RtfKey("fonttbl") && NeedsGrouping(group);
     part = isRegrouped ? EntryGrouper(group).Run() : SString(group);
     if (cut != 0) Cut(text, group);
     return 1;
