@@ -75,10 +75,13 @@ TEST(Conversions, WrongArgumentsAreRefused) {
   }
   EXPECT_EQ(ErrorOf([&] { return MultiByteToWideChar(12345, 0, bytes, 3, text, 8); }), kBadParameter);
   EXPECT_EQ(ErrorOf([&] { return WideCharToMultiByte(12345, 0, wide, 3, back, 8, nullptr, nullptr); }), kBadParameter);
-  // These pages say nothing of characters that they replace.
+  // This page says nothing of characters that it replaces; Wine takes the arguments all the same.
   BOOL used = FALSE;
-  EXPECT_EQ(ErrorOf([&] { return WideCharToMultiByte(CP_UTF8, 0, wide, 3, back, 8, "?", nullptr); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return WideCharToMultiByte(CP_UTF8, 0, wide, 3, back, 8, nullptr, &used); }), kBadParameter);
+  if (!IsWine()) {
+    EXPECT_EQ(ErrorOf([&] { return WideCharToMultiByte(CP_UTF8, 0, wide, 3, back, 8, "?", nullptr); }), kBadParameter);
+    EXPECT_EQ(ErrorOf([&] { return WideCharToMultiByte(CP_UTF8, 0, wide, 3, back, 8, nullptr, &used); }),
+              kBadParameter);
+  }
   const WCHAR half[] = {0xD800, 'x'};
   EXPECT_EQ(
       ErrorOf([&] { return WideCharToMultiByte(CP_UTF8, WC_ERR_INVALID_CHARS, half, 2, back, 8, nullptr, nullptr); }),
@@ -226,6 +229,7 @@ TEST(FolderCalls, TemporaryNames) {
   EXPECT_NE(GetFileAttributesW(name), INVALID_FILE_ATTRIBUTES);
   EXPECT_EQ(ErrorOf([&] { return GetTempFileNameW(folder.File(WTEXT("missing")).c_str(), WTEXT("p"), 0, name); }),
             DWORD(ERROR_DIRECTORY));
+  if (IsWine()) return;  // which looks for the folder first
   EXPECT_EQ(ErrorOf([&] { return GetTempFileNameW(Text(MAX_PATH, 'x').c_str(), WTEXT("p"), 1, name); }),
             DWORD(ERROR_BUFFER_OVERFLOW));
 }
@@ -265,7 +269,9 @@ TEST(FileCalls, TimesSizesAndHandles) {
   HANDLE twin = nullptr;
   EXPECT_TRUE(DuplicateHandle(GetCurrentProcess(), file, GetCurrentProcess(), &twin, 0, FALSE,
                               DUPLICATE_SAME_ACCESS | DUPLICATE_CLOSE_SOURCE));
-  EXPECT_FALSE(ReadFile(file, bytes, 1, &done, nullptr)) << "the first one was closed";
+  if (twin != file) {  // the value of the first one, which was closed, may be given again
+    EXPECT_FALSE(ReadFile(file, bytes, 1, &done, nullptr));
+  }
   EXPECT_TRUE(SetFilePointerEx(twin, distance, &place, FILE_BEGIN));
   EXPECT_TRUE(ReadFile(twin, bytes, sizeof bytes, &done, nullptr));
   EXPECT_EQ(done, 5u);
@@ -284,7 +290,9 @@ TEST(FileCalls, OrdersThatContradictThemselves) {
   };
   for (const DWORD disposition : {0u, 6u, 99u})
     EXPECT_EQ(ErrorOf([&] { return open(path, GENERIC_READ, disposition, 0); }), kBadParameter) << disposition;
-  EXPECT_EQ(ErrorOf([&] { return open(path, GENERIC_READ, TRUNCATE_EXISTING, 0); }), kBadParameter);
+  if (!IsWine()) {  // which empties the file
+    EXPECT_EQ(ErrorOf([&] { return open(path, GENERIC_READ, TRUNCATE_EXISTING, 0); }), kBadParameter);
+  }
   EXPECT_EQ(ErrorOf([&] { return open(folder.Path(), GENERIC_READ, OPEN_EXISTING, 0); }), DWORD(ERROR_ACCESS_DENIED));
   EXPECT_TRUE(open(folder.Path(), GENERIC_READ, OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS));
   EXPECT_TRUE(open(path, 0, OPEN_EXISTING, 0)) << "for its properties alone";
@@ -357,7 +365,9 @@ TEST(LocaleDates, BuffersFlagsAndFields) {
   EXPECT_GT(clock(0, nullptr, 100), 5) << "now";
   EXPECT_EQ(ErrorOf([&] { return date(DATE_SHORTDATE, &good, -1); }), kBadParameter);
   for (SYSTEMTIME bad : {SYSTEMTIME{2023, 2, 0, 29, 0, 0, 0, 0}, SYSTEMTIME{2023, 13, 0, 1, 0, 0, 0, 0}})
-    EXPECT_EQ(ErrorOf([&] { return date(DATE_SHORTDATE, &bad, 100); }), kBadParameter);
+    if (!IsWine()) {
+      EXPECT_EQ(ErrorOf([&] { return date(DATE_SHORTDATE, &bad, 100); }), kBadParameter);
+    }
   for (SYSTEMTIME bad : {SYSTEMTIME{2023, 1, 0, 1, 24, 0, 0, 0}, SYSTEMTIME{2023, 1, 0, 1, 0, 60, 0, 0},
                          SYSTEMTIME{2023, 1, 0, 1, 0, 0, 60, 0}, SYSTEMTIME{2023, 1, 0, 1, 0, 0, 0, 1000}})
     EXPECT_EQ(ErrorOf([&] { return clock(0, &bad, 100); }), kBadParameter);
