@@ -57,7 +57,8 @@ class EntryGrouper {
   bool m_isOpenWord = false;  // the last tag was a control word without its blank
 };
 
-// Whether a table has to be written anew so that merging reads it, and can be: binary data among the entries would move.
+// Whether a table has to be written anew so that merging reads it, and can be: binary data among the entries would
+// move.
 bool NeedsGrouping(SStringView table) {
   rtf::TagReader tags(table);
   SStringView brace, word;
