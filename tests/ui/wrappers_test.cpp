@@ -6,6 +6,7 @@
 #include <stdexcept>
 
 #include "qxcore/platform/resource_table.h"
+#include "tests/support/wine.h"
 #include "tests/ui/dialog_template.h"
 #include "tests/ui/ui_fixture.h"
 
@@ -283,7 +284,9 @@ TEST_F(WindowMembers, ScrollBars_OfTheWindowAndOfAControl) {
   window.EnableScrollBarCtrl(SB_HORZ);
   EXPECT_TRUE(bar.IsWindowEnabled());
   EXPECT_TRUE(bar.EnableArrows(ESB_DISABLE_BOTH));
-  EXPECT_FALSE(bar.EnableArrows(ESB_DISABLE_BOTH)) << "they were disabled already";
+  if (!IsWine()) {  // which says so each time
+    EXPECT_FALSE(bar.EnableArrows(ESB_DISABLE_BOTH)) << "they were disabled already";
+  }
   EXPECT_TRUE(bar.EnableArrows());
 
   EXPECT_NE(window.GetStyle() & WS_VSCROLL, 0u);
