@@ -295,12 +295,14 @@ TEST(LongInputs, ZeroBytesBehindTheBeginning_MakeNo16BitText) {
   for (const auto& one : kTexts) {
     std::string run = Repeated(one.line, 24 * kMega), few = run;
     if (run.size() % 2 != 0) run += '\n', few += '\n';
-    // The beginnings of pieces lie in the run; the few are at even and at odd offsets.
+    // The beginnings of pieces lie in the run; the few are at even or at odd offsets by the piece, of 4 MB behind 16
+    // MB.
     const std::size_t from = run.find('\n', 15 * kMega);
     std::fill_n(run.begin() + static_cast<std::ptrdiff_t>(from), run.find('\n', 21 * kMega) - from, '\0');
-    for (std::size_t mega = 17; mega < 24; ++mega) {
-      std::size_t at = few.find('\n', mega * kMega);
-      while (at % 2 != mega % 2) at = few.find('\n', at + 1);
+    for (std::size_t place = 0; place < 24 * kMega; place += 1024) {
+      const std::size_t parity = place / (place < 16 * kMega ? 1024 : 4 * kMega) % 2;
+      std::size_t at = few.find('\n', place);
+      while (at % 2 != parity) at = few.find('\n', at + 1);
       few[at] = '\0';
     }
     for (const std::string* bytes : {&run, &few}) {
