@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "tests/support/wine.h"
 #include "tests/window/recorder.h"
 
 namespace {
@@ -97,14 +98,13 @@ void PostMouse(HWND window, UINT message, POINT screen) {
   PostMessageW(window, message, message == WM_LBUTTONUP ? 0 : MK_LBUTTON, MAKELPARAM(screen.x, screen.y));
 }
 
-#ifndef _WIN32
 POINT MiddleOf(HWND owner, HMENU menu, UINT item) {
   RECT place{};
   EXPECT_TRUE(GetMenuItemRect(owner, menu, item, &place));
   return {(place.left + place.right) / 2, (place.top + place.bottom) / 2};
 }
 
-// Under Wine the mouse takes the activation along when it moves from the bar to the popup, which ends the menu.
+// A release chooses the item that a move has selected, and no other.
 TEST(Input, AMenuIsOpenedByAPressAndChosenByARelease) {
   Record record;
   const HWND top = MakeFrame();
@@ -112,15 +112,18 @@ TEST(Input, AMenuIsOpenedByAPressAndChosenByARelease) {
   g_menuOwner = top;
   const Steps steps({{WM_ENTERIDLE, [] {
                         const HMENU popup = GetSubMenu(GetMenu(g_menuOwner), 0);
-                        PostMouse(g_menuOwner, WM_LBUTTONUP, MiddleOf(g_menuOwner, popup, 2));
+                        const POINT item = MiddleOf(g_menuOwner, popup, 2);
+                        for (const UINT message : {UINT{WM_LBUTTONUP}, UINT{WM_MOUSEMOVE}, UINT{WM_LBUTTONUP}})
+                          PostMouse(g_menuOwner, message, item);
                       }}});
   SendMessageW(top, WM_NCLBUTTONDOWN, HTMENU, MAKELPARAM(file.x, file.y));
   Pump();
   DestroyWindow(top);
-  for (const char* line : {"top WM_INITMENUPOPUP", "top WM_MENUSELECT 80800065", "top WM_COMMAND 65 none"})
+  // Wine does not say that the mouse selects.
+  const char* selected = IsWine() ? "top WM_MENUSELECT 800065" : "top WM_MENUSELECT 80800065";
+  for (const char* line : {"top WM_INITMENUPOPUP", selected, "top WM_COMMAND 65 none"})
     EXPECT_NE(record.Text().find(line), std::string::npos) << line << " in\n" << record.Text();
 }
-#endif
 
 TEST(MessageList, SizingByTheBorder) {
   Record record;
@@ -286,6 +289,7 @@ TEST(Dialog, KeyboardWalksAndChooses) {
   DestroyWindow(dialog);
 }
 
+#ifndef _WIN32
 void Mouse(DWORD flags, int dx = 0, int dy = 0) {
   INPUT input{};
   input.type = INPUT_MOUSE;
@@ -293,6 +297,12 @@ void Mouse(DWORD flags, int dx = 0, int dy = 0) {
   input.mi.dx = dx;
   input.mi.dy = dy;
   SendInput(1, &input, sizeof input);
+}
+
+// With its place in the same event: what the display reports meanwhile does not move it.
+void MouseAt(POINT point, DWORD flags) {
+  const auto scaled = [](LONG at, int size) { return static_cast<int>((at << 16) / GetSystemMetrics(size)) + 1; };
+  Mouse(flags | MOUSEEVENTF_MOVE | MOUSEEVENTF_ABSOLUTE, scaled(point.x, SM_CXSCREEN), scaled(point.y, SM_CYSCREEN));
 }
 
 // Handles messages until one of the kind has been dispatched, or for at most ten seconds.
@@ -312,6 +322,8 @@ bool PumpUntil(UINT wanted) {
 }
 
 // The press ends the menu, and is one in the window that it meets.
+// Under Wine it is the same when the press arrives, but on a busy machine input that is sent to a menu is lost now and
+// then.
 TEST(Input, APressBesideAnOpenMenu_ClosesItAndReachesTheWindowThere) {
   Record record;
   const HWND top = MakeFrame();
@@ -320,9 +332,8 @@ TEST(Input, APressBesideAnOpenMenu_ClosesItAndReachesTheWindowThere) {
   Pump();
   {
     const Steps steps({{WM_ENTERIDLE, [] {
-                          SetCursorPos(450, 350);
-                          Mouse(MOUSEEVENTF_LEFTDOWN);
-                          Mouse(MOUSEEVENTF_LEFTUP);
+                          MouseAt({450, 350}, MOUSEEVENTF_LEFTDOWN);
+                          MouseAt({450, 350}, MOUSEEVENTF_LEFTUP);
                         }}});
     EXPECT_EQ(TrackPopupMenu(GetSubMenu(GetMenu(top), 0), TPM_RETURNCMD, 50, 60, 0, top, nullptr), 0);
   }
@@ -337,7 +348,6 @@ TEST(Input, APressBesideAnOpenMenu_ClosesItAndReachesTheWindowThere) {
   DestroyWindow(top);
 }
 
-#ifndef _WIN32
 // Under Wine input that is sent while the loop of sizing begins can be lost, and the loop waits for ever.
 TEST(Input, TheBorderSizesTheWindow) {
   const HWND top = Make(WTEXT("top"), WS_OVERLAPPEDWINDOW | WS_VISIBLE, nullptr, {100, 100, 400, 300});

@@ -81,11 +81,10 @@ bool MenuLoop::TakeMouse(const MSG& message) {
       return true;
     case WM_LBUTTONUP:
     case WM_RBUTTONUP:
+      // An item is chosen only when the mouse has selected it before.
       if (ItemUnder(message.pt, &at, &position) && at + 1 == m_levels.size() && position >= 0 &&
-          (at > 0 || m_levels[at].popup != nullptr)) {
-        Select(position);
+          position == m_levels[at].selected && (at > 0 || m_levels[at].popup != nullptr))
         Execute();
-      }
       return true;
     default:
       return true;
