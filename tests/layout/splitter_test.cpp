@@ -510,6 +510,45 @@ TEST_F(Splitters, SizesFollowTheDpi) {
   EXPECT_EQ(m_splitter.Pane(0, 1).left, 59);
 }
 
+// A collapsed pane opens again to the size that it had, in pixels of the new resolution.
+TEST_F(Splitters, CollapsedPanesFollowTheDpi) {
+  MakeStatic(1, 2);
+  m_splitter.SetColumnInfo(0, 100, 10);
+  m_splitter.RecalcLayout();
+  ASSERT_TRUE(m_splitter.ToggleBar(kSHitColumnBar));
+  m_frame->SendMessageW(WM_DPICHANGED, MAKEWPARAM(192, 192));
+  ASSERT_EQ(Widths()[0], 0);
+  ASSERT_TRUE(m_splitter.ToggleBar(kSHitColumnBar));
+  EXPECT_EQ(Widths()[0], 200);
+}
+
+// The windows that were moved in one splitter, by their identifiers.
+HWND g_watched = nullptr;
+std::vector<int> g_moved;
+
+LRESULT CALLBACK NoteMoves(int code, WPARAM wParam, LPARAM lParam) {
+  const auto* sent = reinterpret_cast<const CWPSTRUCT*>(lParam);
+  const bool isMoved = sent->message == WM_WINDOWPOSCHANGED && ::GetParent(sent->hwnd) == g_watched;
+  if (isMoved) g_moved.push_back(::GetDlgCtrlID(sent->hwnd));
+  return ::CallNextHookEx(nullptr, code, wParam, lParam);
+}
+
+// The scroll bars have their places before the panes, so that a pane finds its bars where it asks for them.
+TEST_F(Splitters, BarsAreMovedBeforePanes) {
+  MakeDynamic(4, 4);
+  ASSERT_TRUE(m_splitter.SplitColumn(100));
+  ASSERT_TRUE(m_splitter.SplitRow(100));
+  g_moved.clear();
+  g_watched = m_splitter.m_hWnd;
+  const HHOOK hook = ::SetWindowsHookExW(WH_CALLWNDPROC, &NoteMoves, nullptr, ::GetCurrentThreadId());
+  ASSERT_NE(hook, nullptr);
+  Size(350, 250);
+  ::UnhookWindowsHookEx(hook);
+  const auto isPane = [](int id) { return id < static_cast<int>(kSHorzScrollBarId); };
+  EXPECT_TRUE(std::is_partitioned(g_moved.begin(), g_moved.end(), [&](int id) { return !isPane(id); }));
+  EXPECT_GE(std::count_if(g_moved.begin(), g_moved.end(), isPane), 3);
+}
+
 // Memory that runs out at any point of making and splitting leaves a grid that is whole.
 TEST_F(Splitters, FailingAllocations) {
   const auto operation = [this] {

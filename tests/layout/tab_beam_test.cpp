@@ -223,6 +223,44 @@ TEST_F(Beams, SizesFollowTheDpi) {
   EXPECT_EQ(m_beam.GetTabWidth(0), width);
 }
 
+// A font from WM_SETFONT outlives a change of the resolution, in which it grows, and of the system's metrics.
+TEST_F(Beams, AGivenFontStays) {
+  const auto describe = [this] {
+    LOGFONTW font = {};
+    m_beam.FontOf(false).GetLogFont(&font);
+    return font;
+  };
+  const LOGFONTW usual = describe();
+  LOGFONTW bold = usual;
+  bold.lfHeight = -20;
+  bold.lfWeight = FW_BOLD;
+  SFont given;
+  ASSERT_TRUE(given.CreateFontIndirectW(&bold));
+  m_beam.SendMessageW(WM_SETFONT, reinterpret_cast<WPARAM>(given.GetSafeHandle()), 0);
+  m_beam.SendMessageW(WM_DPICHANGED, MAKEWPARAM(192, 192));
+  EXPECT_EQ(describe().lfHeight, -40);
+  m_beam.m_buttons.m_width = 1;  // as if the system's metric had changed
+  m_beam.SendMessageW(WM_SETTINGCHANGE);
+  EXPECT_GT(m_beam.m_buttons.m_width, 1);
+  EXPECT_EQ(describe().lfHeight, -40);
+  EXPECT_EQ(describe().lfWeight, FW_BOLD);
+  m_beam.SendMessageW(WM_DPICHANGED, MAKEWPARAM(96, 96));
+  m_beam.SendMessageW(WM_SETFONT);
+  EXPECT_EQ(describe().lfHeight, usual.lfHeight);
+  EXPECT_EQ(describe().lfWeight, usual.lfWeight);
+}
+
+// Tabs may come before the window: a given width stays, and a measured one is what it would be in the window.
+TEST_F(Beams, TabsBeforeTheWindow) {
+  Beam early;
+  early.InsertTab(0, WTEXT("wide"), nullptr, 200);
+  early.InsertTab(1, WTEXT("Sales figures"), nullptr);
+  EXPECT_EQ(early.GetTabWidth(1), early.TextWidth(WTEXT("Sales figures"), false) + 8);
+  ASSERT_TRUE(early.Create(&m_parent, WS_VISIBLE, 10));
+  EXPECT_EQ(early.GetTabWidth(0), 200);
+  EXPECT_EQ(early.GetTabWidth(1), early.TextWidth(WTEXT("Sales figures"), false) + 8);
+}
+
 // A listener that deletes the beam's window in the middle of a choice.
 TEST_F(Beams, AWindowThatEndsWhileATabIsChosen) {
   Insert(3);

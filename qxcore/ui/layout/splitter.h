@@ -29,6 +29,7 @@
 #include "qxcore/ui/window/window.h"
 
 class SAccessible;
+class SDeferredMoves;
 class SView;
 
 // The most rows, and the most columns.
@@ -282,6 +283,7 @@ class QXCORE_API SSplitterWnd : public SWnd {
 
   // --- geometry ---
   int Metric(int index) const;
+  void MoveChildren(SDeferredMoves& moves, UINT firstId, UINT lastId, const SRect& inside);
   SRect ChildRect(UINT id, const SRect& inside) const;
   SRect PaneRect(int row, int column, const SRect& inside) const;
   SRect ScrollBarRect(bool rows, int at, const SRect& inside) const;

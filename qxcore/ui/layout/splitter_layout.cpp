@@ -25,13 +25,19 @@ void SSplitterWnd::RecalcLayout() {
   SSizePanes(m_rows.GetArray(), m_rowCount, inside.Height(), m_gapY, m_keepRatio);
 
   SDeferredMoves moves((m_columnCount + 1) * (m_rowCount + 1) + 1);
-  for (HWND child = ::GetWindow(m_hWnd, GW_CHILD); child != nullptr; child = ::GetWindow(child, GW_HWNDNEXT)) {
-    const UINT id = static_cast<UINT>(::GetDlgCtrlID(child));
-    if (id == kSSizeBoxId) SUpdateSizeBox(child, m_hWnd);
-    if (id >= kSPaneId && id <= kSSizeBoxId) moves.Move(child, ChildRect(id, inside));
-  }
+  MoveChildren(moves, kSHorzScrollBarId, kSSizeBoxId, inside);
+  MoveChildren(moves, kSPaneId, kSHorzScrollBarId - 1, inside);
   moves.End();
   if (m_hWnd != nullptr) InvalidateRect(nullptr, 0);
+}
+
+void SSplitterWnd::MoveChildren(SDeferredMoves& moves, UINT firstId, UINT lastId, const SRect& inside) {
+  for (HWND child = ::GetWindow(m_hWnd, GW_CHILD); child != nullptr; child = ::GetWindow(child, GW_HWNDNEXT)) {
+    const UINT id = static_cast<UINT>(::GetDlgCtrlID(child));
+    if (id < firstId || id > lastId) continue;
+    if (id == kSSizeBoxId) SUpdateSizeBox(child, m_hWnd);
+    moves.Move(child, ChildRect(id, inside));
+  }
 }
 
 // Children outside of the grid get an empty rectangle.
@@ -157,7 +163,11 @@ void SSplitterWnd::ScaleTo(int dpi) {
        {&m_barWidth, &m_barHeight, &m_borderShareX, &m_borderShareY, &m_gapX, &m_gapY, &m_borderX, &m_borderY}) {
     *size = ::MulDiv(*size, dpi, former);
   }
-  Scale(m_rows, dpi, former, !m_keepRatio);
-  Scale(m_columns, dpi, former, !m_keepRatio);
+  for (STableDumb<SPaneInfo>* table : {&m_rows, &m_columns, &m_rowsBefore, &m_columnsBefore}) {
+    Scale(*table, dpi, former, !m_keepRatio);
+  }
+  for (STableDumb<int>* sizes : {&m_openRows, &m_openColumns}) {
+    for (int& size : *sizes) size = ::MulDiv(size, dpi, former);
+  }
   m_dpi = dpi;
 }

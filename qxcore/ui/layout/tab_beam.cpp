@@ -42,11 +42,9 @@ int STabBeam::PreCreateWindow(CREATESTRUCTW* create) {
 
 int STabBeam::OnCreate(CREATESTRUCTW* create) {
   if (SWnd::OnCreate(create) == -1) return -1;
-  m_measure.Attach(::CreateCompatibleDC(nullptr));
-  ScaleTo(static_cast<int>(::GetDpiForWindow(m_hWnd)));
-  MakeFonts();
+  ChangeDpi(static_cast<int>(::GetDpiForWindow(m_hWnd)));
+  if (m_font.GetSafeHandle() == nullptr) MakeFonts();
   ReadButtonSize();
-  MeasureAll();
   return 0;
 }
 
@@ -175,7 +173,9 @@ SRect STabBeam::GetTabRect(int index) const {
 }
 
 void STabBeam::AdjustTabSize(int index) {
-  if (!IsTab(index) || m_measure.GetSafeHdc() == nullptr) return;
+  if (!IsTab(index)) return;
+  if (m_measure.GetSafeHdc() == nullptr) m_measure.Attach(::CreateCompatibleDC(nullptr));
+  if (m_font.GetSafeHandle() == nullptr) MakeFonts();
   STab& tab = *m_tabs[index];
   const SSelectObject font(m_measure, tab.m_hasContent ? m_font.GetSafeHandle() : m_emptyFont.GetSafeHandle());
   tab.m_width = m_measure.GetTextExtent(tab.m_text).cx + m_spacing;
@@ -235,18 +235,32 @@ void STabBeam::MakeEmptyFont() {
 
 void STabBeam::ReadButtonSize() { m_buttons.SetSize(::GetSystemMetricsForDpi(SM_CXHSCROLL, static_cast<UINT>(m_dpi))); }
 
-void STabBeam::ScaleTo(int dpi) {
-  if (dpi <= 0) return;
-  m_spacing = ::MulDiv(m_spacing, dpi, m_dpi);
-  m_dpi = dpi;
+// A font that the program gave stays, in the size of the new resolution.
+void STabBeam::ChangeDpi(int dpi) {
+  if (dpi <= 0 || dpi == m_dpi) return;
+  const int former = std::exchange(m_dpi, dpi);
+  m_spacing = ::MulDiv(m_spacing, dpi, former);
+  LOGFONTW description;
+  if (m_hasGivenFont && m_font.GetLogFont(&description)) {
+    description.lfHeight = ::MulDiv(description.lfHeight, dpi, former);
+    m_font.CreateFontIndirectW(&description);
+    MakeEmptyFont();
+  } else {
+    MakeFonts();
+  }
+  MeasureAll();
 }
 
-// The fonts are copies, so the caller's may go.
+// The fonts are copies, so the caller's may go. Without a font the usual one comes back.
 LRESULT STabBeam::OnSetFont(WPARAM wParam, LPARAM) {
   LOGFONTW description;
-  if (::GetObjectW(reinterpret_cast<HGDIOBJ>(wParam), sizeof description, &description) == 0) return 0;
-  m_font.CreateFontIndirectW(&description);
-  MakeEmptyFont();
+  m_hasGivenFont = ::GetObjectW(reinterpret_cast<HGDIOBJ>(wParam), sizeof description, &description) != 0;
+  if (m_hasGivenFont) {
+    m_font.CreateFontIndirectW(&description);
+    MakeEmptyFont();
+  } else {
+    MakeFonts();
+  }
   MeasureAll();
   return 0;
 }
@@ -256,15 +270,14 @@ void STabBeam::OnWinIniChange(UINT what, LPCWSTR area) {
   const int former = m_buttons.m_width;
   ReadButtonSize();
   if (m_buttons.m_width == former) return;
-  MakeFonts();
+  if (!m_hasGivenFont) MakeFonts();
   MeasureAll();
+  Repaint();
 }
 
 LRESULT STabBeam::OnDpiChanged(WPARAM wParam, LPARAM) {
-  ScaleTo(LOWORD(wParam));
-  MakeFonts();
+  ChangeDpi(LOWORD(wParam));
   ReadButtonSize();
-  MeasureAll();
   Repaint();
   return 0;
 }

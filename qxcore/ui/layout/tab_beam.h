@@ -157,13 +157,14 @@ class QXCORE_API STabBeam : public SWnd {
   void ReadButtonSize();
   void MakeFonts();
   void MakeEmptyFont();
-  void ScaleTo(int dpi);
+  void ChangeDpi(int dpi);
   void StopAutoMove();
   LRESULT Notify(int code, int tab, int former);
   void DrawAll(SDC* dc);
 
   SDC m_measure;  // for measuring texts
   int m_dpi = 96;
+  bool m_hasGivenFont = false;    // by WM_SETFONT
   int m_pressed = kSTabNoButton;  // the button that the mouse is held down on
   SPoint m_pointer;               // where the mouse is meanwhile
 };
