@@ -2,6 +2,7 @@
 
 #include <random>
 
+#include "qxcore/ui/accessible/accessible.h"
 #include "tests/bar/bar_fixture.h"
 #include "tests/bar/pane_peer.h"
 
@@ -405,5 +406,41 @@ struct Order : SStatusBar {
 };
 
 TEST(CtrlBar, Order_OfFieldsAndSlots) { Order().Check(); }
+
+// Panes are children in the order in which they are shown, those of a layout among them.
+TEST_F(StatusBars, AScreenReaderLearnsThePanes) {
+  m_bar.InsertPane(0, 60, 0);
+  m_bar.InsertPane(1, 20, kSPaneSplice);
+  m_bar.InsertPane(2, 2000, 0);
+  SStatusBarLayout layout;
+  layout.InsertPane(0, 50, 0);
+  layout.Attach(&m_bar);
+  ASSERT_EQ(layout.Activate(1), 1);
+  SetText(0, WTEXT("ready"));
+  SetText(2, WTEXT("long"));
+  const SString inserted(WTEXT("of the document"));
+  layout.SetPaneText(0, &inserted);
+
+  const auto object = m_bar.MakeAccessible();
+  EXPECT_EQ(object->GetRole(0), kSRoleStatusBar);
+  EXPECT_EQ(object->GetRect(0), m_bar.GetWindowRect());
+  EXPECT_TRUE(object->GetState(0) & kSStateReadOnly);
+  const int count = object->GetChildCount();
+  ASSERT_EQ(count, static_cast<int>(PartsOf(m_bar).size()));
+  for (int child = 1; child <= count; ++child) {
+    EXPECT_EQ(object->GetRole(child), kSRoleStaticText);
+    EXPECT_EQ(object->GetName(child), SString(PartText(m_bar, child - 1).c_str())) << child;
+    SRect part = PartRect(m_bar, child - 1) & m_bar.GetClientRect();
+    m_bar.ClientToScreen(&part);
+    EXPECT_EQ(object->GetRect(child), part) << child;
+    EXPECT_EQ(object->ChildAt(SPoint(part.left + 1, part.top + 1)), child);
+    EXPECT_TRUE(object->GetDefaultAction(child).IsEmpty());
+    EXPECT_FALSE(object->DoDefaultAction(child));
+  }
+  m_frame->SetClientSize(90, 100);  // the last pane has no room now
+  EXPECT_TRUE(object->GetState(count) & kSStateInvisible);
+  EXPECT_EQ(object->GetRole(count + 1), 0);
+  EXPECT_TRUE(object->GetName(-1).IsEmpty());
+}
 
 }  // namespace
