@@ -78,6 +78,14 @@ class WorkbenchTest(unittest.TestCase):
         self.write_three()
         self.assertEqual(len(self.run_done("drop texts\nprint list\n").splitlines()), 3)
 
+    def test_a_window_that_nobody_sees_is_an_error(self):
+        if ON_WINE:
+            self.skipTest("there is a screen")
+        environment = dict(os.environ, QXCORE_REGISTRY=str(self.folder / "registry.db"), QXCORE_DISPLAY="headless")
+        result = subprocess.run(WORKBENCH, env=environment, capture_output=True, timeout=LIMIT)
+        self.assertEqual(result.returncode, 1)
+        self.assertIn("nobody would see the window", result.stderr.decode())
+
     def test_keys_move_and_show(self):
         self.write_three()
         shown = self.run_done("open texts\nkey home\nkey down\nwait\nkey enter\nwait\nprint preview\n")

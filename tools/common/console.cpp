@@ -93,6 +93,8 @@ void SetUp() {
   SetConsoleCtrlHandler(OnConsoleEvent, TRUE);
 }
 
+void WantScreen() {}
+
 std::vector<std::string> Arguments(int, char**) {
   // The narrow arguments have lost what the ANSI code page lacks.
   std::vector<std::string> arguments;
@@ -122,6 +124,8 @@ std::FILE* OpenNew(const std::filesystem::path& path, bool) {
 bool Synchronise(std::FILE* file) { return std::fflush(file) == 0 && _commit(_fileno(file)) == 0; }
 
 #else
+
+void WantScreen() { setenv("QXCORE_DISPLAY", "sdl", 0); }
 
 void SetUpStreams() {
   std::signal(SIGPIPE, SIG_IGN);

@@ -31,6 +31,10 @@ void RemoveWhenKilled(const std::filesystem::path* path);
 
 bool IsTerminal(std::FILE* stream);
 
+// Asks for a screen that a person sees, where none is the usual; QXCORE_DISPLAY in the environment comes before. Call
+// it before the first window.
+void WantScreen();
+
 // True when the last failed write of the C library says that the reader of a pipe has gone.
 bool IsBrokenPipe(int error);
 

@@ -26,6 +26,9 @@ int WorkbenchApp::InitInstance() {
   }
   m_mainWnd = m_frame;
   const bool isUnattended = m_script != nullptr || !m_options.picture.empty();
+  if (!isUnattended && ::GetSystemMetrics(SM_CMONITORS) == 0) {
+    throw Failure{"nobody would see the window; --script and --picture need no screen"};
+  }
   if (isUnattended) {
     m_frame->SetReporter([this](const SString& text) {
       if (m_script != nullptr) return m_script->Fail(text);

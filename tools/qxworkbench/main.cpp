@@ -34,6 +34,7 @@ int ReadAndStart(std::vector<std::string> arguments) {
   } catch (const CLI::ParseError& error) {
     return parser.exit(error) == 0 ? kDone : kWrongUsage;
   }
+  if (options.script.empty() && options.picture.empty()) console::WantScreen();
   return Start(options);
 }
 

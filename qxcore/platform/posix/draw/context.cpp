@@ -60,6 +60,7 @@ void Context::SetPlayback(double scaleX, double scaleY, double addX, double addY
 void Context::EndPlayback() { SetPlayback(1, 1, 0, 0); }
 
 void Context::ComputeClip() const {
+  m_wasDrawnOn = true;
   m_clip = m_visible;
   if (m_settings.clipped) {
     Area own = m_settings.clip;

@@ -61,6 +61,7 @@ class Context final : public Object {
   POINT m_origin{};  // of the device, on the surface
   Ref<Bitmap> m_target;
   HWND m_window = nullptr;
+  HWND m_top = nullptr;                  // the top-level window whose surface it is
   std::unique_ptr<Recorder> m_recorder;  // of a metafile
 
   // --- settings ---
@@ -91,6 +92,10 @@ class Context final : public Object {
     return m_single ? &m_clip.Extents() : nullptr;
   }
 
+  // Whether anything may have been drawn: all drawing asks for the clip region.
+  bool WasDrawnOn() const { return m_wasDrawnOn; }
+  const Box& VisibleExtents() const { return m_visible.Extents(); }
+
   // Further scaling, of what a metafile plays into a rectangle.
   void SetPlayback(double scaleX, double scaleY, double addX, double addY);
   void EndPlayback();
@@ -102,7 +107,7 @@ class Context final : public Object {
   Mapping m_map;
   double m_playScaleX = 1, m_playScaleY = 1, m_playAddX = 0, m_playAddY = 0;
   mutable Area m_clip;
-  mutable bool m_clipValid = false, m_single = false;
+  mutable bool m_clipValid = false, m_single = false, m_wasDrawnOn = false;
 };
 
 }  // namespace draw

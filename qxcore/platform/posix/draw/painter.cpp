@@ -74,6 +74,13 @@ HFONT DialogFont(LPCWSTR face, int height, int weight, bool isItalic, SIZE* unit
   return font;
 }
 
+bool PixelsOf(void* window, platform::ShownPixels* pixels) {
+  const Surface* surface = WindowSurface(window);
+  if (!surface) return false;
+  *pixels = {surface->pixels, surface->stride, surface->width, surface->height};
+  return true;
+}
+
 // Before main, as the model's other tables.
 [[maybe_unused]] const bool g_installed = [] {
   platform::Painter& painter = platform::g_painter;
@@ -88,6 +95,7 @@ HFONT DialogFont(LPCWSTR face, int height, int weight, bool isItalic, SIZE* unit
   painter.controlBrush = ControlBrush;
   painter.textSize = TextSize;
   painter.dialogFont = DialogFont;
+  painter.pixels = PixelsOf;
   painter.freeSurface = FreeWindowSurface;
   return true;
 }();

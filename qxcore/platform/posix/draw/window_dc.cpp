@@ -4,6 +4,7 @@
 
 #include "qxcore/platform/posix/draw/fill.h"
 #include "qxcore/platform/posix/draw/window_surface.h"
+#include "qxcore/platform/posix/window/on_display.h"
 #include "qxcore/platform/posix/window/target.h"
 
 using namespace draw;
@@ -49,6 +50,7 @@ HDC OpenWindow(HWND window, bool isWhole, const pixman_region32_t* clip) try {
     visible.And(within);
   }
   dc->m_window = window;
+  dc->m_top = target.top;
   dc->SetTarget(surface, target.origin, visible);
   return EnterAs<HDC>(dc.get());
 } catch (const std::bad_alloc&) {
@@ -81,6 +83,15 @@ HDC ScreenContext() try {
   return NoMemory(HDC{});
 }
 
+// What was drawn on a window goes to the display.
+void ShowDrawn(const Context& dc) {
+  if (!dc.m_top || !dc.WasDrawnOn()) return;
+  const Surface& surface = dc.m_surface;
+  const Box& drawn = dc.VisibleExtents();
+  platform::model::PresentOnDisplay(dc.m_top, {surface.pixels, surface.stride, surface.width, surface.height},
+                                    {drawn.x1, drawn.y1, drawn.x2, drawn.y2});
+}
+
 }  // namespace
 
 HDC GetDC(HWND window) { return window ? OpenWindow(window, false, nullptr) : ScreenContext(); }
@@ -89,7 +100,9 @@ HDC GetWindowDC(HWND window) { return window ? OpenWindow(window, true, nullptr)
 
 int ReleaseDC(HWND, HDC handle) {
   auto* dc = Find<Context>(handle);
-  return dc && dc->m_type == OBJ_DC && Remove(handle);
+  if (!dc || dc->m_type != OBJ_DC) return 0;
+  ShowDrawn(*dc);
+  return Remove(handle) ? 1 : 0;
 }
 
 HWND WindowFromDC(HDC handle) {

@@ -1,5 +1,6 @@
 #include "qxcore/platform/posix/window/activate.h"
 
+#include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/send.h"
 #include "qxcore/platform/posix/window/tree.h"
 
@@ -94,6 +95,7 @@ bool Activate(HWND handle, By by, bool moveFocus) {
   }
   if (handle != nullptr && !IsWindow(handle)) return false;
   Remember(thread, handle);
+  if (handle != nullptr && TheDisplay().Serves(thread->id)) TheDisplay().Activate(handle);
   if ((previous == nullptr) != (handle == nullptr)) TellApplication(handle != nullptr);
   if (handle != nullptr && GetActiveWindow() == handle) {
     Send(handle, WM_NCACTIVATE, TRUE, reinterpret_cast<LPARAM>(previous));

@@ -1,7 +1,10 @@
-// The clipboard of this process: one block of memory for each format, which belongs to it.
+// The clipboard of this process: one block of memory for each format, which belongs to it. With a display, text is
+// exchanged with other programs: theirs replaces all that is here when somebody looks, ours goes out on closing. There
+// lines end with LF, here with CR and LF.
 
 #include <utility>
 
+#include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/thread.h"
 #include "qxcore/platform/win32/clipboard.h"
 
@@ -13,6 +16,8 @@ struct Clipboard {
   HWND window = nullptr;         // for which it was opened; the owner once it has emptied it
   HWND owner = nullptr;
   List<std::pair<UINT, HANDLE>> data;
+  bool hasChanged = false;  // since it was opened
+  std::u16string sent;      // what other programs got last
 };
 
 Clipboard& TheClipboard() {
@@ -33,6 +38,67 @@ HANDLE* Find(Clipboard& clipboard, UINT format) {
   return nullptr;
 }
 
+void Empty(Clipboard& clipboard) {
+  for (const auto& entry : clipboard.data) GlobalFree(entry.second);
+  clipboard.data.clear();
+}
+
+// --- text for and from other programs ---
+
+bool IsExchanged() { return TheDisplay().Serves(CurrentThread()->id); }
+
+HANDLE BlockOfText(std::u16string_view lines) {
+  std::u16string text;
+  for (const char16_t unit : lines) {
+    if (unit == '\n' && !text.ends_with('\r')) text += '\r';
+    text += unit;
+  }
+  const HGLOBAL block = GlobalAlloc(GMEM_MOVEABLE, (text.size() + 1) * sizeof(WCHAR));
+  auto* target = block != nullptr ? static_cast<WCHAR*>(GlobalLock(block)) : nullptr;
+  if (target == nullptr) throw std::bad_alloc();
+  std::copy_n(text.c_str(), text.size() + 1, target);
+  GlobalUnlock(block);
+  return block;
+}
+
+std::u16string TextOfBlock(HANDLE block) {
+  std::u16string text;
+  const auto* units = static_cast<const WCHAR*>(GlobalLock(block));
+  if (units == nullptr) return text;
+  for (const WCHAR* end = units + GlobalSize(block) / sizeof(WCHAR); units != end && *units != 0; ++units) {
+    if (*units != '\r' || units + 1 == end || units[1] != '\n') text += *units;
+  }
+  GlobalUnlock(block);
+  return text;
+}
+
+// Without the lock. Does nothing while somebody has the clipboard open.
+void TakeFromOthers() {
+  std::u16string text;
+  if (!IsExchanged() || !TheDisplay().ClipboardText(&text)) return;
+  const Guard guard;
+  Clipboard& clipboard = TheClipboard();
+  if (clipboard.user != nullptr || text == clipboard.sent) return;
+  const HANDLE block = BlockOfText(text);
+  Empty(clipboard);
+  clipboard.owner = nullptr;
+  clipboard.sent = text;
+  clipboard.data.push_back({CF_UNICODETEXT, block});
+}
+
+// Without the lock: after a change.
+void GiveToOthers() {
+  std::u16string text;
+  {
+    const Guard guard;
+    Clipboard& clipboard = TheClipboard();
+    if (!std::exchange(clipboard.hasChanged, false)) return;
+    if (const HANDLE* block = Find(clipboard, CF_UNICODETEXT)) text = TextOfBlock(*block);
+    clipboard.sent = text;
+  }
+  if (IsExchanged()) TheDisplay().SetClipboardText(text);
+}
+
 }  // namespace
 }  // namespace platform::model
 
@@ -40,23 +106,31 @@ using namespace platform::model;
 
 BOOL OpenClipboard(HWND window) {
   Thread* thread = CurrentThread();
-  const Guard guard;
-  Clipboard& clipboard = TheClipboard();
-  if (clipboard.user != nullptr && (clipboard.user != thread || clipboard.window != window))
-    return Fail(ERROR_ACCESS_DENIED);
-  if (window != nullptr && Expect(window) == nullptr) return FALSE;
-  clipboard.user = thread;
-  clipboard.window = window;
-  return TRUE;
+  return OrNoMemory<BOOL>(FALSE, [&]() -> BOOL {
+    TakeFromOthers();
+    const Guard guard;
+    Clipboard& clipboard = TheClipboard();
+    if (clipboard.user != nullptr && (clipboard.user != thread || clipboard.window != window))
+      return Fail(ERROR_ACCESS_DENIED);
+    if (window != nullptr && Expect(window) == nullptr) return FALSE;
+    clipboard.user = thread;
+    clipboard.window = window;
+    return TRUE;
+  });
 }
 
 BOOL CloseClipboard() {
   Thread* thread = CurrentThread();
-  const Guard guard;
-  Clipboard* clipboard = Opened(thread);
-  if (clipboard == nullptr) return FALSE;
-  clipboard->user = nullptr;
-  return TRUE;
+  return OrNoMemory<BOOL>(FALSE, [&]() -> BOOL {
+    {
+      const Guard guard;
+      Clipboard* clipboard = Opened(thread);
+      if (clipboard == nullptr) return FALSE;
+      clipboard->user = nullptr;
+    }
+    GiveToOthers();
+    return TRUE;
+  });
 }
 
 BOOL EmptyClipboard() {
@@ -64,9 +138,9 @@ BOOL EmptyClipboard() {
   const Guard guard;
   Clipboard* clipboard = Opened(thread);
   if (clipboard == nullptr) return FALSE;
-  for (const auto& entry : clipboard->data) GlobalFree(entry.second);
-  clipboard->data.clear();
+  Empty(*clipboard);
   clipboard->owner = clipboard->window;
+  clipboard->hasChanged = true;
   return TRUE;
 }
 
@@ -76,6 +150,7 @@ HANDLE SetClipboardData(UINT format, HANDLE memory) {
     const Guard guard;
     Clipboard* clipboard = Opened(thread);
     if (clipboard == nullptr) return nullptr;
+    clipboard->hasChanged = true;
     if (HANDLE* former = Find(*clipboard, format)) {
       GlobalFree(std::exchange(*former, memory));
     } else {
@@ -94,8 +169,11 @@ HANDLE GetClipboardData(UINT format) {
 }
 
 BOOL IsClipboardFormatAvailable(UINT format) {
-  const Guard guard;
-  return Find(TheClipboard(), format) != nullptr;
+  return OrNoMemory<BOOL>(FALSE, [&]() -> BOOL {
+    TakeFromOthers();
+    const Guard guard;
+    return Find(TheClipboard(), format) != nullptr;
+  });
 }
 
 HWND GetClipboardOwner() {

@@ -4,7 +4,7 @@
 
 #include <pixman.h>
 
-#include "qxcore/platform/win32.h"
+#include "qxcore/platform/posix/display/display.h"
 
 namespace platform {
 
@@ -37,6 +37,8 @@ struct Painter {
   SIZE (*textSize)(LPCWSTR text, int count, bool isMenu) = nullptr;
   // A font for a dialog, of the given height in pixels (negative: of the characters), and its dialog base units.
   HFONT (*dialogFont)(LPCWSTR face, int height, int weight, bool isItalic, SIZE* units) = nullptr;
+  // The pixels of a top-level window; false before anything was drawn.
+  bool (*pixels)(void* surface, ShownPixels* pixels) = nullptr;
   // The pixels of a top-level window are no longer needed.
   void (*freeSurface)(void* surface) = nullptr;
 };

@@ -1,9 +1,9 @@
-// Files that are dropped on a window: reading the block that WM_DROPFILES carries.
+// Files that are dropped on a window: making and reading the block that WM_DROPFILES carries.
+
+#include "qxcore/platform/posix/window/drop_files.h"
 
 #include <algorithm>
 #include <cstring>
-
-#include "qxcore/platform/win32.h"
 
 namespace {
 
@@ -41,7 +41,54 @@ class Locked {
   const Drop* m_drop;
 };
 
+// The window that accepts files at a point of the screen; null for none.
+HWND AcceptingWindow(HWND top, POINT point) {
+  HWND window = top;
+  for (HWND child = top; child != nullptr;) {
+    window = child;
+    POINT inside = point;
+    ::ScreenToClient(window, &inside);
+    child = ::ChildWindowFromPoint(window, inside);
+    if (child == window) break;
+  }
+  while (window != nullptr && !(::GetWindowLongPtrW(window, GWL_EXSTYLE) & WS_EX_ACCEPTFILES)) {
+    window = window != top ? ::GetAncestor(window, GA_PARENT) : nullptr;
+  }
+  return window;
+}
+
+// Paths follow the layout, each with its NUL, and one more NUL.
+HGLOBAL BlockOf(const platform::model::List<platform::model::Text>& files, POINT point, bool isOutside) {
+  std::size_t length = 1;
+  for (const auto& file : files) length += file.size() + 1;
+  const HGLOBAL block = ::GlobalAlloc(GMEM_MOVEABLE | GMEM_ZEROINIT, sizeof(Drop) + length * sizeof(WCHAR));
+  auto* drop = block != nullptr ? static_cast<Drop*>(::GlobalLock(block)) : nullptr;
+  if (drop == nullptr) throw std::bad_alloc();
+  *drop = {sizeof(Drop), point, isOutside, TRUE};
+  auto* target = reinterpret_cast<WCHAR*>(drop + 1);
+  for (const auto& file : files) target = std::copy_n(file.c_str(), file.size() + 1, target);
+  ::GlobalUnlock(block);
+  return block;
+}
+
 }  // namespace
+
+namespace platform::model {
+
+bool PostDroppedFiles(HWND top, POINT point, const List<Text>& files) {
+  const HWND window = AcceptingWindow(top, point);
+  if (window == nullptr || files.empty()) return false;
+  POINT inside = point;
+  RECT client{};
+  ::ScreenToClient(window, &inside);
+  ::GetClientRect(window, &client);
+  const HGLOBAL block = BlockOf(files, inside, !::PtInRect(&client, inside));
+  if (::PostMessageW(window, WM_DROPFILES, reinterpret_cast<WPARAM>(block), 0)) return true;
+  ::GlobalFree(block);
+  return false;
+}
+
+}  // namespace platform::model
 
 UINT DragQueryFileW(HDROP drop, UINT index, LPWSTR buffer, UINT capacity) {
   const Locked block(drop);

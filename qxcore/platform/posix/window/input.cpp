@@ -70,8 +70,8 @@ void NoteKey(BYTE* keys, WORD key, bool isUp) {
   }
 }
 
-void Enqueue(Thread* thread, const MSG& message, UINT flag) {
-  thread->input.Push(message);
+void Enqueue(Thread* thread, const MSG& message, UINT flag, WCHAR typed = 0) {
+  thread->input.Push({message, typed});
   thread->changed |= flag;
   Wake(thread);
 }
@@ -101,7 +101,7 @@ void ReportMouse(UINT message, POINT point, int data) {
   if (thread == nullptr) return;
   // A move replaces one that still waits.
   if (message == WM_MOUSEMOVE && !thread->input.IsEmpty()) {
-    MSG& last = thread->input.At(thread->input.Count() - 1);
+    MSG& last = thread->input.At(thread->input.Count() - 1).message;
     if (last.message == WM_MOUSEMOVE) {
       last.pt = point;
       return;
@@ -112,14 +112,14 @@ void ReportMouse(UINT message, POINT point, int data) {
           message == WM_MOUSEMOVE ? QS_MOUSEMOVE : QS_MOUSEBUTTON);
 }
 
-void ReportKey(WORD key, WORD scan, bool isUp, bool isExtended) {
+void ReportKey(WORD key, WORD scan, bool isUp, bool isExtended, WCHAR typed) {
   NoteKey(g_asyncKeys, key, isUp);
   const LPARAM lParam =
       1 | static_cast<LPARAM>(scan) << 16 | (isExtended ? 1 << 24 : 0) | (isUp ? static_cast<LPARAM>(0xC0000000) : 0);
   Enqueue(KeyThread(CurrentThread()),
           {nullptr, isUp ? static_cast<UINT>(WM_KEYUP) : static_cast<UINT>(WM_KEYDOWN), key, lParam,
            static_cast<DWORD>(Now()), g_cursorPoint},
-          QS_KEY);
+          QS_KEY, typed);
 }
 
 Hit HitTest(POINT point) {
@@ -146,7 +146,8 @@ Hit HitTest(POINT point) {
 
 bool TakeInput(Thread* thread, MSG* message, const Filter& filter, bool remove) {
   for (std::size_t i = 0; i < thread->input.Count();) {
-    const MSG raw = thread->input.At(i);
+    const Input input = thread->input.At(i);
+    const MSG& raw = input.message;
     MSG routed = raw;
     // What a filter shuts out before it is routed stays; the kind of message may still change.
     const bool isKey = !IsMouse(raw.message);
@@ -168,6 +169,7 @@ bool TakeInput(Thread* thread, MSG* message, const Filter& filter, bool remove) 
       continue;
     }
     *message = routed;
+    if (isKey) thread->lastKey = {routed, input.typed};
     if (remove) {
       thread->input.Remove(i);
     } else if (isKey) {

@@ -1,6 +1,7 @@
 // The one entrance of input, for SendInput and for displays alike: tests and users take the same road.
 #pragma once
 
+#include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/thread.h"
 
 namespace platform::model {
@@ -9,7 +10,8 @@ namespace platform::model {
 // A mouse message (WM_MOUSEMOVE, a button, a wheel) at a point of the screen; `data` is the wheel's delta.
 void ReportMouse(UINT message, POINT point, int data);
 // A key, by its virtual number; a character without a key as VK_PACKET with the character in `scan`.
-void ReportKey(WORD key, WORD scan, bool isUp, bool isExtended);
+// `typed` is what the keyboard's own layout makes of the key; kByLayout leaves that to TranslateMessage.
+void ReportKey(WORD key, WORD scan, bool isUp, bool isExtended, WCHAR typed = DisplayEvents::kByLayout);
 
 // The window below a point of the screen, by WM_NCHITTEST of the caller's own windows. Without the lock.
 struct Hit {

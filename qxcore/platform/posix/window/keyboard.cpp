@@ -41,6 +41,14 @@ WCHAR CharacterOf(WPARAM key, const BYTE* keys) {
   return 0;
 }
 
+// What the keyboard's own layout made of a key that was taken from the queue.
+WCHAR TypedBy(Thread* thread, const MSG& message) {
+  const Guard guard;
+  const MSG& last = thread->lastKey.message;
+  const bool isLast = last.message == message.message && last.wParam == message.wParam && last.time == message.time;
+  return isLast ? thread->lastKey.typed : DisplayEvents::kByLayout;
+}
+
 bool IsSystemKey(const Thread* thread, const MSG& message) {
   if (message.wParam == VK_F10) return true;
   if (IsDown(thread->keys, VK_CONTROL)) return false;
@@ -114,7 +122,9 @@ BOOL TranslateMessage(const MSG* message) {
   const bool isPacket = message->wParam == VK_PACKET;
   BYTE keys[256];
   GetKeyboardState(keys);
-  const WCHAR character = isPacket ? HIWORD(message->lParam) : CharacterOf(message->wParam, keys);
+  WCHAR character = TypedBy(thread, *message);
+  if (isPacket) character = HIWORD(message->lParam);
+  if (character == platform::DisplayEvents::kByLayout) character = CharacterOf(message->wParam, keys);
   if (character == 0) return TRUE;
   return OrNoMemory<BOOL>(FALSE, [&] {
     const Guard guard;

@@ -84,7 +84,7 @@ void MenuLoop::WaitForAny() {
   Thread* thread = CurrentThread();
   MSG message;
   const Guard guard;
-  while (!TakeMessage(thread, &message, {nullptr, 0, 0}, false)) WaitForMessage(thread);
+  while (thread->menuOwner == m_owner && !TakeMessage(thread, &message, {nullptr, 0, 0}, false)) WaitForMessage(thread);
 }
 
 }  // namespace platform::model

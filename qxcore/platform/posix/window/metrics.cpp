@@ -28,25 +28,11 @@ constexpr Metric kLengths[] = {
 
 // Counts, flags and widths of lines, which do not.
 constexpr Metric kFixed[] = {
-    {SM_CXBORDER, 1},
-    {SM_CYBORDER, 1},
-    {SM_CXDLGFRAME, 3},
-    {SM_CYDLGFRAME, 3},
-    {SM_MOUSEPRESENT, 1},
-    {SM_CXDOUBLECLK, 4},
-    {SM_CYDOUBLECLK, 4},
-    {SM_CMOUSEBUTTONS, 3},
-    {SM_CXEDGE, 2},
-    {SM_CYEDGE, 2},
-    {SM_ARRANGE, 8},
-    {SM_NETWORK, 3},
-    {SM_CXDRAG, 4},
-    {SM_CYDRAG, 4},
-    {SM_MOUSEWHEELPRESENT, 1},
-    {SM_CMONITORS, 1},
-    {SM_SAMEDISPLAYFORMAT, 1},
-    {SM_CXFOCUSBORDER, 1},
-    {SM_CYFOCUSBORDER, 1},
+    {SM_CXBORDER, 1},      {SM_CYBORDER, 1},      {SM_CXDLGFRAME, 3},        {SM_CYDLGFRAME, 3},
+    {SM_MOUSEPRESENT, 1},  {SM_CXDOUBLECLK, 4},   {SM_CYDOUBLECLK, 4},       {SM_CMOUSEBUTTONS, 3},
+    {SM_CXEDGE, 2},        {SM_CYEDGE, 2},        {SM_ARRANGE, 8},           {SM_NETWORK, 3},
+    {SM_CXDRAG, 4},        {SM_CYDRAG, 4},        {SM_MOUSEWHEELPRESENT, 1}, {SM_SAMEDISPLAYFORMAT, 1},
+    {SM_CXFOCUSBORDER, 1}, {SM_CYFOCUSBORDER, 1},
 };
 
 int OfScreen(int index, UINT dpi) {
@@ -54,6 +40,8 @@ int OfScreen(int index, UINT dpi) {
   const RECT work = TheDisplay().WorkArea();
   const int frame = 2 * GetSystemMetricsForDpi(SM_CXSIZEFRAME, dpi);
   switch (index) {
+    case SM_CMONITORS:
+      return TheDisplay().Monitors();
     case SM_CXSCREEN:
     case SM_CXVIRTUALSCREEN:
       return screen.cx;

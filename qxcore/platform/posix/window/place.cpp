@@ -2,10 +2,10 @@
 
 #include "qxcore/platform/posix/window/place.h"
 
-#include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/activate.h"
 #include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/default_proc.h"
+#include "qxcore/platform/posix/window/on_display.h"
 #include "qxcore/platform/posix/window/paint.h"
 #include "qxcore/platform/posix/window/send.h"
 #include "qxcore/platform/posix/window/tree.h"
@@ -125,20 +125,6 @@ HWND ParentHandle(HWND handle) {
   const Guard guard;
   const Window* window = FindWindowObject(handle);
   return window != nullptr && window->IsChild() ? HandleOf(window->parent) : nullptr;
-}
-
-// What the display shows of a top-level window.
-void ShowOnDisplay(HWND handle) {
-  RECT rect{};
-  bool isShown = false;
-  {
-    const Guard guard;
-    const Window* window = FindWindowObject(handle);
-    if (window == nullptr || window->parent != Desktop()) return;
-    rect = window->window;
-    isShown = window->IsVisible();
-  }
-  TheDisplay().Show(handle, isShown, rect);
 }
 
 // What of the window's pixels stays valid moves along: all of it when it only moved, else the part of the client

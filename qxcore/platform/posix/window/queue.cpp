@@ -203,7 +203,7 @@ DWORD GetQueueStatus(UINT flags) {
   if (!thread->sent.IsEmpty()) now |= QS_SENDMESSAGE;
   if (thread->paints > 0) now |= QS_PAINT;
   for (std::size_t i = 0; i < thread->input.Count(); ++i) {
-    const UINT message = thread->input.At(i).message;
+    const UINT message = thread->input.At(i).message.message;
     now |= message <= WM_KEYLAST ? QS_KEY : message == WM_MOUSEMOVE ? QS_MOUSEMOVE : QS_MOUSEBUTTON;
   }
   const std::uint64_t* due = NextTimer(thread);

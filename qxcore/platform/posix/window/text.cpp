@@ -22,7 +22,7 @@ bool SetText(HWND handle, LPCWSTR text) {
 
 LRESULT DefaultSetText(HWND handle, LPCWSTR text) {
   if (!SetText(handle, text)) return FALSE;
-  if (IsTopLevel(handle)) TheDisplay().SetTitle(handle, text != nullptr ? text : WTEXT(""));
+  if (IsTopLevel(handle)) TheDisplay().SetTitle(handle, text != nullptr ? text : u"");
   PaintFrame(handle);
   return TRUE;
 }

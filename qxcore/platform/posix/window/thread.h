@@ -20,6 +20,12 @@ struct SentMessage {
   Thread* sender = nullptr;
 };
 
+// An input event as the device reported it; the window is found when it is taken.
+struct Input {
+  MSG message;
+  WCHAR typed = 0;  // of a key, see ReportKey
+};
+
 struct Hook : OnModelHeap {
   HHOOK handle = nullptr;
   int kind = 0;
@@ -84,7 +90,8 @@ struct Thread {
   bool isWoken = false;
 
   Ring<MSG> posted;
-  Ring<MSG> input;  // as it came from the device: the window is found when it is taken
+  Ring<Input> input;
+  Input lastKey{};  // the one that was taken last
   Ring<SentMessage*> sent;
   bool quits = false;
   int quitCode = 0;

@@ -1,0 +1,23 @@
+// What the X server says of the desktop and SDL does not.
+#pragma once
+
+#include <string>
+
+struct SDL_Window;
+
+namespace platform::sdl {
+
+struct Desktop {
+  bool hasWindowManager = false;  // that frames windows and lets the user move them
+  unsigned dpi = 0;               // the user's choice for texts (Xft.dpi); 0 for none
+};
+// Without an X server nothing.
+Desktop AskDesktop();
+
+// Where the pointer is now; SDL's own answer is that of the last event. False without an X server.
+bool FindPointer(int* x, int* y);
+
+// Names a window in UTF-8 for the window manager. SDL's own way needs a locale that has the characters.
+void NameWindow(SDL_Window* window, const std::string& name);
+
+}  // namespace platform::sdl

@@ -1,0 +1,205 @@
+#include "tests/display/x_client.h"
+
+#include <X11/Xatom.h>
+#include <X11/Xlib.h>
+#include <X11/Xutil.h>
+#include <dlfcn.h>
+#include <poll.h>
+
+#include <atomic>
+#include <cstring>
+#include <stdexcept>
+#include <thread>
+
+namespace test {
+
+struct XClient::State {
+  ::Display* server = XOpenDisplay(nullptr);
+  ::Window root = None, own = None;
+
+  // The extension for input, as far as it is called.
+  int (*fakeMotion)(::Display*, int, int, int, unsigned long) = nullptr;
+  int (*fakeButton)(::Display*, unsigned, int, unsigned long) = nullptr;
+  int (*fakeKey)(::Display*, unsigned, int, unsigned long) = nullptr;
+
+  std::thread server_of_text;
+  std::atomic<bool> ends{false};
+
+  State() {
+    if (server == nullptr) throw std::runtime_error("there is no X server");
+    root = DefaultRootWindow(server);
+    own = XCreateSimpleWindow(server, root, 1200, 900, 20, 20, 0, 0, 0);
+    if (void* module = dlopen("libXtst.so.6", RTLD_NOW | RTLD_LOCAL)) {
+      fakeMotion = reinterpret_cast<decltype(fakeMotion)>(dlsym(module, "XTestFakeMotionEvent"));
+      fakeButton = reinterpret_cast<decltype(fakeButton)>(dlsym(module, "XTestFakeButtonEvent"));
+      fakeKey = reinterpret_cast<decltype(fakeKey)>(dlsym(module, "XTestFakeKeyEvent"));
+    }
+  }
+  ~State() {
+    ends = true;
+    if (server_of_text.joinable()) server_of_text.join();
+    XCloseDisplay(server);
+  }
+
+  // The name that window managers show.
+  std::string NameOf(::Window window) const {
+    Atom type = None;
+    int format = 0;
+    unsigned long count = 0, rest = 0;
+    unsigned char* value = nullptr;
+    XGetWindowProperty(server, window, XInternAtom(server, "_NET_WM_NAME", False), 0, 1000, False, AnyPropertyType,
+                       &type, &format, &count, &rest, &value);
+    const std::string name = value != nullptr ? std::string(reinterpret_cast<char*>(value), count) : std::string();
+    if (value != nullptr) XFree(value);
+    return name;
+  }
+  ::Window Find(const std::string& title, ::Window from) const {
+    if (NameOf(from) == title) return from;
+    ::Window ignored, parent, *children = nullptr, found = None;
+    unsigned count = 0;
+    if (XQueryTree(server, from, &ignored, &parent, &children, &count) == 0) return None;
+    for (unsigned i = 0; i < count && found == None; ++i) found = Find(title, children[i]);
+    if (children != nullptr) XFree(children);
+    return found;
+  }
+  ::Window Find(const std::string& title) const { return Find(title, root); }
+};
+
+XClient::XClient() : m_state(std::make_unique<State>()) {}
+XClient::~XClient() = default;
+
+bool XClient::CanType() const { return m_state->fakeMotion && m_state->fakeButton && m_state->fakeKey; }
+
+// --- hands ---
+
+void XClient::Move(POINT point) {
+  m_state->fakeMotion(m_state->server, -1, point.x, point.y, 0);
+  XSync(m_state->server, False);
+}
+
+void XClient::Button(int button, bool isDown) {
+  m_state->fakeButton(m_state->server, static_cast<unsigned>(button), isDown, 0);
+  XSync(m_state->server, False);
+}
+
+void XClient::Click(POINT point) {
+  Move(point);
+  Button(1, true);
+  Button(1, false);
+}
+
+void XClient::Key(const char* name, bool isDown) {
+  const KeyCode code = XKeysymToKeycode(m_state->server, XStringToKeysym(name));
+  m_state->fakeKey(m_state->server, code, isDown, 0);
+  XSync(m_state->server, False);
+}
+
+// --- eyes ---
+
+std::vector<std::uint32_t> XClient::Pixels(const RECT& rect) {
+  const unsigned width = static_cast<unsigned>(rect.right - rect.left),
+                 height = static_cast<unsigned>(rect.bottom - rect.top);
+  XImage* image = XGetImage(m_state->server, m_state->root, rect.left, rect.top, width, height, AllPlanes, ZPixmap);
+  std::vector<std::uint32_t> pixels;
+  if (image == nullptr) return pixels;
+  for (int y = 0; y < image->height; ++y)
+    for (int x = 0; x < image->width; ++x)
+      pixels.push_back(static_cast<std::uint32_t>(XGetPixel(image, x, y)) & 0xFFFFFF);
+  XDestroyImage(image);
+  return pixels;
+}
+
+// --- windows ---
+
+bool XClient::HasWindow(const std::string& title) { return m_state->Find(title) != None; }
+
+void XClient::Place(const std::string& title, const RECT& rect) {
+  XMoveResizeWindow(m_state->server, m_state->Find(title), rect.left, rect.top,
+                    static_cast<unsigned>(rect.right - rect.left), static_cast<unsigned>(rect.bottom - rect.top));
+  XSync(m_state->server, False);
+}
+
+void XClient::AskToClose(const std::string& title) {
+  ::Display* server = m_state->server;
+  XEvent event{};
+  event.xclient.type = ClientMessage;
+  event.xclient.window = m_state->Find(title);
+  event.xclient.message_type = XInternAtom(server, "WM_PROTOCOLS", False);
+  event.xclient.format = 32;
+  event.xclient.data.l[0] = static_cast<long>(XInternAtom(server, "WM_DELETE_WINDOW", False));
+  event.xclient.data.l[1] = CurrentTime;
+  XSendEvent(server, event.xclient.window, False, NoEventMask, &event);
+  XSync(server, False);
+}
+
+void XClient::TakeKeyboard() {
+  XMapWindow(m_state->server, m_state->own);
+  XSync(m_state->server, False);
+  XSetInputFocus(m_state->server, m_state->own, RevertToPointerRoot, CurrentTime);
+  XSync(m_state->server, False);
+}
+
+void XClient::GiveKeyboard(const std::string& title) {
+  XSetInputFocus(m_state->server, m_state->Find(title), RevertToPointerRoot, CurrentTime);
+  XSync(m_state->server, False);
+}
+
+// --- the clipboard ---
+
+void XClient::AskForText() {
+  ::Display* server = m_state->server;
+  XConvertSelection(server, XInternAtom(server, "CLIPBOARD", False), XInternAtom(server, "UTF8_STRING", False),
+                    XInternAtom(server, "ANSWER", False), m_state->own, CurrentTime);
+  XSync(server, False);
+}
+
+bool XClient::Answer(std::string* text) {
+  XEvent event;
+  if (!XCheckTypedEvent(m_state->server, SelectionNotify, &event)) return false;
+  text->clear();
+  Atom type = None;
+  int format = 0;
+  unsigned long count = 0, rest = 0;
+  unsigned char* value = nullptr;
+  XGetWindowProperty(m_state->server, m_state->own, XInternAtom(m_state->server, "ANSWER", False), 0, 1000, True,
+                     AnyPropertyType, &type, &format, &count, &rest, &value);
+  if (value != nullptr) {
+    text->assign(reinterpret_cast<char*>(value), count);
+    XFree(value);
+  }
+  return true;
+}
+
+void XClient::OfferText(const std::string& text) {
+  ::Display* server = m_state->server;
+  const Atom clipboard = XInternAtom(server, "CLIPBOARD", False), utf8 = XInternAtom(server, "UTF8_STRING", False);
+  XSetSelectionOwner(server, clipboard, m_state->own, CurrentTime);
+  XSync(server, False);
+  m_state->server_of_text = std::thread([this, server, utf8, text] {
+    while (!m_state->ends) {
+      pollfd waiting{ConnectionNumber(server), POLLIN, 0};
+      poll(&waiting, 1, 20);
+      XEvent event;
+      while (XPending(server) > 0) {
+        XNextEvent(server, &event);
+        if (event.type != SelectionRequest) continue;
+        const XSelectionRequestEvent& request = event.xselectionrequest;
+        XEvent answer{};
+        answer.xselection.type = SelectionNotify;
+        answer.xselection.requestor = request.requestor;
+        answer.xselection.selection = request.selection;
+        answer.xselection.target = request.target;
+        answer.xselection.time = request.time;
+        answer.xselection.property = request.target == utf8 ? request.property : None;
+        if (request.target == utf8) {
+          XChangeProperty(server, request.requestor, request.property, utf8, 8, PropModeReplace,
+                          reinterpret_cast<const unsigned char*>(text.data()), static_cast<int>(text.size()));
+        }
+        XSendEvent(server, request.requestor, False, NoEventMask, &answer);
+        XFlush(server);
+      }
+    }
+  });
+}
+
+}  // namespace test
