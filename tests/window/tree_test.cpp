@@ -138,6 +138,20 @@ TEST(WindowTree, RandomTreesKeepTheirShape) {
   EXPECT_EQ(g_alive, 0);
 }
 
+// Nothing of a window is kept while it is minimised, so that its children must be painted as well.
+TEST(WindowTree, ARestoredWindowIsPaintedWithItsChildren) {
+  const HWND top = MakeCounting(nullptr, WS_OVERLAPPEDWINDOW | WS_CLIPCHILDREN | WS_VISIBLE);
+  const HWND child = MakeCounting(top, WS_CHILD | WS_VISIBLE);
+  ASSERT_NE(child, nullptr);
+  SetWindowPos(top, nullptr, 20, 20, 300, 200, SWP_NOZORDER);
+  ValidateRect(child, nullptr);
+  ASSERT_FALSE(GetUpdateRect(child, nullptr, FALSE));
+  ShowWindow(top, SW_MINIMIZE);
+  ShowWindow(top, SW_RESTORE);
+  EXPECT_TRUE(GetUpdateRect(child, nullptr, FALSE));
+  DestroyWindow(top);
+}
+
 TEST(WindowTree, StaleHandles) {
   const HWND window = MakeCounting(nullptr, WS_POPUP);
   const HWND child = MakeCounting(window, WS_CHILD);

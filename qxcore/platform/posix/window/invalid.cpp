@@ -60,10 +60,12 @@ void InvalidateChildren(Window* window, const Region& region, Erase erase, Child
 
 // Takes the children's places away, as long as anything is left to take from.
 void SubtractChildren(const Window* window, Region* region) {
-  for (const Window* child = window->firstChild; child != nullptr && !region->IsEmpty(); child = child->next) {
-    if (!child->IsVisible()) continue;
-    const RECT place = ChildInWindow(window, child);
-    if (!IsEmpty(Common(place, region->Bounds()))) region->Subtract(place);
+  const RECT client = ClientInWindow(window);
+  RECT bounds = Moved(region->Bounds(), -client.left, -client.top);
+  for (const Window* child = window->firstChild; child != nullptr && !IsEmpty(bounds); child = child->next) {
+    if (!child->IsVisible() || IsEmpty(Common(child->window, bounds))) continue;
+    region->Subtract(Moved(child->window, client.left, client.top));
+    bounds = Moved(region->Bounds(), -client.left, -client.top);
   }
 }
 
@@ -215,7 +217,8 @@ bool SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, b
   }
   const RECT oldPlace = Moved(oldClient, -oldWindow.left, -oldWindow.top);
   if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return isExposed;
-  Invalidate(window, spoiled, Erase::Yes, Children::Unclipped);
+  // Nothing is left of what the children showed, either, when all of the window is given up.
+  Invalidate(window, spoiled, Erase::Yes, flags & SWP_NOCOPYBITS ? Children::All : Children::Unclipped);
   return isExposed;
 }
 
