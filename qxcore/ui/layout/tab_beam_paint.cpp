@@ -6,8 +6,9 @@
 #include "qxcore/ui/layout/internal/edges.h"
 #include "qxcore/ui/layout/tab_beam.h"
 
+// Once all of the beam is invalid, it stays so until it is painted.
 void STabBeam::Repaint() {
-  if (m_hWnd != nullptr) InvalidateRect(nullptr, 0);
+  if (m_hWnd != nullptr && !std::exchange(m_awaitsPaint, true)) InvalidateRect(nullptr, 0);
 }
 
 void STabBeam::OnSize(UINT, int, int) { Repaint(); }
@@ -20,6 +21,7 @@ void STabBeam::OnSysColorChange() {
 }
 
 void STabBeam::OnPaint() {
+  m_awaitsPaint = false;
   SBufferedPaint paint(m_hWnd);
   if (SDC* dc = paint.Get()) DrawAll(dc);
 }
