@@ -49,8 +49,11 @@ class ShownSplitter {
 
 BENCH("resize a splitter of 16 x 16 panes/ours") {
   ShownSplitter splitter;
-  int step = 0;
-  for (auto _ : state) splitter.Resize(1600 - ++step % 2 * 100, 1200 - step % 2 * 100);
+  int less = 0;
+  for (auto _ : state) {
+    less = 100 - less;
+    splitter.Resize(1600 - less, 1200 - less);
+  }
 }
 
 class ShownBeam {
