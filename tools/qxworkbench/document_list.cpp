@@ -34,7 +34,7 @@ void DocumentList::SetFinding(int number, const Finding& finding) {
   const bool movesRow = m_column != Column::kName;
   if (movesRow) m_order.erase(m_order.begin() + RowOf(number));
   Document& document = m_documents[static_cast<std::size_t>(number)].document;
-  document.state = finding.error.empty() ? Document::kDetected : Document::kFailed;
+  document.state = finding.error.empty() ? Document::State::kDetected : Document::State::kFailed;
   document.encoding = finding.value;
   document.encodingName = finding.encoding;
   if (finding.error.empty()) document.bytes = finding.bytes;

@@ -7,12 +7,12 @@
 #include "tools/common/finding.h"
 
 struct Document {
-  enum State { kWaiting, kDetected, kFailed };
+  enum class State { kWaiting, kDetected, kFailed };
 
   SString path;        // as the library spells it
   SString name;        // the same below the open folder
   std::string native;  // the same as an argument of TextSource
-  State state = kWaiting;
+  State state = State::kWaiting;
   Encoding encoding = 0;  // with Finding's remark of XML
   SString encodingName;
   unsigned long long bytes = 0;

@@ -365,8 +365,8 @@ void WorkbenchFrame::ConvertSelected(Encoding to, const SString& folder) {
                         SString(),
                         "",
                         false};
-    if (document.state == Document::kWaiting) item.error = "its encoding is not known yet";
-    if (document.state == Document::kFailed) item.error = ToUtf8(document.warning);
+    if (document.state == Document::State::kWaiting) item.error = "its encoding is not known yet";
+    if (document.state == Document::State::kFailed) item.error = ToUtf8(document.warning);
     items.push_back(std::move(item));
   }
   if (items.empty()) throw Failure{"no file is selected"};

@@ -58,7 +58,7 @@ SString FileListView::CellText(const Document& document, Column column) const {
     case Column::kName:
       return document.name;
     case Column::kEncoding:
-      return document.state == Document::kWaiting ? SString(WTEXT("...")) : document.encodingName;
+      return document.state == Document::State::kWaiting ? SString(WTEXT("...")) : document.encodingName;
     case Column::kSize:
       return SizeText(document.bytes);
     default:
