@@ -36,7 +36,7 @@ class QXCORE_API SModeSetter {
   virtual void Set(InteractiveMode mode);  // sets another mode
 
  protected:
-  explicit SModeSetter(InteractiveMode& mode);
+  explicit SModeSetter(InteractiveMode& mode);  // which mode it is; it has to outlive the object
 
  private:
   InteractiveMode& m_mode;
