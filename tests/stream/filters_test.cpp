@@ -52,9 +52,9 @@ std::string Archive(const std::string& bytes, bool deflated) {
 }
 
 SInputStream* OpenFirst(SInputStream* in) {
-  auto* zip = new SZipInputStream(in, true);
+  auto zip = std::make_unique<SZipInputStream>(in, true);
   zip->GetNextEntry();
-  return zip;
+  return zip.release();
 }
 
 const std::vector<Filter>& Filters() {
@@ -70,9 +70,9 @@ const std::vector<Filter>& Filters() {
        Same},
       {"push-back",
        [](SInputStream* in) {
-         auto* pushback = new SInputPushbackStream(in, 3, true);
+         auto pushback = std::make_unique<SInputPushbackStream>(in, 3, true);
          pushback->Unread(static_cast<unsigned char>(pushback->Read()));
-         return pushback;
+         return pushback.release();
        },
        Same},
       {"inflater", [](SInputStream* in) { return new SInflaterInputStream(in, 33, true); }, Deflate, true},

@@ -17,6 +17,9 @@ static void SilenceDialogs() {}
 // The buffer of a system message is not given back, once an exception; that is meant.
 extern "C" const char* __lsan_default_suppressions() { return "leak:SECOMException::GetText"; }
 
+// A request beyond all memory fails under the sanitizer, too, instead of ending the program.
+extern "C" const char* __asan_default_options() { return "allocator_may_return_null=1"; }
+
 // Memory of a young process is zero by chance: what comes from the heap here never is.
 static void FillFreshMemory() {
 #ifdef __GLIBC__

@@ -68,7 +68,8 @@ HRESULT SMappedFile::Read(void* buffer, unsigned long* count) {
   *count = 0;
   if (const HRESULT status = NeedView()) return status;
   const std::size_t piece = std::min<std::size_t>(wanted, CountLeft());
-  const std::size_t done = platform::CopyFromView(buffer, m_view.GetPointer() + m_position, piece);
+  // Behind the end the cursor may lie where no address is.
+  const std::size_t done = piece == 0 ? 0 : platform::CopyFromView(buffer, m_view.GetPointer() + m_position, piece);
   *count = static_cast<unsigned long>(done);
   m_position += *count;
   return Result(done == piece ? SFile::kOk : SFile::kReadFailed);
@@ -80,7 +81,7 @@ HRESULT SMappedFile::Write(const void* buffer, unsigned long* count) {
   *count = 0;
   if (const HRESULT status = NeedView()) return status;
   const std::size_t piece = std::min<std::size_t>(wanted, CountLeft());
-  const std::size_t done = platform::CopyToView(m_view.GetPointer() + m_position, buffer, piece);
+  const std::size_t done = piece == 0 ? 0 : platform::CopyToView(m_view.GetPointer() + m_position, buffer, piece);
   *count = static_cast<unsigned long>(done);
   m_position += *count;
   return Result(done == wanted ? SFile::kOk : SFile::kWriteFailed);
