@@ -1,21 +1,11 @@
 // The order of the virtual functions of bars, splitters and tabs, which is part of the binary interface.
 
-#include <cstring>
-
 #include "tests/layout/layout_fixture.h"
+#include "tests/support/slots.h"
 
 namespace {
 
 constexpr int kAfterWindow = 31;  // SWnd's own, with the two slots of the destructor
-
-// The number of a virtual function, as a pointer to it holds it.
-template <class Function>
-std::ptrdiff_t SlotOf(Function function) {
-  std::ptrdiff_t parts[2];
-  static_assert(sizeof(function) == sizeof(parts));
-  std::memcpy(parts, &function, sizeof(parts));
-  return (parts[0] - 1) / static_cast<std::ptrdiff_t>(sizeof(void*));
-}
 
 template <class... Functions>
 void ExpectInOrder(Functions... functions) {

@@ -261,6 +261,17 @@ TEST_F(Beams, TabsBeforeTheWindow) {
   EXPECT_EQ(early.GetTabWidth(1), early.TextWidth(WTEXT("Sales figures"), false) + 8);
 }
 
+TEST_F(Beams, AChangeWhileDrawingIsLockedHidesNoLaterOne) {
+  Insert(1);
+  m_beam.SendMessageW(WM_SETREDRAW, 0);
+  m_beam.SetTabText(0, WTEXT("locked"));
+  m_beam.SendMessageW(WM_SETREDRAW, 1);
+  ValidateRect(m_beam.m_hWnd, nullptr);
+  EXPECT_FALSE(GetUpdateRect(m_beam.m_hWnd, nullptr, 0));
+  m_beam.SetTabText(0, WTEXT("later"));
+  EXPECT_TRUE(GetUpdateRect(m_beam.m_hWnd, nullptr, 0));
+}
+
 // A listener that deletes the beam's window in the middle of a choice.
 TEST_F(Beams, AWindowThatEndsWhileATabIsChosen) {
   Insert(3);

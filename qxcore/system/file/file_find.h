@@ -39,8 +39,8 @@ class QXCORE_API SFileFind : public SBaseFind {
   const SString& GetMask() const { return m_mask; }
 
  protected:
-  // FindFile for a caller that looks at folders only: the platform may leave out what is none, where it knows that
-  // without looking at each entry.
+  // FindFile for a caller that looks at folders only. The platform leaves other entries out where a listing says what
+  // they are; where it does not, they are found, too.
   int FindFolders(const WCHAR* mask);
 
  private:

@@ -165,7 +165,6 @@ class QXCORE_API STabBeam : public SWnd {
   SDC m_measure;  // for measuring texts
   int m_dpi = 96;
   bool m_hasGivenFont = false;    // by WM_SETFONT
-  bool m_awaitsPaint = false;     // all of it is invalid
   int m_pressed = kSTabNoButton;  // the button that the mouse is held down on
   SPoint m_pointer;               // where the mouse is meanwhile
 };

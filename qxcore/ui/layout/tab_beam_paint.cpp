@@ -6,9 +6,13 @@
 #include "qxcore/ui/layout/internal/edges.h"
 #include "qxcore/ui/layout/tab_beam.h"
 
-// Once all of the beam is invalid, it stays so until it is painted.
+// A beam that is invalid as a whole is left alone: who inserts many tabs asks for this each time. The system is asked,
+// for a window that may not be drawn now remembers nothing.
 void STabBeam::Repaint() {
-  if (m_hWnd != nullptr && !std::exchange(m_awaitsPaint, true)) InvalidateRect(nullptr, 0);
+  if (m_hWnd == nullptr) return;
+  RECT client, invalid;
+  ::GetClientRect(m_hWnd, &client);
+  if (!::GetUpdateRect(m_hWnd, &invalid, 0) || !::EqualRect(&invalid, &client)) InvalidateRect(nullptr, 0);
 }
 
 void STabBeam::OnSize(UINT, int, int) { Repaint(); }
@@ -21,7 +25,6 @@ void STabBeam::OnSysColorChange() {
 }
 
 void STabBeam::OnPaint() {
-  m_awaitsPaint = false;
   SBufferedPaint paint(m_hWnd);
   if (SDC* dc = paint.Get()) DrawAll(dc);
 }

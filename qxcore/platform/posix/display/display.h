@@ -87,7 +87,8 @@ class Display {
   // One of the IDC_ numbers; 0 hides the cursor.
   virtual void SetCursor(int shape) = 0;
 
-  // The text that programs exchange. ClipboardText returns false when there is none, or nobody to exchange it with.
+  // The text that programs exchange. ClipboardText returns false when the clipboard holds no text, and on a display
+  // without a clipboard.
   virtual bool ClipboardText(std::u16string* text) = 0;
   virtual void SetClipboardText(std::u16string_view text) = 0;
 
