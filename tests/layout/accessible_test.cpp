@@ -7,21 +7,7 @@ namespace {
 
 SPoint Middle(const SRect& rect) { return SPoint((rect.left + rect.right) / 2, (rect.top + rect.bottom) / 2); }
 
-class Accessible : public test::UiTest {
- protected:
-  void SetUp() override {
-    UiTest::SetUp();
-    m_frame = new SFrameWnd;
-    ASSERT_TRUE(m_frame->Create(nullptr, WTEXT("f"), WS_POPUP | WS_VISIBLE, SRect(0, 0, 600, 300)));
-  }
-  void TearDown() override {
-    m_frame->DestroyWindow();
-    UiTest::TearDown();
-  }
-
-  test::App m_app;
-  SFrameWnd* m_frame = nullptr;
-};
+class Accessible : public test::FrameTest {};
 
 TEST_F(Accessible, TabsAreATabStrip) {
   STabWnd tabs;

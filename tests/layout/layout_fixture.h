@@ -108,4 +108,21 @@ class KeyIsDown {
   int m_key;
 };
 
+// Tests whose bars stand in a shown frame.
+class FrameTest : public UiTest {
+ protected:
+  void SetUp() override {
+    UiTest::SetUp();
+    m_frame = new SFrameWnd;
+    ASSERT_TRUE(m_frame->Create(nullptr, WTEXT("f"), WS_POPUP | WS_VISIBLE, SRect(0, 0, 600, 300)));
+  }
+  void TearDown() override {
+    m_frame->DestroyWindow();
+    UiTest::TearDown();
+  }
+
+  App m_app;
+  SFrameWnd* m_frame = nullptr;
+};
+
 }  // namespace test

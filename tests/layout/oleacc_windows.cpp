@@ -83,20 +83,7 @@ void ExpectSame(const Found& found, const SAccessible& own) {
   }
 }
 
-class Oleacc : public test::UiTest {
- protected:
-  void SetUp() override {
-    UiTest::SetUp();
-    m_frame = new SFrameWnd;
-    ASSERT_TRUE(m_frame->Create(nullptr, WTEXT("f"), WS_POPUP | WS_VISIBLE, SRect(0, 0, 600, 300)));
-  }
-  void TearDown() override {
-    m_frame->DestroyWindow();
-    UiTest::TearDown();
-  }
-  test::App m_app;
-  SFrameWnd* m_frame = nullptr;
-};
+class Oleacc : public test::FrameTest {};
 
 TEST_F(Oleacc, FindsTheBarsOfASplitter) {
   SSplitterWnd splitter;
