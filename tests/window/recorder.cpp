@@ -41,6 +41,7 @@ std::map<HWND, std::string> g_windows;
 std::string g_text;
 int g_depth = 0;
 bool g_isOn = false;
+bool g_isLookingForMessages = false;
 
 std::string Narrow(LPCWSTR text) {
   std::string narrow;
@@ -59,8 +60,10 @@ std::string Who(HWND window) {
 
 // Messages about icons, input methods and palettes, questions of painting for the caption, and the private ones
 // are left out; so are hit tests, idle notifications and what comes of the mouse's resting place, which depend on the
-// display.
+// display. A WM_CANCELMODE that arrives while the queue is looked at is the display's, too: Wine sends it when the
+// X server's word that a window lost the input focus comes so late that the window is active again.
 bool IsListed(UINT message, LPARAM lParam) {
+  if (message == WM_CANCELMODE && g_isLookingForMessages) return false;
   if (message == WM_MOUSEMOVE || message == WM_NCMOUSEMOVE) return false;
   if (message == WM_SETCURSOR && (HIWORD(lParam) == WM_MOUSEMOVE || HIWORD(lParam) == WM_NCMOUSEMOVE)) return false;
   for (const MessageName& each : kNames)
@@ -222,9 +225,16 @@ void NoteDialog(HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) {
   if (IsListed(message, lParam)) Note(Who(dialog) + " " + NameOf(message) + Details(message, wParam, lParam));
 }
 
+static bool TakeMessage(MSG* message) {
+  g_isLookingForMessages = true;
+  const bool isThere = PeekMessageW(message, nullptr, 0, 0, PM_REMOVE) != 0;
+  g_isLookingForMessages = false;
+  return isThere;
+}
+
 void Pump() {
   MSG message;
-  while (PeekMessageW(&message, nullptr, 0, 0, PM_REMOVE)) {
+  while (TakeMessage(&message)) {
     TranslateMessage(&message);
     DispatchMessageW(&message);
   }
