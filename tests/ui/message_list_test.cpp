@@ -8,6 +8,7 @@
 #include <map>
 #include <sstream>
 
+#include "tests/support/display.h"
 #include "tests/support/wine.h"
 #include "tests/ui/dialog_template.h"
 #include "tests/ui/ui_fixture.h"
@@ -192,6 +193,8 @@ TEST_F(MessageLists, Command_ComesFromAMenu) {
   bar.CreateMenu();
   bar.AppendMenuW(MF_POPUP, reinterpret_cast<UINT_PTR>(file.Detach()), WTEXT("&File"));
   frame->SetMenu(bar.Detach());
+  test::HearTheDisplay();
+  test::PumpAll();
   Start();
   window = frame->m_hWnd;
   frame->SendMessageW(WM_SYSCOMMAND, SC_KEYMENU, 'f');

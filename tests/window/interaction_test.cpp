@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "tests/support/display.h"
 #include "tests/support/wine.h"
 #include "tests/window/recorder.h"
 
@@ -61,6 +62,7 @@ HWND MakeFrame() {
   const HWND top = Make(WTEXT("top"), WS_OVERLAPPEDWINDOW | WS_VISIBLE);
   Pump();
   SetMenu(top, MakeMenu());
+  test::HearTheDisplay();
   Pump();
   return top;
 }
@@ -289,7 +291,6 @@ TEST(Dialog, KeyboardWalksAndChooses) {
   DestroyWindow(dialog);
 }
 
-#ifndef _WIN32
 void Mouse(DWORD flags, int dx = 0, int dy = 0) {
   INPUT input{};
   input.type = INPUT_MOUSE;
@@ -322,13 +323,12 @@ bool PumpUntil(UINT wanted) {
 }
 
 // The press ends the menu, and is one in the window that it meets.
-// Under Wine it is the same when the press arrives, but on a busy machine input that is sent to a menu is lost now and
-// then.
 TEST(Input, APressBesideAnOpenMenu_ClosesItAndReachesTheWindowThere) {
   Record record;
   const HWND top = MakeFrame();
   const HWND other = Make(WTEXT("other"), WS_POPUP | WS_VISIBLE, nullptr, {400, 300, 500, 400});
   SetForegroundWindow(top);
+  test::HearTheDisplay();
   Pump();
   {
     const Steps steps({{WM_ENTERIDLE, [] {
@@ -348,7 +348,7 @@ TEST(Input, APressBesideAnOpenMenu_ClosesItAndReachesTheWindowThere) {
   DestroyWindow(top);
 }
 
-// Under Wine input that is sent while the loop of sizing begins can be lost, and the loop waits for ever.
+#ifndef _WIN32  // Under Wine input that is sent while the loop of sizing begins can be lost; the loop waits for ever.
 TEST(Input, TheBorderSizesTheWindow) {
   const HWND top = Make(WTEXT("top"), WS_OVERLAPPEDWINDOW | WS_VISIBLE, nullptr, {100, 100, 400, 300});
   SetForegroundWindow(top);
