@@ -132,8 +132,13 @@ int SString::IsRtf() const { return IsRtfText(m_text); }
 
 int SString::IsRtfText(const WCHAR* text) {
   if (text == nullptr) return 0;
-  SStringView view(text);
-  return view.substr(0, 5) == WTEXT("{\\rtf") || view.substr(0, 6) == WTEXT("{\\urtf");
+  // The text may be long: only its beginning is looked at.
+  const auto begins = [text](SStringView start) {
+    std::size_t at = 0;
+    while (at < start.size() && text[at] == start[at]) ++at;
+    return at == start.size();
+  };
+  return begins(WTEXT("{\\rtf")) || begins(WTEXT("{\\urtf"));
 }
 
 // --- numbers ---

@@ -7,8 +7,7 @@
 
 namespace draw {
 
-std::uint32_t Surface::Nearest(std::uint32_t pixel) const {
-  if (!mono) return pixel;
+std::uint32_t Surface::BlackOrWhite(std::uint32_t pixel) {
   std::uint32_t red = pixel >> 16 & 0xFF, green = pixel >> 8 & 0xFF, blue = pixel & 0xFF;
   return 30 * red + 59 * green + 11 * blue > 100 * 127 ? kWhitePixel : 0;
 }

@@ -23,7 +23,10 @@ struct Surface {
 
   std::uint32_t* Row(int y) const { return pixels + static_cast<std::ptrdiff_t>(stride) * y; }
   // A colour as this surface can hold it.
-  std::uint32_t Nearest(std::uint32_t pixel) const;
+  std::uint32_t Nearest(std::uint32_t pixel) const { return mono ? BlackOrWhite(pixel) : pixel; }
+
+ private:
+  static std::uint32_t BlackOrWhite(std::uint32_t pixel);
 };
 
 class Bitmap final : public Object {

@@ -4,10 +4,6 @@
 
 namespace draw {
 
-Box BoxOf(int left, int top, int right, int bottom) {
-  return {std::min(left, right), std::min(top, bottom), std::max(left, right), std::max(top, bottom)};
-}
-
 void Area::SetBox(const Box& box) {
   pixman_region32_fini(&m_region);
   if (IsEmpty(box))

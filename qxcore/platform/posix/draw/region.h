@@ -3,6 +3,7 @@
 
 #include <pixman.h>
 
+#include <algorithm>
 #include <vector>
 
 #include "qxcore/platform/posix/draw/object.h"
@@ -16,7 +17,9 @@ inline Box Intersect(const Box& a, const Box& b) {
   return {std::max(a.x1, b.x1), std::max(a.y1, b.y1), std::min(a.x2, b.x2), std::min(a.y2, b.y2)};
 }
 // The box of two corners in any order.
-Box BoxOf(int left, int top, int right, int bottom);
+inline Box BoxOf(int left, int top, int right, int bottom) {
+  return {std::min(left, right), std::min(top, bottom), std::max(left, right), std::max(top, bottom)};
+}
 
 // A pixman region as a value. What needs memory throws std::bad_alloc; an operation in place then leaves an empty
 // area, an assignment leaves the former one.

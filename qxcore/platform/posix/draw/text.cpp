@@ -102,8 +102,7 @@ void DrawLineOfText(Context& dc, POINT at, UINT options, const Box* rect, SStrin
   MovePosition(dc, width);
 }
 
-bool RecordText(Context& dc, int x, int y, UINT options, const RECT* rect, SStringView text, const int* advances) {
-  if (!dc.m_recorder) return false;
+BOOL RecordText(Context& dc, int x, int y, UINT options, const RECT* rect, SStringView text, const int* advances) {
   std::vector<int> keptAdvances;
   if (advances) keptAdvances.assign(advances, advances + text.size());
   RECT keptRect = rect ? *rect : RECT{};
@@ -111,7 +110,7 @@ bool RecordText(Context& dc, int x, int y, UINT options, const RECT* rect, SStri
     ExtTextOutW(to, x, y, options, hasRect ? &keptRect : nullptr, kept.data(), static_cast<UINT>(kept.size()),
                 keptAdvances.empty() ? nullptr : keptAdvances.data());
   });
-  return true;
+  return TRUE;
 }
 
 }  // namespace
@@ -125,7 +124,8 @@ BOOL ExtTextOutW(HDC handle, int x, int y, UINT options, const RECT* rect, LPCWS
   auto* dc = Find<Context>(handle);
   if (!dc) return FALSE;
   SStringView view(text ? text : WTEXT(""), text ? count : 0);
-  if (RecordText(*dc, x, y, options, rect, view, advances)) return TRUE;
+  if (dc->m_recorder) [[unlikely]]
+    return RecordText(*dc, x, y, options, rect, view, advances);
   Box box{};
   if (rect) box = dc->Map(*rect);
   if (rect && options & ETO_OPAQUE) PaintBox(*dc, box, SolidPaint(*dc, dc->m_settings.bkColor), R2_COPYPEN);
