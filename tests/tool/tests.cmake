@@ -5,6 +5,6 @@ if(TARGET qxtool)
     add_test(NAME tool.${list} COMMAND ${Python3_EXECUTABLE} ${CMAKE_CURRENT_LIST_DIR}/${list}_test.py
       $<TARGET_FILE:qxtool> $<$<BOOL:${WIN32}>:wine>
       COMMAND_EXPAND_LISTS)
-    set_tests_properties(tool.${list} PROPERTIES TIMEOUT 600)
+    set_tests_properties(tool.${list} PROPERTIES TIMEOUT 900)
   endforeach()
 endif()

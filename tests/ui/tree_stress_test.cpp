@@ -170,7 +170,7 @@ int Tree::OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* result) 
 
 class TreeStress : public test::UiTest {
  protected:
-  test::TimeLimit m_longer{280};
+  TreeStress() : UiTest(600) {}
 };
 
 TEST_F(TreeStress, WindowsAtRandom_LeaveNothing) {

@@ -88,7 +88,7 @@ inline void PumpAll() {
 // Ends the process when a test waits for longer: a modal path must never wait for a person.
 class TimeLimit {
  public:
-  explicit TimeLimit(int seconds = 30);
+  explicit TimeLimit(int seconds);
   TimeLimit(const TimeLimit&) = delete;
   TimeLimit& operator=(const TimeLimit&) = delete;
   ~TimeLimit();
@@ -101,6 +101,8 @@ class TimeLimit {
 // No test leaves a window, a permanent object or a pending exception behind.
 class UiTest : public testing::Test {
  protected:
+  // Seconds that one test may take, on the busiest machine.
+  explicit UiTest(int limit = 120) : m_limit(limit) {}
   void SetUp() override { m_permanent = SWnd::HandleMap().GetPermanentCount(); }
   void TearDown() override {
     PumpAll();
