@@ -298,7 +298,7 @@ class ZipTest(ToolCase):
         self.assert_fails(self.run_tool("test", "many.zip"), "not met in sequence")
         self.assert_fails(self.run_tool("extract-all", "many.zip", "out", "--max-bytes", 2_000_000), "more than 2000000 bytes")
         self.assert_fails(self.run_tool("extract-all", "many.zip", "out"), "not met in sequence")
-        self.assertLess(time.monotonic() - began, 30)
+        self.assertLess(time.monotonic() - began, 300)  # to read all 60 GB would take longer on any machine
 
     @unittest.skipIf(ON_WINE, "no signals reach a program under Wine")
     def test_interruption_ends_cleanly(self):
