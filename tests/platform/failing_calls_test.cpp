@@ -13,6 +13,7 @@
 
 #include "qxcore/platform/win32.h"
 #include "tests/support/failing_calls.h"
+#include "tests/support/file_size_limit.h"
 #include "tests/support/open_handles.h"
 #include "tests/support/temp_folder.h"
 
@@ -129,6 +130,46 @@ TEST_F(FailingCalls, CopyingAndMoving) {
       },
       [&] { return MoveFileExW(m_from.c_str(), away.c_str(), MOVEFILE_COPY_ALLOWED) != FALSE; },
       [&](bool isDone) { EXPECT_EQ(ReadAll(isDone ? away : m_from), kNew); });
+  test::RemoveAll(away);
+}
+
+// A signal that comes while the system reads or writes is no failure.
+TEST_F(FailingCalls, InterruptedOnesAreTakenUpAgain) {
+  if (!OrdersReachReads()) GTEST_SKIP() << "the sanitizer has its own read and write";
+  const Text away = WTEXT("C:\\dev\\shm\\qxcore-signals") + m_folder.Path().substr(m_folder.Path().rfind('\\') + 1);
+  const Text settings = m_folder.File(WTEXT("settings"));
+  WithEachCallFailing(
+      EINTR,
+      [&] {
+        const Orders orders = std::exchange(g_orders, {});
+        test::RemoveAll(away);
+        Put(m_from, kNew);
+        Put(m_to, kOld);
+        Put(settings, "[section]\r\nfirst=1\r\n");
+        g_orders = orders;
+        g_orders.forever = false;
+        EXPECT_TRUE(CopyFileW(m_from.c_str(), m_to.c_str(), FALSE)) << GetLastError();
+        EXPECT_TRUE(MoveFileExW(m_from.c_str(), away.c_str(), MOVEFILE_COPY_ALLOWED)) << GetLastError();
+        EXPECT_TRUE(WritePrivateProfileStringW(WTEXT("section"), WTEXT("first"), WTEXT("2"), settings.c_str()));
+      },
+      [&](bool) {
+        EXPECT_EQ(ReadAll(m_to), kNew);
+        EXPECT_EQ(ReadAll(away), kNew);
+        EXPECT_EQ(ReadAll(settings), "[section]\r\nfirst=2\r\n");
+      });
+  test::RemoveAll(away);
+}
+
+TEST_F(FailingCalls, AMoveWithoutRoomLeavesNothingElsewhere) {
+  const Text away = WTEXT("C:\\dev\\shm\\qxcore-full") + m_folder.Path().substr(m_folder.Path().rfind('\\') + 1);
+  if (!CreateDirectoryW(away.c_str(), nullptr)) GTEST_SKIP() << "no second file system";
+  Put(m_from, kNew);
+  {
+    const test::FileSizeLimit full(1000);
+    EXPECT_FALSE(MoveFileExW(m_from.c_str(), (away + WTEXT("\\to")).c_str(), MOVEFILE_COPY_ALLOWED));
+  }
+  EXPECT_EQ(ReadAll(m_from), kNew);
+  EXPECT_TRUE(RemoveDirectoryW(away.c_str())) << "there is something in it";
   test::RemoveAll(away);
 }
 

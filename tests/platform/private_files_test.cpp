@@ -23,6 +23,7 @@
 #include <string>
 #include <vector>
 
+#include "tests/support/failing_calls.h"
 #include "tests/support/registry_root.h"
 #include "tests/support/temp_folder.h"
 
@@ -31,20 +32,19 @@ namespace {
 // What the hooks below see and do.
 struct Hooks {
   bool hasNoLocks = false;     // as on a file system without them
-  bool watchesWrites = false;  // collects the rights of files that are written
-  std::vector<mode_t> rights;
+  std::vector<mode_t> rights;  // of files that were written; see WatchWrite
   int umaskCalls = 0;
 };
 Hooks g_hooks;
 
-template <class Function>
-Function* Real(const char* name) {
-  return reinterpret_cast<Function*>(dlsym(RTLD_NEXT, name));
+void WatchWrite(int file) {
+  struct stat info;
+  if (fstat(file, &info) == 0 && S_ISREG(info.st_mode)) g_hooks.rights.push_back(info.st_mode & 0777);
 }
 
 }  // namespace
 
-// These stand in front of the C library's for the whole program.
+// These stand in front of the C library's, and of the weak ones that fail on order, for the whole program.
 extern "C" int fcntl(int file, int command, ...) {
   static auto* const real = Real<int(int, int, ...)>("fcntl");
   va_list arguments;
@@ -55,15 +55,7 @@ extern "C" int fcntl(int file, int command, ...) {
     errno = EINVAL;
     return -1;
   }
-  return real(file, command, argument);
-}
-
-extern "C" ssize_t write(int file, const void* bytes, std::size_t count) {
-  static auto* const real = Real<ssize_t(int, const void*, std::size_t)>("write");
-  struct stat info;
-  if (g_hooks.watchesWrites && fstat(file, &info) == 0 && S_ISREG(info.st_mode))
-    g_hooks.rights.push_back(info.st_mode & 0777);
-  return real(file, bytes, count);
+  return MustFail() ? -1 : real(file, command, argument);
 }
 
 extern "C" mode_t umask(mode_t mask) noexcept {
@@ -103,7 +95,10 @@ bool IsRoot() { return geteuid() == 0; }
 class PrivateFiles : public testing::Test {
  protected:
   PrivateFiles() { chmod(Native(m_folder.Path()).c_str(), 0755); }
-  ~PrivateFiles() override { g_hooks = {}; }
+  ~PrivateFiles() override {
+    g_hooks = {};
+    g_beforeWrite = nullptr;
+  }
 
   Text Path(const WCHAR* name) const { return m_folder.File(name); }
   void Make(const WCHAR* name, const std::string& bytes, mode_t rights) const {
@@ -129,11 +124,11 @@ TEST_F(PrivateFiles, ACopyHasNoMoreRightsThanItsSourceAtAnyTime) {
     test::RemoveAll(Path(u"to"));
     Make(u"from", "secret", each.source);
     if (each.target != 0) Make(u"to", "old and longer", each.target);
-    g_hooks.watchesWrites = true;
+    g_beforeWrite = WatchWrite;
     g_hooks.rights.clear();
     g_hooks.umaskCalls = 0;
     EXPECT_TRUE(CopyFileW(Path(u"from").c_str(), Path(u"to").c_str(), FALSE)) << GetLastError();
-    g_hooks.watchesWrites = false;
+    g_beforeWrite = nullptr;
     EXPECT_EQ(g_hooks.umaskCalls, 0);
     EXPECT_EQ(RightsOf(Path(u"to")), each.result) << std::oct << each.source << ' ' << each.target;
     ASSERT_FALSE(g_hooks.rights.empty());
@@ -171,7 +166,7 @@ TEST_F(PrivateFiles, AMoveToAnotherFileSystemKeepsEverything) {
   utimensat(AT_FDCWD, Native(Path(u"from")).c_str(), times, 0);
   EXPECT_EQ(chown(Native(Path(u"from")).c_str(), 1234, 5678), 0);
   WriteAll(Path(u"disk\\to"), "old");
-  g_hooks.watchesWrites = true;
+  g_beforeWrite = WatchWrite;
   EXPECT_FALSE(MoveFileExW(Path(u"from").c_str(), Path(u"disk\\to").c_str(), MOVEFILE_REPLACE_EXISTING));
   EXPECT_EQ(GetLastError(), DWORD(ERROR_NOT_SAME_DEVICE));
   EXPECT_FALSE(MoveFileW(Path(u"from").c_str(), Path(u"disk\\to").c_str()));
@@ -223,7 +218,7 @@ TEST_F(PrivateFiles, AnIniFileKeepsItsRightsOwnerAndOtherNames) {
   if (IsRoot()) {
     EXPECT_EQ(chown(Native(Path(u"a.ini")).c_str(), 1234, 5678), 0);
   }
-  g_hooks.watchesWrites = true;
+  g_beforeWrite = WatchWrite;
   EXPECT_TRUE(SetKey(u"a.ini"));
   EXPECT_EQ(g_hooks.umaskCalls, 0);
   for (const mode_t rights : g_hooks.rights) EXPECT_EQ(rights & ~0604, 0u);

@@ -22,8 +22,12 @@ struct Orders {
 };
 inline Orders g_orders;
 
-inline bool MustFail() {
-  if (g_orders.failAt == 0) return false;
+// Is told of each write before it is done.
+inline void (*g_beforeWrite)(int file) = nullptr;
+
+// A signal interrupts reads and writes only: what else is called with files on disk does not wait.
+inline bool MustFail(bool mayBeInterrupted = false) {
+  if (g_orders.failAt == 0 || (g_orders.error == EINTR && !mayBeInterrupted)) return false;
   ++g_orders.calls;
   const bool fails = g_orders.forever ? g_orders.calls >= g_orders.failAt : g_orders.calls == g_orders.failAt;
   if (!fails) return false;
@@ -97,17 +101,18 @@ extern "C" __attribute__((weak)) int open(const char* path, int flags, ...) {
 extern "C" __attribute__((weak)) int close(int file) {
   static auto* const real = Real<int(int)>("close");
   const int result = real(file);  // closed all the same, as the kernel does it
-  return MustFail() ? -1 : result;
+  return MustFail(true) ? -1 : result;
 }
 
 extern "C" __attribute__((weak)) ssize_t read(int file, void* buffer, std::size_t count) {
   static auto* const real = Real<ssize_t(int, void*, std::size_t)>("read");
-  return MustFail() ? -1 : real(file, buffer, count);
+  return MustFail(true) ? -1 : real(file, buffer, count);
 }
 
 extern "C" __attribute__((weak)) ssize_t write(int file, const void* buffer, std::size_t count) {
   static auto* const real = Real<ssize_t(int, const void*, std::size_t)>("write");
-  return MustFail() ? -1 : real(file, buffer, count);
+  if (g_beforeWrite != nullptr) g_beforeWrite(file);
+  return MustFail(true) ? -1 : real(file, buffer, count);
 }
 
 extern "C" __attribute__((weak)) off_t lseek(int file, off_t offset, int whence) noexcept {
