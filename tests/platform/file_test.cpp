@@ -232,6 +232,12 @@ TEST(Files, RuntimeStreams) {
   ASSERT_NE(file, nullptr);
   std::fputs("line\r\n", file);
   EXPECT_EQ(platform::FileTell(file), 6);
+  const std::int64_t further = std::int64_t{5} << 30;
+  EXPECT_EQ(platform::FileSeek(file, further, SEEK_CUR), 0);
+  EXPECT_EQ(platform::FileTell(file), further + 6);
+  EXPECT_EQ(platform::FileSeek(file, 2, SEEK_SET), 0);
+  EXPECT_EQ(platform::FileTell(file), 2);
+  EXPECT_NE(platform::FileSeek(file, -1, SEEK_SET), 0);
   std::fclose(file);
   EXPECT_EQ(ReadAll(path), "line\r\n");
   EXPECT_EQ(platform::WideFileOpen(folder.Path().c_str(), WTEXT("rb")), nullptr);
