@@ -5,8 +5,15 @@
 #include <vector>
 
 #include "qxcore/core/io_exceptions.h"
+#include "qxcore/stream/input_buffer.h"
+#include "qxcore/stream/input_file.h"
+#include "qxcore/stream/output_file.h"
+#include "qxcore/stream/output_file_on_change.h"
+#include "qxcore/stream/output_global.h"
 #include "qxcore/stream/output_string_stream.h"
 #include "qxcore/stream/seekable_input_ansi_file.h"
+#include "qxcore/stream/seekable_string_input_stream.h"
+#include "qxcore/stream/zip/inflater.h"
 #include "tests/stream/reader_fixture.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/wine.h"
@@ -227,6 +234,78 @@ TEST(BaseStreams, ComeFromTheSingleByte) {
   EXPECT_EQ(out.bytes, "0123789");
   out.Flush();
   out.Close();
+}
+
+TEST(BaseStreams, HaveNothingMoreOnceTheyAreClosed) {
+  const test::TempFolder folder;
+  const test::Text path = folder.File(WTEXT("file"));
+  ASSERT_TRUE(test::WriteAll(path, "0123456789"));
+  char bytes[4] = {};
+  std::uint64_t place = 0;
+  SInputFile in(SString(path.c_str()));
+  EXPECT_EQ(in.Read(), '0');
+  EXPECT_TRUE(in.GetPlace(&place));
+  EXPECT_EQ(place, 1u);
+  in.Close();
+  EXPECT_EQ(in.Read(), -1);
+  EXPECT_EQ(in.Read(bytes, 4), 0u);
+  EXPECT_EQ(in.Skip(4), 0u);
+  EXPECT_EQ(in.Available(), 0u);
+  EXPECT_TRUE(in.IsEOF());
+  EXPECT_TRUE(in.SeekPos(0)) << "it says that it failed";
+  EXPECT_FALSE(in.GetPlace(&place));
+  EXPECT_FALSE(in.GoToPlace(0));
+
+  SOutputFile out(SString(folder.File(WTEXT("out")).c_str()));
+  EXPECT_EQ(out.Write("abc", 3), 3u);
+  out.Close();
+  EXPECT_THROW(out.Write('x'), SEIOWriteFailed);
+  EXPECT_THROW(out.Write("xy", 2), SEIOWriteFailed);
+  EXPECT_EQ(out.Write("", 0), 0u);
+  out.Flush();
+  out.Close();
+  EXPECT_EQ(out.GetPosition(), -1);
+  EXPECT_EQ(test::ReadAll(folder.File(WTEXT("out"))), "abc");
+
+  SOutputFileOnChange changed(SString(path.c_str()));
+  changed.Close();
+  changed.Flush();
+  EXPECT_THROW(changed.Write("x", 1), SEIOWriteFailed);
+  EXPECT_EQ(test::ReadAll(path), "") << "the content was empty";
+
+  SInputBuffer none(nullptr, 0);
+  unsigned long size = 7;
+  EXPECT_EQ(none.TakeRest(&size), nullptr);
+  SInflater unmade;
+  EXPECT_EQ(unmade.Inflate(bytes, 4), 0);
+  EXPECT_THROW(unmade.SetDictionary("x", 1), SEZipException);
+}
+
+TEST(BaseStreams, MemoryThatNothingCanHoldIsRefused) {
+  SOutputGlobal out;
+  EXPECT_EQ(out.Write("kept", 4), 4u);
+  EXPECT_EQ(out.Write(nullptr, 0), 0u);
+  EXPECT_THROW(out.Write("x", ~0ul), SEOutOfMemory);
+  EXPECT_THROW(out.Write("x", ~0ul - 70000), SEOutOfMemory);
+  EXPECT_EQ(out.UsedSize(), 4u);
+  EXPECT_EQ(std::string(static_cast<const char*>(out.GetData()), 4), "kept");
+}
+
+TEST(BaseStreams, CharactersOfAFileGoBackToTheirMark) {
+  const test::TempFolder folder;
+  const test::Text path = folder.File(WTEXT("file"));
+  ASSERT_TRUE(test::WriteAll(path, "one two"));
+  SSeekableInputANSIFile file(SString(path.c_str()));
+  SSeekableStringInputStream in(file);
+  EXPECT_THROW(in.Reset(), SEIOResetInvalid);
+  WCHAR text[20] = {};
+  EXPECT_EQ(in.Read(text, 4 * sizeof(WCHAR) + 1), 4 * sizeof(WCHAR)) << "half a character is none";
+  in.Mark(0);
+  EXPECT_EQ(in.Read(text, sizeof text), 3 * sizeof(WCHAR)) << "what is there";
+  in.Reset();
+  EXPECT_EQ(in.Read(), 't');
+  file.Close();
+  EXPECT_THROW(in.Reset(), SEIOResetInvalid);
 }
 
 // Into a text without a stream below, and with characters that the encoding lacks.

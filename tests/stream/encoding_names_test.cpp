@@ -77,6 +77,16 @@ TEST(EncodingNames, Patterns_ScanTheirNumbers) {
   EXPECT_EQ(Support::MatchEncodingName(WTEXT("Cp65001")), Support::kUTF8);
   EXPECT_EQ(Support::MatchEncodingName(WTEXT("Cp65000")), 0u);
   EXPECT_EQ(Support::MatchEncodingName(WTEXT("Cp70000")), 0u);
+  EXPECT_EQ(Support::MatchEncodingName(WTEXT("Cp0")), 0u);
+  EXPECT_EQ(Support::MatchEncodingName(WTEXT("Cp")), 0u);
+  int matched = 0;
+  EXPECT_EQ(Support::MatchEncodingName(WTEXT("Cp1252-1"), 0, &matched), 0x204E4u);
+  EXPECT_EQ(matched, 6);
+  for (const WCHAR* unfinished : {WTEXT("Unicode(0x"), WTEXT("Unicode(0x)"), WTEXT("Unicode(0x1C"),
+                                  WTEXT("Unicode(0x1C+"), WTEXT("Unicode(0x10000)")}) {
+    EXPECT_EQ(Support::MatchEncodingName(unfinished, 0, &matched), Support::kUTF16LE);
+    EXPECT_EQ(matched, 7) << "the name alone";
+  }
   EXPECT_EQ(Support::MatchEncodingName(WTEXT("Unicode(0x001C)")), 0x4001Cu);
   EXPECT_EQ(Support::GetEncodingName(0x40003), WTEXT("Unicode(0x0003)"));
   EXPECT_EQ(Support::MatchEncodingName(Support::GetEncodingName(0x40003)), 0x40003u);

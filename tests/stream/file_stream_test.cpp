@@ -22,6 +22,11 @@
 #include "tests/support/temp_folder.h"
 #include "tests/support/text.h"
 
+#ifndef _WIN32
+#include <fcntl.h>
+#include <unistd.h>
+#endif
+
 namespace {
 
 using test::ReadAll;
@@ -406,6 +411,55 @@ TEST(RealFilesOnLinux, ReadErrorsAreRemembered) {
   EXPECT_TRUE(file.IsEOF());
   SInputBufferStream buffered(file);
   EXPECT_EQ(buffered.GetError(), EIO);
+}
+
+// A line that no string can hold is told, and can still be read in other ways.
+TEST(RealFilesOnLinux, ALineThatIsTooLongStaysWhereItIs) {
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("sparse"));
+  ASSERT_TRUE(WriteAll(path, "first\n"));
+  const HANDLE sparse = CreateFileW(path.c_str(), GENERIC_WRITE, 0, nullptr, OPEN_EXISTING, 0, nullptr);
+  LARGE_INTEGER size;
+  size.QuadPart = 0x40000000;
+  EXPECT_TRUE(SetFilePointerEx(sparse, size, nullptr, FILE_BEGIN) && SetEndOfFile(sparse));
+  CloseHandle(sparse);
+  SSeekableInputANSIFile file{Path(path)};
+  EXPECT_EQ(file.ReadLn(), WTEXT("first"));
+  EXPECT_THROW(file.ReadLn(), SEOutOfMemory);
+  EXPECT_EQ(file.GetPos(), 6u);
+  EXPECT_EQ(file.Read(), 0);
+}
+
+// Behind a good block the file's descriptor is made one that cannot be read.
+TEST(RealFilesOnLinux, AReadThatFailsBehindAGoodBlockIsRemembered) {
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("data"));
+  const std::string bytes = RandomBytes(200000);
+  WriteAll(path, bytes);
+  for (const bool byByte : {false, true}) {
+    const int next = open("/dev/null", O_WRONLY);
+    close(next);
+    SInputFile file{Path(path)};
+    std::string got(bytes.size(), 0);
+    ASSERT_EQ(file.Read(got.data(), 10), 10u);
+    const int unreadable = open("/dev/null", O_WRONLY);
+    ASSERT_EQ(dup2(unreadable, next), next);
+    close(unreadable);
+    std::size_t count = 10;
+    if (byByte) {
+      for (int byte; (byte = file.Read()) >= 0;) got[count++] = static_cast<char>(byte);
+    } else {
+      count += file.Read(got.data() + 10, static_cast<unsigned long>(got.size() - 10));
+    }
+    EXPECT_GT(count, 10u);
+    EXPECT_LT(count, bytes.size());
+    EXPECT_EQ(got.substr(0, count), bytes.substr(0, count));
+    EXPECT_EQ(file.GetError(), EBADF);
+    EXPECT_TRUE(file.IsEOF());
+    std::uint64_t place = 0;
+    EXPECT_FALSE(file.GetPlace(&place)) << "what is there cannot be read again";
+    EXPECT_EQ(file.Read(), -1);
+  }
 }
 
 // A file that is deleted while it is read stays readable; one that is cut ends where it was cut.

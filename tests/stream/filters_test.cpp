@@ -9,6 +9,7 @@
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/stream/input_binary_stream.h"
+#include "qxcore/stream/input_buffer.h"
 #include "qxcore/stream/input_buffer_stream.h"
 #include "qxcore/stream/input_pushback_stream.h"
 #include "qxcore/stream/java_unicode_escape_filter_stream.h"
@@ -114,6 +115,36 @@ TEST(PairsOfFilters, OverASourceOfSingleBytes_GiveWhatIsAskedFor) {
       for (test::Steps steps; const unsigned long more = in->Skip(4000 - skipped); steps.Take()) skipped += more;
       ASSERT_EQ(skipped, 4000u);
       ASSERT_EQ(in->Read(), static_cast<unsigned char>(bytes[4000]));
+    }
+  }
+}
+
+// Has more than its type can count.
+class EndlessInput : public SInputBuffer {
+ public:
+  using SInputBuffer::SInputBuffer;
+  unsigned long Available() override { return ~0ul; }
+};
+
+TEST(Filters, WhatIsAvailable_IsWhatComes_AndNeverWraps) {
+  // No escape among them, so that there is a byte for each character.
+  const std::string bytes = "plain \\text with \\back\\slashes that are held back, and longer than the buffers";
+  const auto size = static_cast<unsigned long>(bytes.size());
+  const std::function<SInputStream*(SInputStream*)> kinds[] = {
+      Filters()[1].make, Filters()[2].make, Filters()[3].make,
+      [](SInputStream* in) { return new SJavaUnicodeEscapeFilterStream(in, true); }};
+  for (const auto& make : kinds) {
+    SCOPED_TRACE(&make - kinds);
+    const std::unique_ptr<SInputStream> in(make(new SInputBuffer(bytes.data(), size)));
+    for (unsigned long left = size; left > 0; --left) {
+      ASSERT_EQ(in->Available(), left);
+      ASSERT_EQ(in->Read(), bytes[size - left]);
+    }
+    EXPECT_EQ(in->Available(), 0u);
+    const std::unique_ptr<SInputStream> endless(make(new EndlessInput(bytes.data(), size)));
+    for (unsigned long left = size; left > 0; --left) {
+      ASSERT_EQ(endless->Available(), ~0ul);
+      endless->Read();
     }
   }
 }

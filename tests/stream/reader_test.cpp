@@ -40,6 +40,10 @@ TEST(Selection, MarksAndDeclarations_Decide) {
   EXPECT_EQ(ReadBytes(Utf16Bytes(WTEXT("<?xml version='1.0'?>"), true), kAnsi | kFull).selected, 0x2E40001u);
   EXPECT_EQ(ReadBytes("\xEF\xBB\xBF<?xml v?", kAnsi | kFull).selected, 0x2E4000Cu) << "eleven bytes, the mark included";
   EXPECT_EQ(ReadBytes("<?xml", kAnsi | kFull).selected, 0xE10000u) << "too short for a declaration";
+  const std::string wide = Utf16Bytes(WTEXT("<?xml version='1.0'?>"));
+  EXPECT_EQ(ReadBytes("\xFF\xFE" + wide, kAnsi | kFull).selected, 0x2E4000Au);
+  EXPECT_EQ(ReadBytes("\xFE\xFF" + wide, kAnsi | kFull).selected, 0xE40009u) << "a declaration in another form is none";
+  EXPECT_EQ(ReadBytes("\xEF\xBB\xBF" + wide, kAnsi | kFull).selected, 0xE4000Cu);
 }
 
 TEST(Selection, ShortInputs_AreNotDetected) {
@@ -337,6 +341,28 @@ TEST(Losses, QuickUtf8_TrustsItsInput) {
   EXPECT_EQ(reader.SetQuickUTF8ToUTF16(1), 0);
   EXPECT_EQ(reader.ReadAll().Right(2), WTEXT(")\u00E9"));
   EXPECT_TRUE(reader.GetEncodingWarning().IsEmpty());
+}
+
+// Where sequences have all of their bytes, or end with the text, there is nothing that could be trusted wrongly.
+TEST(Losses, QuickUtf8_OfWholeSequencesIsTheText) {
+  const char* const kPieces[] = {"a", "\xC3\xA9", "\xE2\x82\xAC", "\xF0\x9F\x98\x80", "\x80", "\xFF"};
+  RandomText random(41);
+  for (int round = 0; round < 300; ++round) {
+    std::string bytes;
+    for (int i = random.Number(40); i >= 0; --i) bytes += kPieces[random.Number(6)];
+    if (round % 3 == 0) bytes += "\xE2\x82";
+    const SString expected = ReadBytes(bytes, Support::kUTF8).text;
+    for (unsigned long piece : {1ul, 2ul, 3ul, 7ul, ~0ul}) {
+      PiecewiseInput in(bytes, piece), again(bytes, piece);
+      SMultiFormatReaderUnicode reader(in, Support::kUTF8), byOne(again, Support::kUTF8);
+      reader.SetQuickUTF8ToUTF16(1);
+      byOne.SetQuickUTF8ToUTF16(1);
+      ASSERT_EQ(reader.ReadAll(), expected) << testing::PrintToString(bytes) << " in pieces of " << piece;
+      SString text;
+      for (int c; (c = byOne.Read()) >= 0;) text += static_cast<WCHAR>(c);
+      ASSERT_EQ(text, expected) << testing::PrintToString(bytes) << " in pieces of " << piece;
+    }
+  }
 }
 
 // --- single- and double-byte pages against the platform itself ---

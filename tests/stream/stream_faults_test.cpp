@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <string>
 
@@ -119,6 +120,25 @@ TEST(ZipFaults, AnExtractionThatFailsLeavesNoFile) {
   const test::FileSizeLimit enough(whole.size());
   SZipFile::ExtractFile(archive, WTEXT("deflated"), SString(target.c_str()));
   EXPECT_EQ(test::ReadAll(target), whole);
+}
+
+// A link and what it leads to are not the extraction's to remove.
+TEST(ZipFaults, AnExtractionThatFailsLeavesLinksAndDevices) {
+  test::TempFolder folder;
+  std::string damaged = SomeArchive();
+  damaged[damaged.rfind("PK\x01\x02", damaged.rfind("stored")) + 16] ^= 1;  // the checksum in the directory
+  ASSERT_TRUE(test::WriteAll(folder.File(WTEXT("a.zip")), damaged));
+  ASSERT_TRUE(test::WriteAll(folder.File(WTEXT("kept")), "former"));
+  std::string link = test::Narrow(folder.File(WTEXT("link"))).substr(2);
+  std::replace(link.begin(), link.end(), '\\', '/');
+  ASSERT_EQ(symlink("kept", link.c_str()), 0);
+  const SString archive(folder.File(WTEXT("a.zip")).c_str());
+  EXPECT_THROW(SZipFile::ExtractFile(archive, WTEXT("stored"), SString(folder.File(WTEXT("link")).c_str())),
+               SEZipException);
+  EXPECT_NE(GetFileAttributesW(folder.File(WTEXT("link")).c_str()) & FILE_ATTRIBUTE_REPARSE_POINT, 0u);
+  EXPECT_EQ(test::ReadAll(folder.File(WTEXT("kept"))), "") << "half an entry would look like a whole one";
+  EXPECT_THROW(SZipFile::ExtractFile(archive, WTEXT("stored"), SString(WTEXT("C:\\dev\\null"))), SEZipException);
+  EXPECT_NE(GetFileAttributesW(WTEXT("C:\\dev\\null")), INVALID_FILE_ATTRIBUTES);
 }
 
 // The comparison that cannot read the file, the file that cannot be written: what is there at the end is the new

@@ -153,6 +153,74 @@ TEST_F(ZipFileTest, AnEntryThatReachesOutOfTheDirectoryIsRefused) {
   const std::size_t last = bytes.rfind("PK\x01\x02");
   bytes[last + 32] = '\xFF';  // the length of the comment
   EXPECT_EQ(List(bytes).back(), "failed: invalid CEN header format");
+  // Also where only what the entries before have passed over shows it.
+  ZipBuilder zip = Sound();
+  for (ZipPart& part : zip.parts) part.extra.assign(40, 'x');
+  bytes = zip.Make();
+  bytes[bytes.rfind("PK\x01\x02") + 32] = 5;  // into the END record
+  EXPECT_EQ(List(bytes).back(), "failed: invalid CEN header format");
+}
+
+// Others may write to the file.
+TEST_F(ZipFileTest, AnArchiveThatIsCutWhileItIsListed_IsNoShorterOne) {
+  ZipBuilder zip;
+  for (int i = 0; i < 500; ++i) {
+    zip.parts.emplace_back("entry " + std::to_string(i), "text", false);
+    zip.parts.back().extra.assign(30, 'x');
+    zip.parts.back().comment.assign(60, 'c');
+  }
+  const std::string bytes = zip.Make();
+  const std::size_t directory = bytes.find("PK\x01\x02");
+  for (std::size_t size = 0; size < bytes.size() - 22; size += size < directory ? directory : 911) {
+    SZipFile archive(Write(bytes));
+    const HANDLE file = CreateFileW(m_folder.File(WTEXT("a.zip")).c_str(), GENERIC_WRITE,
+                                    FILE_SHARE_READ | FILE_SHARE_WRITE, nullptr, OPEN_EXISTING, 0, nullptr);
+    ASSERT_NE(file, INVALID_HANDLE_VALUE);
+    LARGE_INTEGER end;
+    end.QuadPart = static_cast<LONGLONG>(size);
+    EXPECT_TRUE(SetFilePointerEx(file, end, nullptr, FILE_BEGIN) && SetEndOfFile(file));
+    CloseHandle(file);
+    int entries = 0;
+    bool told = false;
+    try {
+      for (int found = archive.FindFile(nullptr, 0); found != 0; found = archive.FindNextFile()) {
+        EXPECT_EQ(Narrow(archive.GetEntry().GetName()), "entry " + std::to_string(entries++));
+      }
+      told = archive.HasFailed() != 0;
+    } catch (const SEZipException&) {
+      told = true;
+    }
+    EXPECT_TRUE(told) << size << ": " << entries;
+    EXPECT_LT(entries, 500) << size;
+  }
+}
+
+// What the directory says of an entry, and what its own header and data say.
+TEST_F(ZipFileTest, EntriesThatAreNotWhatTheDirectorySays) {
+  const std::string sound = Sound().Make();
+  const SString target = Path(WTEXT("out"));
+  const struct {
+    const char* name;
+    std::size_t field;  // of the directory's record
+    char value;
+    const char* text;
+  } cases[] = {
+      {"stored.txt", 24, 5, "invalid entry size"},          {"stored.txt", 24, 120, "invalid entry size"},
+      {"stored.txt", 16, 1, "invalid entry CRC"},           {"stored.txt", 42, 2, "invalid LOC header signature"},
+      {"folder/deflated.txt", 24, 1, "invalid entry size"}, {"folder/deflated.txt", 16, 1, "invalid entry CRC"}};
+  for (const auto& each : cases) {
+    std::string bytes = sound;
+    std::size_t record = bytes.rfind(each.name);
+    record = bytes.rfind("PK\x01\x02", record);
+    bytes[record + each.field] = static_cast<char>(bytes[record + each.field] + each.value);
+    try {
+      SZipFile::ExtractFile(Write(bytes), SString(each.name), target);
+      ADD_FAILURE() << each.name << ' ' << each.field;
+    } catch (const SEZipException& e) {
+      EXPECT_EQ(Narrow(e.GetText()), each.text);
+    }
+    EXPECT_EQ(GetFileAttributesW(target), INVALID_FILE_ATTRIBUTES);
+  }
 }
 
 // Every length of the file and every single wrong byte: an answer, or an exception of the right kind.
