@@ -117,6 +117,16 @@ TEST(IdleConsumerList, ChangesDuringACall_AreSafe) {
   EXPECT_EQ(CallsOf([&] { EXPECT_EQ(list.OnIdleNext(1), 1); }), "a") << "the cycle ends with the last consumer";
 }
 
+TEST(IdleConsumerList, OneThatLeavesInItsTurn_LetsTheNextCome) {
+  SIdleConsumerList list;
+  Worker a(&list, 'a'), b(&list, 'b'), c(&list, 'c');
+  a.m_action = [&] { list.Unregister(&a); };
+  EXPECT_EQ(CallsOf([&] {
+              for (int i = 0; i < 5; ++i) list.OnIdleNext(0);
+            }),
+            "abcbc");
+}
+
 TEST(IdleConsumerList, Register_WithoutMemory_ChangesNothing) {
   SIdleConsumerList list;
   for (int n = 1; n <= 2; ++n) {

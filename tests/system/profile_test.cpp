@@ -150,6 +150,21 @@ TEST_F(Profile, EncodingsOfTheFile) {
   }
 }
 
+#ifndef _WIN32
+// Nothing could follow half a character.
+TEST_F(Profile, AFileThatEndsInHalfACharacterCanBeWrittenOn) {
+  for (const bool isReversed : {false, true}) {
+    std::string bytes = "\xFF\xFE" + Utf16(WTEXT("[Section]\r\nkey=1"));
+    for (std::size_t i = 0; isReversed && i < bytes.size(); i += 2) std::swap(bytes[i], bytes[i + 1]);
+    WriteAll(m_path, bytes + 'x');
+    EXPECT_EQ(Section().WriteProfile(WTEXT("added"), SString(WTEXT("2"))), S_OK);
+    EXPECT_EQ(Text(WTEXT("key")), SString(WTEXT("1")));
+    EXPECT_EQ(Text(WTEXT("added")), SString(WTEXT("2")));
+    EXPECT_EQ(ReadAll(m_path).size() % 2, 0u);
+  }
+}
+#endif
+
 // The platform's own list forms, which the tool uses.
 TEST_F(Profile, ListsOfSectionsAndKeys) {
   WriteAll(m_path, "[one]\nk1=1\nk2=2\n[two]\nk3=3\n");
