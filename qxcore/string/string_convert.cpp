@@ -31,12 +31,21 @@ SString operator+(char a, const SString& b) { return Widened(a) + b; }
 
 // --- code pages ---
 
+// Bytes that a text takes at most in the OEM page. Only pages that keep a state are asked: the question is a whole
+// conversion.
+static int RoomInOem(const WCHAR* text, int length) {
+  CPINFO info;
+  const bool isPlain = GetCPInfo(CP_OEMCP, &info) && info.MaxCharSize <= 2 && length <= INT_MAX / 2;
+  return isPlain ? static_cast<int>(info.MaxCharSize) * length
+                 : WideCharToMultiByte(CP_OEMCP, 0, text, length, nullptr, 0, nullptr, nullptr);
+}
+
 // Each byte of the OEM page is kept as a character of that value; a character that takes two bytes there becomes two.
 void SString::CharToOemW() {
   if (IsEmpty()) return;
-  const int size = WideCharToMultiByte(CP_OEMCP, 0, m_text, Length(), nullptr, 0, nullptr, nullptr);
-  SWorkingBuffer<char> bytes(static_cast<std::size_t>(size));
-  WideCharToMultiByte(CP_OEMCP, 0, m_text, Length(), bytes.Get(), size, nullptr, nullptr);
+  const int room = RoomInOem(m_text, Length());
+  SWorkingBuffer<char> bytes(static_cast<std::size_t>(room));
+  const int size = WideCharToMultiByte(CP_OEMCP, 0, m_text, Length(), bytes.Get(), room, nullptr, nullptr);
   SString converted;
   WCHAR* out = converted.GetBufferSetLength(size);
   for (int i = 0; i < size; ++i) out[i] = static_cast<unsigned char>(bytes.Get()[i]);

@@ -100,8 +100,8 @@ TEST(OemConversion, LongTexts_EqualThePlatforms) {
   ASSERT_EQ(static_cast<std::size_t>(converted.Length()), bytes.size());
   for (std::size_t i = 0; i < bytes.size(); ++i) ASSERT_EQ(converted[i], static_cast<unsigned char>(bytes[i]));
   WideString back(bytes.size(), 0);
-  MultiByteToWideChar(CP_OEMCP, 0, bytes.data(), static_cast<int>(bytes.size()), back.data(),
-                      static_cast<int>(back.size()));
+  back.resize(static_cast<std::size_t>(MultiByteToWideChar(CP_OEMCP, 0, bytes.data(), static_cast<int>(bytes.size()),
+                                                           back.data(), static_cast<int>(back.size()))));
   converted.OemToCharW();
   EXPECT_TRUE(converted.View() == SStringView(back));
   SString empty;
