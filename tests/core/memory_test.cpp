@@ -27,6 +27,8 @@ TEST(Memory, ResizingKeepsTheContentAndAFailureTheBlock) {
     block = static_cast<char*>(SMemRealloc(block, size));
     EXPECT_EQ(std::count(block, block + 10, 'x'), 10);
   }
+  block = static_cast<char*>(SMemRealloc(block, 0));
+  EXPECT_NE(block, nullptr) << "a block of nothing is one all the same";
   SMemFree(block);
   void* const nothing = SMemTryAlloc(0);
   EXPECT_NE(nothing, nullptr);

@@ -216,6 +216,29 @@ class Indicator : public SProgressIndicatorEx {
   int moves = 0, questions = 0, cancelAt = 0;
 };
 
+TEST(RealFiles, ProgressGoesTheSameWayAgain) {
+  class Counter : public SProgressIndicatorEx {
+   public:
+    void SetRange(std::uint64_t, std::uint64_t) override {}
+    void SetPos(std::uint64_t) override { ++moves; }
+    std::uint64_t GetPos() const override { return 0; }
+    bool IsCancelled() override { return false; }
+    int moves = 0;
+  } indicator;
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("data"));
+  WriteAll(path, RandomBytes(100000));
+  SInputFile file(Path(path), &indicator);
+  while (file.Read() >= 0) {
+  }
+  const int once = indicator.moves;
+  EXPECT_GT(once, 50);
+  EXPECT_TRUE(file.GoToPlace(0));
+  while (file.Read() >= 0) {
+  }
+  EXPECT_GT(indicator.moves, 2 * once - 10);
+}
+
 TEST(RealFiles, ProgressAndCancelling) {
   TempFolder folder;
   const std::string bytes = RandomBytes(100000);

@@ -97,6 +97,10 @@ TEST(MemoryStreams, Global_GrowsInStepsAndChangesHands) {
   EXPECT_EQ(read, WTEXT("text"));
   SHGlobal taken;
   EXPECT_EQ(again.GetHGlobal(&taken), 1);
+  again.Attach(taken.Detach(), 1000000);
+  EXPECT_LT(again.UsedSize(), 100000u) << "no more is used than there is";
+  EXPECT_EQ(again.GetHGlobal(&taken), 1);
+  EXPECT_GE(taken.Size(), 8u);
   SInputGlobal(taken, true).Close();
 }
 

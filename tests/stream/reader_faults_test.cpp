@@ -282,6 +282,33 @@ std::string Repeated(const std::string& unit, std::size_t size) {
 }
 
 // Zero bytes are judged over all of the text, wherever the pieces are cut in which it is looked at.
+// Cancels one read behind what a reader keeps.
+class InterruptedLongInput : public LongInput {
+ public:
+  using LongInput::LongInput;
+  using LongInput::Read;
+  unsigned long Read(void* buffer, unsigned long count) override {
+    std::uint64_t place = 0;
+    GetPlace(&place);
+    if (place > 24u << 20 && !std::exchange(m_wasCancelled, true)) throw SEIOAbortedException();
+    return LongInput::Read(buffer, count);
+  }
+
+ private:
+  bool m_wasCancelled = false;
+};
+
+TEST(LongInputs, ACancelledLookAtTheRestLosesNothing) {
+  constexpr unsigned long kLength = 40ul << 20;
+  InterruptedLongInput in(kLength, "caf\xC3\xA9 caf\xC3\xA9", true);
+  OpenReader reader(in, kAnsi | kFull | kGuess);
+  EXPECT_THROW(reader.CheckFormat(), SEIOAbortedException);
+  reader.CheckFormat();
+  EXPECT_EQ(reader.GetFormat() & Support::kValueMask, Support::kUTF8);
+  EXPECT_EQ(reader.Skip(kLength), kLength);
+  EXPECT_EQ(reader.ReadAll(), WTEXT("caf\u00E9 caf\u00E9"));
+}
+
 TEST(LongInputs, ZeroBytesBehindTheBeginning_MakeNo16BitText) {
   constexpr std::size_t kMega = 1u << 20;
   const struct {

@@ -116,6 +116,22 @@ TEST(ZipInputStream, NamesAreDecodedByTheirFlag) {
   EXPECT_EQ(names[7], SString("k\xE4se"));
 }
 
+TEST(ZipInputStream, NamesEndBeforeANul) {
+  for (const unsigned flags : {0u, 0x800u}) {
+    for (const std::string& name : {std::string("ab\0c", 4), std::string("\0", 1)}) {
+      ZipBuilder built;
+      built.parts.emplace_back(name, "text");
+      built.parts.back().flags = flags;
+      const std::string archive = built.Make();
+      SInputBuffer memory(archive.data(), static_cast<unsigned long>(archive.size()));
+      SZipInputStream zip(memory);
+      const SZipEntry* entry = zip.GetNextEntry();
+      ASSERT_NE(entry, nullptr);
+      EXPECT_EQ(entry->GetName(), SString(name.c_str())) << flags;
+    }
+  }
+}
+
 TEST(ZipInputStream, BadHeadersAndDataEndInTheirTexts) {
   struct Case {
     const char* outcome;

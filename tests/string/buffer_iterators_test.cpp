@@ -80,6 +80,17 @@ TEST(StringBuffer, RandomAppends_AgreeWithPlainString) {
 }
 
 // Large buffers grow where they are; what is appended may lie in them.
+TEST(StringBuffer, ClearedInPlace_IsAnEmptyText) {
+  SStringBuffer buffer(100);
+  buffer += WTEXT("former");
+  buffer.Clear();
+  EXPECT_TRUE(buffer.IsEmpty());
+  EXPECT_EQ(SString(static_cast<const WCHAR*>(buffer)), WTEXT(""));
+  EXPECT_GE(buffer.GetCapacity(), 100) << "the room stays";
+  buffer += WTEXT("new");
+  EXPECT_EQ(buffer.Detach(), WTEXT("new"));
+}
+
 TEST(StringBuffer, LargeContent_AppendsPartsOfItself) {
   const long before = SString::GetLargeBufferBytes();
   {

@@ -127,6 +127,11 @@ TEST(FileNamesAtEdges, FoldersAreMadeFromTheTop) {
   EXPECT_EQ(created.CompareNoCase(base + WTEXT("\\a")), 0) << "the first that was missing";
   EXPECT_EQ(SFile::CreateFilePath(base + WTEXT("\\a\\b\\c\\d\\file"), nullptr), Code(SFile::kOk));
   EXPECT_TRUE(SFile::IsDirectory(base + WTEXT("\\a\\b\\c\\d")));
+  SString slashes = base + WTEXT("\\x\\y\\file");
+  slashes.ReplaceAll(WCHAR('\\'), WCHAR('/'));
+  EXPECT_EQ(SFile::CreateFilePath(slashes, &created), Code(SFile::kOk));
+  EXPECT_TRUE(SFile::IsDirectory(base + WTEXT("\\x\\y"))) << "the platform takes both";
+  EXPECT_FALSE(SFile::Exists(base + WTEXT("\\x\\y\\file")));
   WriteAll(folder.File(WTEXT("a\\file")), "");
   EXPECT_EQ(SFile::CreateFilePath(base + WTEXT("\\a\\file\\x"), &created, 0), Code(SFile::kCreateDirectoryFailed));
   EXPECT_NE(SFile::CreateFilePath(WTEXT("\\\\no-such-server\\share\\x\\y"), &created, 0), Code(SFile::kOk));

@@ -121,6 +121,11 @@ TEST_F(MappedFileTest, ViewsShowTheFileAndChangeIt) {
   EXPECT_EQ(view.GetOffset(), 65536u);
   view.GetPointer()[0] = static_cast<unsigned char>(~bytes[65536]);
   EXPECT_EQ(view.FlushView(), E_FAIL);  // all went well
+  ASSERT_EQ(view.OpenView(100, 65536, 0), 0);
+  EXPECT_EQ(view.GetSize(), 100u);
+  EXPECT_EQ(view.CloseView(), 0);
+  EXPECT_EQ(view.GetSize(), 0u);
+  EXPECT_EQ(view.GetOffset(), 0u);
   EXPECT_EQ(view.Done(), 0);
   EXPECT_EQ(view.FlushView(), 1);
   EXPECT_EQ(file.Done(), 0);
