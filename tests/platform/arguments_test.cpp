@@ -7,6 +7,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cstdlib>
 #include <random>
 #include <string>
@@ -259,6 +260,33 @@ TEST(NameArguments, FullPathsOfEveryForm) {
   EXPECT_EQ(GetLastError(), DWORD(ERROR_PATH_NOT_FOUND));
 }
 
+TEST(NameArguments, AFolderIsMovedToANameWithABackslashBehindIt) {
+  TempFolder folder;
+  ASSERT_TRUE(CreateDirectoryW(folder.File(u"from").c_str(), nullptr));
+  ASSERT_TRUE(WriteAll(folder.File(u"from\\f"), "1"));
+  EXPECT_TRUE(MoveFileW(folder.File(u"from").c_str(), folder.File(u"To\\").c_str())) << GetLastError();
+  WIN32_FIND_DATAW data;
+  const HANDLE search = FindFirstFileW(folder.File(u"to").c_str(), &data);
+  ASSERT_NE(search, INVALID_HANDLE_VALUE);
+  EXPECT_EQ(Text(data.cFileName), u"To");
+  FindClose(search);
+  EXPECT_EQ(ReadAll(folder.File(u"To\\f")), "1");
+}
+
+TEST(NameArguments, TheRootHasNoFoldersAboveIt) {
+  WIN32_FIND_DATAW data;
+  const HANDLE search = FindFirstFileW(u"C:\\*", &data);
+  ASSERT_NE(search, INVALID_HANDLE_VALUE);
+  int entries = 0;
+  do {
+    EXPECT_NE(Text(data.cFileName), u".");
+    EXPECT_NE(Text(data.cFileName), u"..");
+    ++entries;
+  } while (FindNextFileW(search, &data));
+  EXPECT_GT(entries, 5);
+  FindClose(search);
+}
+
 TEST(NameArguments, ACurrentDirectoryOfAnyLength) {
   TempFolder folder;
   WCHAR start[MAX_PATH];
@@ -365,6 +393,26 @@ TEST(TextArguments, AreLookedAt) {
   }
   EXPECT_EQ(ErrorOf([&] { return FindResourceW(nullptr, number(1), number(999)) != nullptr; }),
             DWORD(ERROR_RESOURCE_TYPE_NOT_FOUND));
+}
+
+TEST(TextArguments, NothingIsWrittenBehindTheRoom) {
+  const std::string bytes("ab\0cd\0", 6);
+  const Text wide(bytes.begin(), bytes.end());
+  for (const UINT page : {1252u, 932u, 50220u, 54936u, 57002u, 65000u, 65001u}) {
+    if (!IsValidCodePage(page)) continue;
+    for (int room = 1; room <= 7; ++room) {
+      WCHAR text[8];
+      char back[8];
+      std::fill_n(text, 8, u'#');
+      std::fill_n(back, 8, '#');
+      const int length = MultiByteToWideChar(page, 0, bytes.data(), 6, text, room);
+      EXPECT_EQ(length, room >= 6 ? 6 : 0) << page;
+      EXPECT_EQ(Text(text + room, text + 8), Text(static_cast<std::size_t>(8 - room), u'#')) << page << ' ' << room;
+      const int size = WideCharToMultiByte(page, 0, wide.data(), 6, back, room, nullptr, nullptr);
+      EXPECT_EQ(size, room >= 6 ? 6 : 0) << page;
+      EXPECT_EQ(std::string(back + room, back + 8), std::string(static_cast<std::size_t>(8 - room), '#')) << page;
+    }
+  }
 }
 
 // Numbers of every form, as another reader of numbers has them.
