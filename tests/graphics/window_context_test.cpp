@@ -1,6 +1,10 @@
 // Contexts of windows: where they draw, and what is kept out of them.
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <array>
+#include <random>
+
 #include "qxcore/graphics/background.h"
 #include "qxcore/graphics/bitmap.h"
 #include "qxcore/graphics/window_dc.h"
@@ -96,6 +100,107 @@ TEST_F(WindowContexts, ABackgroundFillsTheClientArea) {
   EXPECT_EQ(dc.GetPixel(SPoint(39, 29)), kChild) << "the last band has the end colour";
   EXPECT_FALSE(background.Erase(dc, nullptr));
 }
+
+#ifndef _WIN32
+// Wine moves the windows of a batch one after the other, and one over the pixels of the next.
+
+// Windows in the cells of a grid, each of one colour.
+class Grid {
+ public:
+  static constexpr int kColumns = 4, kRows = 3, kCount = kColumns * kRows;
+
+  explicit Grid(HWND top) : m_top(top) {
+    for (int i = 0; i < kCount; ++i) {
+      m_windows[i] = CreateWindowExW(0, WTEXT("WindowContexts"), WTEXT(""), WS_CHILD | WS_VISIBLE, 0, 0, 0, 0, top,
+                                     nullptr, nullptr, nullptr);
+    }
+  }
+
+  // New cells, mostly in the former order; the windows move to them at once.
+  void MoveAll() {
+    const std::array<int, kColumns + 1> x = Edges<kColumns>(120);
+    const std::array<int, kRows + 1> y = Edges<kRows>(90);
+    if (Roll(3) == 0) std::swap(m_cells[Roll(kCount)], m_cells[Roll(kCount)]);
+    m_former = m_places;
+    HDWP batch = BeginDeferWindowPos(kCount);
+    for (int i = 0; i < kCount; ++i) {
+      const int column = m_cells[i] % kColumns, row = m_cells[i] / kColumns;
+      SRect& place = m_places[i];
+      place = SRect(x[column], y[row], x[column + 1] - Roll(3), y[row + 1] - Roll(3));
+      place.right = std::max(place.left, place.right);
+      place.bottom = std::max(place.top, place.bottom);
+      batch = DeferWindowPos(batch, m_windows[i], nullptr, place.left, place.top, place.Width(), place.Height(),
+                             SWP_NOZORDER | SWP_NOACTIVATE | SWP_DEFERERASE);
+    }
+    ASSERT_TRUE(EndDeferWindowPos(batch));
+  }
+
+  // What is not invalid shows what it showed before: of a window its colour, of the parent what was not covered.
+  void Check() {
+    const HRGN invalid = CreateRectRgn(0, 0, 0, 0);
+    for (int i = 0; i < kCount; ++i) {
+      GetUpdateRgn(m_windows[i], invalid, FALSE);
+      SClientDC dc(m_windows[i]);
+      for (int y = 0; y < m_places[i].Height(); y += 2) {
+        for (int x = 0; x < m_places[i].Width(); x += 2) {
+          if (PtInRegion(invalid, x, y)) continue;
+          ASSERT_EQ(dc.GetPixel(SPoint(x, y)), Color(i)) << i << ": " << x << ", " << y;
+        }
+      }
+    }
+    GetUpdateRgn(m_top, invalid, FALSE);
+    for (int y = 0; y < 90; ++y) {
+      for (int x = 0; x < 120; ++x) {
+        const bool wasUncovered = IsIn(m_former, x, y) && !IsIn(m_places, x, y);
+        ASSERT_TRUE(!wasUncovered || PtInRegion(invalid, x, y)) << x << ", " << y;
+      }
+    }
+    DeleteObject(invalid);
+  }
+
+  void Paint() {
+    for (int i = 0; i < kCount; ++i) {
+      SClientDC dc(m_windows[i]);
+      dc.FillSolidRect(SRect(0, 0, 500, 500), Color(i));
+      ValidateRect(m_windows[i], nullptr);
+    }
+    ValidateRect(m_top, nullptr);
+  }
+
+ private:
+  using Places = std::array<SRect, kCount>;
+
+  static COLORREF Color(int i) { return RGB(20 * i + 10, 255 - 20 * i, 7 * i); }
+  static bool IsIn(const Places& places, int x, int y) {
+    return std::any_of(places.begin(), places.end(), [&](const SRect& place) { return place.Contains(SPoint(x, y)); });
+  }
+  int Roll(int sides) { return static_cast<int>(m_random() % static_cast<unsigned>(sides)); }
+  template <int count>
+  std::array<int, count + 1> Edges(int length) {
+    std::array<int, count + 1> edges = {};
+    for (int& edge : edges) edge = Roll(length + 1);
+    std::sort(edges.begin(), edges.end());
+    return edges;
+  }
+
+  HWND m_top;
+  std::array<HWND, kCount> m_windows = {};
+  std::array<int, kCount> m_cells = {0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11};
+  Places m_places, m_former;
+  std::mt19937 m_random{7};
+};
+
+TEST_F(WindowContexts, WhatMovesTogetherKeepsItsPixelsOrIsInvalid) {
+  ShowWindow(child, SW_HIDE);
+  Grid grid(top);
+  for (int step = 0; step < 300; ++step) {
+    grid.Paint();
+    grid.MoveAll();
+    grid.Check();
+    if (HasFatalFailure()) FAIL() << "step " << step;
+  }
+}
+#endif
 
 TEST_F(WindowContexts, AStaleWindowHasNone) {
   DestroyWindow(child);

@@ -1,6 +1,8 @@
 // Which parts of windows are invalid: kept with the window as a region, turned into WM_PAINT when the queue is
 // otherwise empty.
 
+#include <iterator>
+
 #include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/frame.h"
 #include "qxcore/platform/posix/window/paint.h"
@@ -34,8 +36,7 @@ RECT ChildInWindow(const Window* parent, const Window* child) {
 bool IsAllInvalid(const Window* window, const RECT& shown) {
   if (!window->wantsPaint || !window->eraseUpdate || !window->frameUpdate) return false;
   if (window->firstChild != nullptr && window->childrenInvalidAt != g_scene) return false;
-  pixman_region32_t* update = const_cast<pixman_region32_t*>(window->update.Pixman());
-  return pixman_region32_n_rects(update) == 1 && Same(window->update.Bounds(), shown);
+  return window->update.Covers(shown);
 }
 
 void InvalidateChildren(Window* window, const Region& region, Erase erase, Children children) {
@@ -47,7 +48,7 @@ void InvalidateChildren(Window* window, const Region& region, Erase erase, Child
     const RECT place = ChildInWindow(window, child), shown = Common(place, clip);
     if (IsEmpty(shown) || IsAllInvalid(child, Moved(shown, -place.left, -place.top))) continue;
     areAllInvalid = false;
-    if (IsEmpty(Common(shown, bounds))) continue;
+    if (IsEmpty(Common(shown, bounds)) || region.Misses(place)) continue;
     Region part = region;
     part.Intersect(place);
     if (part.IsEmpty()) continue;
@@ -58,15 +59,36 @@ void InvalidateChildren(Window* window, const Region& region, Erase erase, Child
   if (areAllInvalid) window->childrenInvalidAt = g_scene;
 }
 
-// Takes the children's places away, as long as anything is left to take from.
-void SubtractChildren(const Window* window, Region* region) {
-  const RECT client = ClientInWindow(window);
-  RECT bounds = Moved(region->Bounds(), -client.left, -client.top);
-  for (const Window* child = window->firstChild; child != nullptr && !IsEmpty(bounds); child = child->next) {
-    if (!child->IsVisible() || IsEmpty(Common(child->window, bounds))) continue;
-    region->Subtract(Moved(child->window, client.left, client.top));
-    bounds = Moved(region->Bounds(), -client.left, -client.top);
+// Boxes that are taken from a region together, which is cheaper than one by one.
+class Cuts {
+ public:
+  explicit Cuts(Region* region) : m_region(region) {}
+  Cuts(const Cuts&) = delete;
+  Cuts& operator=(const Cuts&) = delete;
+  ~Cuts() { Make(); }
+  void Add(const RECT& rect) {
+    if (m_region->Misses(rect)) return;
+    if (m_count == std::size(m_boxes)) Make();
+    m_boxes[m_count++] = {rect.left, rect.top, rect.right, rect.bottom};
   }
+
+ private:
+  void Make() {
+    if (m_count > 0) m_region->Subtract(Region(m_boxes, m_count));
+    m_count = 0;
+  }
+  Region* m_region;
+  std::size_t m_count = 0;
+  pixman_box32_t m_boxes[64];
+};
+
+// Takes the children's places away.
+void SubtractChildren(const Window* window, Region* region) {
+  const RECT client = ClientInWindow(window), bounds = Moved(region->Bounds(), -client.left, -client.top);
+  Cuts cuts(region);
+  for (const Window* child = window->firstChild; child != nullptr; child = child->next)
+    if (child->IsVisible() && !IsEmpty(Common(child->window, bounds)))
+      cuts.Add(Moved(child->window, client.left, client.top));
 }
 
 void MarkInvalid(Window* window, const Region& region, Erase erase) {
@@ -183,27 +205,32 @@ void SpoilByOrder(Window* window) {
   }
 }
 
-bool SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
-  const bool isShown = IsShown(window);
-  bool isExposed = false;
-  if (wasShown && !IsRoot(window->parent)) {
-    Region exposed(oldWindow);
-    if (isShown) exposed.Subtract(window->window);
-    const RECT client = ClientInWindow(window->parent);
-    exposed.Move(client.left, client.top);
-    exposed.Intersect(client);
-    isExposed = !exposed.IsEmpty();
-    if (isExposed) Invalidate(window->parent, exposed, Erase::Yes, Children::All);
-  }
-  if (!isShown) return isExposed;
+bool Uncover(Window* parent, Region* uncovered) {
+  const RECT client = ClientInWindow(parent);
+  uncovered->Move(client.left, client.top);
+  uncovered->Intersect(client);
+  if (uncovered->IsEmpty()) return false;
+  Invalidate(parent, *uncovered, Erase::Yes, Children::All);
+  return true;
+}
+
+bool UncoverByMove(Window* window, const RECT& oldWindow) {
+  if (IsRoot(window->parent)) return false;
+  Region uncovered(oldWindow);
+  if (IsShown(window)) uncovered.Subtract(window->window);
+  return Uncover(window->parent, &uncovered);
+}
+
+void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
+  if (!IsShown(window)) return;
   const RECT whole = AtOrigin(window->window);
   if (!wasShown) {
     Invalidate(window, Region(whole), Erase::Yes, Children::All);
     if (window->wantsPaint) window->frameUpdate = true;
-    return isExposed;
+    return;
   }
   const bool sameSize = Width(oldWindow) == Width(whole) && Height(oldWindow) == Height(whole);
-  if (sameSize && !(flags & SWP_FRAMECHANGED) && !(flags & SWP_NOCOPYBITS)) return isExposed;
+  if (sameSize && !(flags & SWP_FRAMECHANGED) && !(flags & SWP_NOCOPYBITS)) return;
   Region spoiled(whole);
   const UINT classStyle = window->windowClass->style;
   const bool redraws = (flags & SWP_NOCOPYBITS) ||
@@ -216,10 +243,9 @@ bool SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, b
     spoiled.Subtract(kept);
   }
   const RECT oldPlace = Moved(oldClient, -oldWindow.left, -oldWindow.top);
-  if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return isExposed;
+  if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return;
   // Nothing is left of what the children showed, either, when all of the window is given up.
   Invalidate(window, spoiled, Erase::Yes, flags & SWP_NOCOPYBITS ? Children::All : Children::Unclipped);
-  return isExposed;
 }
 
 // A parent that does not leave its children out paints first; they would be painted over.
@@ -276,6 +302,14 @@ bool Wanted(const Window* window, const RECT* rect, HRGN handle, Region* region)
 
 Children ChildrenOf(UINT flags) {
   return flags & RDW_NOCHILDREN ? Children::No : flags & RDW_ALLCHILDREN ? Children::All : Children::Unclipped;
+}
+
+// Whether all of the client area is asked for, and is invalid as it is: who changes much in a row asks so each time.
+bool AddsNothing(const Window* window, const RECT* rect, HRGN handle, UINT flags) {
+  if (rect != nullptr || handle != nullptr || (flags & ~RDW_ERASE) != RDW_INVALIDATE) return false;
+  if (!window->wantsPaint || ((flags & RDW_ERASE) && !window->eraseUpdate)) return false;
+  if (window->firstChild != nullptr && !(window->style & WS_CLIPCHILDREN)) return false;
+  return window->update.Covers(ClientInWindow(window));
 }
 
 void Change(Window* window, const RECT* rect, HRGN handle, const Region& wanted, UINT flags) {
@@ -336,6 +370,7 @@ BOOL RedrawWindow(HWND handle, const RECT* rect, HRGN region, UINT flags) {
       const Guard guard;
       Window* window = Expect(handle);
       if (window == nullptr) return FALSE;
+      if (AddsNothing(window, rect, region, flags)) return TRUE;
       Region wanted;
       if (!Wanted(window, rect, region, &wanted)) return FALSE;
       Change(window, rect, region, wanted, flags);

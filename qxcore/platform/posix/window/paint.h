@@ -28,9 +28,13 @@ bool IsUnpainted(const Window* window);
 void DropPaint(Window* window);
 // Counts the window among those that want WM_PAINT, or no longer.
 void SetWantsPaint(Window* window, bool wants);
-// After a change of place: what comes to light of the parent, and what of the window itself. Returns whether anything
-// of the parent did.
-bool SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags);
+// After a change of place of a window that was shown: what comes to light of the parent and of siblings. Returns
+// whether anything did.
+bool UncoverByMove(Window* window, const RECT& oldWindow);
+// The same for what several children left, relative to the parent's client area; the region is changed.
+bool Uncover(Window* parent, Region* uncovered);
+// After a change of place: what must be painted of the window itself.
+void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags);
 // After a change in the Z order: where the window and its siblings overlap.
 void SpoilByOrder(Window* window);
 // Whether erasing must wait until a parent has been painted.

@@ -7,6 +7,7 @@
 #include "qxcore/platform/posix/window/default_proc.h"
 #include "qxcore/platform/posix/window/on_display.h"
 #include "qxcore/platform/posix/window/paint.h"
+#include "qxcore/platform/posix/window/placing.h"
 #include "qxcore/platform/posix/window/send.h"
 #include "qxcore/platform/posix/window/tree.h"
 
@@ -65,10 +66,6 @@ void Settle(const Window* window, WINDOWPOS& place) {
   if (!(place.flags & SWP_NOZORDER) && IsInPlace(window, place.hwndInsertAfter)) place.flags |= SWP_NOZORDER;
 }
 
-struct NewPlace {
-  RECT window, client;
-};
-
 // The new rectangles; asks the window for its client area when the size or the frame changes.
 NewPlace Measure(HWND handle, const WINDOWPOS& place) {
   RECT oldWindow{}, oldClient{};
@@ -103,10 +100,14 @@ void Reorder(Window* window, HWND after) {
   if (parent == Desktop() && after == HWND_TOP) RaiseTopLevel(window);
 }
 
-// Under the lock: the change itself, and what of the screen it spoils. Returns whether that is anything of the parent.
-bool Apply(Window* window, WINDOWPOS& place, const NewPlace& to) {
-  const RECT oldWindow = window->window, oldClient = window->client;
-  const bool wasShown = IsShown(window);
+// Under the lock: the change itself, and what of the screen it spoils.
+void Apply(Window* window, Placing& placing, Uncovers uncovers) {
+  WINDOWPOS& place = placing.place;
+  const NewPlace& to = placing.to;
+  const RECT oldClient = window->client;
+  placing.from = {window->window, window->client};
+  placing.wasShown = IsShown(window);
+  placing.isUnpainted = IsUnpainted(window);
   if (!(place.flags & SWP_NOZORDER)) Reorder(window, place.hwndInsertAfter);
   window->window = to.window;
   window->client = to.client;
@@ -118,7 +119,10 @@ bool Apply(Window* window, WINDOWPOS& place, const NewPlace& to) {
   if (window->IsVisible()) ++g_scene;
   if (oldClient.left == to.client.left && oldClient.top == to.client.top) place.flags |= kNoClientMove;
   if (Width(oldClient) == Width(to.client) && Height(oldClient) == Height(to.client)) place.flags |= kNoClientSize;
-  return !(place.flags & SWP_NOREDRAW) && SpoilByMove(window, oldWindow, oldClient, wasShown, place.flags);
+  if (place.flags & SWP_NOREDRAW) return;
+  if (placing.wasShown && uncovers == Uncovers::Now) placing.spoilsParent = UncoverByMove(window, placing.from.window);
+  SpoilByMove(window, placing.from.window, oldClient, placing.wasShown, place.flags);
+  placing.isUnpainted |= IsUnpainted(window);
 }
 
 HWND ParentHandle(HWND handle) {
@@ -129,48 +133,57 @@ HWND ParentHandle(HWND handle) {
 
 // What of the window's pixels stays valid moves along: all of it when it only moved, else the part of the client
 // area that was and is there. The surface is the top-level window's and moves with it.
-void KeepPixels(HWND handle, const NewPlace& from, const NewPlace& to, UINT flags) {
-  if (g_painter.movePixels == nullptr || flags & (SWP_NOCOPYBITS | SWP_SHOWWINDOW | SWP_HIDEWINDOW)) return;
-  if (!IsWindowVisible(handle)) return;
+PixelMove MoveOfPixels(HWND handle, const NewPlace& from, const NewPlace& to) {
   const bool isChild = !IsTopLevel(handle);
-  const int movedX = isChild ? to.window.left - from.window.left : 0;
-  const int movedY = isChild ? to.window.top - from.window.top : 0;
+  int dx = isChild ? to.window.left - from.window.left : 0;
+  int dy = isChild ? to.window.top - from.window.top : 0;
   const RECT oldClient = Moved(from.client, -from.window.left, -from.window.top);
-  RECT newClient = Moved(to.client, -to.window.left, -to.window.top);
+  RECT kept = Moved(to.client, -to.window.left, -to.window.top);
   const bool isSame =
-      Same(oldClient, newClient) && Width(from.window) == Width(to.window) && Height(from.window) == Height(to.window);
+      Same(oldClient, kept) && Width(from.window) == Width(to.window) && Height(from.window) == Height(to.window);
   if (isSame) {
-    if (movedX != 0 || movedY != 0) g_painter.movePixels(handle, AtOrigin(to.window), movedX, movedY);
-    return;
+    kept = AtOrigin(to.window);
+  } else {
+    dx += kept.left - oldClient.left;
+    dy += kept.top - oldClient.top;
+    kept.right = std::min(kept.right, kept.left + Width(oldClient));
+    kept.bottom = std::min(kept.bottom, kept.top + Height(oldClient));
   }
-  const int dx = movedX + newClient.left - oldClient.left, dy = movedY + newClient.top - oldClient.top;
-  if (dx == 0 && dy == 0) return;
-  newClient.right = std::min(newClient.right, newClient.left + Width(oldClient));
-  newClient.bottom = std::min(newClient.bottom, newClient.top + Height(oldClient));
-  g_painter.movePixels(handle, newClient, dx, dy);
+  return {handle, kept, Moved(kept, to.window.left, to.window.top), dx, dy};
 }
 
-BOOL Place(WINDOWPOS& place) {
+}  // namespace
+
+PixelMove KeptPixels(const Placing& placing) {
+  constexpr UINT kNothingStays = SWP_NOCOPYBITS | SWP_SHOWWINDOW | SWP_HIDEWINDOW;
+  const HWND handle = placing.place.hwnd;
+  if (g_painter.movePixels == nullptr || placing.isUnpainted || placing.place.flags & kNothingStays) return {};
+  if (!IsWindowVisible(handle)) return {};
+  const PixelMove move = MoveOfPixels(handle, placing.from, placing.to);
+  return move.dx != 0 || move.dy != 0 ? move : PixelMove{};
+}
+
+bool Begin(Placing& placing, Uncovers uncovers) {
+  WINDOWPOS& place = placing.place;
   const HWND handle = place.hwnd;
   if (!(place.flags & SWP_NOSENDCHANGING)) Send(handle, WM_WINDOWPOSCHANGING, 0, reinterpret_cast<LPARAM>(&place));
   {
     const Guard guard;
     const Window* window = Expect(handle);
-    if (window == nullptr) return FALSE;
+    if (window == nullptr) return false;
     Settle(window, place);
   }
-  const NewPlace to = Measure(handle, place);
-  NewPlace from{};
-  bool spoilsParent = false, isUnpainted = false;
-  {
-    const Guard guard;
-    Window* window = Expect(handle);
-    if (window == nullptr) return FALSE;
-    from = {window->window, window->client};
-    isUnpainted = IsUnpainted(window);
-    spoilsParent = Apply(window, place, to);
-  }
-  if (!isUnpainted) KeepPixels(handle, from, to, place.flags);
+  placing.to = Measure(handle, place);
+  const Guard guard;
+  Window* window = Expect(handle);
+  if (window == nullptr) return false;
+  Apply(window, placing, uncovers);
+  return placing.isDone = true;
+}
+
+bool Finish(Placing& placing) {
+  WINDOWPOS& place = placing.place;
+  const HWND handle = place.hwnd;
   ShowOnDisplay(handle);
   if (!(place.flags & (SWP_NOACTIVATE | SWP_HIDEWINDOW))) {
     if (ParentHandle(handle) != nullptr) {
@@ -180,7 +193,7 @@ BOOL Place(WINDOWPOS& place) {
     }
   }
   if (!(place.flags & (SWP_NOREDRAW | SWP_DEFERERASE))) {
-    if (const HWND parent = spoilsParent ? ParentHandle(handle) : nullptr) EraseNow(parent);
+    if (const HWND parent = placing.spoilsParent ? ParentHandle(handle) : nullptr) EraseNow(parent);
     EraseNow(handle);
   }
   if ((place.flags & kAnyChange) != kNoChange && IsWindow(handle)) {
@@ -189,11 +202,12 @@ BOOL Place(WINDOWPOS& place) {
   return IsWindow(handle);
 }
 
-struct Batch : OnModelHeap {
-  List<WINDOWPOS> places;
-};
-
-}  // namespace
+bool PlaceNow(Placing& placing) {
+  if (!Begin(placing, Uncovers::Now)) return false;
+  const PixelMove move = KeptPixels(placing);
+  if (move.window != nullptr) g_painter.movePixels(move.window, move.to, move.dx, move.dy);
+  return Finish(placing);
+}
 
 LRESULT DefaultPosChanging(HWND handle, WINDOWPOS* place) {
   if (place->flags & SWP_NOSIZE) return 0;
@@ -246,8 +260,8 @@ BOOL SetWindowPos(HWND handle, HWND after, int x, int y, int width, int height, 
     if (window == nullptr) return FALSE;
     if (IsRoot(window)) return FALSE;
   }
-  WINDOWPOS place{handle, after, x, y, width, height, flags};
-  return Place(place);
+  Placing placing{{handle, after, x, y, width, height, flags}};
+  return PlaceNow(placing);
 }
 
 BOOL MoveWindow(HWND window, int x, int y, int width, int height, BOOL repaint) {
@@ -256,60 +270,3 @@ BOOL MoveWindow(HWND window, int x, int y, int width, int height, BOOL repaint) 
 }
 
 BOOL BringWindowToTop(HWND window) { return SetWindowPos(window, HWND_TOP, 0, 0, 0, 0, SWP_NOSIZE | SWP_NOMOVE); }
-
-HDWP BeginDeferWindowPos(int count) {
-  if (count < 0) return Fail<HDWP>(ERROR_INVALID_PARAMETER);
-  return OrNoMemory<HDWP>(nullptr, [&]() -> HDWP {
-    const Guard guard;
-    Batch* batch = new Batch;
-    try {
-      batch->places.reserve(static_cast<std::size_t>(count));
-      return static_cast<HDWP>(AddObject(Kind::Batch, batch, nullptr));
-    } catch (...) {
-      delete batch;
-      throw;
-    }
-  });
-}
-
-// A second request for a window joins the first. A failure ends the batch, as published.
-HDWP DeferWindowPos(HDWP handle, HWND window, HWND after, int x, int y, int width, int height, UINT flags) {
-  const Guard guard;
-  Batch* batch = FindAs<Batch, Kind::Batch>(handle);
-  if (batch == nullptr) return Fail<HDWP>(ERROR_INVALID_DWP_HANDLE);
-  const auto end = [&](DWORD error) {
-    delete static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
-    return Fail<HDWP>(error);
-  };
-  if (FindWindowObject(window) == nullptr) return end(ERROR_INVALID_WINDOW_HANDLE);
-  for (WINDOWPOS& place : batch->places) {
-    if (place.hwnd != window) continue;
-    if (!(flags & SWP_NOZORDER)) place.hwndInsertAfter = after;
-    if (!(flags & SWP_NOMOVE)) place.x = x, place.y = y;
-    if (!(flags & SWP_NOSIZE)) place.cx = width, place.cy = height;
-    constexpr UINT kDenials =
-        SWP_NOSIZE | SWP_NOMOVE | SWP_NOZORDER | SWP_NOREDRAW | SWP_NOACTIVATE | SWP_NOCOPYBITS | SWP_NOOWNERZORDER;
-    place.flags = (place.flags & flags & kDenials) | ((place.flags | flags) & ~kDenials);
-    return handle;
-  }
-  try {
-    batch->places.push_back({window, after, x, y, width, height, flags});
-    return handle;
-  } catch (const std::bad_alloc&) {
-    return end(ERROR_NOT_ENOUGH_MEMORY);
-  }
-}
-
-BOOL EndDeferWindowPos(HDWP handle) {
-  Batch* batch = nullptr;
-  {
-    const Guard guard;
-    batch = static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
-  }
-  if (batch == nullptr) return Fail(ERROR_INVALID_DWP_HANDLE);
-  BOOL result = TRUE;
-  for (WINDOWPOS& place : batch->places)
-    if (!Place(place)) result = FALSE;
-  delete batch;
-  return result;
-}

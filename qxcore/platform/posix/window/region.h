@@ -12,6 +12,10 @@ class Region {
  public:
   Region() { pixman_region32_init(&m_region); }
   explicit Region(const RECT& rect) : Region() { Add(rect); }
+  // The union of boxes; empty ones add nothing.
+  Region(const pixman_box32_t* boxes, std::size_t count) {
+    pixman_region32_init_rects(&m_region, boxes, static_cast<int>(count));
+  }
   Region(const Region& other) : Region() { pixman_region32_copy(&m_region, &other.m_region); }
   Region& operator=(const Region& other) {
     pixman_region32_copy(&m_region, &other.m_region);
@@ -35,6 +39,17 @@ class Region {
   RECT Bounds() const {
     const pixman_box32_t* box = pixman_region32_extents(const_cast<pixman_region32_t*>(&m_region));
     return {box->x1, box->y1, box->x2, box->y2};
+  }
+  // Whether none of it lies in the rectangle; cheaper than an intersection.
+  bool Misses(const RECT& rect) const {
+    pixman_box32_t box{rect.left, rect.top, rect.right, rect.bottom};
+    return pixman_region32_contains_rectangle(const_cast<pixman_region32_t*>(&m_region), &box) == PIXMAN_REGION_OUT;
+  }
+  // Whether it is one rectangle that holds the given one.
+  bool Covers(const RECT& rect) const {
+    const RECT bounds = Bounds();
+    return pixman_region32_n_rects(const_cast<pixman_region32_t*>(&m_region)) == 1 && bounds.left <= rect.left &&
+           bounds.top <= rect.top && bounds.right >= rect.right && bounds.bottom >= rect.bottom;
   }
   pixman_region32_t* Pixman() { return &m_region; }
   const pixman_region32_t* Pixman() const { return &m_region; }

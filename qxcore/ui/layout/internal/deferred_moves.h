@@ -1,4 +1,4 @@
-// Moves windows in one batch, so that each is painted once, in its new place.
+// Moves windows in one batch, so that each is erased and painted once, in its new place.
 #pragma once
 
 #include <algorithm>
@@ -14,7 +14,7 @@ class SDeferredMoves {
 
   // Without a batch, which the system may refuse, a window moves at once.
   void Move(HWND window, const SRect& rect, UINT flags = 0) {
-    const UINT all = flags | SWP_NOZORDER | SWP_NOACTIVATE;
+    const UINT all = flags | SWP_NOZORDER | SWP_NOACTIVATE | SWP_DEFERERASE;
     const int width = std::max(rect.Width(), 0), height = std::max(rect.Height(), 0);
     if (m_batch != nullptr) {
       m_batch = ::DeferWindowPos(m_batch, window, nullptr, rect.left, rect.top, width, height, all);
