@@ -87,7 +87,7 @@ TEST(ShortMemory, FailsTheCallAlone) {
   WithShortMemory("polyline", [&] { return Polyline(dc, star, 5); });
   WithShortMemory("ellipse", [&] { return Ellipse(dc, 1, 1, 50, 30); });
   WithShortMemory("round rectangle", [&] { return RoundRect(dc, 1, 1, 50, 30, 8, 8); });
-  WithShortMemory("copy within", [&] { return BitBlt(dc, 5, 5, 20, 20, dc, 0, 0, SRCCOPY); });
+  WithShortMemory("stretch within", [&] { return StretchBlt(dc, 5, 5, 20, 20, dc, 0, 0, 10, 10, SRCCOPY); });
   WithShortMemory("text", [&] {
     font.lfHeight = ++height;  // no face is kept of this size
     HFONT made = CreateFontIndirectW(&font);

@@ -92,6 +92,18 @@ void CopyBox(const Context& to, const Box& part, const Surface& from, int dx, in
     std::memcpy(to.m_surface.Row(y) + known.x1, from.Row(y + dy) + known.x1 + dx, bytes);
 }
 
+// The same within one surface: rows go in the order in which none is written over before it is read.
+void MoveBox(const Surface& surface, const Box& part, int dx, int dy) {
+  const Box known = Intersect(part, {-dx, -dy, surface.width - dx, surface.height - dy});
+  if (IsEmpty(known)) return;
+  const std::size_t bytes = static_cast<std::size_t>(known.x2 - known.x1) * 4;
+  const int rows = known.y2 - known.y1;
+  for (int i = 0; i < rows; ++i) {
+    const int y = dy >= 0 ? known.y1 + i : known.y2 - 1 - i;
+    std::memmove(surface.Row(y) + known.x1, surface.Row(y + dy) + known.x1 + dx, bytes);
+  }
+}
+
 // Where source and target are the same surface, the part that is read is copied first; `x` and `y` then count from
 // the copy's corner.
 Source SourceOf(const Context& to, const Surface& from, Extent& x, Extent& y) {
@@ -122,12 +134,17 @@ void Stretch(Context& to, const Rectangle4& target, const Surface& from, const S
   Paint pattern = UsesPattern(table) ? PaintOf(to, *to.m_settings.brush) : Paint();
   Extent toX(target.x, target.width), toY(target.y, target.height);
   Extent fromX(origin.x, origin.width), fromY(origin.y, origin.height);
-  const Source source = SourceOf(to, from, fromX, fromY);
-  Box box{toX.start, toY.start, toX.start + toX.size, toY.start + toY.size};
   Axis axisX{toX.start, toX.size, fromX.start, fromX.size, (target.width < 0) != (origin.width < 0), false};
   Axis axisY{toY.start, toY.size, fromY.start, fromY.size, (target.height < 0) != (origin.height < 0), true};
-  bool plain = table == TableOf(SRCCOPY) && !convert.toColors && !convert.toMono && !axisX.mirrored &&
-               !axisY.mirrored && toX.size == fromX.size && toY.size == fromY.size;
+  const bool plain = table == TableOf(SRCCOPY) && !convert.toColors && !convert.toMono && !axisX.mirrored &&
+                     !axisY.mirrored && toX.size == fromX.size && toY.size == fromY.size;
+  const Box box{toX.start, toY.start, toX.start + toX.size, toY.start + toY.size};
+  const Box* clip = to.SingleClip();
+  if (plain && clip != nullptr && to.m_surface.pixels == from.pixels)
+    return MoveBox(from, Intersect(box, *clip), fromX.start - box.x1, fromY.start - box.y1);
+  const Source source = SourceOf(to, from, fromX, fromY);
+  axisX.from = fromX.start;
+  axisY.from = fromY.start;
   ForVisible(to, box, [&](const Box& part) {
     if (plain)
       CopyBox(to, part, source.surface, fromX.start - box.x1, fromY.start - box.y1);
