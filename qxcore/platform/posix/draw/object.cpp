@@ -5,7 +5,7 @@
 
 namespace draw {
 
-Slot g_slots[kSlots];
+constinit Slot g_slots[kSlots] = {};  // so that a program which draws nothing touches none of it
 
 namespace {
 

@@ -63,8 +63,8 @@ class Ref {
 };
 
 struct Slot {
-  std::atomic<std::uint32_t> handle;  // 0 when free
-  Object* object;
+  std::atomic<std::uint32_t> handle = 0;  // 0 when free
+  Object* object = nullptr;
 };
 constexpr std::uint32_t kSlots = 0x10000;
 extern Slot g_slots[kSlots];

@@ -2,7 +2,8 @@
 
 #include <png.h>
 
-#include <cstring>
+#include <csetjmp>
+#include <new>
 
 namespace platform {
 
@@ -18,32 +19,52 @@ struct Image : png_image {
   Image& operator=(const Image&) = delete;
 };
 
-// Three bytes a pixel, as the file holds them.
-std::vector<BYTE> WithoutPadding(const Pixels& pixels) {
-  std::vector<BYTE> rows;
-  rows.reserve(pixels.data.size() * 3);
-  for (std::uint32_t pixel : pixels.data) {
-    for (int shift : {0, 8, 16}) rows.push_back(static_cast<BYTE>(pixel >> shift));
+// --- writing: row by row, so that no second copy of the pixels is made ---
+
+// libpng is C, which no exception may pass.
+void Append(png_structp png, png_bytep piece, std::size_t count) {
+  auto* bytes = static_cast<std::vector<BYTE>*>(png_get_io_ptr(png));
+  bool hasRoom = true;
+  try {
+    bytes->insert(bytes->end(), piece, piece + count);
+  } catch (const std::bad_alloc&) {
+    hasRoom = false;
   }
-  return rows;
+  if (!hasRoom) png_error(png, "memory is out");
 }
+
+// Windows and drawings are flat: filters take time and make them larger.
+bool WriteRows(png_structp png, png_infop info, const Pixels& pixels) {
+  constexpr int kFastest = 1;
+  if (setjmp(png_jmpbuf(png))) return false;
+  png_set_IHDR(png, info, static_cast<png_uint_32>(pixels.width), static_cast<png_uint_32>(pixels.height), 8,
+               PNG_COLOR_TYPE_RGB, PNG_INTERLACE_NONE, PNG_COMPRESSION_TYPE_DEFAULT, PNG_FILTER_TYPE_DEFAULT);
+  png_set_sRGB(png, info, PNG_sRGB_INTENT_PERCEPTUAL);
+  png_set_compression_level(png, kFastest);
+  png_set_filter(png, PNG_FILTER_TYPE_BASE, PNG_FILTER_NONE);
+  png_write_info(png, info);
+  png_set_bgr(png);
+  png_set_filler(png, 0, PNG_FILLER_AFTER);
+  const auto* row = reinterpret_cast<png_const_bytep>(pixels.data.data());
+  for (int y = 0; y < pixels.height; ++y, row += std::size_t{4} * static_cast<unsigned>(pixels.width))
+    png_write_row(png, row);
+  png_write_end(png, info);
+  return true;
+}
+
+void Quiet(png_structp, png_const_charp) {}
+void Leave(png_structp png, png_const_charp) { png_longjmp(png, 1); }
 
 }  // namespace
 
 HRESULT EncodePng(const Pixels& pixels, std::vector<BYTE>* bytes) {
   bytes->clear();
-  Image image;
-  image.width = static_cast<png_uint_32>(pixels.width);
-  image.height = static_cast<png_uint_32>(pixels.height);
-  image.format = PNG_FORMAT_BGR;
-  std::vector<BYTE> rows = WithoutPadding(pixels);
-  png_alloc_size_t size = 0;
-  if (!png_image_write_to_memory(&image, nullptr, &size, 0, rows.data(), 0, nullptr)) return E_FAIL;
-  bytes->resize(size);
-  if (png_image_write_to_memory(&image, bytes->data(), &size, 0, rows.data(), 0, nullptr)) {
-    bytes->resize(size);
-    return S_OK;
-  }
+  png_structp png = png_create_write_struct(PNG_LIBPNG_VER_STRING, nullptr, &Leave, &Quiet);
+  png_infop info = png != nullptr ? png_create_info_struct(png) : nullptr;
+  if (info != nullptr) png_set_write_fn(png, bytes, &Append, nullptr);
+  const bool isWritten = info != nullptr && WriteRows(png, info, pixels);
+  png_destroy_write_struct(&png, &info);
+  if (isWritten) return S_OK;
   bytes->clear();
   return E_FAIL;
 }
