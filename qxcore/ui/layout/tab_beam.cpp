@@ -51,6 +51,7 @@ int STabBeam::OnCreate(CREATESTRUCTW* create) {
 void STabBeam::OnDestroy() {
   StopAutoMove();
   m_measure.DeleteDC();
+  m_measuredFont = nullptr;
   SWnd::OnDestroy();
 }
 
@@ -65,14 +66,17 @@ int STabBeam::InsertTab(int index, LPCWSTR text, SWnd* window, int width) {
   m_tabs.Insert(index, tab.get());
   tab.release();
   ++m_count;
-  if (width < 0) AdjustTabSize(index);
+  if (width < 0) {
+    AdjustTabSize(index);
+  } else {
+    Repaint();
+  }
   if (m_current < 0) {
     m_current = index;
     EnsureVisible(index);
   } else if (index <= m_current) {
     ++m_current;
   }
-  Repaint();
   return index;
 }
 
@@ -174,10 +178,11 @@ SRect STabBeam::GetTabRect(int index) const {
 
 void STabBeam::AdjustTabSize(int index) {
   if (!IsTab(index)) return;
-  if (m_measure.GetSafeHdc() == nullptr) m_measure.Attach(::CreateCompatibleDC(nullptr));
   if (m_font.GetSafeHandle() == nullptr) MakeFonts();
+  if (m_measure.GetSafeHdc() == nullptr) m_measure.Attach(::CreateCompatibleDC(nullptr));
   STab& tab = *m_tabs[index];
-  const SSelectObject font(m_measure, tab.m_hasContent ? m_font.GetSafeHandle() : m_emptyFont.GetSafeHandle());
+  const HGDIOBJ font = tab.m_hasContent ? m_font.GetSafeHandle() : m_emptyFont.GetSafeHandle();
+  if (std::exchange(m_measuredFont, font) != font) ::SelectObject(m_measure.GetSafeHdc(), font);
   tab.m_width = m_measure.GetTextExtent(tab.m_text).cx + m_spacing;
   Repaint();
 }
@@ -221,12 +226,15 @@ void STabBeam::Scroll(int button) { SetFirstVisible(STabScrollTarget(Strip(), bu
 
 // --- fonts and sizes ---
 
-void STabBeam::MakeFonts() {
-  m_font.LoadDefaultUIFont(static_cast<unsigned int>(m_dpi));
-  MakeEmptyFont();
-}
-
-void STabBeam::MakeEmptyFont() {
+// The font that is described, the usual one for null; and the same for empty tabs.
+void STabBeam::MakeFonts(const LOGFONTW* given) {
+  m_measure.DeleteDC();  // it holds one of the former fonts
+  m_measuredFont = nullptr;
+  if (given != nullptr) {
+    m_font.CreateFontIndirectW(given);
+  } else {
+    m_font.LoadDefaultUIFont(static_cast<unsigned int>(m_dpi));
+  }
   LOGFONTW description;
   if (!m_font.GetLogFont(&description)) return;
   description.lfItalic = TRUE;
@@ -241,13 +249,9 @@ void STabBeam::ChangeDpi(int dpi) {
   const int former = std::exchange(m_dpi, dpi);
   m_spacing = ::MulDiv(m_spacing, dpi, former);
   LOGFONTW description;
-  if (m_hasGivenFont && m_font.GetLogFont(&description)) {
-    description.lfHeight = ::MulDiv(description.lfHeight, dpi, former);
-    m_font.CreateFontIndirectW(&description);
-    MakeEmptyFont();
-  } else {
-    MakeFonts();
-  }
+  const bool staysGiven = m_hasGivenFont && m_font.GetLogFont(&description);
+  if (staysGiven) description.lfHeight = ::MulDiv(description.lfHeight, dpi, former);
+  MakeFonts(staysGiven ? &description : nullptr);
   MeasureAll();
 }
 
@@ -255,12 +259,7 @@ void STabBeam::ChangeDpi(int dpi) {
 LRESULT STabBeam::OnSetFont(WPARAM wParam, LPARAM) {
   LOGFONTW description;
   m_hasGivenFont = ::GetObjectW(reinterpret_cast<HGDIOBJ>(wParam), sizeof description, &description) != 0;
-  if (m_hasGivenFont) {
-    m_font.CreateFontIndirectW(&description);
-    MakeEmptyFont();
-  } else {
-    MakeFonts();
-  }
+  MakeFonts(m_hasGivenFont ? &description : nullptr);
   MeasureAll();
   return 0;
 }

@@ -50,7 +50,7 @@ class QXCORE_API STabBeam : public SWnd {
   virtual int DeleteTab(int index);
   // The tab of a window; -1 for none.
   virtual int FindTab(const SWnd* window);
-  // Sets the width of a tab to that of its text and the spacing.
+  // Sets the width of a tab to that of its text and the spacing, and repaints the beam.
   virtual void AdjustTabSize(int index);
 
   using SWnd::Create;
@@ -155,14 +155,14 @@ class QXCORE_API STabBeam : public SWnd {
   void Repaint();
   void MeasureAll();
   void ReadButtonSize();
-  void MakeFonts();
-  void MakeEmptyFont();
+  void MakeFonts(const LOGFONTW* given = nullptr);
   void ChangeDpi(int dpi);
   void StopAutoMove();
   LRESULT Notify(int code, int tab, int former);
   void DrawAll(SDC* dc);
 
-  SDC m_measure;  // for measuring texts
+  SDC m_measure;                     // for measuring texts
+  HGDIOBJ m_measuredFont = nullptr;  // the font that is selected into it
   int m_dpi = 96;
   bool m_hasGivenFont = false;    // by WM_SETFONT
   int m_pressed = kSTabNoButton;  // the button that the mouse is held down on

@@ -6,13 +6,8 @@
 #include "qxcore/ui/layout/internal/edges.h"
 #include "qxcore/ui/layout/tab_beam.h"
 
-// A beam that is invalid as a whole is left alone: who inserts many tabs asks for this each time. The system is asked,
-// for a window that may not be drawn now remembers nothing.
 void STabBeam::Repaint() {
-  if (m_hWnd == nullptr) return;
-  RECT client, invalid;
-  ::GetClientRect(m_hWnd, &client);
-  if (!::GetUpdateRect(m_hWnd, &invalid, 0) || !::EqualRect(&invalid, &client)) InvalidateRect(nullptr, 0);
+  if (m_hWnd != nullptr) InvalidateRect(nullptr, 0);
 }
 
 void STabBeam::OnSize(UINT, int, int) { Repaint(); }
