@@ -5,6 +5,7 @@
 #include "qxcore/ui/accessible/accessible.h"
 #include "tests/bar/bar_fixture.h"
 #include "tests/bar/pane_peer.h"
+#include "tests/support/slots.h"
 
 namespace {
 
@@ -379,13 +380,8 @@ TEST(CtrlBar, Offsets_AreThoseOfTheStyleAndTheFields) {
 
 // The order of fields and virtual functions is part of the binary interface.
 struct Order : SStatusBar {
-  static int SlotOf(auto member) {
-    std::uintptr_t first = 0;
-    std::memcpy(&first, &member, sizeof first);
-    return static_cast<int>((first - 1) / sizeof(void*));
-  }
   void Check() {
-    const int last = SlotOf(&Order::SafeOnKillFocus);
+    const std::ptrdiff_t last = SlotOf(&Order::SafeOnKillFocus);
     EXPECT_EQ(SlotOf(&Order::OnBarStyleChange), last + 1);
     EXPECT_EQ(SlotOf(&Order::GetBarLayout), last + 2);
     EXPECT_EQ(SlotOf(&Order::GetCustomLayout), last + 3);

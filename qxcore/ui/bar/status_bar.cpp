@@ -7,6 +7,7 @@
 #include "qxcore/ui/app/ui_font.h"
 #include "qxcore/ui/app/ui_sys_data.h"
 #include "qxcore/ui/bar/internal/auto_size.h"
+#include "qxcore/ui/bar/internal/pane_operations.h"
 #include "qxcore/ui/bar/internal/pane_placing.h"
 #include "qxcore/ui/bar/status_bar_layout.h"
 
@@ -50,39 +51,27 @@ int SStatusBar::PreCreateWindow(CREATESTRUCTW* create) {
 // --- panes ---
 
 int SStatusBar::InsertPane(int index, int width, DWORD style) {
-  if (m_panes.InsertPane(index, width, style) < 0) return 0;
-  UpdatePaneRects(1);
-  return 1;
+  return SPaneOperations<SStatusBar>::Insert(*this, index, width, style);
 }
 
-int SStatusBar::DeletePane(int index) {
-  if (!m_panes.DeletePane(index)) return 0;
-  UpdatePaneRects(1);
-  return 1;
-}
+int SStatusBar::DeletePane(int index) { return SPaneOperations<SStatusBar>::Delete(*this, index); }
 
 int SStatusBar::SetPaneText(int index, const SString* text, int update) {
-  const int at = m_panes.SetPaneText(index, text);
-  if (at < 0) return 0;
-  if (SFitToText(m_panes[at], m_hWnd, GetBarFont())) UpdatePaneRects(0);
-  if (update && at < m_panes.GetCount()) SendText(m_panes[at], SControlIndex(at, m_splice, ExtraCount()));
-  return 1;
+  return SPaneOperations<SStatusBar>::SetText(*this, index, text, update);
 }
 
 int SStatusBar::SetPaneStyle(int index, DWORD style) {
-  const int at = m_panes.Find(index);
-  if (at < 0) return 0;
-  m_panes[at].m_style = style;
-  SFitToText(m_panes[at], m_hWnd, GetBarFont());
-  UpdatePaneRects(1);
-  return 1;
+  return SPaneOperations<SStatusBar>::SetStyle(*this, index, style);
 }
 
 int SStatusBar::SetPaneWidth(int index, int width) {
-  const int at = m_panes.Find(index);
-  if (at < 0) return 0;
-  if (std::exchange(m_panes[at].m_width, width) != width) UpdatePaneRects(0);
-  return 1;
+  return SPaneOperations<SStatusBar>::SetWidth(*this, index, width);
+}
+
+bool SStatusBar::FitPane(SStatusBarPane& pane) { return SFitToText(pane, m_hWnd, GetBarFont()); }
+
+void SStatusBar::SendPane(int position) {
+  SendText(m_panes[position], SControlIndex(position, m_splice, ExtraCount()));
 }
 
 int SStatusBar::GetPaneRect(int index, SRect* rect) const {
@@ -130,6 +119,6 @@ void SStatusBar::SetDpi(int dpi) {
   }
   m_panes.ScaleWidths(m_dpi, dpi);
   m_dpi = dpi;
-  for (SStatusBarPane& pane : m_panes) SFitToText(pane, m_hWnd, GetBarFont());
+  for (SStatusBarPane& pane : m_panes) FitPane(pane);
   for (SStatusBarLayout* layout = m_attached; layout != nullptr; layout = layout->m_next) layout->SetDpi(dpi);
 }

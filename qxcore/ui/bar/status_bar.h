@@ -27,6 +27,8 @@
 class SAccessible;
 class SStatusBarLayout;
 struct SPaneSpace;
+template <class Owner>
+struct SPaneOperations;
 
 // The usual identifier of a frame's status bar.
 inline constexpr UINT kSStatusBarId = 0xE801;
@@ -118,11 +120,14 @@ class QXCORE_API SStatusBar : public SCtrlBar {
 
  private:
   friend class SStatusBarLayout;
+  friend struct SPaneOperations<SStatusBar>;
   class Panes;  // the accessible object
   int ExtraCount() const;
   int GetControlRect(int controlIndex, SRect* rect) const;
   const SStatusBarPane* FindShown(int controlIndex) const;
   SPaneSpace GetPaneSpace() const;
+  bool FitPane(SStatusBarPane& pane);
+  void SendPane(int position);
   void SendText(SStatusBarPane& pane, int controlIndex);
   void SendEmptyPane();
   void SetDpi(int dpi);

@@ -4,6 +4,7 @@
 
 #include "qxcore/ui/app/ui_font.h"
 #include "qxcore/ui/bar/internal/auto_size.h"
+#include "qxcore/ui/bar/internal/pane_operations.h"
 #include "qxcore/ui/window/thread_state.h"
 
 SStatusBarLayout::~SStatusBarLayout() {
@@ -40,49 +41,39 @@ int SStatusBarLayout::Activate(int activate) {
 
 // --- panes ---
 
-void SStatusBarLayout::Changed(int markTextDirty) {
-  if (IsActive()) m_bar->UpdatePaneRects(markTextDirty);
-}
-
 int SStatusBarLayout::InsertPane(int index, int width, DWORD style) {
-  if (m_panes.InsertPane(index, width, style) < 0) return 0;
-  Changed(1);
-  return 1;
+  return SPaneOperations<SStatusBarLayout>::Insert(*this, index, width, style);
 }
 
-int SStatusBarLayout::DeletePane(int index) {
-  if (!m_panes.DeletePane(index)) return 0;
-  Changed(1);
-  return 1;
-}
+int SStatusBarLayout::DeletePane(int index) { return SPaneOperations<SStatusBarLayout>::Delete(*this, index); }
 
 int SStatusBarLayout::SetPaneText(int index, const SString* text, int update) {
-  const int at = m_panes.SetPaneText(index, text);
-  if (at < 0) return 0;
-  if (SFitToText(m_panes[at], m_bar->GetSafeHwnd(), SGetDefaultUIFont(m_dpi))) Changed(0);
-  if (update && IsActive() && at < m_panes.GetCount()) m_bar->SendText(m_panes[at], m_bar->m_splice + at);
-  return 1;
+  return SPaneOperations<SStatusBarLayout>::SetText(*this, index, text, update);
 }
 
 int SStatusBarLayout::SetPaneStyle(int index, DWORD style) {
-  const int at = m_panes.Find(index);
-  if (at < 0) return 0;
-  m_panes[at].m_style = style;
-  SFitToText(m_panes[at], m_bar->GetSafeHwnd(), SGetDefaultUIFont(m_dpi));
-  Changed(1);
-  return 1;
+  return SPaneOperations<SStatusBarLayout>::SetStyle(*this, index, style);
 }
 
 int SStatusBarLayout::SetPaneWidth(int index, int width) {
-  const int at = m_panes.Find(index);
-  if (at < 0) return 0;
-  if (std::exchange(m_panes[at].m_width, width) != width) Changed(0);
-  return 1;
+  return SPaneOperations<SStatusBarLayout>::SetWidth(*this, index, width);
+}
+
+void SStatusBarLayout::UpdatePaneRects(int markTextDirty) {
+  if (IsActive()) m_bar->UpdatePaneRects(markTextDirty);
+}
+
+bool SStatusBarLayout::FitPane(SStatusBarPane& pane) {
+  return SFitToText(pane, m_bar->GetSafeHwnd(), SGetDefaultUIFont(m_dpi));
+}
+
+void SStatusBarLayout::SendPane(int position) {
+  if (IsActive()) m_bar->SendText(m_panes[position], m_bar->m_splice + position);
 }
 
 void SStatusBarLayout::SetDpi(int dpi) {
   if (dpi == m_dpi) return;
   m_panes.ScaleWidths(m_dpi, dpi);
   m_dpi = dpi;
-  for (SStatusBarPane& pane : m_panes) SFitToText(pane, m_bar->GetSafeHwnd(), SGetDefaultUIFont(dpi));
+  for (SStatusBarPane& pane : m_panes) FitPane(pane);
 }

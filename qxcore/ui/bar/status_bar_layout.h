@@ -41,7 +41,10 @@ class QXCORE_API SStatusBarLayout {
 
  private:
   friend class SStatusBar;
-  void Changed(int markTextDirty);
+  friend struct SPaneOperations<SStatusBarLayout>;
+  void UpdatePaneRects(int markTextDirty);
+  bool FitPane(SStatusBarPane& pane);
+  void SendPane(int position);
   void SetDpi(int dpi);
 
   SStatusBarPanes m_panes;
