@@ -8,10 +8,12 @@ Each run has a time limit: whatever waits for a person fails the test.
 import os
 import pathlib
 import shutil
+import signal
 import struct
 import subprocess
 import sys
 import tempfile
+import time
 import unittest
 
 sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "support"))
@@ -116,6 +118,71 @@ class WorkbenchTest(unittest.TestCase):
         for row in report.splitlines():
             name = next(name for name in names if row.startswith(name + " "))
             self.assertTrue(row[len(name):].strip().startswith(listed[name]), (row, listed[name]))
+
+    @unittest.skipIf(ON_WINE, "needs names and files that Windows does not have")
+    def test_odd_names_and_kinds_of_files(self):
+        """Whatever bytes a name has, its file is listed, shown and converted; what has no end is not read."""
+        names = [b"bad\xff\xfe.txt", b"new\nline", b"tab\there", b"colon:star*?", b"back\\slash", b"-", b" blanks ", b"dot.",
+                 b'quote"', b"CON", b"x" * 255, "é".encode() * 127, "\U0001F600日本".encode(), b"below/it"]
+        folder = os.fsencode(self.texts) + b"/"
+        for name in names:
+            os.makedirs(os.path.dirname(folder + name), exist_ok=True)
+            pathlib.Path(os.fsdecode(folder + name)).write_bytes(GERMAN.encode("cp1252"))
+        os.mkfifo(folder + b"pipe")
+        os.symlink("nowhere", folder + b"dangling")
+        os.makedirs(folder + b"/".join([b"d" * 200] * 8))
+        result = self.run_script("-open texts\nopen texts/below\nprint status\n-open texts\nprint list\nselect all\nanswer yes\n-convert UTF-8 to out\nprint status\n")
+        self.assertEqual(result.returncode, 0, result.stderr)
+        self.assertIn(b"script.txt:1: ", result.stderr)  # a path that is too long for the library
+        below, *rows, status = result.stdout.decode().splitlines()
+        self.assertTrue(below.endswith("1 file in " + str(self.texts / "below")), below)
+        self.assertEqual(len(rows), len(names) + 2)
+        self.assertIn("pipe\t\t0\tit is a pipe or a device", rows)
+        self.assertEqual([row.split("\t")[0] for row in rows if "Cannot open" in row], ["dangling"])
+        self.assertTrue(status.startswith(f"{len(names)} files were converted"), status)
+        for name in names:
+            converted = pathlib.Path(os.fsdecode(os.fsencode(self.folder) + b"/out/" + name))
+            self.assertEqual(converted.read_bytes(), GERMAN.encode(), name)
+
+    @unittest.skipIf(ON_WINE or os.geteuid() == 0 and not shutil.which("setpriv"), "needs rights of files, and to have none")
+    def test_what_belongs_to_somebody_else(self):
+        """A folder and a file that cannot be read are told; the rest is done."""
+        self.write("a.txt", GERMAN)
+        self.write("secret.txt", GERMAN).chmod(0)
+        self.write("locked/b.txt", GERMAN)
+        (self.texts / "locked").chmod(0)
+        (self.folder / "files").mkdir()
+        self.write("../files/c.txt", GERMAN).chmod(0)
+        self.addCleanup((self.texts / "locked").chmod, 0o700)
+        self.folder.chmod(0o777)
+        (self.folder / "script.txt").write_text("-open texts/locked\n-open texts\nprint list\nopen files\nprint status\n")
+        nobody = ["setpriv", "--reuid=65534", "--regid=65534", "--clear-groups"] if os.geteuid() == 0 else []
+        if subprocess.run([*nobody, *WORKBENCH, "--version"], capture_output=True).returncode != 0:
+            self.skipTest("nobody else may run the program where it lies")
+        environment = dict(os.environ, QXCORE_REGISTRY=str(self.folder / "registry.db"))
+        result = subprocess.run([*nobody, *WORKBENCH, "--script", "script.txt"], cwd=self.folder, env=environment,
+                                capture_output=True, timeout=LIMIT)
+        messages = result.stderr.decode().splitlines()
+        self.assertEqual((result.returncode, len(messages)), (0, 2), messages)
+        for message in messages:
+            self.assertRegex(message, "texts/locked: .*denied")
+        first, second, status = result.stdout.decode().splitlines()
+        self.assertTrue(first.startswith("a.txt\tUTF-8\t"), first)
+        self.assertIn("Permission denied", second)
+        self.assertTrue(status.endswith("/files; 1 file could not be read"), status)
+
+    def test_a_folder_that_disappears(self):
+        """While it is open, and for good: what was listed stays, each step says what it misses."""
+        self.write_three()
+        process = self.start("open texts\nselect all\necho ready\npause go\nanswer yes\n-convert UTF-8\n-preview a.txt\n"
+                             "print status\n-open texts\nprint list\n")
+        shutil.rmtree(self.texts)
+        (self.folder / "go").write_bytes(b"")
+        out, err = process.communicate(timeout=LIMIT)
+        self.assertEqual(process.returncode, 0, err.decode())
+        self.assertEqual(len(out.decode().splitlines()), 4, out.decode())
+        self.assertIn("0 files were converted; a.txt: ", out.decode().splitlines()[0])
+        self.assertIn("there is no such folder", err.decode().splitlines()[-1])
 
     # --- conversion, in each mode ---
 
@@ -229,6 +296,46 @@ class WorkbenchTest(unittest.TestCase):
             self.assertEqual(content, GERMAN.encode("utf-8" if name < "texts/100" else "cp1252"), name)
         shown = self.run_done("cancel after 20\nopen texts\nprint status\n")
         self.assertEqual(shown, "Cancelled after 20 files\n")
+
+    # --- interruption: by Ctrl-C in a terminal, or a request to end ---
+
+    def start(self, text, *options):
+        """Starts a script and returns the process when it has said "ready"."""
+        (self.folder / "script.txt").write_text(text, encoding="utf-8")
+        environment = dict(os.environ, QXCORE_REGISTRY=str(self.folder / "registry.db"))
+        process = subprocess.Popen([*WORKBENCH, "--script", "script.txt", *options], cwd=self.folder, env=environment,
+                                   stdin=subprocess.DEVNULL, stdout=subprocess.PIPE, stderr=subprocess.PIPE)
+        self.addCleanup(process.kill)
+        self.assertEqual(process.stdout.readline().strip(), b"ready")
+        return process
+
+    def interrupt(self, process, number):
+        process.send_signal(number)
+        out, err = process.communicate(timeout=LIMIT)
+        self.assertEqual((process.returncode, err.decode()), (128 + number, "qxworkbench: cancelled\n"), out.decode())
+
+    @unittest.skipIf(ON_WINE, "needs signals")
+    def test_an_interruption_ends_what_waits(self):
+        """Whatever it waits for: a file, an answer, work."""
+        self.write("large.txt", GERMAN * 400000)
+        for text in ("echo ready\npause never\n", "open texts\nselect all\necho ready\nconvert UTF-16\n",
+                     "echo ready\n-convert UTF-8\nopen texts\n"):
+            for number in (signal.SIGINT, signal.SIGTERM, signal.SIGHUP):
+                self.interrupt(self.start(text), number)
+
+    @unittest.skipIf(ON_WINE, "needs signals")
+    def test_an_interruption_leaves_each_file_whole(self):
+        for number in range(3):
+            self.write(f"{number}.txt", GERMAN * 200000, "cp1252")
+        process = self.start("open texts\nselect all\nanswer yes\necho ready\nconvert UTF-16\n")
+        end = time.monotonic() + LIMIT
+        while not list(self.texts.glob("*.tmp")) and time.monotonic() < end:
+            time.sleep(0.001)
+        self.interrupt(process, signal.SIGINT)
+        self.assertEqual(sorted(self.contents()), [f"texts/{number}.txt" for number in range(3)])
+        for name, content in self.contents().items():
+            is_whole = content in ((GERMAN * 200000).encode("cp1252"), (GERMAN * 200000).encode("utf-16le"))
+            self.assertTrue(is_whole, name)
 
     # --- pictures, settings ---
 

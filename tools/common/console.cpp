@@ -17,6 +17,8 @@
 #else
 #include <fcntl.h>
 #include <unistd.h>
+
+#include <thread>
 #endif
 
 namespace console {
@@ -30,6 +32,7 @@ volatile std::sig_atomic_t g_signal = 0;  // that asked for the end; 0: none
 #ifdef _WIN32
 
 const WCHAR* volatile g_removeWhenKilled = nullptr;
+void (*volatile g_wake)() = nullptr;
 UINT g_outputCodePage = 0;
 
 BOOL WINAPI OnConsoleEvent(DWORD event) {
@@ -40,6 +43,7 @@ BOOL WINAPI OnConsoleEvent(DWORD event) {
     ExitProcess(static_cast<UINT>(kSignalBase + (isBreak ? SIGINT : SIGTERM)));
   }
   g_signal = SIGINT;
+  if (g_wake != nullptr) g_wake();
   return TRUE;
 }
 
@@ -48,6 +52,7 @@ void RestoreConsole() { SetConsoleOutputCP(g_outputCodePage); }
 #else
 
 const char* volatile g_removeWhenKilled = nullptr;
+int g_wakePipe[2] = {-1, -1};  // a handler may do little more than write to it
 
 void OnSignal(int number) {
   if (g_signal != 0) {
@@ -55,6 +60,9 @@ void OnSignal(int number) {
     _exit(kSignalBase + number);
   }
   g_signal = number;
+  const int former = errno;
+  [[maybe_unused]] const ssize_t written = g_wakePipe[1] < 0 ? 0 : write(g_wakePipe[1], "", 1);
+  errno = former;
 }
 
 #endif
@@ -92,6 +100,8 @@ void SetUp() {
   SetUpStreams();
   SetConsoleCtrlHandler(OnConsoleEvent, TRUE);
 }
+
+void WakeWhenInterrupted(void (*wake)()) { g_wake = wake; }
 
 void WantScreen() {}
 
@@ -142,6 +152,13 @@ void SetUp() {
   // Who started the tool with nohup wants it to go on when the terminal is gone.
   struct sigaction former = {};
   if (sigaction(SIGHUP, nullptr, &former) == 0 && former.sa_handler != SIG_IGN) sigaction(SIGHUP, &action, nullptr);
+}
+
+void WakeWhenInterrupted(void (*wake)()) {
+  if (pipe2(g_wakePipe, O_CLOEXEC) != 0) return;
+  std::thread([wake] {
+    for (char byte; read(g_wakePipe[0], &byte, 1) == 1;) wake();
+  }).detach();
 }
 
 std::vector<std::string> Arguments(int argc, char** argv) { return {argv + (argc > 0 ? 1 : 0), argv + argc}; }

@@ -26,6 +26,10 @@ bool Interrupted();
 // What the tool then exits with: 130 after Ctrl-C, 143 after termination, 129 after the terminal was closed.
 int InterruptedCode();
 
+// Calls `wake` on another thread whenever the user asks for an end, for a program that waits for something else. Call
+// it once, behind SetUp.
+void WakeWhenInterrupted(void (*wake)());
+
 // A file that is removed when a second interruption ends the process at once; null for none.
 void RemoveWhenKilled(const std::filesystem::path* path);
 

@@ -27,10 +27,12 @@ fs::path BehindLinks(fs::path path) {
   return path;
 }
 
+// The name is cut, so that there is room for the rest where the target's name is as long as can be.
 fs::path TemporaryBeside(const fs::path& target) {
+  constexpr std::size_t kLongest = 200;
   std::random_device random;
   for (;;) {
-    fs::path name = target;
+    fs::path name = target.parent_path() / target.filename().native().substr(0, kLongest);
     name += ".qx" + std::to_string(random()) + ".tmp";
     std::error_code error;
     if (!fs::exists(fs::symlink_status(name, error))) return name;

@@ -7,6 +7,11 @@ SString ShownArgument(const std::string& argument) {
   return ToUtf8(text) == argument ? text : SFile::FromNative(argument);
 }
 
+SString ShownPath(const SString& path) {
+  const std::string native = SFile::ToNative(path);
+  return native.empty() ? path : ShownArgument(native);
+}
+
 int DisplayWidth(SStringView text) {
   int width = 0;
   for (WCHAR c : text) {

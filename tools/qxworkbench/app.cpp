@@ -1,17 +1,24 @@
 #include "tools/qxworkbench/app.h"
 
+#include <atomic>
 #include <cstdio>
 
+#include "qxcore/core/io_exceptions.h"
 #include "qxcore/ui/app/interaction_mode.h"
 #include "tools/common/console.h"
 #include "tools/common/failure.h"
 #include "tools/common/standard_streams.h"
 #include "tools/common/utf8.h"
+#include "tools/qxworkbench/commands.h"
 #include "tools/qxworkbench/picture.h"
 
 namespace {
 
 constexpr SIZE kSize{1000, 640};  // of the window at 96 dots an inch
+
+std::atomic<HWND> g_interrupted = nullptr;  // the window that hears of an interruption
+
+void TellWindow() { ::PostMessageW(g_interrupted, kMsgInterrupted, 0, 0); }
 
 }  // namespace
 
@@ -25,6 +32,8 @@ int WorkbenchApp::InitInstance() {
     throw Failure{"the window cannot be made: " + SystemText(::GetLastError())};
   }
   m_mainWnd = m_frame;
+  g_interrupted = m_frame->m_hWnd;
+  console::WakeWhenInterrupted(&TellWindow);
   const bool isUnattended = m_script != nullptr || !m_options.picture.empty();
   if (!isUnattended && ::GetSystemMetrics(SM_CMONITORS) == 0) {
     throw Failure{"nobody would see the window; --script and --picture need no screen"};
@@ -55,8 +64,9 @@ int WorkbenchApp::InitInstance() {
 int WorkbenchApp::OnIdle(long count) {
   const Clock::time_point begin = Clock::now();
   bool goesOn = SWinApp::OnIdle(count) != 0;
+  if (console::Interrupted() && m_mainWnd != nullptr) m_frame->DestroyWindow();
   if (m_mainWnd != nullptr && !m_hasEnded) {
-    goesOn |= m_frame->Step();
+    goesOn |= StepFrame();
     Measure(begin, "idle");
     // What the script does is the user's part, and is measured by the messages that it sends.
     if (m_script != nullptr) goesOn |= RunScript();
@@ -64,6 +74,15 @@ int WorkbenchApp::OnIdle(long count) {
     if (!m_options.picture.empty() && !m_frame->IsBusy()) goesOn = true;
   }
   return goesOn && !m_hasEnded;
+}
+
+// An interruption ends what reads and writes at once; the next idle work ends the program.
+bool WorkbenchApp::StepFrame() {
+  try {
+    return m_frame->Step();
+  } catch (const SEIOAbortedException&) {
+    return true;
+  }
 }
 
 // One command at a time; true while there are more to run at once.

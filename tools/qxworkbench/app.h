@@ -39,6 +39,7 @@ class WorkbenchApp : public SWinApp {
  private:
   using Clock = std::chrono::steady_clock;
 
+  bool StepFrame();
   bool RunScript();
   void TakePicture();
   void End(int code);

@@ -26,6 +26,8 @@ enum Command : UINT {
 
 // Posted by the thread that looks at a large file when it is done.
 inline constexpr UINT kMsgWorkIsDone = WM_APP + 1;
+// Posted when the program is interrupted: by Ctrl-C, or by a request to end.
+inline constexpr UINT kMsgInterrupted = WM_APP + 2;
 
 // What the menu offers, by the names of the table.
 inline constexpr const char* kUsualEncodings[] = {"UTF-8",  "UTF-16LE", "UTF-16BE", "Cp1252", "Cp1250",

@@ -1,9 +1,11 @@
 #include "tools/qxworkbench/detection_job.h"
 
+#include <filesystem>
 #include <utility>
 
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/system/file/file.h"
+#include "tools/common/console.h"
 #include "tools/common/failure.h"
 #include "tools/common/utf8.h"
 
@@ -25,6 +27,21 @@ class Cancellation : public SProgressIndicatorEx {
   std::atomic<std::uint64_t> m_position = 0;
   std::atomic<bool> m_isCancelled = false;
 };
+
+// Reading from a pipe could last for ever.
+bool IsPipeOrDevice(const Document& document) {
+  std::error_code error;
+  const std::filesystem::file_status status = std::filesystem::status(console::PathOf(document.native), error);
+  return std::filesystem::exists(status) && !std::filesystem::is_regular_file(status);
+}
+
+Finding LookAtFile(const Document& document) {
+  const bool hasSize = document.bytes != 0;  // so that few files are asked for their kind
+  if (hasSize || !IsPipeOrDevice(document)) return LookAt(document.native, kUsualRequest);
+  Finding finding;
+  finding.error = "it is a pipe or a device";
+  return finding;
+}
 
 SString Backslashed(const SString& folder) {
   return folder[folder.Length() - 1] == '\\' ? folder : folder + WTEXT("\\");
@@ -71,13 +88,14 @@ DetectionJob::~DetectionJob() { Cancel(); }
 
 void DetectionJob::Open(const SString& folder) {
   const SString whole = SFile::NormalizeDirectoryName(folder);
-  if (whole.IsEmpty() || !SFile::Exists(whole)) throw Failure{"there is no such folder", kFailed, ToUtf8(folder)};
-  if (!SFile::IsDirectory(whole)) throw Failure{"it is no folder", kFailed, ToUtf8(folder)};
+  if (whole.IsEmpty() || !SFile::Exists(whole))
+    throw Failure{"there is no such folder", kFailed, ToUtf8(ShownPath(folder))};
+  if (!SFile::IsDirectory(whole)) throw Failure{"it is no folder", kFailed, ToUtf8(ShownPath(folder))};
   auto finder = std::make_unique<SRecurseFindFiles>();
   const int found = finder->FindFile(Backslashed(whole) + WTEXT("*"));
   const SFindFailures& failures = finder->GetFailures();
   if (!found && !failures.IsEmpty())
-    throw Failure{SystemText(failures.GetFirstError()), kFailed, ToUtf8(failures.GetFirstFolder())};
+    throw Failure{SystemText(failures.GetFirstError()), kFailed, ToUtf8(ShownPath(failures.GetFirstFolder()))};
   Cancel();
   m_documents.Clear();
   m_wasCancelled = false;
@@ -119,7 +137,8 @@ void DetectionJob::ListSome(const TimeSlice& slice) {
 void DetectionJob::AddFound() {
   Document document;
   document.path = m_finder->GetFilePath();
-  document.name = document.path.Mid(m_prefix.Length());
+  document.below = document.path.Mid(m_prefix.Length());
+  document.name = ShownPath(document.below);
   document.native = SFile::ToNative(document.path);
   document.bytes = m_finder->GetLength();
   const bool isLarge = document.bytes > kLargest;
@@ -130,7 +149,7 @@ void DetectionJob::AddFound() {
 void DetectionJob::LookAtNext() {
   const int number = m_waiting.front();
   m_waiting.pop_front();
-  Enter(number, LookAt(m_documents.At(number).native, kUsualRequest));
+  Enter(number, LookAtFile(m_documents.At(number)));
 }
 
 void DetectionJob::TakeLarge() {
@@ -153,7 +172,7 @@ void DetectionJob::Enter(int number, const Finding& finding) {
 SString DetectionJob::Failures() const {
   if (m_finder == nullptr || m_finder->GetFailures().IsEmpty()) return SString();
   const SFindFailures& failures = m_finder->GetFailures();
-  std::string text = ToUtf8(failures.GetFirstFolder()) + ": " + SystemText(failures.GetFirstError());
+  std::string text = ToUtf8(ShownPath(failures.GetFirstFolder())) + ": " + SystemText(failures.GetFirstError());
   if (failures.GetCount() > 1) text += " (and " + std::to_string(failures.GetCount() - 1) + " other folders)";
   return FromUtf8(text);
 }

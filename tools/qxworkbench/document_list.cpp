@@ -49,8 +49,14 @@ int DocumentList::RowOf(int number) const {
 int DocumentList::Find(const SString& name) const {
   const SString folded = Folded(name);
   for (int number = 0; number < Count(); ++number)
-    if (EntryAt(number).folded == folded) return number;
+    if (EntryAt(number).folded == folded || Folded(At(number).below) == folded) return number;
   return -1;
+}
+
+int DocumentList::FailedCount() const {
+  return static_cast<int>(std::count_if(m_documents.begin(), m_documents.end(), [](const Entry& entry) {
+    return entry.document.state == Document::State::kFailed;
+  }));
 }
 
 // Numbers settle what is equal, so that the order is one.

@@ -10,8 +10,9 @@ struct Document {
   enum class State { kWaiting, kDetected, kFailed };
 
   SString path;        // as the library spells it
-  SString name;        // the same below the open folder
-  std::string native;  // the same as an argument of TextSource
+  SString below;       // the part of it below the open folder
+  SString name;        // the same as the system spells it
+  std::string native;  // the path as an argument of TextSource
   State state = State::kWaiting;
   Encoding encoding = 0;  // with Finding's remark of XML
   SString encodingName;
@@ -38,8 +39,11 @@ class DocumentList {
   int NumberAt(int row) const { return m_order[static_cast<std::size_t>(row)]; }
   const Document& AtRow(int row) const { return At(NumberAt(row)); }
   int RowOf(int number) const;
-  // The document with this name, in any case of letters; -1 for none.
+  // The document with this name, in any case of letters and in either spelling; -1 for none.
   int Find(const SString& name) const;
+
+  // How many could not be looked at.
+  int FailedCount() const;
 
   // Sorts by a column; equal ones follow by their names.
   void SortBy(Column column, bool isDescending);

@@ -15,10 +15,10 @@
 QXCORE_IMPLEMENT_MESSAGE_MAP(
     WorkbenchFrame, SDockSiteFrameWnd, on<WM_DESTROY, &WorkbenchFrame::OnDestroy>(),
     on<WM_DROPFILES, &WorkbenchFrame::OnDropFiles>(), on<kMsgWorkIsDone, &WorkbenchFrame::OnWorkIsDone>(),
-    command<kOpenFolder, &WorkbenchFrame::OnOpenFolder>(), command<kRefresh, &WorkbenchFrame::OnRefresh>(),
-    update<kRefresh, &WorkbenchFrame::OnUpdateNeedsFolder>(), command<kConvert, &WorkbenchFrame::OnConvert>(),
-    update<kConvert, &WorkbenchFrame::OnUpdateNeedsSelection>(), command<kPreview, &WorkbenchFrame::OnPreview>(),
-    update<kPreview, &WorkbenchFrame::OnUpdateNeedsSelection>(),
+    on<kMsgInterrupted, &WorkbenchFrame::OnInterrupted>(), command<kOpenFolder, &WorkbenchFrame::OnOpenFolder>(),
+    command<kRefresh, &WorkbenchFrame::OnRefresh>(), update<kRefresh, &WorkbenchFrame::OnUpdateNeedsFolder>(),
+    command<kConvert, &WorkbenchFrame::OnConvert>(), update<kConvert, &WorkbenchFrame::OnUpdateNeedsSelection>(),
+    command<kPreview, &WorkbenchFrame::OnPreview>(), update<kPreview, &WorkbenchFrame::OnUpdateNeedsSelection>(),
     command<kClosePreview, &WorkbenchFrame::OnClosePreview>(),
     update<kClosePreview, &WorkbenchFrame::OnUpdateNeedsPreview>(), command<kSelectAll, &WorkbenchFrame::OnSelectAll>(),
     update<kSelectAll, &WorkbenchFrame::OnUpdateNeedsFolder>(), command<kCancelWork, &WorkbenchFrame::OnCancelWork>(),
@@ -45,7 +45,7 @@ SString FilesText(int count) { return FromUtf8(std::to_string(count) + (count ==
 // The folder in which the paths of all documents begin, as a path of the system.
 std::string TargetOf(const Document& document, const SString& folder) {
   if (folder.IsEmpty()) return document.native;
-  return SFile::ToNative(SFile::NormalizeDirectoryName(folder) + WTEXT("\\") + document.name);
+  return SFile::ToNative(SFile::NormalizeDirectoryName(folder) + WTEXT("\\") + document.below);
 }
 
 }  // namespace
@@ -171,7 +171,9 @@ void WorkbenchFrame::StepDetection() {
   } else if (const SString failures = m_detection.Failures(); !failures.IsEmpty()) {
     Report(failures);
   } else {
-    Say(looked + WTEXT(" in ") + m_detection.Folder());
+    const int failed = m_documents.FailedCount();
+    Say(looked + WTEXT(" in ") + ShownPath(m_detection.Folder()) +
+        (failed == 0 ? SString() : WTEXT("; ") + FilesText(failed) + WTEXT(" could not be read")));
   }
 }
 
@@ -259,9 +261,22 @@ bool WorkbenchFrame::CancelWasPressed(int done) {
   return (status.m_flags & SProgressStatusBar::kCancelRequested) != 0;
 }
 
+// Idle work goes on.
 LRESULT WorkbenchFrame::OnWorkIsDone(WPARAM, LPARAM) {
   if (SWinApp* app = SGetApp()) app->SetNeedOnIdle(1);
   return 0;
+}
+
+// A box that asks something is answered as far as it must be; the application's idle work then ends the program.
+LRESULT WorkbenchFrame::OnInterrupted(WPARAM, LPARAM) {
+  const HWND box = ::GetLastActivePopup(m_hWnd);
+  for (const int button : {IDCANCEL, IDNO, IDOK}) {
+    const HWND control = box != m_hWnd ? ::GetDlgItem(box, button) : nullptr;
+    if (control == nullptr) continue;
+    ::PostMessageW(box, WM_COMMAND, static_cast<WPARAM>(button), reinterpret_cast<LPARAM>(control));
+    break;
+  }
+  return OnWorkIsDone(0, 0);
 }
 
 // --- folders and previews ---
@@ -271,8 +286,8 @@ void WorkbenchFrame::OpenFolder(const SString& folder) {
   m_workBegan = ::GetTickCount();
   m_wasDetecting = true;
   KeepSetting(kFolderSetting, m_detection.Folder());
-  SetWindowTextW(m_detection.Folder() + WTEXT(" \u2013 qxcore workbench"));
-  Say(WTEXT("Reading ") + m_detection.Folder());
+  SetWindowTextW(ShownPath(m_detection.Folder()) + WTEXT(" \u2013 qxcore workbench"));
+  Say(WTEXT("Reading ") + ShownPath(m_detection.Folder()));
   m_list->ListChanged();
   ShowCounts();
 }
@@ -308,7 +323,7 @@ LRESULT WorkbenchFrame::OnDropFiles(WPARAM drop, LPARAM) {
 
 void WorkbenchFrame::OnOpenFolder() {
   const SString folder = m_detection.Folder().IsEmpty() ? ReadSetting(kFolderSetting) : m_detection.Folder();
-  TextDialog dialog(WTEXT("Open Folder"), WTEXT("The folder with the texts:"), folder);
+  TextDialog dialog(WTEXT("Open Folder"), WTEXT("The folder with the texts:"), ShownPath(folder));
   if (dialog.DoModal() != IDOK || dialog.GetText().IsEmpty()) return;
   Try([&] { OpenFolder(console::NameOf(ToUtf8(dialog.GetText()))); });
 }

@@ -57,6 +57,7 @@ class WorkbenchFrame : public SDockSiteFrameWnd {
   void OnDestroy();
   LRESULT OnDropFiles(WPARAM drop, LPARAM);
   LRESULT OnWorkIsDone(WPARAM, LPARAM);
+  LRESULT OnInterrupted(WPARAM, LPARAM);
 
   void OnOpenFolder();
   void OnRefresh();

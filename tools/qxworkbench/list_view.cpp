@@ -43,10 +43,11 @@ HFONT FileListView::MakeFont(int dpi) { return SGetDefaultUIFont(dpi); }
 
 // --- painting ---
 
-// The size takes what nine digits need, the encoding a quarter; name and warning share the rest.
+// The size takes what nine digits need, the encoding what its longest usual names need, as far as half of the list is
+// left for name and warning.
 SRect FileListView::ColumnRect(Column column, const SRect& row) const {
   const int size = std::min(row.Width() / 5, 11 * CharacterWidth() + 2 * Scaled(kPadding));
-  const int encoding = (row.Width() - size) * 3 / 10;
+  const int encoding = std::min(row.Width() / 2 - size, 28 * CharacterWidth() + 2 * Scaled(kPadding));
   const int name = (row.Width() - size - encoding) * 55 / 100;
   const int edges[] = {0, name, name + encoding, name + encoding + size, row.Width()};
   const auto at = static_cast<std::size_t>(column);

@@ -15,7 +15,9 @@ int Start(const WorkbenchOptions& options) {
   if (!app.Init(nullptr, nullptr, nullptr, SW_SHOWNORMAL) || !app.InitInstance()) return kFailed;
   app.Run();
   FlushPrinted();
-  return app.ExitCode();
+  if (!console::Interrupted()) return app.ExitCode();
+  Complain("cancelled");
+  return console::InterruptedCode();
 }
 
 int ReadAndStart(std::vector<std::string> arguments) {
@@ -41,7 +43,7 @@ int ReadAndStart(std::vector<std::string> arguments) {
 }  // namespace
 
 int main(int argc, char** argv) {
-  console::SetUpStreams();
+  console::SetUp();
   SetProgramName("qxworkbench");
   try {
     return ReadAndStart(console::Arguments(argc, argv));

@@ -155,11 +155,19 @@ void Cancel(const Call& call) {
   if (!call.frame.CancelWork()) throw Failure{"there is nothing to cancel"};
 }
 
+// A name without what would begin another line or column.
+std::string OnOneLine(const SString& name) {
+  std::string text = ToUtf8(name);
+  std::replace_if(
+      text.begin(), text.end(), [](char c) { return c >= 0 && c < ' '; }, '?');
+  return text;
+}
+
 std::string ListText(const DocumentList& documents) {
   std::string text;
   for (int row = 0; row < documents.Count(); ++row) {
     const Document& document = documents.AtRow(row);
-    text += ToUtf8(document.name) + "\t" + ToUtf8(document.encodingName) + "\t" + std::to_string(document.bytes) +
+    text += OnOneLine(document.name) + "\t" + ToUtf8(document.encodingName) + "\t" + std::to_string(document.bytes) +
             "\t" + ToUtf8(document.warning) + "\n";
   }
   return text;

@@ -12,5 +12,6 @@ SString ReadSetting(const SString& name) {
 }
 
 void KeepSetting(const SString& name, const SString& value) {
+  if (ReadSetting(name) == value) return;  // writing waits for the disk
   SRegistry(HKEY_CURRENT_USER, Key(), 1).WriteProfile(name, value);
 }

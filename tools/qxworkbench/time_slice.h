@@ -6,7 +6,7 @@
 class TimeSlice {
  public:
   // Begins now. A step does at least one file or piece, and looks at the clock behind each.
-  explicit TimeSlice(std::chrono::milliseconds length = std::chrono::milliseconds(8)) : m_end(Clock::now() + length) {}
+  explicit TimeSlice(std::chrono::milliseconds length = std::chrono::milliseconds(4)) : m_end(Clock::now() + length) {}
   bool IsOver() const { return Clock::now() >= m_end; }
 
  private:
