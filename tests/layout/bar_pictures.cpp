@@ -20,7 +20,7 @@ class Pane : public SView {
     const SSelectObject font(*dc, SGetDefaultUIFont(static_cast<int>(::GetDpiForWindow(m_hWnd))));
     dc->SetTextColor(::GetSysColor(COLOR_WINDOWTEXT));
     dc->SetBkColor(::GetSysColor(COLOR_WINDOW));
-    dc->TextOutW(8, 8, WTEXT("A pane"));
+    dc->TextOutW(8, 8, WTEXT("notes"));
   }
 };
 QXCORE_IMPLEMENT_CREATABLE_CLASS(Pane, SView, 1)
@@ -78,21 +78,25 @@ bool StatusBars(const char* folder, const char* suffix) {
   return isDone;
 }
 
+// The guide's program, and then its tabs as they look with scroll buttons and an empty tab.
 bool SplitterAndTabs(const char* folder, const char* suffix) {
   auto* frame = new SFrameWnd;
   SSplitterWnd splitter;
   STabWnd tabs;
-  frame->Create(nullptr, WTEXT("frame"), WS_POPUP | WS_VISIBLE, SRect(0, 0, Scaled(480), Scaled(200)));
+  frame->Create(nullptr, WTEXT("frame"), WS_POPUP | WS_VISIBLE, SRect(0, 0, Scaled(400), Scaled(200)));
   splitter.CreateStatic(frame, 1, 2);
-  splitter.AddPane(0, 0, &Pane::classPane, SSize(Scaled(150), 0));
+  splitter.AddPane(0, 0, &Pane::classPane, SSize(Scaled(120), 0));
   tabs.Create(&splitter, nullptr, nullptr, WS_CHILD | WS_VISIBLE, SSplitterWnd::IdFromRowCol(0, 1));
   splitter.AddPane(0, 1, &tabs, SSize(0, 0));
-  for (LPCWSTR text : {WTEXT("first"), WTEXT("second"), WTEXT("empty")}) tabs.AddTab(&Pane::classPane, text);
+  for (LPCWSTR text : {WTEXT("first"), WTEXT("second")}) tabs.AddTab(&Pane::classPane, text);
+  frame->RecalcLayout();
+  bool isDone = Save(*frame, folder, "splitter-and-tabs", suffix);
+  tabs.AddTab(&Pane::classPane, WTEXT("empty"));
   tabs.GetTabBeam()->SetTabEmpty(2, 1);
   tabs.GetTabBeam()->SetScrollButtons(1, 0);
+  tabs.GetTabBeam()->SetFirstVisible(0);
   tabs.ActivateTab(1);
-  frame->RecalcLayout();
-  const bool isDone = Save(*frame, folder, "splitter-and-tabs", suffix);
+  isDone &= Save(tabs, folder, "tabs", suffix);
   frame->DestroyWindow();
   return isDone;
 }
