@@ -70,8 +70,10 @@ int WorkbenchApp::OnIdle(long count) {
     Measure(begin, "idle");
     // What the script does is the user's part, and is measured by the messages that it sends.
     if (m_script != nullptr) goesOn |= RunScript();
-    if (m_script == nullptr && !m_options.picture.empty() && !m_frame->IsBusy() && count > 2) TakePicture();
-    if (!m_options.picture.empty() && !m_frame->IsBusy()) goesOn = true;
+    if (m_script == nullptr && !m_options.picture.empty() && !m_frame->IsBusy()) {
+      goesOn = true;
+      if (count > 2) TakePicture();
+    }
   }
   return goesOn && !m_hasEnded;
 }
