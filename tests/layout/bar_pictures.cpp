@@ -94,8 +94,9 @@ bool SplitterAndTabs(const char* folder, const char* suffix) {
   tabs.AddTab(&Pane::classPane, WTEXT("empty"));
   tabs.GetTabBeam()->SetTabEmpty(2, 1);
   tabs.GetTabBeam()->SetScrollButtons(1, 0);
-  tabs.GetTabBeam()->SetFirstVisible(0);
+  tabs.ShowScrollBar(SB_HORZ, 0);
   tabs.ActivateTab(1);
+  tabs.GetTabBeam()->SetFirstVisible(0);
   isDone &= Save(tabs, folder, "tabs", suffix);
   frame->DestroyWindow();
   return isDone;
