@@ -8,6 +8,8 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <cmath>
+#include <cstdio>
 #include <cstdlib>
 #include <random>
 #include <string>
@@ -304,6 +306,115 @@ TEST(NameArguments, ACurrentDirectoryOfAnyLength) {
   SetCurrentDirectoryW(start);
 }
 
+// What is at the end of a path, what must not be changed, and what leads elsewhere.
+TEST(NameArguments, FilesAndFoldersThatStayAsTheyAre) {
+  TempFolder folder;
+  const Text file = folder.File(u"f"), other = folder.File(u"g"), sub = folder.File(u"sub");
+  ASSERT_TRUE(WriteAll(file, "1") && WriteAll(other, "2") && CreateDirectoryW(sub.c_str(), nullptr));
+  const auto open = [](const Text& path, DWORD access, DWORD disposition, DWORD flags = 0) {
+    const HANDLE handle = CreateFileW(path.c_str(), access, 0, nullptr, disposition, flags, nullptr);
+    return handle != INVALID_HANDLE_VALUE && CloseHandle(handle);
+  };
+  EXPECT_EQ(ErrorOf([&] { return open(file + u"\\", GENERIC_READ, OPEN_EXISTING); }), DWORD(ERROR_INVALID_NAME));
+  EXPECT_EQ(ErrorOf([&] { return open(folder.File(u"new\\"), GENERIC_WRITE, CREATE_NEW); }), DWORD(ERROR_INVALID_NAME));
+  EXPECT_EQ(ErrorOf([&] { return open(sub, GENERIC_WRITE, OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS); }),
+            DWORD(ERROR_ACCESS_DENIED));
+  WCHAR text[MAX_PATH];
+  EXPECT_EQ(ErrorOf([&] { return GetLongPathNameW((file + u"\\").c_str(), text, MAX_PATH); }),
+            DWORD(ERROR_FILE_NOT_FOUND));
+  SetFileAttributesW(other.c_str(), FILE_ATTRIBUTE_READONLY);
+  EXPECT_EQ(ErrorOf([&] { return open(other, GENERIC_READ, CREATE_ALWAYS); }), DWORD(ERROR_ACCESS_DENIED));
+  EXPECT_EQ(ErrorOf([&] { return open(other, GENERIC_READ | GENERIC_WRITE, TRUNCATE_EXISTING); }),
+            DWORD(ERROR_ACCESS_DENIED));
+  EXPECT_EQ(ErrorOf([&] { return open(other, GENERIC_READ, OPEN_EXISTING, FILE_FLAG_DELETE_ON_CLOSE); }),
+            DWORD(ERROR_ACCESS_DENIED));
+  EXPECT_EQ(ErrorOf([&] { return MoveFileExW(file.c_str(), other.c_str(), MOVEFILE_REPLACE_EXISTING); }),
+            DWORD(ERROR_ACCESS_DENIED));
+  EXPECT_EQ(ErrorOf([&] { return MoveFileExW(file.c_str(), sub.c_str(), MOVEFILE_REPLACE_EXISTING); }),
+            DWORD(ERROR_ACCESS_DENIED));
+  EXPECT_EQ(ErrorOf([&] { return MoveFileW(sub.c_str(), folder.File(u"sub\\below").c_str()); }),
+            DWORD(ERROR_ACCESS_DENIED))
+      << "a folder into itself";
+  EXPECT_EQ(ReadAll(file) + ReadAll(other), "12");
+  std::string native = test::Narrow(folder.Path()).substr(2);
+  std::replace(native.begin(), native.end(), '\\', '/');
+  ASSERT_EQ(symlink("sub", (native + "/link").c_str()), 0);
+  EXPECT_EQ(ErrorOf([&] { return DeleteFileW(folder.File(u"link").c_str()); }), DWORD(ERROR_ACCESS_DENIED))
+      << "a link to a folder is a folder";
+  EXPECT_TRUE(RemoveDirectoryW(folder.File(u"link").c_str()));
+  EXPECT_NE(GetFileAttributesW(sub.c_str()), INVALID_FILE_ATTRIBUTES);
+  GetCurrentDirectoryW(MAX_PATH, text);
+  ASSERT_TRUE(SetCurrentDirectoryW(sub.c_str()));
+  EXPECT_EQ(ErrorOf([&] { return RemoveDirectoryW(sub.c_str()); }), DWORD(ERROR_SHARING_VIOLATION));
+  SetCurrentDirectoryW(text);
+  EXPECT_EQ(ErrorOf([] { return RemoveDirectoryW(u"C:\\"); }), DWORD(ERROR_DIR_NOT_EMPTY));
+  WIN32_FIND_DATAW data;
+  EXPECT_EQ(ErrorOf([&] { return FindFirstFileW(nullptr, &data) != INVALID_HANDLE_VALUE; }),
+            DWORD(ERROR_PATH_NOT_FOUND));
+  EXPECT_EQ(ErrorOf([&] { return FindFirstFileW(u"", &data) != INVALID_HANDLE_VALUE; }), DWORD(ERROR_PATH_NOT_FOUND));
+  EXPECT_EQ(ErrorOf([&] {
+              return FindFirstFileExW(u"*", FindExInfoStandard, &data, FindExSearchNameMatch, &data, 0) !=
+                     INVALID_HANDLE_VALUE;
+            }),
+            kBadParameter);
+  const HANDLE handle = CreateFileW(file.c_str(), GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr);
+  EXPECT_EQ(ErrorOf([&] { return FindNextFileW(handle, &data); }), kBadHandle) << "no search";
+  CloseHandle(handle);
+}
+
+// --- the program ---
+
+// Prints what a child of this test is asked for.
+TEST(DISABLED_Child, PrintsItself) {
+  std::printf("<%s|%u|%u>\n", test::Narrow(GetCommandLineW()).c_str(), GetACP(), GetOEMCP());
+}
+
+// What the child printed between its brackets.
+std::string AskChild(const std::string& environment, const std::string& arguments) {
+  char path[4096] = {};
+  EXPECT_GT(readlink("/proc/self/exe", path, sizeof path - 1), 0);
+  const std::string command = environment + " '" + path +
+                              "' --gtest_also_run_disabled_tests --gtest_filter=DISABLED_Child.PrintsItself " +
+                              arguments;
+  std::string printed;
+  std::FILE* const child = popen(command.c_str(), "r");
+  for (int c; (c = std::getc(child)) != EOF;) printed += static_cast<char>(c);
+  pclose(child);
+  const std::size_t begin = printed.find('<'), end = printed.rfind('>');
+  return begin < end && end != std::string::npos ? printed.substr(begin + 1, end - begin - 1) : printed;
+}
+
+TEST(ProgramArguments, WordsAreQuotedSoThatTheyComeApartAgain) {
+  const std::string line = AskChild("", R"(plain 'two words' '' 'q"x' 'back\' 'b\"' 'end \' 'two  x')");
+  const std::string expected = R"( plain "two words" "" "q\"x" back\ "b\\\"" "end \\" "two  x"|)";
+  EXPECT_NE(line.find(expected), std::string::npos) << line;
+}
+
+TEST(ProgramArguments, PagesThatAreNoneAreTheStandardOnes) {
+  const auto pages = [](const std::string& ansi, const std::string& oem) {
+    const std::string printed = AskChild("QXCORE_ACP='" + ansi + "' QXCORE_OEMCP='" + oem + "'", "");
+    return printed.substr(printed.find('|') + 1);
+  };
+  EXPECT_EQ(pages("1251", "866"), "1251|866");
+  for (const char* wrong : {"", "0", "x", "1251x", "12345", "70000", "-1"})
+    EXPECT_EQ(pages(wrong, wrong), "1252|437") << wrong;
+}
+
+TEST(ProgramArguments, ThePathOfTheProgramFitsOrIsCut) {
+  WCHAR path[MAX_PATH], part[MAX_PATH];
+  const DWORD length = GetModuleFileNameW(nullptr, path, MAX_PATH);
+  ASSERT_GT(length, 10u);
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_SUCCESS));
+  EXPECT_NE(GetFileAttributesW(path), INVALID_FILE_ATTRIBUTES);
+  EXPECT_EQ(GetModuleFileNameW(nullptr, part, 8), 8u);
+  EXPECT_EQ(GetLastError(), DWORD(ERROR_INSUFFICIENT_BUFFER));
+  EXPECT_EQ(Text(part), Text(path).substr(0, 7));
+  EXPECT_EQ(GetModuleFileNameW(nullptr, part, length + 1), length);
+  EXPECT_EQ(ErrorOf([&] { return GetModuleFileNameW(nullptr, part, 0); }), DWORD(ERROR_INSUFFICIENT_BUFFER));
+  EXPECT_EQ(ErrorOf([&] { return GetModuleFileNameW(platform::ModuleHandle(), part, MAX_PATH); }),
+            DWORD(ERROR_MOD_NOT_FOUND));
+}
+
 // --- shared memory ---
 
 TEST(MappingArguments, EveryNameIsItsOwn) {
@@ -413,6 +524,52 @@ TEST(TextArguments, NothingIsWrittenBehindTheRoom) {
       EXPECT_EQ(std::string(back + room, back + 8), std::string(static_cast<std::size_t>(8 - room), '#')) << page;
     }
   }
+}
+
+TEST(TextArguments, DefaultsOfTwoBytesAndLonelyHalves) {
+  const WCHAR missing[] = {u'a', 0x0E01, u'b'}, half[] = {0xD800, u'x'};
+  char bytes[20] = {};
+  BOOL used = FALSE;
+  EXPECT_EQ(WideCharToMultiByte(932, 0, missing, 3, bytes, 20, "\x81\x48", &used), 4);
+  EXPECT_EQ(std::string(bytes, 4),
+            "a\x81\x48"
+            "b");
+  EXPECT_TRUE(used);
+  EXPECT_EQ(WideCharToMultiByte(932, 0, missing, 3, bytes, 20, "\x81", &used), 3) << "a lead byte alone stays one byte";
+  EXPECT_EQ(WideCharToMultiByte(932, 0, missing, 3, bytes, 20, "#", nullptr), 3);
+  EXPECT_EQ(std::string(bytes, 3), "a#b");
+  EXPECT_EQ(WideCharToMultiByte(932, 0, missing, 3, bytes, 20, "", nullptr), 3);
+  EXPECT_EQ(bytes[1], '?');
+  EXPECT_EQ(
+      ErrorOf([&] { return WideCharToMultiByte(54936, WC_ERR_INVALID_CHARS, half, 2, bytes, 20, nullptr, nullptr); }),
+      DWORD(ERROR_NO_UNICODE_TRANSLATION));
+  EXPECT_GT(WideCharToMultiByte(54936, 0, half, 2, bytes, 20, nullptr, &used), 0);
+  EXPECT_TRUE(used);
+}
+
+TEST(TextArguments, NumbersThatAreNoneAndLongPrecisions) {
+  const auto format = [](const WCHAR* pattern, auto value) {
+    WCHAR text[300];
+    const int length = platform::WideFormat(text, 300, pattern, value);
+    return length < 0 ? Text(u"refused") : Text(text, static_cast<std::size_t>(length));
+  };
+  const double infinite = HUGE_VAL, none = std::nan("");
+  EXPECT_EQ(format(u"%E", -infinite), u"-1.#INF00E+000");
+  EXPECT_EQ(format(u"%+g", infinite), u"+1.#INF");
+  EXPECT_EQ(format(u"% G", none), u" 1.#QNAN");
+  EXPECT_EQ(format(u"%.10f", none), u"1.#QNAN00000");
+  EXPECT_EQ(format(u"%g", -none), u"-1.#IND");
+  EXPECT_EQ(format(u"%.0g", 2.5), u"3");
+  EXPECT_EQ(format(u"%+.1f", 2.0), u"+2.0");
+  EXPECT_EQ(format(u"% .1f", 2.0), u" 2.0");
+  EXPECT_EQ(format(u"%Lf", 1.0), u"1.000000");
+  EXPECT_EQ(format(u"%#X", 255), u"0XFF");
+  EXPECT_EQ(format(u"%#o", 8), u"010");
+  EXPECT_EQ(format(u"%.0S", "narrow"), u"");
+  EXPECT_EQ(format(u"%9999999999d", 1), u"refused");
+  char narrow[200];
+  const int length = std::snprintf(narrow, sizeof narrow, "%.70f", 0.1);
+  EXPECT_EQ(format(u"%.70f", 0.1), Text(narrow, narrow + length));
 }
 
 // Numbers of every form, as another reader of numbers has them.

@@ -48,7 +48,7 @@ class FailingCalls : public testing::Test {
   // `run` returns whether the operation said that it was done; `check` is given that.
   void WithEachFailure(const std::function<void()>& prepare, const std::function<bool()>& run,
                        const std::function<void(bool)>& check) {
-    for (const int error : {EIO, EACCES, ENOSPC, EMFILE}) {
+    for (const int error : {EIO, EACCES, ENOSPC, EMFILE, EINVAL}) {
       SCOPED_TRACE(error);
       bool isDone = false;
       int before = 0, failures = 0;
@@ -193,14 +193,14 @@ TEST_F(FailingCalls, InitialisationFiles) {
 }
 
 TEST_F(FailingCalls, Mappings) {
-  for (const bool isOfAFile : {true, false}) {
+  for (const WCHAR* name : {static_cast<const WCHAR*>(nullptr), WTEXT(""), WTEXT("Local\\qxcore failing calls")}) {
+    const bool isOfAFile = name == nullptr;
     WithEachFailure([&] { Put(m_to, kOld); },
                     [&] {
                       const HANDLE file = isOfAFile ? CreateFileW(m_to.c_str(), GENERIC_READ | GENERIC_WRITE, 0,
                                                                   nullptr, OPEN_EXISTING, 0, nullptr)
                                                     : INVALID_HANDLE_VALUE;
                       if (isOfAFile && file == INVALID_HANDLE_VALUE) return false;
-                      const WCHAR* name = isOfAFile ? nullptr : WTEXT("Local\\qxcore failing calls");
                       const HANDLE mapping = CreateFileMappingW(file, nullptr, PAGE_READWRITE, 0, 80000, name);
                       bool isDone = mapping != nullptr;
                       char* const view =

@@ -24,6 +24,7 @@
 #include <vector>
 
 #include "tests/support/failing_calls.h"
+#include "tests/support/file_size_limit.h"
 #include "tests/support/registry_root.h"
 #include "tests/support/temp_folder.h"
 
@@ -343,6 +344,43 @@ TEST_F(PrivateFiles, TheRegistryIsKeptInTheUsersDataFolder) {
   EXPECT_EQ(RightsOf(Path(u"data\\x\\qxcore\\registry.db")), 0600u);
   EXPECT_EQ(RightsOf(Path(u"data\\x\\qxcore")), 0700u);
   EXPECT_NE(RegQueryValueExW(HKEY_CURRENT_USER, u"v", nullptr, nullptr, nullptr, nullptr), 0);
+}
+
+TEST_F(PrivateFiles, SettingsLieInTheUsersFolderWhateverNamesIt) {
+  const char* const variables[] = {"HOME", "XDG_CONFIG_HOME"};
+  std::string kept[2];
+  for (int i = 0; i < 2; ++i) kept[i] = getenv(variables[i]) != nullptr ? getenv(variables[i]) : "";
+  const std::string home = Native(m_folder.Path());
+  WCHAR text[20];
+  const auto read = [&] {
+    GetPrivateProfileStringW(u"s", u"k", u"missing", text, 20, u"qxcore-test.ini");
+    return Text(text);
+  };
+  test::SetVariable("HOME", home);
+  for (const char* folder : {"", "relative", "/"}) {
+    test::SetVariable("XDG_CONFIG_HOME", folder[0] == '/' ? home + "/own" : folder);
+    EXPECT_TRUE(WritePrivateProfileStringW(u"s", u"k", folder[0] == '/' ? u"own" : u"home", u"qxcore-test.ini"));
+    EXPECT_EQ(read(), folder[0] == '/' ? u"own" : u"home") << folder;
+  }
+  EXPECT_EQ(ReadAll(Path(u".config\\qxcore\\qxcore-test.ini")), "[s]\r\nk=home\r\n");
+  EXPECT_EQ(ReadAll(Path(u"own\\qxcore\\qxcore-test.ini")), "[s]\r\nk=own\r\n");
+  // Without the variables it is the folder that the system knows.
+  test::SetVariable("XDG_CONFIG_HOME", "");
+  test::SetVariable("HOME", "");
+  EXPECT_EQ(read(), u"missing");
+  for (int i = 0; i < 2; ++i) test::SetVariable(variables[i], kept[i]);
+}
+
+TEST_F(PrivateFiles, AnIniFileWithOtherNamesStaysWholeWithoutRoom) {
+  Make(u"a.ini", "[s]\r\nk=old\r\n", 0644);
+  ASSERT_EQ(link(Native(Path(u"a.ini")).c_str(), Native(Path(u"b.ini")).c_str()), 0);
+  {
+    const test::FileSizeLimit full(16);
+    EXPECT_FALSE(SetKey(u"a.ini", Text(200, u'n').c_str()));
+  }
+  EXPECT_EQ(ReadAll(Path(u"b.ini")), "[s]\r\nk=old\r\n");
+  EXPECT_TRUE(SetKey(u"a.ini", u"n"));
+  EXPECT_EQ(ReadAll(Path(u"b.ini")), "[s]\r\nk=n\r\n");
 }
 
 TEST_F(PrivateFiles, ARegistryThatCannotBeOpenedNowIsThereLater) {
