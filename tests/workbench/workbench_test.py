@@ -319,7 +319,7 @@ class WorkbenchTest(unittest.TestCase):
         """Whatever it waits for: a file, an answer, work."""
         self.write("large.txt", GERMAN * 400000)
         for text in ("echo ready\npause never\n", "open texts\nselect all\necho ready\nconvert UTF-16\n",
-                     "echo ready\n-convert UTF-8\nopen texts\n"):
+                     "open texts\nselect all\necho ready\n-convert UTF-16\nopen texts\n"):
             for number in (signal.SIGINT, signal.SIGTERM, signal.SIGHUP):
                 self.interrupt(self.start(text), number)
 
