@@ -132,7 +132,7 @@ TEST_F(PrivateFiles, ACopyHasNoMoreRightsThanItsSourceAtAnyTime) {
     g_beforeWrite = nullptr;
     EXPECT_EQ(g_hooks.umaskCalls, 0);
     EXPECT_EQ(RightsOf(Path(u"to")), each.result) << std::oct << each.source << ' ' << each.target;
-    ASSERT_FALSE(g_hooks.rights.empty());
+    ASSERT_EQ(g_hooks.rights.empty(), !OrdersReachReads()) << "a sanitizer has its own write";
     for (const mode_t rights : g_hooks.rights) EXPECT_EQ(rights & ~each.source, 0u) << std::oct << each.source;
     EXPECT_EQ(ReadAll(Path(u"to")), "secret");
     chmod(Native(Path(u"from")).c_str(), 0600);
