@@ -202,6 +202,43 @@ TEST_F(WindowContexts, WhatMovesTogetherKeepsItsPixelsOrIsInvalid) {
 }
 #endif
 
+// What a window hid of another one is nobody's when both have moved.
+TEST_F(WindowContexts, WhatLayBelowAnotherWindowOfABatchIsInvalid) {
+  ShowWindow(child, SW_HIDE);
+  const auto make = [&](const SRect& place) {
+    const HWND window =
+        CreateWindowExW(0, WTEXT("WindowContexts"), WTEXT(""), WS_CHILD | WS_VISIBLE | WS_CLIPSIBLINGS, place.left,
+                        place.top, place.Width(), place.Height(), top, nullptr, nullptr, nullptr);
+    SClientDC(window).FillSolidRect(SRect(0, 0, 100, 100), RGB(200, 0, 0));
+    ValidateRect(window, nullptr);
+    return window;
+  };
+  const COLORREF below = RGB(0, 0, 200);
+  for (const int shift : {0, 7}) {
+    const HWND large = make(SRect(0, 0, 60, 60)), small = make(SRect(10, 10, 30, 30));
+    SetWindowPos(small, HWND_TOP, 0, 0, 0, 0, SWP_NOMOVE | SWP_NOSIZE | SWP_NOACTIVATE);
+    SClientDC(large).FillSolidRect(SRect(0, 0, 100, 100), below);
+    ValidateRect(large, nullptr);
+    HDWP batch = BeginDeferWindowPos(2);
+    constexpr UINT kFlags = SWP_NOSIZE | SWP_NOZORDER | SWP_NOACTIVATE | SWP_DEFERERASE;
+    batch = DeferWindowPos(batch, small, nullptr, 70, 65, 0, 0, kFlags);
+    batch = DeferWindowPos(batch, large, nullptr, shift, shift, 0, 0, kFlags);
+    ASSERT_TRUE(EndDeferWindowPos(batch));
+    const HRGN invalid = CreateRectRgn(0, 0, 0, 0);
+    GetUpdateRgn(large, invalid, FALSE);
+    SClientDC dc(large);
+    for (int y = 0; y < 60; ++y) {
+      for (int x = 0; x < 60; ++x) {
+        if (PtInRegion(invalid, x, y)) continue;
+        ASSERT_EQ(dc.GetPixel(SPoint(x, y)), below) << x << ", " << y << " after a move by " << shift;
+      }
+    }
+    DeleteObject(invalid);
+    DestroyWindow(small);
+    DestroyWindow(large);
+  }
+}
+
 TEST_F(WindowContexts, AStaleWindowHasNone) {
   DestroyWindow(child);
   EXPECT_EQ(GetDC(child), nullptr);

@@ -1,5 +1,7 @@
 // Batches: windows that move together.
 
+#include <algorithm>
+
 #include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/paint.h"
 #include "qxcore/platform/posix/window/placing.h"
@@ -94,10 +96,7 @@ bool PlaceOneByOne(Batch* batch) {
   return isDone;
 }
 
-// Whether all may be erased later, and there is memory for what is kept meanwhile.
-bool CanMoveTogether(Batch* batch) {
-  for (const Placing& placing : batch->placings)
-    if (!(placing.place.flags & SWP_DEFERERASE)) return false;
+bool MakeRoom(Batch* batch) {
   return OrNoMemory<bool>(false, [batch] {
     const std::size_t count = batch->placings.size();
     batch->moves.reserve(count);
@@ -105,6 +104,27 @@ bool CanMoveTogether(Batch* batch) {
     batch->taken.reserve(count);
     return true;
   });
+}
+
+// Whether no window hides a part of another one. What it hid could not be told any more once both have moved.
+bool AreApart(Batch* batch) {
+  const Guard guard;
+  List<pixman_box32_t>& places = batch->left;
+  long long sum = 0;
+  for (const Placing& placing : batch->placings) {
+    const Window* window = FindWindowObject(placing.place.hwnd);
+    if (window == nullptr || !IsShown(window)) continue;
+    places.push_back(BoxOf(window->window));
+    sum += Region(window->window).Area();
+  }
+  const bool areApart = Region(places.data(), places.size()).Area() == sum;
+  places.clear();
+  return areApart;
+}
+
+bool MayEraseLater(const Batch& batch) {
+  return std::all_of(batch.placings.begin(), batch.placings.end(),
+                     [](const Placing& placing) { return (placing.place.flags & SWP_DEFERERASE) != 0; });
 }
 
 }  // namespace
@@ -163,7 +183,8 @@ BOOL EndDeferWindowPos(HDWP handle) {
     batch = static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
   }
   if (batch == nullptr) return Fail(ERROR_INVALID_DWP_HANDLE);
-  const BOOL result = CanMoveTogether(batch) ? PlaceTogether(batch) : PlaceOneByOne(batch);
+  const bool movesTogether = MayEraseLater(*batch) && MakeRoom(batch) && AreApart(batch);
+  const BOOL result = movesTogether ? PlaceTogether(batch) : PlaceOneByOne(batch);
   delete batch;
   return result;
 }

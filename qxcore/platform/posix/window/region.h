@@ -51,6 +51,13 @@ class Region {
     return pixman_region32_n_rects(const_cast<pixman_region32_t*>(&m_region)) == 1 && bounds.left <= rect.left &&
            bounds.top <= rect.top && bounds.right >= rect.right && bounds.bottom >= rect.bottom;
   }
+  long long Area() const {
+    int count = 0;
+    const pixman_box32_t* box = pixman_region32_rectangles(const_cast<pixman_region32_t*>(&m_region), &count);
+    long long area = 0;
+    for (; count > 0; --count, ++box) area += static_cast<long long>(box->x2 - box->x1) * (box->y2 - box->y1);
+    return area;
+  }
   pixman_region32_t* Pixman() { return &m_region; }
   const pixman_region32_t* Pixman() const { return &m_region; }
 
