@@ -111,16 +111,18 @@ class KeyIsDown {
 // Tests whose bars stand in a shown frame.
 class FrameTest : public UiTest {
  protected:
+  explicit FrameTest(int width = 600) : m_width(width) {}
   void SetUp() override {
     UiTest::SetUp();
     m_frame = new SFrameWnd;
-    ASSERT_TRUE(m_frame->Create(nullptr, WTEXT("f"), WS_POPUP | WS_VISIBLE, SRect(0, 0, 600, 300)));
+    ASSERT_TRUE(m_frame->Create(nullptr, WTEXT("f"), WS_POPUP | WS_VISIBLE, SRect(0, 0, m_width, 300)));
   }
   void TearDown() override {
     m_frame->DestroyWindow();
     UiTest::TearDown();
   }
 
+  const int m_width;
   App m_app;
   SFrameWnd* m_frame = nullptr;
 };

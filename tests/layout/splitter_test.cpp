@@ -59,18 +59,13 @@ class Splitter : public SSplitterWnd {
 };
 
 // A frame whose client is a splitter; its size is that of the splitter.
-class Splitters : public test::UiTest {
+class Splitters : public test::FrameTest {
  protected:
-  void SetUp() override {
-    UiTest::SetUp();
-    m_frame = new SFrameWnd;
-    ASSERT_TRUE(m_frame->Create(nullptr, WTEXT("f"), WS_POPUP | WS_VISIBLE, SRect(0, 0, 400, 300)));
-  }
+  Splitters() : FrameTest(400) {}
   void TearDown() override {
-    m_frame->DestroyWindow();
+    FrameTest::TearDown();
     test::PaneView::s_refuses = false;
     EXPECT_EQ(test::PaneView::s_living, 0);
-    UiTest::TearDown();
   }
 
   void MakeStatic(int rows, int columns, DWORD scroll = 0) {
@@ -117,8 +112,6 @@ class Splitters : public test::UiTest {
     }
   }
 
-  test::App m_app;
-  SFrameWnd* m_frame = nullptr;
   Splitter m_splitter;
 };
 

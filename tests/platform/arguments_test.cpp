@@ -1,42 +1,30 @@
 // What the calls of the portable layer answer to arguments that are missing, contradict themselves or are larger than
-// anything: the published errors, and nothing done. Linux only, because the other system does not look at all of them.
+// anything: the published errors, and nothing done. The registry, handles, the program and shared memory. Linux only,
+// because the other system does not look at all of them.
 
 #ifndef _WIN32
 
 #include <gtest/gtest.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
-#include <algorithm>
-#include <cmath>
 #include <cstdio>
-#include <cstdlib>
-#include <random>
 #include <string>
 #include <vector>
 
 #include "qxcore/platform/module.h"
 #include "qxcore/platform/wide.h"
+#include "tests/support/last_error.h"
 #include "tests/support/registry_root.h"
 #include "tests/support/temp_folder.h"
 
 namespace {
 
-using test::ReadAll;
 using test::RegistryRoot;
 using test::TempFolder;
 using test::Text;
 using test::WriteAll;
 
 constexpr DWORD kBadParameter = ERROR_INVALID_PARAMETER, kBadHandle = ERROR_INVALID_HANDLE;
-
-// Clears the last error, calls, and returns the error of a call that must fail.
-template <class Call>
-DWORD ErrorOf(Call call) {
-  SetLastError(0xDEAD);
-  EXPECT_FALSE(call());
-  return GetLastError();
-}
 
 LSTATUS Code(DWORD code) { return static_cast<LSTATUS>(code); }
 
@@ -180,188 +168,6 @@ TEST(HandleArguments, DevicesAreOpenedAndEmptiedLikeFiles) {
   EXPECT_EQ(GetFileAttributesW(folder.File(u"doomed").c_str()), INVALID_FILE_ATTRIBUTES);
 }
 
-// --- names and folders ---
-
-TEST(NameArguments, AreLookedAt) {
-  TempFolder folder;
-  WCHAR text[MAX_PATH] = u"former", *part = text;
-  EXPECT_EQ(ErrorOf([] { return SetCurrentDirectoryW(nullptr); }), DWORD(ERROR_INVALID_NAME));
-  EXPECT_EQ(ErrorOf([] { return SetCurrentDirectoryW(u""); }), DWORD(ERROR_INVALID_NAME));
-  EXPECT_EQ(ErrorOf([&] { return GetFullPathNameW(nullptr, MAX_PATH, text, &part); }), DWORD(ERROR_INVALID_NAME));
-  EXPECT_EQ(part, nullptr);
-  EXPECT_EQ(ErrorOf([&] { return GetFullPathNameW(u"", MAX_PATH, text, nullptr); }), DWORD(ERROR_INVALID_NAME));
-  EXPECT_EQ(ErrorOf([&] { return GetTempFileNameW(nullptr, u"p", 0, text); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return GetTempFileNameW(folder.Path().c_str(), u"p", 0, nullptr); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return GetTempFileNameW(u"", u"p", 0, text); }), DWORD(ERROR_DIRECTORY));
-  EXPECT_EQ(ErrorOf([&] { return GetLongPathNameW(nullptr, text, MAX_PATH); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return GetShortPathNameW(nullptr, text, MAX_PATH); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return GetShortPathNameW(u"", text, MAX_PATH); }), DWORD(ERROR_BAD_PATHNAME));
-  EXPECT_EQ(ErrorOf([&] { return CopyFileW(nullptr, u"x", FALSE); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return CopyFileW(u"x", nullptr, FALSE); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return MoveFileExW(u"x", nullptr, 0); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return MoveFileExW(u"x", u"y", 0x80); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return GetFileAttributesExW(u"x", GetFileExInfoStandard, nullptr); }), kBadParameter);
-  ULARGE_INTEGER room;
-  EXPECT_EQ(ErrorOf([&] { return GetDiskFreeSpaceExW(u"\\\\server\\share", &room, nullptr, nullptr); }),
-            DWORD(ERROR_BAD_NETPATH));
-  ASSERT_TRUE(WriteAll(folder.File(u"f"), "1"));
-  EXPECT_EQ(ErrorOf([&] { return GetDiskFreeSpaceExW(folder.File(u"f").c_str(), &room, nullptr, nullptr); }),
-            DWORD(ERROR_DIRECTORY));
-  EXPECT_EQ(ErrorOf([&] { return SetCurrentDirectoryW(folder.File(u"f").c_str()); }), DWORD(ERROR_DIRECTORY));
-  EXPECT_EQ(GetSystemDirectoryW(nullptr, 0), GetSystemDirectoryW(text, MAX_PATH) + 1);
-  EXPECT_EQ(GetWindowsDirectoryW(text, 2), GetWindowsDirectoryW(text, MAX_PATH) + 1);
-}
-
-TEST(NameArguments, TheTemporaryFolderIsAnAbsolutePath) {
-  const char* const former = std::getenv("TMPDIR");
-  const std::string kept = former != nullptr ? former : "";
-  WCHAR text[MAX_PATH];
-  const auto with = [&](const char* folder) {
-    setenv("TMPDIR", folder, 1);
-    GetTempPathW(MAX_PATH, text);
-    return Text(text);
-  };
-  EXPECT_EQ(with("/"), u"C:\\");
-  EXPECT_EQ(with("/var/tmp"), u"C:\\var\\tmp\\");
-  EXPECT_EQ(with("/var//tmp/"), u"C:\\var\\tmp\\");
-  EXPECT_EQ(with("relative"), u"C:\\tmp\\");
-  EXPECT_EQ(with(""), u"C:\\tmp\\");
-  unsetenv("TMPDIR");
-  GetTempPathW(MAX_PATH, text);
-  EXPECT_EQ(Text(text), u"C:\\tmp\\");
-  if (former != nullptr) setenv("TMPDIR", kept.c_str(), 1);
-}
-
-TEST(NameArguments, FullPathsOfEveryForm) {
-  WCHAR text[MAX_PATH], start[MAX_PATH];
-  GetCurrentDirectoryW(MAX_PATH, start);
-  const Text here(start);
-  const struct {
-    Text given, full;
-  } cases[] = {{u"C:\\a/b", u"C:\\a\\b"},
-               {u"C:\\a\\\\b", u"C:\\a\\b"},
-               {u"C:\\a\\.\\b", u"C:\\a\\b"},
-               {u"C:\\a\\..\\b", u"C:\\b"},
-               {u"C:\\..\\..\\b", u"C:\\b"},
-               {u"C:\\a\\./b", u"C:\\a\\b"},
-               {u"C:\\.hidden\\..x", u"C:\\.hidden\\..x"},
-               {u"c:x", here + u"\\x"},
-               {u"C:", here},
-               {u"z:x", u"z:\\x"},
-               {u"\\a\\..", u"C:\\"},
-               {u"\\\\?\\C:\\x", u"C:\\x"},
-               {u"\\\\server", u"\\\\server"},
-               {u"//server/share", u"\\\\server\\share"},
-               {u"\\\\server\\share\\a\\..\\..\\b\\", u"\\\\server\\share\\b\\"},
-               {u"1:\\x", here + u"\\1:\\x"}};
-  for (const auto& each : cases) {
-    ASSERT_NE(GetFullPathNameW(each.given.c_str(), MAX_PATH, text, nullptr), 0u);
-    EXPECT_EQ(Text(text), each.full);
-  }
-  EXPECT_EQ(GetFileAttributesW(u"Z:\\"), INVALID_FILE_ATTRIBUTES) << "there is one drive";
-  EXPECT_EQ(GetLastError(), DWORD(ERROR_PATH_NOT_FOUND));
-}
-
-TEST(NameArguments, AFolderIsMovedToANameWithABackslashBehindIt) {
-  TempFolder folder;
-  ASSERT_TRUE(CreateDirectoryW(folder.File(u"from").c_str(), nullptr));
-  ASSERT_TRUE(WriteAll(folder.File(u"from\\f"), "1"));
-  EXPECT_TRUE(MoveFileW(folder.File(u"from").c_str(), folder.File(u"To\\").c_str())) << GetLastError();
-  WIN32_FIND_DATAW data;
-  const HANDLE search = FindFirstFileW(folder.File(u"to").c_str(), &data);
-  ASSERT_NE(search, INVALID_HANDLE_VALUE);
-  EXPECT_EQ(Text(data.cFileName), u"To");
-  FindClose(search);
-  EXPECT_EQ(ReadAll(folder.File(u"To\\f")), "1");
-}
-
-TEST(NameArguments, TheRootHasNoFoldersAboveIt) {
-  WIN32_FIND_DATAW data;
-  const HANDLE search = FindFirstFileW(u"C:\\*", &data);
-  ASSERT_NE(search, INVALID_HANDLE_VALUE);
-  int entries = 0;
-  do {
-    EXPECT_NE(Text(data.cFileName), u".");
-    EXPECT_NE(Text(data.cFileName), u"..");
-    ++entries;
-  } while (FindNextFileW(search, &data));
-  EXPECT_GT(entries, 5);
-  FindClose(search);
-}
-
-TEST(NameArguments, ACurrentDirectoryOfAnyLength) {
-  TempFolder folder;
-  WCHAR start[MAX_PATH];
-  GetCurrentDirectoryW(MAX_PATH, start);
-  ASSERT_TRUE(SetCurrentDirectoryW(folder.Path().c_str()));
-  Text expected = folder.Path();
-  const Text part(90, u'd');
-  for (int depth = 0; depth < 8; ++depth) {
-    ASSERT_TRUE(CreateDirectoryW(part.c_str(), nullptr) && SetCurrentDirectoryW(part.c_str()));
-    expected += u'\\' + part;
-    Text now(1000, u'\0');
-    now.resize(GetCurrentDirectoryW(1000, now.data()));
-    EXPECT_EQ(now, expected);
-  }
-  SetCurrentDirectoryW(start);
-}
-
-// What is at the end of a path, what must not be changed, and what leads elsewhere.
-TEST(NameArguments, FilesAndFoldersThatStayAsTheyAre) {
-  TempFolder folder;
-  const Text file = folder.File(u"f"), other = folder.File(u"g"), sub = folder.File(u"sub");
-  ASSERT_TRUE(WriteAll(file, "1") && WriteAll(other, "2") && CreateDirectoryW(sub.c_str(), nullptr));
-  const auto open = [](const Text& path, DWORD access, DWORD disposition, DWORD flags = 0) {
-    const HANDLE handle = CreateFileW(path.c_str(), access, 0, nullptr, disposition, flags, nullptr);
-    return handle != INVALID_HANDLE_VALUE && CloseHandle(handle);
-  };
-  EXPECT_EQ(ErrorOf([&] { return open(file + u"\\", GENERIC_READ, OPEN_EXISTING); }), DWORD(ERROR_INVALID_NAME));
-  EXPECT_EQ(ErrorOf([&] { return open(folder.File(u"new\\"), GENERIC_WRITE, CREATE_NEW); }), DWORD(ERROR_INVALID_NAME));
-  EXPECT_EQ(ErrorOf([&] { return open(sub, GENERIC_WRITE, OPEN_EXISTING, FILE_FLAG_BACKUP_SEMANTICS); }),
-            DWORD(ERROR_ACCESS_DENIED));
-  WCHAR text[MAX_PATH];
-  EXPECT_EQ(ErrorOf([&] { return GetLongPathNameW((file + u"\\").c_str(), text, MAX_PATH); }),
-            DWORD(ERROR_FILE_NOT_FOUND));
-  SetFileAttributesW(other.c_str(), FILE_ATTRIBUTE_READONLY);
-  EXPECT_EQ(ErrorOf([&] { return open(other, GENERIC_READ, CREATE_ALWAYS); }), DWORD(ERROR_ACCESS_DENIED));
-  EXPECT_EQ(ErrorOf([&] { return open(other, GENERIC_READ | GENERIC_WRITE, TRUNCATE_EXISTING); }),
-            DWORD(ERROR_ACCESS_DENIED));
-  EXPECT_EQ(ErrorOf([&] { return open(other, GENERIC_READ, OPEN_EXISTING, FILE_FLAG_DELETE_ON_CLOSE); }),
-            DWORD(ERROR_ACCESS_DENIED));
-  EXPECT_EQ(ErrorOf([&] { return MoveFileExW(file.c_str(), other.c_str(), MOVEFILE_REPLACE_EXISTING); }),
-            DWORD(ERROR_ACCESS_DENIED));
-  EXPECT_EQ(ErrorOf([&] { return MoveFileExW(file.c_str(), sub.c_str(), MOVEFILE_REPLACE_EXISTING); }),
-            DWORD(ERROR_ACCESS_DENIED));
-  EXPECT_EQ(ErrorOf([&] { return MoveFileW(sub.c_str(), folder.File(u"sub\\below").c_str()); }),
-            DWORD(ERROR_ACCESS_DENIED))
-      << "a folder into itself";
-  EXPECT_EQ(ReadAll(file) + ReadAll(other), "12");
-  std::string native = test::Narrow(folder.Path()).substr(2);
-  std::replace(native.begin(), native.end(), '\\', '/');
-  ASSERT_EQ(symlink("sub", (native + "/link").c_str()), 0);
-  EXPECT_EQ(ErrorOf([&] { return DeleteFileW(folder.File(u"link").c_str()); }), DWORD(ERROR_ACCESS_DENIED))
-      << "a link to a folder is a folder";
-  EXPECT_TRUE(RemoveDirectoryW(folder.File(u"link").c_str()));
-  EXPECT_NE(GetFileAttributesW(sub.c_str()), INVALID_FILE_ATTRIBUTES);
-  GetCurrentDirectoryW(MAX_PATH, text);
-  ASSERT_TRUE(SetCurrentDirectoryW(sub.c_str()));
-  EXPECT_EQ(ErrorOf([&] { return RemoveDirectoryW(sub.c_str()); }), DWORD(ERROR_SHARING_VIOLATION));
-  SetCurrentDirectoryW(text);
-  EXPECT_EQ(ErrorOf([] { return RemoveDirectoryW(u"C:\\"); }), DWORD(ERROR_DIR_NOT_EMPTY));
-  WIN32_FIND_DATAW data;
-  EXPECT_EQ(ErrorOf([&] { return FindFirstFileW(nullptr, &data) != INVALID_HANDLE_VALUE; }),
-            DWORD(ERROR_PATH_NOT_FOUND));
-  EXPECT_EQ(ErrorOf([&] { return FindFirstFileW(u"", &data) != INVALID_HANDLE_VALUE; }), DWORD(ERROR_PATH_NOT_FOUND));
-  EXPECT_EQ(ErrorOf([&] {
-              return FindFirstFileExW(u"*", FindExInfoStandard, &data, FindExSearchNameMatch, &data, 0) !=
-                     INVALID_HANDLE_VALUE;
-            }),
-            kBadParameter);
-  const HANDLE handle = CreateFileW(file.c_str(), GENERIC_READ, 0, nullptr, OPEN_EXISTING, 0, nullptr);
-  EXPECT_EQ(ErrorOf([&] { return FindNextFileW(handle, &data); }), kBadHandle) << "no search";
-  CloseHandle(handle);
-}
-
 // --- the program ---
 
 // Prints what a child of this test is asked for.
@@ -453,167 +259,6 @@ TEST(MappingArguments, EveryNameIsItsOwn) {
                      nullptr;
             }),
             DWORD(ERROR_NOT_ENOUGH_MEMORY));
-}
-
-// --- texts, pages and resources ---
-
-TEST(TextArguments, AreLookedAt) {
-  WCHAR text[40] = u"former";
-  const WCHAR letter[] = u"\u00E9";
-  EXPECT_EQ(ErrorOf([&] { return FoldStringW(MAP_COMPOSITE, nullptr, 1, text, 40); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return FoldStringW(MAP_COMPOSITE, letter, 0, text, 40); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return FoldStringW(MAP_COMPOSITE, letter, 1, text, -1); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return FoldStringW(MAP_COMPOSITE, letter, 1, nullptr, 40); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return FoldStringW(MAP_COMPOSITE, text, 1, text, 40); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return FoldStringW(0, letter, 1, text, 40); }), DWORD(ERROR_INVALID_FLAGS));
-  EXPECT_EQ(FoldStringW(MAP_COMPOSITE, letter, -1, nullptr, 0), 3) << "the terminator counts";
-  EXPECT_EQ(ErrorOf([&] { return FoldStringW(MAP_COMPOSITE, letter, 1, text, 1); }), DWORD(ERROR_INSUFFICIENT_BUFFER));
-
-  CPINFO info;
-  CPINFOEXW more;
-  EXPECT_EQ(ErrorOf([] { return GetCPInfo(1252, nullptr); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return GetCPInfo(12345, &info); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return GetCPInfoExW(12345, 0, &more); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return GetCPInfoExW(1252, 1, &more); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([] { return GetCPInfoExW(1252, 0, nullptr); }), kBadParameter);
-  EXPECT_FALSE(IsDBCSLeadByteEx(12345, 0x81));
-  EXPECT_EQ(ErrorOf([] { return EnumSystemCodePagesW(nullptr, CP_INSTALLED); }), kBadParameter);
-  static int pages = 0;
-  const auto stop = [](LPWSTR) -> BOOL { return ++pages < 3; };
-  EXPECT_EQ(ErrorOf([&] { return EnumSystemCodePagesW(stop, 7); }), kBadParameter);
-  EXPECT_TRUE(EnumSystemCodePagesW(stop, CP_SUPPORTED));
-  EXPECT_EQ(pages, 3) << "the caller had enough";
-
-  EXPECT_EQ(ErrorOf([] { return FormatMessageW(FORMAT_MESSAGE_FROM_SYSTEM, nullptr, 2, 0, nullptr, 10, nullptr); }),
-            kBadParameter);
-  EXPECT_EQ(ErrorOf([] { return LoadStringW(nullptr, 1, nullptr, 10); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return LoadStringW(nullptr, 1, text, -1); }), kBadParameter);
-  EXPECT_EQ(ErrorOf([&] { return LoadStringW(platform::ModuleHandle(), 65000, text, 0); }),
-            DWORD(ERROR_RESOURCE_NAME_NOT_FOUND));
-  EXPECT_EQ(Text(text), u"former") << "there was no room to say so";
-  EXPECT_EQ(ErrorOf([&] { return LoadStringW(platform::ModuleHandle(), 65000, text, 40); }),
-            DWORD(ERROR_RESOURCE_NAME_NOT_FOUND));
-  EXPECT_EQ(Text(text), u"");
-  EXPECT_EQ(ErrorOf([] { return GetModuleHandleW(u"other") != nullptr; }), DWORD(ERROR_MOD_NOT_FOUND));
-  const auto number = [](std::uintptr_t n) { return reinterpret_cast<LPCWSTR>(n); };
-  constexpr std::uintptr_t kTexts = 6;
-  for (const std::uintptr_t block : {std::uintptr_t{0}, std::uintptr_t{4000}}) {
-    EXPECT_EQ(
-        ErrorOf([&] { return FindResourceW(platform::ModuleHandle(), number(block), number(kTexts)) != nullptr; }),
-        DWORD(ERROR_RESOURCE_NAME_NOT_FOUND));
-  }
-  EXPECT_EQ(ErrorOf([&] { return FindResourceW(nullptr, number(1), number(999)) != nullptr; }),
-            DWORD(ERROR_RESOURCE_TYPE_NOT_FOUND));
-}
-
-TEST(TextArguments, NothingIsWrittenBehindTheRoom) {
-  const std::string bytes("ab\0cd\0", 6);
-  const Text wide(bytes.begin(), bytes.end());
-  for (const UINT page : {1252u, 932u, 50220u, 54936u, 57002u, 65000u, 65001u}) {
-    if (!IsValidCodePage(page)) continue;
-    for (int room = 1; room <= 7; ++room) {
-      WCHAR text[8];
-      char back[8];
-      std::fill_n(text, 8, u'#');
-      std::fill_n(back, 8, '#');
-      const int length = MultiByteToWideChar(page, 0, bytes.data(), 6, text, room);
-      EXPECT_EQ(length, room >= 6 ? 6 : 0) << page;
-      EXPECT_EQ(Text(text + room, text + 8), Text(static_cast<std::size_t>(8 - room), u'#')) << page << ' ' << room;
-      const int size = WideCharToMultiByte(page, 0, wide.data(), 6, back, room, nullptr, nullptr);
-      EXPECT_EQ(size, room >= 6 ? 6 : 0) << page;
-      EXPECT_EQ(std::string(back + room, back + 8), std::string(static_cast<std::size_t>(8 - room), '#')) << page;
-    }
-  }
-}
-
-TEST(TextArguments, DefaultsOfTwoBytesAndLonelyHalves) {
-  const WCHAR missing[] = {u'a', 0x0E01, u'b'}, half[] = {0xD800, u'x'};
-  char bytes[20] = {};
-  BOOL used = FALSE;
-  EXPECT_EQ(WideCharToMultiByte(932, 0, missing, 3, bytes, 20, "\x81\x48", &used), 4);
-  EXPECT_EQ(std::string(bytes, 4),
-            "a\x81\x48"
-            "b");
-  EXPECT_TRUE(used);
-  EXPECT_EQ(WideCharToMultiByte(932, 0, missing, 3, bytes, 20, "\x81", &used), 3) << "a lead byte alone stays one byte";
-  EXPECT_EQ(WideCharToMultiByte(932, 0, missing, 3, bytes, 20, "#", nullptr), 3);
-  EXPECT_EQ(std::string(bytes, 3), "a#b");
-  EXPECT_EQ(WideCharToMultiByte(932, 0, missing, 3, bytes, 20, "", nullptr), 3);
-  EXPECT_EQ(bytes[1], '?');
-  EXPECT_EQ(
-      ErrorOf([&] { return WideCharToMultiByte(54936, WC_ERR_INVALID_CHARS, half, 2, bytes, 20, nullptr, nullptr); }),
-      DWORD(ERROR_NO_UNICODE_TRANSLATION));
-  EXPECT_GT(WideCharToMultiByte(54936, 0, half, 2, bytes, 20, nullptr, &used), 0);
-  EXPECT_TRUE(used);
-}
-
-TEST(TextArguments, NumbersThatAreNoneAndLongPrecisions) {
-  const auto format = [](const WCHAR* pattern, auto value) {
-    WCHAR text[300];
-    const int length = platform::WideFormat(text, 300, pattern, value);
-    return length < 0 ? Text(u"refused") : Text(text, static_cast<std::size_t>(length));
-  };
-  const double infinite = HUGE_VAL, none = std::nan("");
-  EXPECT_EQ(format(u"%E", -infinite), u"-1.#INF00E+000");
-  EXPECT_EQ(format(u"%+g", infinite), u"+1.#INF");
-  EXPECT_EQ(format(u"% G", none), u" 1.#QNAN");
-  EXPECT_EQ(format(u"%.10f", none), u"1.#QNAN00000");
-  EXPECT_EQ(format(u"%g", -none), u"-1.#IND");
-  EXPECT_EQ(format(u"%.0g", 2.5), u"3");
-  EXPECT_EQ(format(u"%+.1f", 2.0), u"+2.0");
-  EXPECT_EQ(format(u"% .1f", 2.0), u" 2.0");
-  EXPECT_EQ(format(u"%Lf", 1.0), u"1.000000");
-  EXPECT_EQ(format(u"%#X", 255), u"0XFF");
-  EXPECT_EQ(format(u"%#o", 8), u"010");
-  EXPECT_EQ(format(u"%.0S", "narrow"), u"");
-  EXPECT_EQ(format(u"%9999999999d", 1), u"refused");
-  char narrow[200];
-  const int length = std::snprintf(narrow, sizeof narrow, "%.70f", 0.1);
-  EXPECT_EQ(format(u"%.70f", 0.1), Text(narrow, narrow + length));
-}
-
-// Numbers of every form, as another reader of numbers has them.
-TEST(TextArguments, NumbersAreThoseOfTheRuntime) {
-  std::mt19937 random(77);
-  const auto digits = [&](int most) {
-    std::string made;
-    for (int i = static_cast<int>(random() % static_cast<unsigned>(most)); i > 0; --i)
-      made += random() % 3 == 0 ? '0' : static_cast<char>('0' + random() % 10);
-    return made;
-  };
-  for (int round = 0; round < 20000; ++round) {
-    std::string text(random() % 3, ' ');
-    text += std::string("+-").substr(random() % 3, 1);
-    text += digits(12);
-    if (random() % 2 == 0) text += "." + digits(random() % 9 == 0 ? 400 : 12);
-    if (random() % 3 == 0)
-      text += std::string("eE").substr(random() % 2, 1) + std::string("+-").substr(random() % 3, 1) + digits(4);
-    text += std::string("x e").substr(random() % 3, 1);
-    char* stop = nullptr;
-    errno = 0;
-    const double expected = std::strtod(text.c_str(), &stop);
-    const bool isOut = errno == ERANGE && (expected == 0 || expected == HUGE_VAL || expected == -HUGE_VAL);
-    const Text wide(text.begin(), text.end());
-    const WCHAR* end = nullptr;
-    errno = 0;
-    ASSERT_EQ(platform::WideToDouble(wide.c_str(), &end), expected) << text;
-    ASSERT_EQ(end - wide.c_str(), stop - text.c_str()) << text;
-    if (isOut) {
-      ASSERT_EQ(errno, ERANGE) << text;
-    }
-    const int base = static_cast<int>(random() % 36) + 1;
-    std::string letters;
-    for (int i = static_cast<int>(random() % 6); i > 0; --i) letters += static_cast<char>('/' + random() % 80);
-    const std::string whole = std::string(random() % 2, ' ') + std::string("+-").substr(random() % 3, 1) +
-                              (random() % 4 == 0 ? "0x" : "") + letters;
-    const int asked = base == 1 ? 0 : base;
-    const long long value = std::strtoll(whole.c_str(), &stop, asked);
-    const Text wideWhole(whole.begin(), whole.end());
-    if (value >= -0x80000000LL && value <= 0x7FFFFFFF) {
-      ASSERT_EQ(platform::WideToLong(wideWhole.c_str(), &end, asked), value) << whole << " to base " << asked;
-      ASSERT_EQ(end - wideWhole.c_str(), stop - whole.c_str()) << whole << " to base " << asked;
-    }
-  }
 }
 
 }  // namespace

@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "qxcore/platform/wide.h"
+#include "tests/support/last_error.h"
 #include "tests/support/temp_folder.h"
 #include "tests/support/wine.h"
 
@@ -18,14 +19,6 @@ namespace {
 using test::TempFolder;
 using test::Text;
 using test::WriteAll;
-
-// Clears the last error, calls, and returns the error of a call that must fail.
-template <class Call>
-DWORD ErrorOf(Call call) {
-  SetLastError(0xDEAD);
-  EXPECT_FALSE(call());
-  return GetLastError();
-}
 
 constexpr DWORD kBadParameter = ERROR_INVALID_PARAMETER;
 
