@@ -1,5 +1,5 @@
-// Texts, code pages, resources and numbers with arguments that are missing or contradict themselves. Linux only, because
-// the other system does not look at all of them.
+// Texts, code pages, resources and numbers with arguments that are missing or contradict themselves. Linux only,
+// because the other system does not look at all of them.
 
 #ifndef _WIN32
 
