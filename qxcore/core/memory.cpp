@@ -1,10 +1,10 @@
 #include "qxcore/core/memory.h"
 
 #include <atomic>
-#include <cstdlib>
 
 #include "qxcore/core/exception.h"
 #include "qxcore/core/internal/memory_failures.h"
+#include "qxcore/platform/internal/heap.h"
 
 namespace {
 
@@ -26,7 +26,7 @@ bool MustFail() noexcept {
 
 void* SMemTryAlloc(std::size_t size) noexcept {
   if (MustFail()) return nullptr;
-  return std::malloc(size != 0 ? size : 1);
+  return platform::AllocateMemory(size != 0 ? size : 1);
 }
 
 void* SMemAlloc(std::size_t size) {
@@ -36,12 +36,12 @@ void* SMemAlloc(std::size_t size) {
 }
 
 void* SMemRealloc(void* block, std::size_t size) {
-  void* resized = MustFail() ? nullptr : std::realloc(block, size != 0 ? size : 1);
+  void* resized = MustFail() ? nullptr : platform::ResizeMemory(block, size != 0 ? size : 1);
   if (resized == nullptr) throw SEOutOfMemory();
   return resized;
 }
 
-void SMemFree(void* block) noexcept { std::free(block); }
+void SMemFree(void* block) noexcept { platform::FreeMemory(block); }
 
 bool SMemMustFail() noexcept { return MustFail(); }
 

@@ -5,8 +5,13 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cmath>
 #include <map>
+#include <random>
 #include <string>
+#include <thread>
+#include <utility>
+#include <vector>
 
 #include "qxcore/core/assert_valid.h"
 #include "qxcore/core/debug_counter.h"
@@ -33,6 +38,99 @@ TEST(Memory, ResizingKeepsTheContentAndAFailureTheBlock) {
   void* const nothing = SMemTryAlloc(0);
   EXPECT_NE(nothing, nullptr);
   SMemFree(nothing);
+}
+
+// A block with a stamp in every page of it, which no other block has.
+class StampedBlock {
+ public:
+  StampedBlock(std::size_t size, unsigned stamp)
+      : m_bytes(static_cast<char*>(SMemAlloc(size))), m_size(size), m_stamp(stamp) {
+    StampFrom(0);
+  }
+  StampedBlock(StampedBlock&& other) noexcept
+      : m_bytes(std::exchange(other.m_bytes, nullptr)), m_size(other.m_size), m_stamp(other.m_stamp) {}
+  StampedBlock& operator=(StampedBlock&& other) noexcept {
+    std::swap(m_bytes, other.m_bytes);
+    std::swap(m_size, other.m_size);
+    std::swap(m_stamp, other.m_stamp);
+    return *this;
+  }
+  ~StampedBlock() { SMemFree(m_bytes); }
+
+  void Resize(std::size_t size) {
+    m_bytes = static_cast<char*>(SMemRealloc(m_bytes, size));
+    const std::size_t before = std::exchange(m_size, size);
+    EXPECT_EQ(FirstWrong(std::min(before, size)), -1) << before << " to " << size;
+    StampFrom(std::min(before, size) / kPage * kPage);
+  }
+  void Check() const { EXPECT_EQ(FirstWrong(m_size), -1) << m_size; }
+
+ private:
+  static constexpr std::size_t kPage = 4096;
+
+  char Expected(std::size_t at) const { return static_cast<char>(m_stamp * 31 + at / kPage * 7); }
+  void StampFrom(std::size_t at) {
+    for (; at < m_size; at += kPage) m_bytes[at] = Expected(at);
+  }
+  long FirstWrong(std::size_t size) const {
+    for (std::size_t at = 0; at < size; at += kPage) {
+      if (m_bytes[at] != Expected(at)) return static_cast<long>(at);
+    }
+    return -1;
+  }
+
+  char* m_bytes;
+  std::size_t m_size;
+  unsigned m_stamp;
+};
+
+// From a byte to 16 MB, as often small as large.
+std::size_t AnySize(std::mt19937& random) {
+  return static_cast<std::size_t>(std::exp2(std::uniform_real_distribution<>(0, 24)(random)));
+}
+
+TEST(Memory, BlocksOfAllSizesKeepTheirContentInAllThreads) {
+  const auto work = [](unsigned seed) {
+    std::mt19937 random(seed);
+    std::vector<StampedBlock> blocks;
+    for (unsigned step = 0; step < 2000; ++step) {
+      const std::size_t at = blocks.empty() ? 0 : random() % blocks.size();
+      switch (random() % 3) {
+        case 0:
+          if (blocks.size() < 12) blocks.emplace_back(AnySize(random), step);
+          break;
+        case 1:
+          if (!blocks.empty()) blocks[at].Resize(AnySize(random));
+          break;
+        default:
+          if (blocks.empty()) break;
+          blocks[at].Check();
+          blocks[at] = std::move(blocks.back());
+          blocks.pop_back();
+      }
+    }
+    for (const StampedBlock& block : blocks) block.Check();
+  };
+  std::vector<std::thread> threads;
+  for (unsigned seed = 1; seed <= 3; ++seed) threads.emplace_back(work, seed);
+  for (std::thread& thread : threads) thread.join();
+}
+
+TEST(Memory, LargeBlocksComeAndGoWithoutEnd) {
+  // All of them together are larger than the address space of a 32-bit process, and so is what those that stay
+  // would hold if each kept the place of one that went.
+  std::vector<StampedBlock> stay;
+  for (unsigned round = 0; round < 200; ++round) {
+    {
+      StampedBlock goes(100000, round);
+      for (std::size_t size = 150000; size < 24'000'000; size = size * 3 / 2) goes.Resize(size);
+    }
+    stay.emplace_back(100000, round);
+    stay.back().Resize(300000);
+  }
+  for (const StampedBlock& block : stay) block.Check();
+  for (StampedBlock& block : stay) block.Resize(1);
+  for (unsigned round = 0; round < 30; ++round) StampedBlock(std::size_t{100} << 20, round).Resize(1000);
 }
 
 using Figures = std::multimap<std::basic_string<WCHAR>, std::int32_t>;
