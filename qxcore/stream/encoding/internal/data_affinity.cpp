@@ -138,19 +138,17 @@ class Walk {
 
   // Walks whole blocks of well-formed sequences, and zeros; returns where that ends, which is between two sequences.
   const unsigned char* WalkBlocks(const unsigned char* at) {
-    SUtf8BlockWalk walk;
-    SUtf8BlockCounts counts;
-    const unsigned char* stop = SWalkUtf8Blocks(at, m_end, m_isFull, walk, counts);
-    m_nonAscii += counts.leads;
-    m_continuations += counts.continuations;
+    const SUtf8BlockWalk walk = SWalkUtf8Blocks(at, m_end, m_isFull ? SUtf8BlockRules::kFull : SUtf8BlockRules::kBasic);
+    m_nonAscii += walk.leads;
+    m_continuations += walk.continuations;
     if (m_countsZeros) {
       const int first = static_cast<int>((at - m_begin) & 1);
-      m_zeros[first] += counts.zeros[0];
-      m_zeros[first ^ 1] += counts.zeros[1];
+      m_zeros[first] += walk.zeros[0];
+      m_zeros[first ^ 1] += walk.zeros[1];
     }
-    if (walk.Expected() == 0) return stop;
-    if (!m_isFull) return TakeContinuations(stop, walk.Expected());
-    return FinishSequence(stop);
+    if (walk.expected == 0) return walk.stop;
+    if (!m_isFull) return TakeContinuations(walk.stop, walk.expected);
+    return FinishSequence(walk.stop);
   }
 
   // A sequence that the end of the sample cuts is no rejection.

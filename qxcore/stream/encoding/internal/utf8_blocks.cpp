@@ -1,28 +1,82 @@
 #include "qxcore/stream/encoding/internal/utf8_blocks.h"
 
 #include "qxcore/platform/internal/processor.h"
+#include "qxcore/stream/encoding/internal/utf8_blocks_avx2.h"
 
-#if defined(__x86_64__) || defined(__i386__)
-#include <immintrin.h>
+#ifdef __SSE2__
+#include <emmintrin.h>
 #endif
 
 namespace {
 
+#ifdef __SSE2__
+
+// What a processor finds out about 64 bytes at once, one bit for each. The second group is looked at by the full rules
+// only.
+struct Block {
+  static constexpr std::ptrdiff_t kSize = 64;
+
+  std::uint64_t zeros = 0;
+  std::uint64_t above = 0;         // 0x80 and more
+  std::uint64_t continuation = 0;  // 0x80 to 0xBF
+  std::uint64_t fromE0 = 0;
+  std::uint64_t fromF0 = 0;
+
+  std::uint64_t never = 0;  // 0xC0, 0xC1 and from 0xF5 on
+  std::uint64_t isE0 = 0, isED = 0, isF0 = 0, isF4 = 0;
+  std::uint64_t below90 = 0, belowA0 = 0;
+};
+
+// What the sequences that begin in one block expect of the next.
+class Judge {
+ public:
+  // Whether all of the block is well-formed, as far as its sequences lie in it. A block that is refused changes
+  // nothing.
+  template <bool kFull>
+  bool Accept(const Block& block) {
+    const std::uint64_t leads = block.above & ~block.continuation;
+    std::uint64_t due = m_expected | leads << 1 | block.fromE0 << 2;
+    if constexpr (kFull) {
+      due |= block.fromF0 << 3;
+      // The range of the second byte rules out overlong forms, surrogates and values above U+10FFFF.
+      const std::uint64_t wrong =
+          ((block.isE0 << 1 | m_afterE0) & block.belowA0) | ((block.isED << 1 | m_afterED) & ~block.belowA0) |
+          ((block.isF0 << 1 | m_afterF0) & block.below90) | ((block.isF4 << 1 | m_afterF4) & ~block.below90);
+      if ((block.never | wrong) != 0) return false;
+    } else if (block.fromF0 != 0) {
+      return false;
+    }
+    if (due != block.continuation) return false;
+    m_expected = leads >> 63 | block.fromE0 >> 62;
+    if constexpr (kFull) {
+      m_expected |= block.fromF0 >> 61;
+      m_afterE0 = block.isE0 >> 63;
+      m_afterED = block.isED >> 63;
+      m_afterF0 = block.isF0 >> 63;
+      m_afterF4 = block.isF4 >> 63;
+    }
+    return true;
+  }
+
+  // How many continuation bytes the last block expects at the start of the next one.
+  int Expected() const { return m_expected == 0 ? 0 : m_expected == 1 ? 1 : m_expected <= 3 ? 2 : 3; }
+
+ private:
+  std::uint64_t m_expected = 0;
+  std::uint64_t m_afterE0 = 0, m_afterED = 0, m_afterF0 = 0, m_afterF4 = 0;
+};
+
 // Without the processor's own instruction, which not every one has.
-inline int CountBits(std::uint64_t bits) {
+int CountBits(std::uint64_t bits) {
   bits -= bits >> 1 & 0x5555555555555555u;
   bits = (bits & 0x3333333333333333u) + (bits >> 2 & 0x3333333333333333u);
   bits = (bits + (bits >> 4)) & 0x0F0F0F0F0F0F0F0Fu;
   return static_cast<int>(bits * 0x0101010101010101u >> 56);
 }
 
-constexpr std::uint64_t kEven = 0x5555555555555555u;
-
-#ifdef __SSE2__
-
 template <bool kFull>
-SUtf8Block Load(const unsigned char* at) {
-  SUtf8Block block;
+Block Load(const unsigned char* at) {
+  Block block;
   const auto of = [](int byte) { return _mm_set1_epi8(static_cast<char>(byte)); };
   for (int part = 0; part < 4; ++part) {
     const __m128i bytes = _mm_loadu_si128(reinterpret_cast<const __m128i*>(at) + part);
@@ -50,79 +104,39 @@ SUtf8Block Load(const unsigned char* at) {
 }
 
 template <bool kFull>
-const unsigned char* WalkPlain(const unsigned char* at, const unsigned char* end, SUtf8BlockWalk& walk,
-                               SUtf8BlockCounts& counts) {
-  for (; end - at > SUtf8Block::kSize; at += SUtf8Block::kSize) {
-    const SUtf8Block block = Load<kFull>(at);
-    if (!walk.Accept<kFull>(block)) break;
-    counts.leads += CountBits(block.above & ~block.continuation);
-    counts.continuations += CountBits(block.continuation);
+SUtf8BlockWalk WalkPlain(const unsigned char* at, const unsigned char* end) {
+  constexpr std::uint64_t kEven = 0x5555555555555555u;
+  SUtf8BlockWalk walk;
+  Judge judge;
+  for (; end - at > Block::kSize; at += Block::kSize) {
+    const Block block = Load<kFull>(at);
+    if (!judge.Accept<kFull>(block)) break;
+    walk.leads += CountBits(block.above & ~block.continuation);
+    walk.continuations += CountBits(block.continuation);
     if (block.zeros == 0) continue;
-    counts.zeros[0] += CountBits(block.zeros & kEven);
-    counts.zeros[1] += CountBits(block.zeros & ~kEven);
+    walk.zeros[0] += CountBits(block.zeros & kEven);
+    walk.zeros[1] += CountBits(block.zeros & ~kEven);
   }
-  return at;
+  walk.stop = at;
+  walk.expected = judge.Expected();
+  return walk;
 }
 
-#endif
+#else
 
-#if defined(__x86_64__) || defined(__i386__)
-#define QXCORE_TARGET __attribute__((target("avx512f,avx512bw,avx512vl,popcnt,bmi,bmi2")))
-
-template <bool kFull>
-QXCORE_TARGET const unsigned char* WalkAvx512(const unsigned char* at, const unsigned char* end, SUtf8BlockWalk& walked,
-                                              SUtf8BlockCounts& counted) {
-  SUtf8BlockWalk walk = walked;
-  SUtf8BlockCounts counts = counted;
-  for (; end - at > SUtf8Block::kSize; at += SUtf8Block::kSize) {
-    const __m512i bytes = _mm512_loadu_si512(at);
-    SUtf8Block block;
-    block.above = _mm512_movepi8_mask(bytes);
-    block.zeros = _mm512_testn_epi8_mask(bytes, bytes);
-    if (block.above != 0) {
-      block.continuation = _mm512_cmplt_epi8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xC0)));
-      block.fromE0 = _mm512_cmpge_epu8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xE0)));
-      block.fromF0 = _mm512_cmpge_epu8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xF0)));
-      if constexpr (kFull) {
-        block.never = _mm512_cmpge_epu8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xF5))) |
-                      _mm512_cmpeq_epi8_mask(_mm512_and_si512(bytes, _mm512_set1_epi8(static_cast<char>(0xFE))),
-                                             _mm512_set1_epi8(static_cast<char>(0xC0)));
-        block.isE0 = _mm512_cmpeq_epi8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xE0)));
-        block.isED = _mm512_cmpeq_epi8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xED)));
-        block.isF0 = _mm512_cmpeq_epi8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xF0)));
-        block.isF4 = _mm512_cmpeq_epi8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xF4)));
-      }
-    }
-    if constexpr (kFull) {
-      // Plain bytes count here, too: behind a lead byte they are refused as they are no continuation.
-      block.below90 = _mm512_cmplt_epu8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0x90)));
-      block.belowA0 = _mm512_cmplt_epu8_mask(bytes, _mm512_set1_epi8(static_cast<char>(0xA0)));
-    }
-    if (!walk.Accept<kFull>(block)) break;
-    counts.leads += __builtin_popcountll(block.above & ~block.continuation);
-    counts.continuations += __builtin_popcountll(block.continuation);
-    if (block.zeros == 0) continue;
-    counts.zeros[0] += __builtin_popcountll(block.zeros & kEven);
-    counts.zeros[1] += __builtin_popcountll(block.zeros & ~kEven);
-  }
-  walked = walk;
-  counted = counts;
-  return at;
+template <bool>
+SUtf8BlockWalk WalkPlain(const unsigned char* at, const unsigned char*) {
+  return {.stop = at};
 }
+
 #endif
 
 }  // namespace
 
-const unsigned char* SWalkUtf8Blocks(const unsigned char* at, const unsigned char* end, bool full, SUtf8BlockWalk& walk,
-                                     SUtf8BlockCounts& counts) {
-#if defined(__x86_64__) || defined(__i386__)
-  static const bool usesAvx512 = platform::CanUse(platform::Instructions::kAvx512);
-  if (usesAvx512) return full ? WalkAvx512<true>(at, end, walk, counts) : WalkAvx512<false>(at, end, walk, counts);
+SUtf8BlockWalk SWalkUtf8Blocks(const unsigned char* at, const unsigned char* end, SUtf8BlockRules rules) {
+#ifdef QXCORE_HAS_UTF8_BLOCKS_AVX2
+  static const bool usesAvx2 = platform::CanUse(platform::Instructions::kAvx2);
+  if (usesAvx2) return SWalkUtf8BlocksAvx2(at, end, rules);
 #endif
-#ifdef __SSE2__
-  return full ? WalkPlain<true>(at, end, walk, counts) : WalkPlain<false>(at, end, walk, counts);
-#else
-  (void)end, (void)full, (void)walk, (void)counts;
-  return at;
-#endif
+  return rules == SUtf8BlockRules::kFull ? WalkPlain<true>(at, end) : WalkPlain<false>(at, end);
 }
