@@ -1,7 +1,9 @@
 #include "qxcore/stream/encoding/internal/data_affinity.h"
 
 #include <algorithm>
+#include <array>
 #include <climits>
+#include <numeric>
 
 #include "qxcore/platform/internal/utf.h"
 #include "qxcore/platform/win32.h"
@@ -221,9 +223,20 @@ bool Converts(unsigned page, const unsigned char* begin, std::ptrdiff_t size) {
   return size == 0 || MultiByteToWideChar(page, flags, bytes, static_cast<int>(size), nullptr, 0) > 0;
 }
 
+// Whether every byte is a character of its own, so that any text converts.
+bool TakesAnyBytes(unsigned page) {
+  CPINFO info;
+  if (!GetCPInfo(page, &info) || info.MaxCharSize != 1) return false;
+  std::array<unsigned char, 256> all;
+  std::iota(all.begin(), all.end(), static_cast<unsigned char>(0));
+  return Converts(page, all.data(), all.size());
+}
+
 // The end of the sample may cut a double-byte character: then the test is repeated without its lead byte.
 bool ConvertsSample(unsigned page, const unsigned char* begin, const unsigned char* end) {
+  constexpr std::ptrdiff_t kLong = 4096;  // bytes that take longer to convert than to ask for what the page takes
   std::ptrdiff_t size = end - begin;
+  if (size >= kLong && TakesAnyBytes(page)) return true;
   return Converts(page, begin, size) || (IsDBCSLeadByteEx(page, end[-1]) && Converts(page, begin, size - 1));
 }
 
