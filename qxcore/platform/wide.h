@@ -19,14 +19,12 @@
 
 namespace platform {
 
-// --- length, copy, comparison, search ---
+// --- length, comparison, search ---
 
 // Number of characters before the terminator.
 inline std::size_t WideLength(const WCHAR* text) { return std::char_traits<WCHAR>::length(text); }
 // The same, but looks at no more than `limit` characters and returns `limit` when none of them is NUL.
 QXCORE_API std::size_t WideLength(const WCHAR* text, std::size_t limit);
-// Copies with the terminator; the texts do not overlap. Returns target.
-QXCORE_API WCHAR* WideCopy(WCHAR* target, const WCHAR* text);
 
 // By code unit: negative, 0 or positive. The counted forms end after `count` characters.
 QXCORE_API int WideCompare(const WCHAR* a, const WCHAR* b);

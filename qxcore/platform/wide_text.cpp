@@ -83,11 +83,6 @@ std::size_t WideLength(const WCHAR* text, std::size_t limit) {
   return length;
 }
 
-WCHAR* WideCopy(WCHAR* target, const WCHAR* text) {
-  std::memcpy(target, text, (WideLength(text) + 1) * sizeof(WCHAR));
-  return target;
-}
-
 int WideCompare(const WCHAR* a, const WCHAR* b) {
   while (*a == *b && *a != 0) ++a, ++b;
   return Compare(*a, *b);
