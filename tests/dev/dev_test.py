@@ -1,13 +1,16 @@
 #!/usr/bin/env python3
-"""Holds ./dev to taking packages back to older versions only when somebody said so.
+"""Holds ./dev to what it promises to who runs it: to take packages back to older versions only when somebody said so,
+and to say what a variable that it names is for.
 
-usage: set_up_test.py DEV
-The package manager is a stand-in that fails unless it may downgrade, and writes its arguments down.
+usage: dev_test.py DEV
+The package manager is a stand-in that fails unless it may downgrade, and writes its arguments down; so are the
+programs that build and test.
 """
 
 import os
 import pathlib
 import pty
+import re
 import shutil
 import subprocess
 import sys
@@ -15,27 +18,42 @@ import tempfile
 import unittest
 
 DEV = pathlib.Path(sys.argv[1]).resolve()
-STAND_INS = {
+PACKAGE_MANAGER = {
     "apt-get": 'echo "$@" >>"$CALLS"; case "$*" in *--allow-downgrades*|*update*) ;; *) exit 100 ;; esac',
     "apt-cache": 'echo " 500 http://mirror.example/debian stable/main amd64 Packages"',
     "dpkg-query": "exit 1",
     "dpkg": ":",
     "sudo": 'exec "$@"',
 }
+# Everything is there, builds, and passes.
+WELL_EQUIPPED = {
+    "dpkg-query": "echo install ok installed",
+    "cmake": ":",
+    "ctest": 'echo "1/1 Test #1: core ..... Passed 0.01 sec"',
+    "pkg-config": ":",
+}
 
 
-class SetUpTest(unittest.TestCase):
+class DevTest(unittest.TestCase):
+    """A copy of the script among stand-ins."""
+
+    STAND_INS = {}
+
     def setUp(self):
         self.folder = pathlib.Path(tempfile.mkdtemp(prefix="qxcore-dev-"))
         self.addCleanup(shutil.rmtree, self.folder)
         shutil.copy(DEV, self.folder / "dev")
         (self.folder / "bin").mkdir()
-        for name, body in STAND_INS.items():
+        for name, body in self.STAND_INS.items():
             path = self.folder / "bin" / name
             path.write_text(f"#!/bin/sh\n{body}\n")
             path.chmod(0o755)
         self.environment = {"PATH": f"{self.folder}/bin:{os.environ['PATH']}", "CALLS": str(self.folder / "calls"),
                             "HOME": str(self.folder)}
+
+
+class SetUpTest(DevTest):
+    STAND_INS = PACKAGE_MANAGER
 
     def set_up(self, *options, ci=False, answer=None):
         """The exit status, and whether anything was taken back."""
@@ -76,6 +94,30 @@ class SetUpTest(unittest.TestCase):
             self.assertNotEqual(status, 0, answer)
             self.assertFalse(is_taken_back, answer)
         self.assertEqual(self.set_up(answer=b"y\n"), (0, True))
+
+
+class CorpusTest(DevTest):
+    STAND_INS = WELL_EQUIPPED
+    VARIABLE = "QXCORE_CORPUS"
+
+    def said_of_it(self, environment):
+        """What a run of the tests says of the variable."""
+        (self.folder / "build/linux").mkdir(parents=True, exist_ok=True)
+        run = subprocess.run([str(self.folder / "dev"), "test", "linux"], env=self.environment | environment,
+                             stdin=subprocess.DEVNULL, capture_output=True, text=True)
+        self.assertEqual(run.returncode, 0, run.stderr)
+        return [line for line in (run.stdout + run.stderr).splitlines() if self.VARIABLE in line]
+
+    def test_without_it_a_run_says_what_it_is(self):
+        said = self.said_of_it({})
+        self.assertEqual(len(said), 1)
+        self.assertRegex(said[0], "folder of real files")
+        document = re.search(r"\((\S+\.md)\)", said[0])
+        self.assertIsNotNone(document, said[0])
+        self.assertRegex((DEV.parent / document[1]).read_text(), rf"`{self.VARIABLE}`.*folder of real files")
+
+    def test_with_it_nothing_needs_to_be_said(self):
+        self.assertEqual(self.said_of_it({self.VARIABLE: str(self.folder)}), [])
 
 
 unittest.main(argv=sys.argv[:1])
