@@ -3,7 +3,7 @@
 
 usage: package_test.py (cmake|pkgconfig|imports|headers) SOURCE_DIR BUILD_DIR [TOOLCHAIN_FILE]
 
-headers: every installed header compiles alone, and all of them in either order.
+headers: every installed header compiles alone, and all of them in either order; none offers what is there for the tests.
 
 With a toolchain file everything is cross-built for Windows and runs under Wine with nothing but the
 moved folder to find DLLs in.
@@ -79,12 +79,25 @@ def imports(path):
     return {name.lower() for name in re.findall(r"DLL Name: (\S+)", listing)}
 
 
-def check_headers(package, work, compiler):
+def check_hooks(source, include, headers):
+    """The functions by which tests make memory fail are for the library's own tests only."""
+    declared = (source / "qxcore/core/internal/memory_failures.h").read_text(encoding="utf-8")
+    hooks = re.findall(r"^QXCORE_API [\w ]*?\b(\w+)\(", declared, re.M)
+    if not hooks:
+        sys.exit("no hook is declared where they should be")
+    for header in headers:
+        words = set(re.findall(r"\w+", (include / header).read_text(encoding="utf-8")))
+        if found := words.intersection(hooks):
+            sys.exit(f"{header} offers {sorted(found)}, which only tests need")
+
+
+def check_headers(source, package, work, compiler):
     """Each header as a client's only one, and all of them from the first to the last and back."""
     include = package / "include"
     headers = sorted(path.relative_to(include).as_posix() for path in include.rglob("*.h"))
     if not headers or any(not header.startswith("qxcore/") for header in headers):
         sys.exit(f"not all headers lie in include/qxcore: {headers}")
+    check_hooks(source, include, headers)
     # Those in win32/ are the pieces of win32.h, and no client includes them.
     headers = [header for header in headers if "/win32/" not in header]
     texts = {header.replace("/", "_"): [header] for header in headers}
@@ -126,7 +139,7 @@ def main():
             sys.exit("the library is not in the package")
     elif kind == "headers":
         cross = ["i686-w64-mingw32-g++-posix", "-DUNICODE", "-D_UNICODE", "-msse2"]
-        check_headers(package, work, cross if toolchain else [os.environ.get("CXX", "c++")])
+        check_headers(source, package, work, cross if toolchain else [os.environ.get("CXX", "c++")])
     elif kind == "cmake":
         configure = ["cmake", "-S", source / "samples", "-B", work / "samples", f"-Dqxcore11e_DIR={package}/lib/cmake/qxcore11e",
                      "-DCMAKE_BUILD_TYPE=Release", "-G", "Ninja"]
