@@ -205,6 +205,34 @@ TEST(ImageLists, DrawWhatTheMaskLeaves) {
   EXPECT_EQ(list.GetImageCount(), 0);
 }
 
+// A point goes to (point - window's origin) * viewport's extent / window's extent + viewport's origin, and back; each
+// setting answers with the one before.
+TEST(Contexts, PointsAreMappedByOriginsAndExtents) {
+  SMemoryDC dc;
+  EXPECT_EQ(dc.SetMapMode(MM_ANISOTROPIC), MM_TEXT);
+  SSize window(1, 1), viewport(1, 1);
+  SPoint windowOrigin, viewportOrigin;
+  for (const int scale : {1, 3, -2}) {
+    const SSize extent(7 + scale, 11), drawn(extent.cx * scale, extent.cy * -scale);
+    EXPECT_EQ(dc.SetWindowExt(extent), window);
+    EXPECT_EQ(dc.SetViewportExt(drawn), viewport);
+    const SPoint from(scale * 5, -4), to(9, scale * 8);
+    EXPECT_EQ(dc.SetWindowOrg(from), windowOrigin);
+    EXPECT_EQ(dc.SetViewportOrg(to), viewportOrigin);
+    const SSize further(2, scale);
+    EXPECT_EQ(dc.OffsetViewportOrg(further), to);
+    window = extent, viewport = drawn, windowOrigin = from, viewportOrigin = to + further;
+    for (const SPoint& point : {SPoint(0, 0), SPoint(13, -6), from}) {
+      const SPoint mapped(viewportOrigin.x + (point.x - from.x) * scale, viewportOrigin.y - (point.y - from.y) * scale);
+      SPoint there = point;
+      ASSERT_TRUE(dc.LPtoDP(&there, 1));
+      EXPECT_EQ(there, mapped) << scale;
+      ASSERT_TRUE(dc.DPtoLP(&there, 1));
+      EXPECT_EQ(there, point) << scale;
+    }
+  }
+}
+
 TEST(Fonts, SizesAndStyles) {
   SFont font;
   ASSERT_TRUE(font.Create(WTEXT("Liberation Sans"), 12, SFont::kBold + SFont::kUnderline, 96));

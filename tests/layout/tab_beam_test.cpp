@@ -100,6 +100,40 @@ TEST_F(Beams, AMeasuredTabHasItsTextAndTheSpacing) {
   EXPECT_EQ(m_beam.InsertTab(-1, WTEXT("?"), nullptr), -1);
 }
 
+TEST_F(Beams, AnotherSpacingMeasuresAndMovesAllTabs) {
+  for (const WCHAR* text : {WTEXT("one"), WTEXT("Sales figures")}) m_beam.InsertTab(m_beam.GetCount(), text, nullptr);
+  for (const int spacing : {20, 0, 3, -5}) {
+    m_beam.SetSpacing(spacing);
+    const int kept = std::max(spacing, 0);
+    EXPECT_EQ(m_beam.GetSpacing(), kept);
+    EXPECT_EQ(m_beam.GetTabWidth(0), m_beam.TextWidth(WTEXT("one"), false) + kept);
+    EXPECT_EQ(m_beam.GetTabWidth(1), m_beam.TextWidth(WTEXT("Sales figures"), false) + kept);
+    EXPECT_EQ(m_beam.CalcTabOffset(1) - m_beam.CalcTabOffset(0), m_beam.GetTabWidth(0) + kept);
+  }
+}
+
+// From every position to every tab.
+TEST_F(Beams, ATabIsMadeVisibleByScrollingAsLittleAsNeeded) {
+  constexpr int kCount = 20;
+  for (int i = 0; i < kCount; ++i) m_beam.InsertTab(i, WTEXT("tab"), nullptr, 20 + i * 37 % 90);
+  for (int start = 0; start < kCount; ++start) {
+    for (int tab = 0; tab < kCount; ++tab) {
+      m_beam.SetFirstVisible(start);
+      const bool isBehind = tab > m_beam.GetLastVisible();
+      m_beam.EnsureVisible(tab);
+      const int first = m_beam.GetFirstVisible();
+      ASSERT_GE(m_beam.GetLastVisible(), tab);
+      ASSERT_EQ(first, isBehind ? first : std::min(start, tab)) << start << " " << tab;
+      if (!isBehind) continue;
+      m_beam.SetFirstVisible(first - 1);
+      ASSERT_LT(m_beam.GetLastVisible(), tab) << "one tab less would have been enough";
+    }
+  }
+  m_beam.SetFirstVisible(3);
+  for (const int none : {-1, kCount}) m_beam.EnsureVisible(none);
+  EXPECT_EQ(m_beam.GetFirstVisible(), 3);
+}
+
 // Against a model that knows each tab by its window.
 TEST_F(Beams, RandomSequences_TheSameTabStaysCurrent) {
   std::mt19937 random(17);

@@ -10,6 +10,7 @@
 #include "qxcore/ui/frame/frame.h"
 #include "qxcore/ui/rtf/document.h"
 #include "tests/support/text.h"
+#include "tests/support/wine.h"
 
 namespace {
 
@@ -192,6 +193,22 @@ TEST_F(RichEdit, StreamsMoveTheSelection) {
   stream = {0, 0, &Bytes::Refuse};
   other.StreamIn(SF_RTF, stream);
   EXPECT_EQ(stream.dwError, 5u);
+}
+
+TEST_F(RichEdit, PlainTextIsStreamedInUpToTheLimit) {
+  if (IsWine()) GTEST_SKIP() << "Wine's control takes any length";
+  const auto kept = [this](long size) {
+    Bytes plain{std::string(static_cast<std::size_t>(size), 'x')};
+    EDITSTREAM stream = {reinterpret_cast<DWORD_PTR>(&plain), 0, &Bytes::Give};
+    edit.StreamIn(SF_TEXT, stream);
+    return edit.GetTextLength();
+  };
+  EXPECT_EQ(kept(33000), 32767) << "at the start";
+  for (const long limit : {5L, 600L, 40000L}) {
+    edit.SetTextLimit(limit);
+    EXPECT_EQ(kept(limit + 100), limit);
+    EXPECT_EQ(kept(limit - 1), limit - 1);
+  }
 }
 
 // The hidden control hangs below the owner window and goes with it; the document makes another one.

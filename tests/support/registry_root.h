@@ -37,12 +37,16 @@ class RegistryRoot {
     for (char& c : m_file)
       if (c == '\\') c = '/';
     m_file.erase(0, 2);
+    if (const char* former = std::getenv("QXCORE_REGISTRY")) m_former = former;
     if (!IsWindows()) SetVariable("QXCORE_REGISTRY", m_file);
     DeleteTree(HKEY_CURRENT_USER, Path());
   }
   RegistryRoot(const RegistryRoot&) = delete;
   RegistryRoot& operator=(const RegistryRoot&) = delete;
-  ~RegistryRoot() { DeleteTree(HKEY_CURRENT_USER, Path()); }
+  ~RegistryRoot() {
+    DeleteTree(HKEY_CURRENT_USER, Path());
+    if (!IsWindows()) SetVariable("QXCORE_REGISTRY", m_former);
+  }
 
   // Below HKEY_CURRENT_USER.
   static const WCHAR* Path() { return WTEXT("Software\\qxcore test"); }
@@ -50,7 +54,35 @@ class RegistryRoot {
 
  private:
   TempFolder m_folder;
-  std::string m_file;
+  std::string m_file, m_former;
+};
+
+// All that this process knows of the user lies in such a key: for what the library keeps in places of its own, where
+// other tests that run at the same time would see it.
+class OwnUser {
+ public:
+#ifdef _WIN32
+  OwnUser() {
+    RegCreateKeyExW(HKEY_CURRENT_USER, RegistryRoot::Path(), 0, nullptr, 0, KEY_ALL_ACCESS, nullptr, &m_key, nullptr);
+    RegOverridePredefKey(HKEY_CURRENT_USER, m_key);
+  }
+  ~OwnUser() {
+    RegOverridePredefKey(HKEY_CURRENT_USER, nullptr);
+    RegCloseKey(m_key);
+  }
+#else
+  OwnUser() = default;
+#endif
+  OwnUser(const OwnUser&) = delete;
+  OwnUser& operator=(const OwnUser&) = delete;
+
+  const RegistryRoot& Root() const { return m_root; }
+
+ private:
+  RegistryRoot m_root;
+#ifdef _WIN32
+  HKEY m_key = nullptr;
+#endif
 };
 
 }  // namespace test

@@ -44,8 +44,8 @@ def published(headers):
             line = re.sub(r'"(\\.|[^"\\])*"|//.*', "", line)
             if begin := re.match(r"\s*(class|struct) (?:QXCORE_API )?(\w+)[^;(]*$", line):
                 waiting = (begin[2], begin[1] == "struct")
-            elif scopes and (access := re.match(r"\s*(public|protected|private):", line)):
-                scopes[-1] = (scopes[-1][0], access[1] == "public")
+            elif scopes and (access := re.match(r"\s*(?:(public|protected|private):|QXCORE_DECLARE_\w*CLASS\()", line)):
+                scopes[-1] = (scopes[-1][0], access[1] in ("public", None))  # the macros of class records end in a public part
             if all(is_public for _, is_public in scopes):
                 name = next((name for name, _ in reversed(scopes) if name), "")
                 for before, member in re.findall(DECLARED, line):

@@ -270,6 +270,10 @@ TEST_F(ModalStates, WaitCursors_Nest) {
     EXPECT_EQ(::GetCursor(), wait);
     m_owner.BeginWaitCursor();
     EXPECT_EQ(m_app.GetWaitCount(), 2);
+    ::SetCursor(before);
+    m_owner.RestoreWaitCursor();
+    EXPECT_EQ(::GetCursor(), wait);
+    EXPECT_EQ(m_app.GetWaitCount(), 2);
     m_owner.EndWaitCursor();
   }
   EXPECT_EQ(m_app.GetWaitCount(), 0);
@@ -280,6 +284,10 @@ TEST_F(ModalStates, WaitCursors_Nest) {
     EXPECT_EQ(m_app.GetWaitCount(), 0);
   }
   EXPECT_EQ(m_app.GetWaitCount(), 0);
+  const HCURSOR other = ::LoadCursorW(nullptr, IDC_CROSS);
+  ::SetCursor(other);
+  m_owner.RestoreWaitCursor();
+  EXPECT_EQ(::GetCursor(), other) << "there is none to restore";
   ::SetCursor(before);
 }
 

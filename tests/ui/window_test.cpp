@@ -32,6 +32,21 @@ TEST_F(Windows, Create_BindsTheObjectBeforeTheFirstMessage) {
 }
 
 // Each way to fail ends in exactly one PostNcDestroy, and leaves nothing.
+TEST_F(Windows, Classes_AreRegisteredOncePerSetOfAttributes) {
+  const HCURSOR cross = ::LoadCursorW(nullptr, IDC_CROSS);
+  const LPCWSTR name = SRegisterWindowClass(CS_DBLCLKS | CS_HREDRAW, cross);
+  EXPECT_EQ(SRegisterWindowClass(CS_DBLCLKS | CS_HREDRAW, cross), name);
+  EXPECT_NE(SRegisterWindowClass(CS_DBLCLKS, cross), name);
+  EXPECT_NE(SRegisterWindowClass(CS_DBLCLKS | CS_HREDRAW), name);
+  test::Window window;
+  ASSERT_TRUE(window.CreateEx(0, name, WTEXT("own"), WS_POPUP, 0, 0, 10, 10, nullptr, nullptr));
+  EXPECT_EQ(::GetClassLongPtrW(window.m_hWnd, GCL_STYLE), ULONG_PTR{CS_DBLCLKS | CS_HREDRAW});
+  EXPECT_EQ(reinterpret_cast<HCURSOR>(::GetClassLongPtrW(window.m_hWnd, GCLP_HCURSOR)), cross);
+  EXPECT_EQ(SWnd::FromHandlePermanent(window.m_hWnd), &window);
+  window.DestroyWindow();
+  EXPECT_EQ(window.m_ends, 1);
+}
+
 TEST_F(Windows, Create_ThatFails_EndsOnce) {
   class Refusing : public Window {
    public:
