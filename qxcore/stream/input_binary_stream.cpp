@@ -1,5 +1,8 @@
 #include "qxcore/stream/input_binary_stream.h"
 
+#include <string_view>
+#include <utility>
+
 #include "qxcore/core/internal/working_buffer.h"
 #include "qxcore/core/io_exceptions.h"
 #include "qxcore/stream/internal/read_fully.h"
@@ -32,24 +35,40 @@ bool IsPlausible(SInputStream& in, std::int32_t n) {
   return n <= SInputBinaryStream::kConfirmAbove || in.Available() >= static_cast<unsigned long>(n);
 }
 
-// Most texts are plain, and then have as many characters as bytes but for the zero.
-SString ReadText(SInputStream& in, int n) {
-  SWorkingBuffer<char> bytes(static_cast<std::size_t>(n));
-  const unsigned long got = SReadFully(in, bytes.Get(), static_cast<unsigned long>(n));
-  SString text;
+// Whether a text of n characters belongs into the buffer that is there: not where it would hold much more.
+bool Suits(const SString& buffer, int n) {
+  const int room = buffer.GetAllocLength();
+  return room >= n && room / 4 <= n;
+}
+
+// Fills the text with what n bytes, or as many as came, stand for. Returns whether all of its room was needed: most
+// texts are plain, and then have as many characters as bytes but for the zero. Else one in two or three bytes ends it,
+// too.
+bool Fill(SString& text, std::string_view bytes, int n) {
   WCHAR* characters = text.GetBufferSetLength(n);
-  const int length = static_cast<int>(SDecodeUTF8(characters, std::string_view(bytes.Get(), got)) - characters);
-  text.Unlock(length);
-  const bool isPlain = length == n - 1 && got == static_cast<unsigned long>(n) && bytes.Get()[length] == 0;
-  // Else a zero in two or three bytes ends the text, too, and the room that was too much goes back.
-  return isPlain ? text : SString(text.GetSafePointer());
+  const int length = static_cast<int>(SDecodeUTF8(characters, bytes) - characters);
+  const bool isPlain = length == n - 1 && bytes.size() == static_cast<std::size_t>(n) && bytes.back() == 0;
+  text.Unlock(isPlain ? length : -1);
+  return isPlain;
+}
+
+void ReadText(SInputStream& in, int n, SString& text) {
+  SWorkingBuffer<char> buffer(static_cast<std::size_t>(n));
+  const std::string_view bytes(buffer.Get(), SReadFully(in, buffer.Get(), static_cast<unsigned long>(n)));
+  if (Suits(text, n)) {
+    Fill(text, bytes, n);
+    return;
+  }
+  SString made;
+  const bool isFull = Fill(made, bytes, n);
+  text = isFull ? std::move(made) : SString(made.GetSafePointer());  // the room that was too much goes back
 }
 
 template <class Map>
 SInputBinaryStream& ReadMap(SInputBinaryStream& stream, Map& map) {
   map.Clear();
-  SString key, value;
   for (std::int32_t left = SReadCount(stream); left > 0; --left) {
+    SString key, value;
     stream >> key >> value;
     map.Add(key, value);
   }
@@ -68,14 +87,18 @@ SInputBinaryStream& operator>>(SInputBinaryStream& stream, SString& text) {
   if (!IsPlausible(in, n)) {
     throw SEIOException(static_cast<HRESULT>(0x80990040), WTEXT("Invalid string in binary stream"));
   }
-  text = n == 0 ? SString() : ReadText(in, n);
+  if (n == 0) {
+    text = SString();
+  } else {
+    ReadText(in, n, text);
+  }
   return stream;
 }
 
 SInputBinaryStream& operator>>(SInputBinaryStream& stream, SStringTable& table) {
   table.Clear();
-  SString text;
   for (std::int32_t left = SReadCount(stream); left > 0; --left) {
+    SString text;
     stream >> text;
     table.Add(text);
   }
