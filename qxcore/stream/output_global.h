@@ -41,8 +41,10 @@ class QXCORE_API SOutputGlobal : public SOutputStream {
   void Resize(unsigned long size, unsigned long used);
 
  private:
+  void Grow(unsigned long size);
+
   SHGlobal m_memory;
   unsigned char* m_base = nullptr;  // locked
-  unsigned char* m_end = nullptr;
+  unsigned char* m_end = nullptr;   // of the room; the memory may be larger
   unsigned char* m_write = nullptr;
 };
