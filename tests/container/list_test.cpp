@@ -17,10 +17,12 @@
 namespace {
 
 std::vector<int> Values(const SList<Counted>& list) {
-  std::vector<int> values;
-  for (const Counted& element : list) values.push_back(element.Get());
-  std::vector<int> backwards;
-  for (auto place = list.rbegin(); place != list.rend(); ++place) backwards.push_back(place->Get());
+  std::vector<int> values, backwards;
+  // One step more than there are elements shows a ring that does not close.
+  const std::size_t most = list.size() + 1;
+  for (auto place = list.begin(); place != list.end() && values.size() < most; ++place) values.push_back(place->Get());
+  for (auto place = list.rbegin(); place != list.rend() && backwards.size() < most; ++place)
+    backwards.push_back(place->Get());
   EXPECT_TRUE(std::equal(values.begin(), values.end(), backwards.rbegin(), backwards.rend()));
   EXPECT_EQ(static_cast<int>(values.size()), list.GetCount());
   return values;

@@ -387,7 +387,13 @@ TEST(StringTable, ListsComeFromTheTableItself_AndFromResources) {
 
 TEST(StringTable, FailedAllocation_LeavesTheTableAsItWas) {
   const SString list = WTEXT("one,two,three,four,five\\,5");
-  SStringTable table;
+  SStringTable table, lent;  // strings that are lent out are copied, and long ones come from no pool
+  for (const WCHAR character : {WTEXT('a'), WTEXT('b'), WTEXT('c')}) {
+    SString text;
+    std::fill_n(text.GetBufferSetLength(3000), 3000, character);
+    lent.Add(text);
+  }
+  for (SString& text : lent) text.LockBuffer(text.Length());
   Texts expected;  // after the last step that succeeded
   auto step = [&](auto change) {
     change();
@@ -398,6 +404,8 @@ TEST(StringTable, FailedAllocation_LeavesTheTableAsItWas) {
         step([&] { table = SStringTable::null; });
         step([&] { table.AddFromList(list, WTEXT(","), '\\'); });
         step([&] { table += kThree; });
+        step([&] { table += lent; });
+        step([&] { table = lent; });
         step([&] { table.Insert(2, WTEXT("two and a half")); });
         step([&] { table.SetFromList(list, WTEXT(","), '\\'); });
         step([&] { table = kThree; });

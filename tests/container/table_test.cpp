@@ -7,6 +7,7 @@
 #include <functional>
 #include <numeric>
 #include <random>
+#include <set>
 #include <utility>
 #include <vector>
 
@@ -20,15 +21,38 @@
 
 namespace {
 
+// A table that knows the blocks that it has from its memory, so that one that is lost is noticed without a sanitizer.
+template <class Base>
+class Watched : public Base {
+ public:
+  static inline std::set<const void*> blocks;
+
+  Watched() = default;
+  Watched(const Watched&) = default;
+  ~Watched() override { this->Clear(); }
+
+ protected:
+  void* Allocate(int n) override {
+    void* block = Base::Allocate(n);
+    blocks.insert(block);
+    return block;
+  }
+  void Free(void* block) override {
+    EXPECT_EQ(blocks.erase(block), 1u) << "freed, but not one of its own";
+    Base::Free(block);
+  }
+};
+
 // --- copies that fail in the middle of a change ---
 
 template <class Change>
-void WithEachCopyFailing(Change change, int mayGo) {
+void WithEachCopyFailing(Change change, int mayGo, int room = 20) {
   for (long failAt = 1;; ++failAt) {
     Counted::failAt = 0;
     {
-      STable<Counted> table{Counted(0), Counted(1), Counted(2), Counted(3), Counted(4), Counted(5)};
-      table.GrowTo(20);
+      Watched<STable<Counted>> table;
+      for (int value = 0; value < 6; ++value) table.Add(Counted(value));
+      table.GrowTo(room);
       bool hasFailed = false;
       Counted::failAt = failAt;
       try {
@@ -42,10 +66,12 @@ void WithEachCopyFailing(Change change, int mayGo) {
         EXPECT_GE(table.GetCount(), 6 - mayGo) << failAt;
       }
       for (const Counted& element : table) element.Get();
+      EXPECT_EQ(table.blocks.size(), 1u) << failAt;
       if (!hasFailed) return;
       ASSERT_LT(failAt, 100);
     }
     EXPECT_TRUE(Counted::living.empty());
+    EXPECT_TRUE(Watched<STable<Counted>>::blocks.empty());
   }
 }
 
@@ -56,6 +82,8 @@ TEST(TableFaults, FailedCopiesLoseNothingTwice) {
   WithEachCopyFailing([](auto& table) { table.MoveTo(5, 0); }, 0);
   WithEachCopyFailing([](auto& table) { table.Remove(1); }, 5);
   WithEachCopyFailing([](auto& table) { table.Insert(2, Counted(9)); }, 4);
+  WithEachCopyFailing([](auto& table) { table.Insert(2, Counted(9)); }, 4, 6);  // which has to grow first
+  WithEachCopyFailing([](auto& table) { table.GrowTo(30); }, 0);
 }
 
 // A table with memory of its own: growing must not go past its Allocate and Free.
@@ -122,7 +150,7 @@ void Change(std::mt19937& random, Table& table, std::vector<int>& peer) {
   int count = table.GetCount();
   auto any = [&random](int below) { return static_cast<int>(random() % static_cast<unsigned>(below)); };
   int value = any(1000);
-  switch (any(9)) {
+  switch (any(10)) {
     case 0:
     case 1:
       EXPECT_EQ(table.Add(T(value)), count);
@@ -180,6 +208,20 @@ void Change(std::mt19937& random, Table& table, std::vector<int>& peer) {
         peer.clear();
       } else {
         table.GrowTo(count + any(5));
+      }
+      break;
+    case 9:
+      if constexpr (requires { table.CopyArray(nullptr, 0); }) {
+        if (count > 0 && any(2) == 0) {  // a part of its own elements
+          int from = any(count), copied = any(count - from + 1);
+          table.CopyArray(std::as_const(table).GetArray() + from, copied);
+          peer = std::vector<int>(peer.begin() + from, peer.begin() + from + copied);
+        } else if (any(10) == 0) {
+          peer.resize(static_cast<std::size_t>(any(40)));
+          std::iota(peer.begin(), peer.end(), value);
+          const std::vector<T> source(peer.begin(), peer.end());
+          table.CopyArray(source.data(), static_cast<int>(source.size()));
+        }
       }
   }
 }
@@ -340,7 +382,8 @@ class FailingMovable : public Movable {
 
 // While another table holds the same block, a change copies it first; when that fails, both keep what they had.
 TEST(TableShared, CopiesThatFailInADetachingChange_LeaveBothTables) {
-  using Table = STableMem<FailingMovable>;
+  using Table = Watched<STableMem<FailingMovable>>;
+  const FailingMovable source[] = {FailingMovable(6), FailingMovable(7), FailingMovable(8), FailingMovable(9)};
   const std::function<void(Table&)> kChanges[] = {[](Table& table) { table.Remove(2); },
                                                   [](Table& table) { table.MoveTo(0, 3); },
                                                   [](Table& table) { table.Swap(1, 2); },
@@ -348,11 +391,13 @@ TEST(TableShared, CopiesThatFailInADetachingChange_LeaveBothTables) {
                                                   [](Table& table) { table.GrowTo(50); },
                                                   [](Table& table) { table.Insert(1, FailingMovable(9)); },
                                                   [](Table& table) { table.Add(std::as_const(table)[3]); },
+                                                  [&source](Table& table) { table.CopyArray(source, 4); },
                                                   [](Table& table) { table.At(0); }};
   for (const auto& change : kChanges) {
     int failures = 0;
     for (long n = 1;; ++n, ++failures) {
-      Table table{FailingMovable(1), FailingMovable(2), FailingMovable(3), FailingMovable(4)};
+      Table table;
+      for (int value = 1; value <= 4; ++value) table.Add(FailingMovable(value));
       const Table other(table);
       FailingMovable::failAt = n;
       bool hasFailed = false;
@@ -366,11 +411,13 @@ TEST(TableShared, CopiesThatFailInADetachingChange_LeaveBothTables) {
       if (!hasFailed) break;
       EXPECT_EQ(Values(table), (std::vector<int>{1, 2, 3, 4}));
       EXPECT_TRUE(table.IsShared());
-      EXPECT_EQ(Movable::living.size(), 4u);
+      EXPECT_EQ(Movable::living.size(), 4u + std::size(source));
+      EXPECT_EQ(Table::blocks.size(), 1u);
     }
     EXPECT_GE(failures, 4) << "each element was copied";
+    EXPECT_EQ(Movable::living.size(), std::size(source));
+    EXPECT_TRUE(Table::blocks.empty());
   }
-  EXPECT_TRUE(Movable::living.empty());
 }
 
 // A capacity below the number of elements is no order, shared or not; neither is an empty array to copy.

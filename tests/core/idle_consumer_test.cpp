@@ -7,6 +7,7 @@
 #include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 
 #include "qxcore/core/exception.h"
 #include "qxcore/core/internal/memory_failures.h"
@@ -115,6 +116,24 @@ TEST(IdleConsumerList, ChangesDuringACall_AreSafe) {
   EXPECT_EQ(list.GetCount(), 0);
   list.Register(a.get());
   EXPECT_EQ(CallsOf([&] { EXPECT_EQ(list.OnIdleNext(1), 1); }), "a") << "the cycle ends with the last consumer";
+}
+
+// Also where it fills again before they go on.
+TEST(IdleConsumerList, AListThatIsEmptied_EndsAllPassesThatAreUnderWay) {
+  SIdleConsumerList list;
+  Worker a(&list, 'a'), b(&list, 'b');
+  bool isInner = false;
+  a.m_action = [&] {
+    if (std::exchange(isInner, true)) return;
+    list.OnIdleAll(1);
+    list.Register(&b);
+  };
+  b.m_action = [&] {
+    list.Unregister(nullptr);
+    list.Register(&a);
+  };
+  EXPECT_EQ(CallsOf([&] { list.OnIdleAll(1); }), "aab");
+  EXPECT_EQ(list.GetCount(), 2);
 }
 
 TEST(IdleConsumerList, OneThatLeavesInItsTurn_LetsTheNextCome) {

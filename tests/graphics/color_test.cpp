@@ -102,7 +102,7 @@ TEST(Colors, HueSaturationLightnessGoBothWays) {
     ASSERT_TRUE(hue >= 0 && hue < 360 && saturation >= 0 && saturation <= 1 + 1e-12 && lightness >= 0 &&
                 lightness <= 1);
     SColor again;
-    again.SetHSLColor(hue + 720, saturation, lightness);
+    again.SetHSLColor(hue + (i % 5 - 2) * 360, saturation, lightness);  // whole turns in either direction
     ASSERT_EQ(again, color) << std::hex << static_cast<COLORREF>(color);
   }
   struct Case {

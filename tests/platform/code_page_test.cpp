@@ -249,6 +249,36 @@ TEST(CodePages, EnumerationListsWhatIsValid) {
   EXPECT_FALSE(IsValidCodePage(1200));
 }
 
+// A text may hold NULs, and some converters take it in pieces for that: what is lost in any piece is lost in the whole,
+// and the bytes are those of the pieces.
+TEST(CodePages, ATextWithNULsIsItsPieces) {
+  const Text good = WTEXT("ab"), bad = WTEXT("x\xD800y");  // half a pair is in no page
+  for (const UINT page : {437u, 850u, 1252u, 932u, 936u, 949u, 950u, 50220u, 50225u, 52936u, 54936u, 57002u}) {
+    if (!IsValidCodePage(page)) continue;
+    const auto encode = [page](const Text& text, BOOL& used) {
+      char bytes[64];
+      const int size =
+          WideCharToMultiByte(page, 0, text.data(), static_cast<int>(text.size()), bytes, 64, nullptr, &used);
+      return std::string(bytes, static_cast<std::size_t>(size));
+    };
+    for (int pieces = 0; pieces < 8; ++pieces) {
+      Text whole;
+      std::string expected;
+      for (int i = 0; i < 3; ++i) {
+        const Text& piece = (pieces >> i & 1) != 0 ? bad : good;
+        BOOL used = FALSE;
+        if (i > 0) whole += WCHAR{0}, expected += '\0';
+        whole += piece;
+        expected += encode(piece, used);
+        EXPECT_EQ(used != FALSE, &piece == &bad) << page;
+      }
+      BOOL used = FALSE;
+      EXPECT_EQ(encode(whole, used), expected) << page;
+      EXPECT_EQ(used != FALSE, pieces != 0) << page << " " << pieces;
+    }
+  }
+}
+
 #ifndef _WIN32
 // Documented rules that Wine does not know, and pages that it does not have.
 TEST(CodePages, PublishedRulesBeyondWine) {

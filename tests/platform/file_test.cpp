@@ -6,6 +6,7 @@
 #include <string>
 
 #include "tests/support/temp_folder.h"
+#include "tests/support/wine.h"
 
 #ifndef _WIN32
 #include <fcntl.h>
@@ -88,6 +89,38 @@ TEST(Files, RightsOfTheHandle) {
   EXPECT_TRUE(WriteFile(twin, "cd", 2, &done, nullptr));  // one position for both
   CloseHandle(twin);
   EXPECT_EQ(ReadAll(path), "abcd");
+}
+
+// A second handle can do what it was asked for. By the published text it may in some cases do more than the first one,
+// and does so with Wine; here it never is a way to more rights.
+TEST(Files, DuplicatesHaveNoMoreRights) {
+  TempFolder folder;
+  const Text path = folder.File(WTEXT("a"));
+  WriteAll(path, "abcdef");
+  constexpr DWORD kRights[] = {GENERIC_READ, GENERIC_WRITE, GENERIC_READ | GENERIC_WRITE};
+  for (const DWORD given : kRights) {
+    for (const DWORD wanted : kRights) {
+      const HANDLE file = Open(path, given, OPEN_EXISTING);
+      HANDLE twin = nullptr;
+      const bool isMade = DuplicateHandle(GetCurrentProcess(), file, GetCurrentProcess(), &twin, wanted, FALSE, 0);
+      char byte = 'x';
+      DWORD done;
+      const bool reads = isMade && ReadFile(twin, &byte, 1, &done, nullptr);
+      const bool writes = isMade && WriteFile(twin, &byte, 1, &done, nullptr);
+      const DWORD both = given & wanted;
+      if (wanted == both) {
+        EXPECT_TRUE(isMade);
+        EXPECT_EQ(reads, (both & GENERIC_READ) != 0) << given << " " << wanted;
+        EXPECT_EQ(writes, (both & GENERIC_WRITE) != 0) << given << " " << wanted;
+      }
+      if (!IsWindows()) {
+        EXPECT_FALSE(reads && (both & GENERIC_READ) == 0) << given << " " << wanted;
+        EXPECT_FALSE(writes && (both & GENERIC_WRITE) == 0) << given << " " << wanted;
+      }
+      if (isMade) CloseHandle(twin);
+      CloseHandle(file);
+    }
+  }
 }
 
 TEST(Files, SharingModes) {

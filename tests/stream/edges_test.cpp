@@ -1,6 +1,7 @@
 // The choice of an encoding by a second reading of its rules, hints of every code page, texts in double-byte active
 // pages, and the base streams.
 
+#include <algorithm>
 #include <random>
 #include <vector>
 
@@ -299,7 +300,14 @@ TEST(BaseStreams, CharactersOfAFileGoBackToTheirMark) {
   SSeekableStringInputStream in(file);
   EXPECT_THROW(in.Reset(), SEIOResetInvalid);
   WCHAR text[20] = {};
-  EXPECT_EQ(in.Read(text, 4 * sizeof(WCHAR) + 1), 4 * sizeof(WCHAR)) << "half a character is none";
+  in.Mark(0);
+  for (unsigned long size = 0; size < 2 * 7 * sizeof(WCHAR); ++size) {
+    const unsigned long whole = std::min<unsigned long>(size / sizeof(WCHAR), 7);
+    EXPECT_EQ(in.Read(text, size), whole * sizeof(WCHAR)) << size << " bytes; half a character is none";
+    EXPECT_EQ(SString(SStringView(text, whole)), SString(WTEXT("one two")).Left(static_cast<int>(whole)));
+    in.Reset();
+  }
+  EXPECT_EQ(in.Skip(4), 4u);
   in.Mark(0);
   EXPECT_EQ(in.Read(text, sizeof text), 3 * sizeof(WCHAR)) << "what is there";
   in.Reset();

@@ -61,9 +61,13 @@ SString ZipTextOf(Operation operation) {
 }
 
 TEST(Inflater, PiecesOfAnySizeGiveTheWhole) {
-  for (int raw : {0, 1}) {
+  const struct {
+    int raw;
+    std::string dictionary;
+  } kForms[] = {{0, ""}, {1, ""}, {0, Sample(8, 500)}};
+  for (const auto& [raw, dictionary] : kForms) {
     const std::string text = Sample(7, 100000);
-    const std::string packed = Deflate(text, raw ? -15 : 15);
+    const std::string packed = Deflate(text, raw ? -15 : 15, dictionary);
     SInflater inflater(raw);
     std::mt19937 random(1);
     for (int round = 0; round < 3; ++round) {
@@ -71,6 +75,8 @@ TEST(Inflater, PiecesOfAnySizeGiveTheWhole) {
       std::size_t given = 0;
       char out[777];
       for (test::Steps steps; !inflater.IsFinished(); steps.Take()) {
+        if (inflater.NeedsDictionary()) inflater.SetDictionary(dictionary.data(), static_cast<int>(dictionary.size()));
+        ASSERT_FALSE(inflater.NeedsDictionary());
         if (inflater.GetRemaining() == 0) {
           ASSERT_LT(given, packed.size());
           const std::size_t piece = std::min<std::size_t>(1 + random() % 900, packed.size() - given);

@@ -115,15 +115,19 @@ TEST(OutputFileOnChange, Failures) {
     EXPECT_THROW(onFolder.Close(nullptr), SEIOCantOpenForWriting);
   }
   const test::Text path = folder.File(WTEXT("out"));
-  WriteAll(path, "old");
   const SString name = Str(path);
   WithEachAllocationFailing(
       [&] {
+        WriteAll(path, "old");
         SOutputFileOnChange out(name);
         const std::string content(20000, 'n');
         out.Write(content.data(), 20000);
+        out.Close();
       },
-      [] {});
+      [&] {
+        const std::string left = ReadAll(path);
+        EXPECT_TRUE(left == "old" || left.empty()) << "a failed write adds nothing, and a failed Close changes nothing";
+      });
   EXPECT_EQ(ReadAll(path), std::string(20000, 'n'));
 #ifndef _WIN32
   SOutputFileOnChange full(SString(WTEXT("C:\\dev\\full")));

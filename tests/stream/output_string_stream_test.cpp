@@ -11,15 +11,23 @@ namespace {
 
 std::string Written(const SString& text, Encoding format, WCHAR replacement = WTEXT('?'), int piece = 0) {
   CollectingOutput out;
-  SOutputStringStream stream(out, format);
-  stream.SetReplacement(replacement);
-  for (int at = 0; at < text.Length(); at += piece) {
-    int count = piece > 0 ? std::min(piece, text.Length() - at) : text.Length();
-    stream.Write(text.GetPointerAt(at), static_cast<unsigned>(count));
-    if (piece == 0) break;
+  std::string closed;
+  {
+    SOutputStringStream stream(out, format);
+    const WCHAR former = stream.GetReplacement();
+    EXPECT_EQ(stream.SetReplacement(replacement), former);
+    EXPECT_EQ(stream.GetReplacement(), replacement);
+    for (int at = 0; at < text.Length(); at += piece) {
+      int count = piece > 0 ? std::min(piece, text.Length() - at) : text.Length();
+      stream.Write(text.GetPointerAt(at), static_cast<unsigned>(count));
+      if (piece == 0) break;
+    }
+    stream.Close();
+    closed = out.bytes;
+    stream.Close();
   }
-  stream.Close();
-  return out.bytes;
+  EXPECT_EQ(out.bytes, closed) << "what was closed writes no more";
+  return closed;
 }
 
 TEST(TextOutput, EveryFormat_ReadsBackWhatWasWritten) {
@@ -42,7 +50,24 @@ TEST(TextOutput, EveryFormat_ReadsBackWhatWasWritten) {
   }
 }
 
+// Either flag asks for a mark, and only 16-bit and UTF-8 forms have one.
 TEST(TextOutput, MarksStandAtTheBeginningOnly) {
+  const struct {
+    Encoding form;
+    std::string mark;
+  } kForms[] = {{Support::kUTF8, "\xEF\xBB\xBF"},
+                {Support::kUTF16LE, "\xFF\xFE"},
+                {Support::kUTF16BE, "\xFE\xFF"},
+                {Support::kANSI, ""},
+                {Support::kASCII, ""}};
+  for (const auto& [form, mark] : kForms) {
+    for (const Encoding flags : {Encoding{0}, Encoding{Support::kOptionalBOM}, Encoding{Support::kRequiredBOM},
+                                 Encoding{Support::kOptionalBOM | Support::kRequiredBOM}}) {
+      if (flags != 0 && mark.empty()) continue;  // the bits mean other things there
+      const std::string expected = flags != 0 ? mark : std::string();
+      EXPECT_EQ(Written(SString(), form | flags), expected) << std::hex << form << " " << flags;
+    }
+  }
   EXPECT_EQ(Written(SString(), 0x4001C), "\xEF\xBB\xBF");
   EXPECT_EQ(Written(SString(), 0x4000A), "\xFF\xFE");
   EXPECT_EQ(Written(WTEXT("a"), Support::kUTF8), "a");

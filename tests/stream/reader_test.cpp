@@ -417,27 +417,47 @@ TEST(CodePages, Tables_AgreeWithThePlatformsConversion) {
 
 // --- positions ---
 
-TEST(Positions, MarkAndReset_ReadTheSameAgain) {
-  const std::string text = Repeat("line of text \xC3\xA9\xE2\x82\xAC\n", 6000);
-  for (Encoding request : {Support::kUTF8, kAnsi | Support::kQuickDetect | Support::kFavorGuess}) {
-    PiecewiseInput in(text, 100);
-    SMultiFormatReaderUnicode reader(in, request);
-    SString whole = ReadBytes(text, request).text;
-    RandomText random(8);
-    for (int at = 0; at < whole.Length() - 2000;) {
-      reader.Mark(100000);
-      int length = random.Number(1500) + 1;
-      for (int round = 0; round < 2; ++round) {
-        std::vector<WCHAR> block(static_cast<std::size_t>(length));
-        ASSERT_EQ(reader.Read(block.data(), static_cast<unsigned long>(length) * 2),
-                  static_cast<unsigned long>(length) * 2);
-        ASSERT_EQ(SStringView(block.data(), block.size()),
-                  whole.View().substr(static_cast<std::size_t>(at), block.size()))
-            << at;
-        if (round == 0) reader.Reset();
-      }
-      at += length;
+std::pair<unsigned long long, unsigned long long> LossesOf(const SMultiFormatReaderUnicode& reader) {
+  return {reader.GetReplacedCount(), reader.GetDroppedCount()};
+}
+
+// What is read twice counts once: at the end the losses are those of a reader that never went back.
+void ExpectTheSameAfterEveryReset(const std::string& bytes, Encoding request, WCHAR replacement) {
+  PiecewiseInput once(bytes), in(bytes, 100);
+  SMultiFormatReaderUnicode plain(once, request), reader(in, request);
+  const WCHAR former = plain.GetReplacement();
+  for (SMultiFormatReaderUnicode* one : {&plain, &reader}) {
+    EXPECT_EQ(one->SetReplacement(replacement), former);
+    EXPECT_EQ(one->GetReplacement(), replacement);
+  }
+  const SString whole = plain.ReadAll();
+  RandomText random(8);
+  for (int at = 0; at < whole.Length() - 2000;) {
+    reader.Mark(100000);
+    int length = random.Number(1500) + 1;
+    for (int round = 0; round < 2; ++round) {
+      std::vector<WCHAR> block(static_cast<std::size_t>(length));
+      ASSERT_EQ(reader.Read(block.data(), static_cast<unsigned long>(length) * 2),
+                static_cast<unsigned long>(length) * 2);
+      ASSERT_EQ(SStringView(block.data(), block.size()),
+                whole.View().substr(static_cast<std::size_t>(at), block.size()))
+          << at;
+      if (round == 0) reader.Reset();
     }
+    at += length;
+  }
+  reader.ReadAll();
+  EXPECT_EQ(LossesOf(reader), LossesOf(plain));
+}
+
+TEST(Positions, MarkAndReset_ReadTheSameAgain) {
+  const std::string good = Repeat("line of text \xC3\xA9\xE2\x82\xAC\n", 6000);
+  for (Encoding request : {Support::kUTF8, kAnsi | Support::kQuickDetect | Support::kFavorGuess}) {
+    ExpectTheSameAfterEveryReset(good, request, WTEXT('?'));
+  }
+  const std::string bad = Repeat("lost \xC3\xA9\xFF and \x85\xE2\x82 again\n", 6000);
+  for (Encoding request : {Encoding{Support::kUTF8}, Encoding{Support::kASCII}, kAnsi | 932u}) {
+    for (const WCHAR replacement : {WTEXT('?'), WCHAR{0}}) ExpectTheSameAfterEveryReset(bad, request, replacement);
   }
   PiecewiseInput in(std::string(400000, 'a'));
   SMultiFormatReaderUnicode reader(in, Support::kASCII);

@@ -10,10 +10,19 @@
 
 namespace {
 
+// All tokens; from wherever a walk is broken off, a reset one gives them anew.
 template <class Iterator>
 std::vector<SString> Tokens(Iterator token) {
   std::vector<SString> tokens;
   for (; token; ++token) tokens.push_back(*token);
+  for (std::size_t passed = 0; passed <= tokens.size(); ++passed) {
+    token.reset();
+    for (std::size_t i = 0; i < passed; ++i) ++token;
+    token.reset();
+    std::vector<SString> again;
+    for (; token; ++token) again.push_back(*token);
+    EXPECT_EQ(again, tokens) << "reset behind " << passed;
+  }
   return tokens;
 }
 

@@ -295,6 +295,9 @@ TEST(OtherPages, DoubleByteTextsAreCountedByCharacters) {
   EXPECT_EQ(bytes.LengthByte(), 9);
   EXPECT_EQ(bytes.Length(), 6);
   EXPECT_EQ(SAnsiString(text, 3).LengthByte(), 5);
+  SAnsiString cut(text);
+  static_cast<char*>(cut)[2] = 0;  // within a character
+  EXPECT_EQ(cut.Length(), 2) << "nothing behind the end counts";
   EXPECT_EQ(SString(static_cast<const char*>(bytes)), text);
   EXPECT_EQ(SUnicodeString(bytes).Length(), 6);
   EXPECT_EQ(SUnicodeString(bytes, 3).Length(), 2);

@@ -4,6 +4,7 @@
 #include <gtest/gtest.h>
 
 #include <climits>
+#include <functional>
 #include <limits>
 #include <random>
 #include <string>
@@ -169,6 +170,50 @@ TEST(FindFailures, AreListedByTheFolderOfTheirMask) {
   EXPECT_EQ(failures.GetFirstError(), DWORD(ERROR_ACCESS_DENIED));
   failures.Clear();
   EXPECT_TRUE(failures.IsEmpty());
+}
+
+// All that an object says of its file.
+SString StateOf(const SFile& file) {
+  unsigned long low = 0, high = 0;
+  std::int64_t position = -1;
+  file.GetSize(low, high);
+  if (file.IsOpen()) file.SavePosition(position);
+  SString state;
+  state.Format(WTEXT("%s|%s|%s|%s|%s open %d access %lx may be written %d size %lu at %d end %d"),
+               file.GetDrive().GetSafePointer(), file.GetDirectory().GetSafePointer(), file.GetName().GetSafePointer(),
+               file.GetExtension().GetSafePointer(), file.GetFullName().GetSafePointer(), file.IsOpen(),
+               file.GetAccess(), file.CanBeWritten(), low, static_cast<int>(position),
+               file.IsOpen() ? file.IsEOF() : 0);
+  return state;
+}
+
+TEST(FileStates, ACopyOfAnOpenFileSaysWhatTheFirstSays) {
+  TempFolder folder;
+  const SString name = Str(folder.File(WTEXT("f.txt")));
+  WriteAll(folder.File(WTEXT("f.txt")), "12345");
+  const std::function<HRESULT(SFile&)> kWays[] = {
+      [](SFile&) { return S_OK; }, [](SFile& file) { return file.Open(); },
+      [](SFile& file) { return file.OpenExisting(); },
+      [](SFile& file) { return file.OpenExisting(FILE_SHARE_READ | FILE_SHARE_WRITE); },
+      [](SFile& file) { return file.Open(FILE_ATTRIBUTE_READONLY); }};
+  for (const auto& open : kWays) {
+    SFile file(name);
+    ASSERT_EQ(open(file), Code(SFile::kOk));
+    char bytes[2];
+    unsigned long count = 2;
+    if (file.IsOpen()) {
+      ASSERT_EQ(file.Read(bytes, count), Code(SFile::kOk));
+    }
+    SFile copy;
+    ASSERT_EQ(copy.Init(file), Code(SFile::kOk));
+    EXPECT_EQ(StateOf(copy), StateOf(file));
+    ASSERT_EQ(file.Close(), Code(SFile::kOk));
+    EXPECT_EQ(file.GetAccess(), 0u);
+    if (!copy.IsOpen()) continue;
+    count = 2;
+    EXPECT_EQ(copy.Read(bytes, count), Code(SFile::kOk)) << "it goes on alone";
+    EXPECT_EQ(bytes[0], '3');
+  }
 }
 
 TEST(FileStates, WhoMayWrite) {
