@@ -203,6 +203,14 @@ TEST(ImageLists, DrawWhatTheMaskLeaves) {
   EXPECT_FALSE(list.Draw(dc, 2, SPoint(0, 0)));
   EXPECT_TRUE(list.Remove(-1));
   EXPECT_EQ(list.GetImageCount(), 0);
+  const HIMAGELIST former = list.m_hImageList;
+  EXPECT_EQ(SImageList::FromHandlePermanent(former), &list);
+  EXPECT_TRUE(list.DeleteImageList());
+  EXPECT_EQ(list.m_hImageList, nullptr);
+  EXPECT_EQ(SImageList::FromHandlePermanent(former), nullptr);
+  EXPECT_FALSE(list.DeleteImageList());
+  EXPECT_TRUE(list.Create(2, 3));
+  EXPECT_EQ(list.GetImageSize(), SSize(2, 3));
 }
 
 // A point goes to (point - window's origin) * viewport's extent / window's extent + viewport's origin, and back; each

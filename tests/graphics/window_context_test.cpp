@@ -62,6 +62,29 @@ TEST_F(WindowContexts, DrawOnTheirPartOfTheWindow) {
   EXPECT_EQ(WindowFromDC(inner), child);
 }
 
+// The border belongs to the window and not to its client area.
+TEST_F(WindowContexts, OfAWholeWindow_BeginAtItsCorner) {
+  const HWND framed = CreateWindowExW(0, WTEXT("WindowContexts"), WTEXT(""), WS_CHILD | WS_VISIBLE | WS_BORDER, 5, 5,
+                                      50, 40, top, nullptr, nullptr, nullptr);
+  ASSERT_NE(framed, nullptr);
+  Fill(framed, kChild);
+  {
+    SWindowDC whole(framed);
+    EXPECT_EQ(whole.GetClipBox(), SRect(0, 0, 50, 40));
+    EXPECT_EQ(whole.GetPixel(SPoint(1, 1)), kChild);
+    EXPECT_EQ(whole.GetPixel(SPoint(48, 38)), kChild);
+    EXPECT_NE(whole.GetPixel(SPoint(0, 0)), kChild);
+    whole.FillSolidRect(SRect(0, 0, 50, 1), kFrame);
+    EXPECT_EQ(whole.GetPixel(SPoint(49, 0)), kFrame);
+  }
+  SClientDC client(framed);
+  EXPECT_EQ(client.GetClipBox(), SRect(0, 0, 48, 38));
+  EXPECT_EQ(client.GetPixel(SPoint(0, 0)), kChild) << "only the border was drawn on";
+  DestroyWindow(framed);
+  SWindowDC none(framed);
+  EXPECT_EQ(none.GetSafeHdc(), nullptr);
+}
+
 TEST_F(WindowContexts, PaintOnlyWhatIsInvalid) {
   Fill(child, kParent);
   ValidateRect(child, nullptr);

@@ -163,6 +163,31 @@ TEST(RealFiles, WritingAndAppending) {
   EXPECT_EQ(ReadAll(path), "");
 }
 
+// What a file, and a filter over one, still has to give at every place.
+TEST(RealFiles, WhatIsAvailableIsWhatIsLeft) {
+  TempFolder folder;
+  const test::Text path = folder.File(WTEXT("file"));
+  const unsigned long size = 70000;
+  WriteAll(path, std::string(size, 'x'));
+  SInputFile plain(Path(path)), below(Path(path)), deeper(Path(path));
+  SInputBufferStream buffered(below, 100);
+  SInputPushbackStream pushback(deeper, 10);
+  for (SInputStream* in : {static_cast<SInputStream*>(&plain), static_cast<SInputStream*>(&buffered),
+                           static_cast<SInputStream*>(&pushback)}) {
+    std::string block(7001, 0);
+    for (unsigned long left = size; left > 0;) {
+      ASSERT_EQ(in->Available(), left);
+      left -= in->Read(block.data(), block.size());
+      if (left == 0) break;
+      ASSERT_EQ(in->Read(), 'x');
+      ASSERT_EQ(in->Available(), --left);
+      left -= in->Skip(13);
+    }
+    EXPECT_EQ(in->Read(), -1);
+    EXPECT_EQ(in->Available(), 0u);
+  }
+}
+
 TEST(RealFiles, LinesOfTheAnsiPage) {
   TempFolder folder;
   const test::Text path = folder.File(WTEXT("lines"));

@@ -68,6 +68,54 @@ TEST(MemoryStreams, Buffer_SeeksMarksAndEnds) {
   EXPECT_EQ(SInputBuffer("x", -1).Read(), -1);
 }
 
+TEST(MemoryStreams, Buffer_WhatIsTakenAsAWholeIsRead) {
+  const std::string bytes = Pattern(300);
+  SInputBuffer in(bytes.data(), static_cast<unsigned long>(bytes.size()));
+  for (unsigned long at = 0; at <= bytes.size(); at += 60) {
+    ASSERT_FALSE(in.SeekPos(at));
+    unsigned long size = 0;
+    const void* rest = in.TakeRest(&size);
+    EXPECT_EQ(std::string(static_cast<const char*>(rest), size), bytes.substr(at));
+    EXPECT_EQ(in.GetPos(), bytes.size());
+    EXPECT_EQ(in.Available(), 0u);
+    EXPECT_TRUE(in.IsEOF());
+    EXPECT_EQ(ReadRest(in), "");
+  }
+}
+
+// Of what was given away nothing is left, and the stream begins anew without touching it.
+TEST(MemoryStreams, Global_ThatGaveItsMemoryAwayIsEmpty) {
+  const std::string bytes = Pattern(100);
+  for (int way = 0; way < 3; ++way) {
+    SOutputGlobal out;
+    SHGlobal given;
+    for (int round = 0; round < 2; ++round) {
+      out.Write(bytes.data() + round * 50, 50);
+      SHGlobal former = given;
+      if (way == 0) {
+        given.Attach(out.Detach());
+      } else if (way == 1) {
+        EXPECT_EQ(out.GetHGlobal(&given), 1);
+      } else {
+        out.Close();
+      }
+      EXPECT_EQ(out.UsedSize(), 0u);
+      EXPECT_EQ(out.GetData(), nullptr);
+      SString text;
+      EXPECT_EQ(out.GetString(&text), 0);
+      if (round == 0) continue;
+      if (way < 2) {
+        for (SHGlobal* block : {&former, &given}) {
+          const auto* content = static_cast<const char*>(block->Lock());
+          EXPECT_EQ(std::string(content, 50), bytes.substr(block == &former ? 0 : 50, 50));
+          block->Unlock();
+          block->Free();
+        }
+      }
+    }
+  }
+}
+
 TEST(MemoryStreams, Global_GrowsInStepsAndChangesHands) {
   const std::string bytes = Pattern(300000);
   SOutputGlobal out;
