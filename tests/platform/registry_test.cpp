@@ -248,6 +248,16 @@ TEST(Environment, ReferencesAreExpanded) {
   EXPECT_EQ(expand(WTEXT("<%qxcore_ONE%%QXCORE_ONE%>")), WTEXT("<1: a\\b/c1: a\\b/c>"));
   EXPECT_EQ(expand(WTEXT("%QXCORE_NONE% 100% %%")), WTEXT("%QXCORE_NONE% 100% %%"));
   EXPECT_EQ(expand(WTEXT("")), WTEXT(""));
+  // A name is the whole of it, and neither the beginning of another one nor another one and more.
+  test::SetVariable("QXCORE_OneMore", "2");
+  EXPECT_EQ(expand(WTEXT("%qxcore_onemore%%qxcore_one%")), WTEXT("21: a\\b/c"));
+  const WideString name = WTEXT("qxcore_onemore");
+  for (std::size_t length = 7; length < name.size() + 3; ++length) {
+    if (length == 10 || length == name.size()) continue;  // that is one
+    const WideString reference = WTEXT("%") + (name + WTEXT("xyz")).substr(0, length) + WTEXT("%");
+    EXPECT_EQ(expand(reference.c_str()), reference);
+  }
+  test::SetVariable("QXCORE_OneMore", "");
   WCHAR small[4];
   EXPECT_GE(ExpandEnvironmentStringsW(WTEXT("%QXCORE_One%"), small, 4), 9u);
   test::SetVariable("QXCORE_One", "");

@@ -31,6 +31,7 @@ class Characters : public SInputStream {
     return next;
   }
   int IsEOF() override { return m_at == m_text.size(); }
+  WideString Rest() const { return m_text.substr(m_at); }
 
  private:
   WideString m_text;
@@ -109,6 +110,23 @@ WideString UnescapedByTheRules(const std::string& text) {
 }
 
 WideString Unescaped(const std::string& text) { return WideString(Filter::Unescape(text.c_str()).View()); }
+
+// Wherever it is closed: nothing that was read ahead is left, and what comes then is the source's alone.
+TEST(UnicodeEscape, AClosedFilterHoldsNothing) {
+  const WideString text = WTEXT("a\\b\\uc\\uu12x\\u00E9\u00E9\\\\u4E2D\u4E2D!");
+  for (int reads = 0; reads < 60; ++reads) {
+    Characters source(text);
+    Filter filter(source);
+    for (int i = 0; i < reads; ++i) filter.Read();
+    const WideString rest = source.Rest();
+    filter.Close();
+    EXPECT_EQ(filter.Available(), 0u) << reads;
+    EXPECT_EQ(filter.IsEOF() != 0, rest.empty()) << reads;
+    Characters alone(rest);
+    Filter fresh(alone);
+    EXPECT_EQ(ReadAll(filter, 0), ReadAll(fresh, 0)) << reads;
+  }
+}
 
 TEST(UnicodeEscape, EscapesAndMarks) {
   EXPECT_EQ(Escaped(WTEXT("\x00E9")), "\\u00E9");

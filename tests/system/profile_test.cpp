@@ -44,6 +44,16 @@ class Profile : public testing::Test {
   test::Text m_path;
 };
 
+// Values are cut, defaults are not.
+TEST_F(Profile, DefaultsOfAnyLengthComeBackWhole) {
+  for (const int length : {0, 1, 254, 255, 256, 257, 3000}) {
+    SString standard, text;
+    for (int i = 0; i < length; ++i) standard += static_cast<WCHAR>('a' + i % 26);
+    EXPECT_EQ(Section().GetProfile(WTEXT("none"), &text, standard), S_OK);
+    EXPECT_EQ(text, standard) << length;
+  }
+}
+
 TEST_F(Profile, TypedValues) {
   SProfile profile = Section();
   int truth = 9;
