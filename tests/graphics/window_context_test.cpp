@@ -213,17 +213,104 @@ class Grid {
   std::mt19937 m_random{7};
 };
 
+// However often they move before anybody looks.
 TEST_F(WindowContexts, WhatMovesTogetherKeepsItsPixelsOrIsInvalid) {
   ShowWindow(child, SW_HIDE);
   Grid grid(top);
   for (int step = 0; step < 300; ++step) {
     grid.Paint();
-    grid.MoveAll();
+    for (int moves = step % 3; moves >= 0; --moves) grid.MoveAll();
     grid.Check();
     if (HasFatalFailure()) FAIL() << "step " << step;
   }
 }
 #endif
+
+// Windows of which a part is hidden, or the place that it moves to.
+class HiddenParts : public WindowContexts {
+ protected:
+  HWND Make(HWND parent, const SRect& place, DWORD style = 0) {
+    const HWND window =
+        CreateWindowExW(0, WTEXT("WindowContexts"), WTEXT(""), WS_CHILD | WS_VISIBLE | style, place.left, place.top,
+                        place.Width(), place.Height(), parent, nullptr, nullptr, nullptr);
+    Show(window);
+    return window;
+  }
+  // Each pixel that shows tells its place.
+  static void Show(HWND window) {
+    SClientDC dc(window);
+    RECT client;
+    GetClientRect(window, &client);
+    for (int y = 0; y < client.bottom; ++y)
+      for (int x = 0; x < client.right; ++x) dc.SetPixel(SPoint(x, y), Color(x, y));
+    ValidateRect(window, nullptr);
+  }
+  static COLORREF Color(int x, int y) { return RGB(3 * x, 2 * y, 77); }
+  // All that can be seen of the window is as it was painted, or invalid.
+  static void Check(HWND window, const char* what) {
+    const HRGN invalid = CreateRectRgn(0, 0, 0, 0);
+    GetUpdateRgn(window, invalid, FALSE);
+    SClientDC dc(window);
+    RECT client;
+    GetClientRect(window, &client);
+    int valid = 0, wrong = 0;
+    for (int y = 0; y < client.bottom; ++y) {
+      for (int x = 0; x < client.right; ++x) {
+        if (PtInRegion(invalid, x, y) || !dc.RectVisible(SRect(x, y, x + 1, y + 1))) continue;
+        ++valid;
+        wrong += dc.GetPixel(SPoint(x, y)) != Color(x, y);
+      }
+    }
+    DeleteObject(invalid);
+    EXPECT_EQ(wrong, 0) << what << ", of " << valid;
+  }
+  static void Place(HWND window, int x, int y, int width, int height) {
+    SetWindowPos(window, nullptr, x, y, width, height, SWP_NOZORDER | SWP_NOACTIVATE);
+  }
+};
+
+TEST_F(HiddenParts, AreInvalidOnceTheyShow) {
+  ShowWindow(child, SW_HIDE);
+  const HWND edge = Make(top, SRect(90, 60, 150, 120), WS_CLIPSIBLINGS);
+  Place(edge, 20, 10, 60, 60);
+  Check(edge, "was cut by the parent");
+  Show(edge);
+  const HWND above = Make(top, SRect(30, 20, 60, 50), WS_CLIPSIBLINGS);
+  SetWindowPos(above, HWND_TOP, 0, 0, 0, 0, SWP_NOMOVE | SWP_NOSIZE | SWP_NOACTIVATE);
+  Show(edge);
+  Show(above);
+  Place(edge, 55, 30, 60, 60);
+  Check(edge, "was below another one");
+  Check(above, "lies above");
+}
+
+TEST_F(HiddenParts, ComeToLightWithTheParent) {
+  for (const DWORD style : {DWORD{0}, DWORD{WS_CLIPCHILDREN}}) {
+    Place(child, 30, 20, 40, 30);
+    SetWindowLongW(child, GWL_STYLE, static_cast<LONG>(WS_CHILD | WS_VISIBLE | style));
+    const HWND inner = Make(child, SRect(20, 10, 60, 60));
+    Place(child, 30, 20, 70, 60);
+    Check(inner, "the parent grew");
+    DestroyWindow(inner);
+  }
+}
+
+// A frame that shrinks, with a window at its right edge that stays there.
+TEST_F(HiddenParts, TheEdgeOfAShrinkingFrameMovesAlong) {
+  Place(child, 80, 20, 40, 30);
+  Show(child);
+  Place(top, 20, 20, 90, 90);
+  Place(child, 50, 20, 40, 30);
+  Check(child, "its former place is outside");
+}
+
+TEST_F(HiddenParts, ChildrenThatScroll) {
+  Show(child);
+  const HWND other = Make(top, SRect(75, 20, 115, 50));
+  ScrollWindowEx(top, 0, -13, nullptr, nullptr, nullptr, nullptr, SW_SCROLLCHILDREN | SW_INVALIDATE | SW_ERASE);
+  Check(child, "scrolled");
+  Check(other, "scrolled, too");
+}
 
 // What a window hid of another one is nobody's when both have moved.
 TEST_F(WindowContexts, WhatLayBelowAnotherWindowOfABatchIsInvalid) {

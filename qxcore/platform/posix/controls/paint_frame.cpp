@@ -167,16 +167,6 @@ void PopupMenu(HWND window, HMENU menu) {
   OrNoMemory<int>(0, [&] { return PaintPopup(window, menu), 0; });
 }
 
-void MovePixels(HWND window, const RECT& to, int dx, int dy) {
-  const HDC dc = GetWindowDC(window);
-  if (dc == nullptr) return;
-  BitBlt(dc, to.left, to.top, Width(to), Height(to), dc, to.left - dx, to.top - dy, SRCCOPY);
-  ReleaseDC(window, dc);
-  // Children that the style keeps out of the context have not moved along.
-  if (GetWindowLongW(window, GWL_STYLE) & WS_CLIPCHILDREN)
-    RedrawWindow(window, nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_FRAME | RDW_ALLCHILDREN);
-}
-
 }  // namespace
 
 HFONT InterfaceFont() {
@@ -222,7 +212,6 @@ void PaintScrollBar(HDC dc, const RECT& rect, const ScrollBar& bar, bool isVerti
 void InstallPainter() {
   g_painter.nonClient = &NonClient;
   g_painter.popupMenu = &PopupMenu;
-  g_painter.movePixels = &MovePixels;
 }
 
 }  // namespace platform::controls

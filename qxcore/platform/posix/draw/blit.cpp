@@ -194,6 +194,7 @@ BOOL StretchBlt(HDC toHandle, int x, int y, int width, int height, HDC fromHandl
   auto* to = Find<Context>(toHandle);
   auto* from = Find<Context>(fromHandle);
   if (!to || !from || from->m_recorder) return Fail(FALSE, ERROR_INVALID_HANDLE);
+  from->PrepareToRead();
   int left = from->X(fromX), top = from->Y(fromY);
   Rectangle4 origin{left, top, from->X(fromX + fromWidth) - left, from->Y(fromY + fromHeight) - top};
   return StretchFrom(*to, {x, y, width, height}, from->m_surface, from->m_settings, origin, table);

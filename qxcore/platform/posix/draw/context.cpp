@@ -6,6 +6,7 @@
 #include "qxcore/platform/posix/draw/font_object.h"
 #include "qxcore/platform/posix/draw/recorder.h"
 #include "qxcore/platform/posix/draw/stock.h"
+#include "qxcore/platform/posix/window/deferred_copies.h"
 
 namespace draw {
 
@@ -60,6 +61,10 @@ void Context::SetPlayback(double scaleX, double scaleY, double addX, double addY
 void Context::EndPlayback() { SetPlayback(1, 1, 0, 0); }
 
 void Context::ComputeClip() const {
+  if (m_top && !m_wasDrawnOn) {
+    const Box& used = VisibleExtents();
+    platform::model::CopyBefore(m_top, {used.x1, used.y1, used.x2, used.y2});
+  }
   m_wasDrawnOn = true;
   m_clip = m_visible;
   if (m_settings.clipped) {

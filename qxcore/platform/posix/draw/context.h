@@ -92,6 +92,8 @@ class Context final : public Object {
     return m_single ? &m_clip.Extents() : nullptr;
   }
 
+  // Call it before pixels are read; whoever draws asks for the clip region.
+  void PrepareToRead() const { Clip(); }
   // Whether anything may have been drawn: all drawing asks for the clip region.
   bool WasDrawnOn() const { return m_wasDrawnOn; }
   const Box& VisibleExtents() const { return m_visible.Extents(); }

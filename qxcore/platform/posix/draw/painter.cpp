@@ -1,4 +1,5 @@
 // What the window model asks of drawing: contexts, backgrounds, regions, sizes of texts, the caret.
+#include "qxcore/platform/posix/draw/move_pixels.h"
 #include "qxcore/platform/posix/draw/window_surface.h"
 #include "qxcore/platform/posix/window/controls.h"
 
@@ -96,6 +97,8 @@ bool PixelsOf(void* window, platform::ShownPixels* pixels) {
   painter.textSize = TextSize;
   painter.dialogFont = DialogFont;
   painter.pixels = PixelsOf;
+  painter.movePixels = MovePixels;
+  painter.isInUse = IsSurfaceInUse;
   painter.freeSurface = FreeWindowSurface;
   return true;
 }();

@@ -4,6 +4,7 @@
 
 #include "qxcore/platform/posix/draw/fill.h"
 #include "qxcore/platform/posix/draw/window_surface.h"
+#include "qxcore/platform/posix/window/deferred_copies.h"
 #include "qxcore/platform/posix/window/on_display.h"
 #include "qxcore/platform/posix/window/target.h"
 
@@ -25,12 +26,17 @@ Ref<Bitmap> Resized(const Ref<Bitmap>& former, SIZE size) {
   return bitmap;
 }
 
+bool Fits(const Kept& slot, SIZE size) {
+  return slot && slot->m_surface.width == std::max(size.cx, 1) && slot->m_surface.height == std::max(size.cy, 1);
+}
+
 // The bitmap in a top-level window's slot, made or resized as needed; null when there is no memory.
 Ref<Bitmap> SurfaceIn(void** place, SIZE size) {
   if (!*place) *place = new Kept;
   Kept& slot = *static_cast<Kept*>(*place);
-  bool fits = slot && slot->m_surface.width == std::max(size.cx, 1) && slot->m_surface.height == std::max(size.cy, 1);
-  if (!fits) slot = Resized(slot, size);
+  if (Fits(slot, size)) return slot;
+  platform::model::CopyNow();  // from what may be cut off
+  slot = Resized(slot, size);
   return slot;
 }
 
@@ -55,6 +61,19 @@ HDC OpenWindow(HWND window, bool isWhole, const pixman_region32_t* clip) try {
   return EnterAs<HDC>(dc.get());
 } catch (const std::bad_alloc&) {
   return NoMemory(HDC{});
+}
+
+const Surface* GrownSurface(void* surface, SIZE size) {
+  Kept& slot = *static_cast<Kept*>(surface);
+  if (!slot) return nullptr;
+  const SIZE larger{std::max(size.cx, slot->m_surface.width), std::max(size.cy, slot->m_surface.height)};
+  if (!Fits(slot, larger)) slot = Resized(slot, larger);
+  return &slot->m_surface;
+}
+
+bool IsSurfaceInUse(void* surface) {
+  const Kept& slot = *static_cast<Kept*>(surface);
+  return slot && slot->m_references > 1;
 }
 
 void FreeWindowSurface(void* surface) { delete static_cast<Kept*>(surface); }

@@ -13,5 +13,9 @@ HDC OpenWindow(HWND window, bool isWhole, const pixman_region32_t* clip);
 void FreeWindowSurface(void* surface);
 // The pixels behind a top-level window's slot; null before anything was drawn.
 const Surface* WindowSurface(void* surface);
+// The same, at least as large as `size`.
+const Surface* GrownSurface(void* surface, SIZE size);
+// Whether a context draws on it.
+bool IsSurfaceInUse(void* surface);
 
 }  // namespace draw

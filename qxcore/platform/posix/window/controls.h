@@ -5,8 +5,15 @@
 #include <pixman.h>
 
 #include "qxcore/platform/posix/display/display.h"
+#include "qxcore/platform/posix/window/region.h"
 
 namespace platform {
+
+// Pixels that move by (dx, dy) to `to`, all on one surface.
+struct MovedPixels {
+  model::Region to;
+  int dx = 0, dy = 0;
+};
 
 // What `controls` and `draw` fill in. A null entry means that nothing is painted. The functions run without the
 // model's lock.
@@ -21,8 +28,11 @@ struct Painter {
   void (*nonClient)(HWND window) = nullptr;
   // Moves pixels of a window's client area.
   void (*copyPixels)(HWND window, const RECT& from, int dx, int dy) = nullptr;
-  // Moves pixels of a window by (dx, dy) to `to`, which is relative to the window; children move with it.
-  void (*movePixels)(HWND window, const RECT& to, int dx, int dy) = nullptr;
+  // Moves pixels on a top-level window's surface, which is made at least as large as `size` first. None of them is
+  // written over before it was read. False when memory is out: then some may be lost.
+  bool (*movePixels)(HWND top, void* surface, SIZE size, const MovedPixels* moves, std::size_t count) = nullptr;
+  // Whether a context of the surface is open.
+  bool (*isInUse)(void* surface) = nullptr;
   // A menu's popup window; the caret, drawn by inverting; the frame that is dragged.
   void (*popupMenu)(HWND window, HMENU menu) = nullptr;
   void (*caret)(HWND window, const RECT& rect) = nullptr;

@@ -14,18 +14,6 @@
 namespace platform::model {
 namespace {
 
-// What the parents' client areas leave of the window.
-RECT ClipByParents(const Window* window) {
-  RECT clip = AtOrigin(window->window);
-  int dx = window->window.left, dy = window->window.top;
-  for (const Window* above = window->parent; above != nullptr && !IsRoot(above); above = above->parent) {
-    clip = Common(clip, Moved(AtOrigin(above->client), -dx, -dy));
-    dx += above->client.left;
-    dy += above->client.top;
-  }
-  return clip;
-}
-
 // A child's rectangle relative to the parent's window.
 RECT ChildInWindow(const Window* parent, const Window* child) {
   const RECT client = ClientInWindow(parent);
@@ -93,12 +81,8 @@ void SubtractChildren(const Window* window, Region* region) {
 
 void MarkInvalid(Window* window, const Region& region, Erase erase) {
   const RECT client = ClientInWindow(window);
-  Region outside = region;
-  outside.Subtract(client);
-  Region inside = region;
-  inside.Intersect(client);
-  if (!outside.IsEmpty()) window->frameUpdate = true;
-  if (!inside.IsEmpty() && erase == Erase::Yes) window->eraseUpdate = true;
+  if (!Same(Common(region.Bounds(), client), region.Bounds())) window->frameUpdate = true;
+  if (!region.Misses(client) && erase == Erase::Yes) window->eraseUpdate = true;
   window->update.Add(region);
   SetWantsPaint(window, true);
 }
@@ -114,6 +98,17 @@ Region SiblingsAbove(const Window* window) {
 }  // namespace
 
 std::uint64_t g_scene = 1;
+
+RECT ClipByParents(const Window* window) {
+  RECT clip = AtOrigin(window->window);
+  int dx = window->window.left, dy = window->window.top;
+  for (const Window* above = window->parent; above != nullptr && !IsRoot(above); above = above->parent) {
+    clip = Common(clip, Moved(AtOrigin(above->client), -dx, -dy));
+    dx += above->client.left;
+    dy += above->client.top;
+  }
+  return clip;
+}
 
 bool IsUnpainted(const Window* window) {
   return window->firstChild == nullptr && window->wantsPaint && IsAllInvalid(window, ClipByParents(window));
@@ -205,12 +200,12 @@ void SpoilByOrder(Window* window) {
   }
 }
 
-bool Uncover(Window* parent, Region* uncovered) {
+bool Uncover(Window* parent, Region* uncovered, Children children) {
   const RECT client = ClientInWindow(parent);
   uncovered->Move(client.left, client.top);
   uncovered->Intersect(client);
   if (uncovered->IsEmpty()) return false;
-  Invalidate(parent, *uncovered, Erase::Yes, Children::All);
+  Invalidate(parent, *uncovered, Erase::Yes, children);
   return true;
 }
 
@@ -218,7 +213,7 @@ bool UncoverByMove(Window* window, const RECT& oldWindow) {
   if (IsRoot(window->parent)) return false;
   Region uncovered(oldWindow);
   if (IsShown(window)) uncovered.Subtract(window->window);
-  return Uncover(window->parent, &uncovered);
+  return Uncover(window->parent, &uncovered, Children::All);
 }
 
 void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
@@ -231,21 +226,20 @@ void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, b
   }
   const bool sameSize = Width(oldWindow) == Width(whole) && Height(oldWindow) == Height(whole);
   if (sameSize && !(flags & SWP_FRAMECHANGED) && !(flags & SWP_NOCOPYBITS)) return;
-  Region spoiled(whole);
   const UINT classStyle = window->windowClass->style;
   const bool redraws = (flags & SWP_NOCOPYBITS) ||
                        ((classStyle & CS_HREDRAW) && Width(oldClient) != Width(window->client)) ||
                        ((classStyle & CS_VREDRAW) && Height(oldClient) != Height(window->client));
-  if (!redraws) {
-    RECT kept = ClientInWindow(window);
-    kept.right = std::min(kept.right, kept.left + Width(oldClient));
-    kept.bottom = std::min(kept.bottom, kept.top + Height(oldClient));
-    spoiled.Subtract(kept);
-  }
+  RECT kept = ClientInWindow(window);
+  kept.right = std::min(kept.right, kept.left + Width(oldClient));
+  kept.bottom = std::min(kept.bottom, kept.top + Height(oldClient));
   const RECT oldPlace = Moved(oldClient, -oldWindow.left, -oldWindow.top);
   if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return;
-  // Nothing is left of what the children showed, either, when all of the window is given up.
-  Invalidate(window, spoiled, Erase::Yes, flags & SWP_NOCOPYBITS ? Children::All : Children::Unclipped);
+  // Of what the children showed nothing is left outside, and nowhere when all of the window is given up.
+  Region outside(whole);
+  if (!(flags & SWP_NOCOPYBITS)) outside.Subtract(kept);
+  Invalidate(window, outside, Erase::Yes, Children::All);
+  if (redraws) Invalidate(window, Region(whole), Erase::Yes, Children::Unclipped);
 }
 
 // A parent that does not leave its children out paints first; they would be painted over.

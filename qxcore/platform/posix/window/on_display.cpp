@@ -5,6 +5,7 @@
 #include "qxcore/platform/internal/native_path.h"
 #include "qxcore/platform/posix/window/activate.h"
 #include "qxcore/platform/posix/window/controls.h"
+#include "qxcore/platform/posix/window/deferred_copies.h"
 #include "qxcore/platform/posix/window/drop_files.h"
 #include "qxcore/platform/posix/window/frame.h"
 #include "qxcore/platform/posix/window/input.h"
@@ -84,6 +85,7 @@ class Events final : public DisplayEvents {
     if (active != GetActiveWindow() && IsInUse(active)) SetForegroundWindow(active);
   }
   void Exposed(HWND handle) override {
+    CopyNow();
     void* surface = nullptr;
     {
       const Guard guard;

@@ -4,6 +4,7 @@
 
 #include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/default_proc.h"
+#include "qxcore/platform/posix/window/deferred_copies.h"
 #include "qxcore/platform/posix/window/frame.h"
 #include "qxcore/platform/posix/window/send.h"
 #include "qxcore/platform/posix/window/tree.h"
@@ -89,6 +90,7 @@ LRESULT DefaultPaint(HWND handle) {
 
 // While redrawing is off the window counts as hidden, as the system has it.
 LRESULT DefaultSetRedraw(HWND handle, BOOL redraw) {
+  CopyNow();
   const Guard guard;
   Window* window = FindWindowObject(handle);
   if (window == nullptr) return 0;

@@ -31,14 +31,17 @@ void SetWantsPaint(Window* window, bool wants);
 // After a change of place of a window that was shown: what comes to light of the parent and of siblings. Returns
 // whether anything did.
 bool UncoverByMove(Window* window, const RECT& oldWindow);
-// The same for what several children left, relative to the parent's client area; the region is changed.
-bool Uncover(Window* parent, Region* uncovered);
+// The same for what several children left, relative to the parent's client area; the region is changed. `children`: No
+// where none of the others can lie there.
+bool Uncover(Window* parent, Region* uncovered, Children children);
 // After a change of place: what must be painted of the window itself.
 void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags);
 // After a change in the Z order: where the window and its siblings overlap.
 void SpoilByOrder(Window* window);
 // Whether erasing must wait until a parent has been painted.
 bool WaitsForParent(const Window* window);
+// What the parents' client areas leave of the window; relative to it.
+RECT ClipByParents(const Window* window);
 // The part of the window that shows: without what parents cut off and what siblings above and children cover
 // where the styles say so. Relative to the window.
 void VisibleRegion(const Window* window, bool withoutChildren, Region* region);

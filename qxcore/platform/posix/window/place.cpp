@@ -5,10 +5,12 @@
 #include "qxcore/platform/posix/window/activate.h"
 #include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/default_proc.h"
+#include "qxcore/platform/posix/window/deferred_copies.h"
 #include "qxcore/platform/posix/window/on_display.h"
 #include "qxcore/platform/posix/window/paint.h"
 #include "qxcore/platform/posix/window/placing.h"
 #include "qxcore/platform/posix/window/send.h"
+#include "qxcore/platform/posix/window/thread.h"
 #include "qxcore/platform/posix/window/tree.h"
 
 namespace platform::model {
@@ -100,11 +102,35 @@ void Reorder(Window* window, HWND after) {
   if (parent == Desktop() && after == HWND_TOP) RaiseTopLevel(window);
 }
 
+// Where a window has no pixels that could move along: it is hidden there. Windows of a batch have nothing above them.
+Region HiddenPart(const Window* window, Uncovers uncovers) {
+  const RECT whole = AtOrigin(window->window), clip = ClipByParents(window);
+  if (uncovers == Uncovers::Later && Same(whole, clip)) return {};
+  Region hidden(whole), visible(clip);
+  if (uncovers == Uncovers::Now) VisibleRegion(window, false, &visible);
+  hidden.Subtract(visible);
+  return hidden;
+}
+
+// What was hidden moves along, and may show now.
+void SpoilHidden(Window* window, Region hidden, const Placing& placing) {
+  if (hidden.IsEmpty() || !IsShown(window)) return;
+  const NewPlace &from = placing.from, &to = placing.to;
+  const int dx = to.client.left - to.window.left - (from.client.left - from.window.left);
+  const int dy = to.client.top - to.window.top - (from.client.top - from.window.top);
+  hidden.Move(dx, dy);
+  Invalidate(window, hidden, Erase::Yes, Children::All);
+}
+
 // Under the lock: the change itself, and what of the screen it spoils.
 void Apply(Window* window, Placing& placing, Uncovers uncovers) {
   WINDOWPOS& place = placing.place;
   const NewPlace& to = placing.to;
   const RECT oldClient = window->client;
+  const bool moves = window->window.left != to.window.left || window->window.top != to.window.top;
+  const bool takesPixels = moves && window->IsChild() && IsShown(window) && !(place.flags & SWP_NOREDRAW);
+  Region hidden;
+  if (takesPixels) hidden = HiddenPart(window, uncovers);
   placing.from = {window->window, window->client};
   placing.wasShown = IsShown(window);
   placing.isUnpainted = IsUnpainted(window);
@@ -121,8 +147,22 @@ void Apply(Window* window, Placing& placing, Uncovers uncovers) {
   if (Width(oldClient) == Width(to.client) && Height(oldClient) == Height(to.client)) place.flags |= kNoClientSize;
   if (place.flags & SWP_NOREDRAW) return;
   if (placing.wasShown && uncovers == Uncovers::Now) placing.spoilsParent = UncoverByMove(window, placing.from.window);
+  SpoilHidden(window, std::move(hidden), placing);
   SpoilByMove(window, placing.from.window, oldClient, placing.wasShown, place.flags);
   placing.isUnpainted |= IsUnpainted(window);
+}
+
+// Whether pixels that wait to be copied would be looked for in the wrong place afterwards. In a batch, siblings may
+// move.
+bool MovesOthers(const Placing& placing, Uncovers uncovers) {
+  const DeferredCopies& deferred = CurrentThread()->deferredCopies;
+  if (deferred.copies.empty()) return false;
+  const Guard guard;
+  const Window* window = FindWindowObject(placing.place.hwnd);
+  if (window == nullptr) return false;
+  if (uncovers == Uncovers::Later && HandleOf(window->parent) == deferred.parent) return false;
+  const RECT &from = window->client, &to = placing.to.client;
+  return from.left != to.left || from.top != to.top || placing.place.flags & (SWP_SHOWWINDOW | SWP_HIDEWINDOW);
 }
 
 HWND ParentHandle(HWND handle) {
@@ -131,37 +171,7 @@ HWND ParentHandle(HWND handle) {
   return window != nullptr && window->IsChild() ? HandleOf(window->parent) : nullptr;
 }
 
-// What of the window's pixels stays valid moves along: all of it when it only moved, else the part of the client
-// area that was and is there. The surface is the top-level window's and moves with it.
-PixelMove MoveOfPixels(HWND handle, const NewPlace& from, const NewPlace& to) {
-  const bool isChild = !IsTopLevel(handle);
-  int dx = isChild ? to.window.left - from.window.left : 0;
-  int dy = isChild ? to.window.top - from.window.top : 0;
-  const RECT oldClient = Moved(from.client, -from.window.left, -from.window.top);
-  RECT kept = Moved(to.client, -to.window.left, -to.window.top);
-  const bool isSame =
-      Same(oldClient, kept) && Width(from.window) == Width(to.window) && Height(from.window) == Height(to.window);
-  if (isSame) {
-    kept = AtOrigin(to.window);
-  } else {
-    dx += kept.left - oldClient.left;
-    dy += kept.top - oldClient.top;
-    kept.right = std::min(kept.right, kept.left + Width(oldClient));
-    kept.bottom = std::min(kept.bottom, kept.top + Height(oldClient));
-  }
-  return {handle, kept, Moved(kept, to.window.left, to.window.top), dx, dy};
-}
-
 }  // namespace
-
-PixelMove KeptPixels(const Placing& placing) {
-  constexpr UINT kNothingStays = SWP_NOCOPYBITS | SWP_SHOWWINDOW | SWP_HIDEWINDOW;
-  const HWND handle = placing.place.hwnd;
-  if (g_painter.movePixels == nullptr || placing.isUnpainted || placing.place.flags & kNothingStays) return {};
-  if (!IsWindowVisible(handle)) return {};
-  const PixelMove move = MoveOfPixels(handle, placing.from, placing.to);
-  return move.dx != 0 || move.dy != 0 ? move : PixelMove{};
-}
 
 bool Begin(Placing& placing, Uncovers uncovers) {
   WINDOWPOS& place = placing.place;
@@ -174,6 +184,7 @@ bool Begin(Placing& placing, Uncovers uncovers) {
     Settle(window, place);
   }
   placing.to = Measure(handle, place);
+  if (MovesOthers(placing, uncovers)) CopyNow();
   const Guard guard;
   Window* window = Expect(handle);
   if (window == nullptr) return false;
@@ -204,8 +215,7 @@ bool Finish(Placing& placing) {
 
 bool PlaceNow(Placing& placing) {
   if (!Begin(placing, Uncovers::Now)) return false;
-  const PixelMove move = KeptPixels(placing);
-  if (move.window != nullptr) g_painter.movePixels(move.window, move.to, move.dx, move.dy);
+  if (CopyLater(placing)) CopyNow();
   return Finish(placing);
 }
 

@@ -3,89 +3,75 @@
 #include <algorithm>
 
 #include "qxcore/platform/posix/window/controls.h"
+#include "qxcore/platform/posix/window/deferred_copies.h"
 #include "qxcore/platform/posix/window/paint.h"
-#include "qxcore/platform/posix/window/placing.h"
+#include "qxcore/platform/posix/window/thread.h"
+#include "qxcore/platform/posix/window/tree.h"
 
 namespace platform::model {
 namespace {
 
+int g_batches = 0;  // under the lock
+
 struct Batch : OnModelHeap {
+  Batch() { ++g_batches; }
+  ~Batch() { --g_batches; }
+  Batch(const Batch&) = delete;
+  Batch& operator=(const Batch&) = delete;
+
   List<Placing> placings;
-  // For the end of windows that move together; their room is made at the beginning.
-  List<PixelMove> moves;
+  // For windows that move together; their room is made at the beginning.
   List<pixman_box32_t> left, taken;
 };
 
 pixman_box32_t BoxOf(const RECT& rect) { return {rect.left, rect.top, rect.right, rect.bottom}; }
 
+std::size_t CountShownChildren(const Window* parent) {
+  std::size_t count = 0;
+  for (const Window* child = parent->firstChild; child != nullptr; child = child->next) count += child->IsVisible();
+  return count;
+}
+
 // Under the lock: what comes to light of the parent when all are in their new places. Where one window made room for
-// another, nothing does. The windows of a batch have one parent, as published; another one uncovers for itself.
+// another, nothing does.
 void UncoverTogether(Batch* batch) {
-  auto& [placings, moves, left, taken] = *batch;
+  auto &left = batch->left, &taken = batch->taken;
   Window* parent = nullptr;
-  for (const Placing& placing : placings) {
+  for (const Placing& placing : batch->placings) {
     Window* window = placing.isDone ? FindWindowObject(placing.place.hwnd) : nullptr;
     if (window == nullptr || !placing.wasShown || placing.place.flags & SWP_NOREDRAW) continue;
-    if (parent == nullptr && !IsRoot(window->parent)) parent = window->parent;
-    if (window->parent != parent) {
-      UncoverByMove(window, placing.from.window);
-      continue;
-    }
+    parent = window->parent;
     left.push_back(BoxOf(placing.from.window));
     if (IsShown(window)) taken.push_back(BoxOf(window->window));
   }
-  if (parent == nullptr) return;
+  if (parent == nullptr || IsRoot(parent)) return;
   Region uncovered(left.data(), left.size());
   uncovered.Subtract(Region(taken.data(), taken.size()));
-  Uncover(parent, &uncovered);
+  Uncover(parent, &uncovered, CountShownChildren(parent) == taken.size() ? Children::No : Children::All);
 }
 
-bool Meets(const RECT& a, const RECT& b) {
-  return a.left < b.right && b.left < a.right && a.top < b.bottom && b.top < a.bottom;
-}
-
-// Whether the pixels of `moves[at]` are written over before they are read, when all move in their order.
-bool IsOverwritten(const List<PixelMove>& moves, std::size_t at) {
-  const RECT source = Moved(moves[at].target, -moves[at].dx, -moves[at].dy);
-  for (std::size_t i = 0; i < at; ++i)
-    if (Meets(moves[i].target, source)) return true;
-  return false;
-}
-
-bool IsAnyOverwritten(const List<PixelMove>& moves) {
-  for (std::size_t at = 1; at < moves.size(); ++at)
-    if (IsOverwritten(moves, at)) return true;
-  return false;
-}
-
-// In a grid that shrinks each window moves to where the one before it was; in one that grows, the last must move first.
-// A window whose pixels are lost either way is painted anew.
-void MoveTogether(List<PixelMove>& moves) {
-  const bool goesBack = IsAnyOverwritten(moves);
-  if (goesBack) std::reverse(moves.begin(), moves.end());
-  for (std::size_t at = 0; at < moves.size(); ++at) {
-    const PixelMove& move = moves[at];
-    if (goesBack && IsOverwritten(moves, at)) {
-      RedrawWindow(move.window, nullptr, nullptr, RDW_INVALIDATE | RDW_ERASE | RDW_FRAME | RDW_ALLCHILDREN);
-    } else {
-      g_painter.movePixels(move.window, move.to, move.dx, move.dy);
-    }
+// A context that is open would draw where pixels wait.
+void CopyIfInUse(HWND handle) {
+  void* surface = nullptr;
+  {
+    const Guard guard;
+    if (Window* window = FindWindowObject(handle)) surface = TopLevelOf(window)->surface;
   }
+  if (surface != nullptr && g_painter.isInUse != nullptr && g_painter.isInUse(surface)) CopyNow();
 }
 
 // Windows that may be erased later change the screen once, all together, before they hear of it.
 bool PlaceTogether(Batch* batch) {
   bool isDone = true;
-  for (Placing& placing : batch->placings) isDone &= Begin(placing, Uncovers::Later);
+  for (Placing& placing : batch->placings) {
+    isDone &= Begin(placing, Uncovers::Later);
+    if (placing.isDone) CopyLater(placing);
+  }
   {
     const Guard guard;
     UncoverTogether(batch);
   }
-  for (const Placing& placing : batch->placings) {
-    const PixelMove move = placing.isDone ? KeptPixels(placing) : PixelMove{};
-    if (move.window != nullptr) batch->moves.push_back(move);
-  }
-  MoveTogether(batch->moves);
+  CopyIfInUse(CurrentThread()->deferredCopies.parent);
   for (Placing& placing : batch->placings) isDone &= placing.isDone && IsWindow(placing.place.hwnd) && Finish(placing);
   return isDone;
 }
@@ -96,26 +82,30 @@ bool PlaceOneByOne(Batch* batch) {
   return isDone;
 }
 
-bool MakeRoom(Batch* batch) {
-  return OrNoMemory<bool>(false, [batch] {
-    const std::size_t count = batch->placings.size();
-    batch->moves.reserve(count);
-    batch->left.reserve(count);
-    batch->taken.reserve(count);
-    return true;
-  });
+// The parent of the windows, which is one as published; null where it is not, and for none.
+const Window* ParentOf(const Batch& batch) {
+  const Window* parent = nullptr;
+  for (const Placing& placing : batch.placings) {
+    const Window* window = FindWindowObject(placing.place.hwnd);
+    if (window == nullptr) continue;
+    if (parent != nullptr && window->parent != parent) return nullptr;
+    parent = window->parent;
+  }
+  return parent;
 }
 
-// Whether no window hides a part of another one. What it hid could not be told any more once both have moved.
-bool AreApart(Batch* batch) {
-  const Guard guard;
+// Whether the children of the windows' parent, and the parent itself, lie clear of all others. What one hid of another
+// could not be told any more once both have moved.
+bool AreApart(Batch* batch, const Window* parent) {
   List<pixman_box32_t>& places = batch->left;
+  Region visible;
+  VisibleRegion(parent, false, &visible);
+  if (!visible.Covers(visible.Bounds())) return false;
   long long sum = 0;
-  for (const Placing& placing : batch->placings) {
-    const Window* window = FindWindowObject(placing.place.hwnd);
-    if (window == nullptr || !IsShown(window)) continue;
+  for (const Window* window = parent->firstChild; window != nullptr; window = window->next) {
+    if (!window->IsVisible()) continue;
     places.push_back(BoxOf(window->window));
-    sum += Region(window->window).Area();
+    sum += static_cast<long long>(Width(window->window)) * Height(window->window);
   }
   const bool areApart = Region(places.data(), places.size()).Area() == sum;
   places.clear();
@@ -125,6 +115,38 @@ bool AreApart(Batch* batch) {
 bool MayEraseLater(const Batch& batch) {
   return std::all_of(batch.placings.begin(), batch.placings.end(),
                      [](const Placing& placing) { return (placing.place.flags & SWP_DEFERERASE) != 0; });
+}
+
+bool CanMoveTogether(Batch* batch) {
+  if (!MayEraseLater(*batch)) return false;
+  return OrNoMemory<bool>(false, [batch] {
+    const Guard guard;
+    batch->left.reserve(batch->placings.size());
+    batch->taken.reserve(batch->placings.size());
+    const Window* parent = ParentOf(*batch);
+    if (parent == nullptr || IsRoot(parent)) return false;
+    return AreApart(batch, parent);
+  });
+}
+
+// The request for a window that is in the batch already; null for the first one. Every pane of a large splitter asks.
+WINDOWPOS* FormerRequest(Batch& batch, const Window* window) {
+  List<Placing>& placings = batch.placings;
+  const auto isOf = [window](const Placing& placing) { return placing.place.hwnd == window->handle; };
+  if (window->placing < placings.size() && isOf(placings[window->placing])) return &placings[window->placing].place;
+  if (g_batches == 1) return nullptr;  // no other batch had the window since
+  const auto found = std::find_if(placings.begin(), placings.end(), isOf);
+  return found != placings.end() ? &found->place : nullptr;
+}
+
+void Join(WINDOWPOS& place, const WINDOWPOS& later) {
+  const UINT flags = later.flags;
+  if (!(flags & SWP_NOZORDER)) place.hwndInsertAfter = later.hwndInsertAfter;
+  if (!(flags & SWP_NOMOVE)) place.x = later.x, place.y = later.y;
+  if (!(flags & SWP_NOSIZE)) place.cx = later.cx, place.cy = later.cy;
+  constexpr UINT kDenials =
+      SWP_NOSIZE | SWP_NOMOVE | SWP_NOZORDER | SWP_NOREDRAW | SWP_NOACTIVATE | SWP_NOCOPYBITS | SWP_NOOWNERZORDER;
+  place.flags = (place.flags & flags & kDenials) | ((place.flags | flags) & ~kDenials);
 }
 
 }  // namespace
@@ -156,20 +178,16 @@ HDWP DeferWindowPos(HDWP handle, HWND window, HWND after, int x, int y, int widt
     delete static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
     return Fail<HDWP>(error);
   };
-  if (FindWindowObject(window) == nullptr) return end(ERROR_INVALID_WINDOW_HANDLE);
-  for (Placing& placing : batch->placings) {
-    WINDOWPOS& place = placing.place;
-    if (place.hwnd != window) continue;
-    if (!(flags & SWP_NOZORDER)) place.hwndInsertAfter = after;
-    if (!(flags & SWP_NOMOVE)) place.x = x, place.y = y;
-    if (!(flags & SWP_NOSIZE)) place.cx = width, place.cy = height;
-    constexpr UINT kDenials =
-        SWP_NOSIZE | SWP_NOMOVE | SWP_NOZORDER | SWP_NOREDRAW | SWP_NOACTIVATE | SWP_NOCOPYBITS | SWP_NOOWNERZORDER;
-    place.flags = (place.flags & flags & kDenials) | ((place.flags | flags) & ~kDenials);
+  Window* object = FindWindowObject(window);
+  if (object == nullptr) return end(ERROR_INVALID_WINDOW_HANDLE);
+  const WINDOWPOS request{window, after, x, y, width, height, flags};
+  if (WINDOWPOS* former = FormerRequest(*batch, object)) {
+    Join(*former, request);
     return handle;
   }
   try {
-    batch->placings.push_back({{window, after, x, y, width, height, flags}});
+    object->placing = batch->placings.size();
+    batch->placings.push_back({request});
     return handle;
   } catch (const std::bad_alloc&) {
     return end(ERROR_NOT_ENOUGH_MEMORY);
@@ -183,8 +201,8 @@ BOOL EndDeferWindowPos(HDWP handle) {
     batch = static_cast<Batch*>(RemoveObject(Kind::Batch, handle));
   }
   if (batch == nullptr) return Fail(ERROR_INVALID_DWP_HANDLE);
-  const bool movesTogether = MayEraseLater(*batch) && MakeRoom(batch) && AreApart(batch);
-  const BOOL result = movesTogether ? PlaceTogether(batch) : PlaceOneByOne(batch);
+  const BOOL result = CanMoveTogether(batch) ? PlaceTogether(batch) : PlaceOneByOne(batch);
+  const Guard guard;
   delete batch;
   return result;
 }

@@ -19,24 +19,14 @@ struct Placing {
 
 enum class Uncovers { Now, Later };
 
-// The first half: the window is in its new place, and its pixels are in the old one. What it left comes to light now,
+// The first half: the window is in its new place, and its pixels are where they were. What it left comes to light now,
 // or the caller sees to that. False when there is no such window any more.
 bool Begin(Placing& placing, Uncovers uncovers);
 
 // The second half: the display, activation, what must be erased at once, and what the window hears of it.
 bool Finish(Placing& placing);
 
-// Pixels of a window that move along by (dx, dy). `to` is relative to the window, `target` to its parent's client area.
-struct PixelMove {
-  HWND window;
-  RECT to, target;
-  int dx, dy;
-};
-
 // Both halves, and the pixels between them.
 bool PlaceNow(Placing& placing);
-
-// What of its pixels stays valid between the halves; no window for nothing.
-PixelMove KeptPixels(const Placing& placing);
 
 }  // namespace platform::model

@@ -4,6 +4,7 @@
 #include <chrono>
 
 #include "qxcore/platform/posix/display/display.h"
+#include "qxcore/platform/posix/window/deferred_copies.h"
 #include "qxcore/platform/posix/window/send.h"
 #include "qxcore/platform/posix/window/tree.h"
 
@@ -52,6 +53,7 @@ void WaitForWake(Thread* thread, const std::uint64_t* due) {
   if (TheDisplay().Serves(thread->id)) {
     if (!thread->isWoken) {
       const Unguarded unguarded;
+      CopyNow();  // what is shown must be complete while nothing happens
       TheDisplay().Wait(wait);
     }
   } else {

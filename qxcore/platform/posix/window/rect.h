@@ -24,6 +24,9 @@ inline RECT Common(const RECT& a, const RECT& b) {
                   std::min(a.bottom, b.bottom)};
   return both.left < both.right && both.top < both.bottom ? both : RECT{};
 }
+inline RECT Around(const RECT& a, const RECT& b) {
+  return {std::min(a.left, b.left), std::min(a.top, b.top), std::max(a.right, b.right), std::max(a.bottom, b.bottom)};
+}
 inline bool IsEmpty(const RECT& rect) { return rect.left >= rect.right || rect.top >= rect.bottom; }
 inline RECT Inflated(const RECT& rect, int dx, int dy) {
   return {rect.left - dx, rect.top - dy, rect.right + dx, rect.bottom + dy};

@@ -5,6 +5,7 @@
 #include <condition_variable>
 #include <deque>
 
+#include "qxcore/platform/posix/window/deferred_copies.h"
 #include "qxcore/platform/posix/window/window.h"
 
 namespace platform::model {
@@ -112,6 +113,7 @@ struct Thread {
 
   std::atomic<Hook*> hooks[2] = {};  // WH_CBT, WH_CALLWNDPROC; the newest first; written under the lock
   HHOOK nextHook = nullptr;          // where CallNextHookEx goes on; the thread's own
+  DeferredCopies deferredCopies;     // the thread's own
   DWORD messageTime = 0;
   POINT messagePoint{};
   LPARAM messageExtra = 0;

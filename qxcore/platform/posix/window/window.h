@@ -71,6 +71,10 @@ struct Window : OnModelHeap {
   int childPaints = 0;                  // windows below this one, itself included, that want WM_PAINT
   std::uint64_t childrenInvalidAt = 0;  // the scene (paint.h) in which nothing could be added to what is below
 
+  // Numbers in lists that may have been given up since: what stands there names its window.
+  std::size_t placing = 0;       // in the last batch
+  std::size_t deferredCopy = 0;  // among its thread's (deferred_copies.h)
+
   bool isDialog = false;
   bool isActiveFrame = false;        // the state of the caption, by WM_NCACTIVATE
   bool isDestroyed = false;          // WM_DESTROY has been sent
