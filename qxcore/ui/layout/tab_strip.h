@@ -6,7 +6,7 @@
 // For the user-interface thread.
 #pragma once
 
-#include "qxcore/core/memory.h"
+#include "qxcore/container/node_pool.h"
 #include "qxcore/graphics/rect.h"
 #include "qxcore/string/string.h"
 
@@ -21,9 +21,9 @@ struct STab {
   SRect m_drawn;             // where it was painted last; empty when it was not visible
   SRect m_textArea;          // the same of its text
 
-  // The library's memory; throws SEOutOfMemory.
-  static void* operator new(std::size_t size) { return SMemAlloc(size); }
-  static void operator delete(void* block) noexcept { SMemFree(block); }
+  // From the pools of nodes; throws SEOutOfMemory.
+  static void* operator new(std::size_t size) { return SNodePools::Alloc(size, alignof(STab)); }
+  static void operator delete(void* tab, std::size_t size) noexcept { SNodePools::Free(tab, size, alignof(STab)); }
 };
 
 // The tabs, and what their places depend on.
