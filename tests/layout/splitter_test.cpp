@@ -504,6 +504,58 @@ TEST_F(Splitters, SizesFollowTheDpi) {
   EXPECT_EQ(m_splitter.Pane(0, 1).left, 59);
 }
 
+// There and back everything is as it was: places, minima, the collapsed pane, and the state that a program keeps.
+TEST_F(Splitters, TheFormerDpiBringsTheFormerSizes) {
+  MakeStatic(2, 3, WS_HSCROLL | WS_VSCROLL);
+  m_splitter.SetColumnInfo(0, 61, 11);
+  m_splitter.SetColumnInfo(1, 83, 15);
+  m_splitter.SetRowInfo(0, 95, 21);
+  m_splitter.RecalcLayout();
+  ASSERT_TRUE(m_splitter.ToggleBar(kSHitColumnBar + 1));
+  for (const int keepsRatio : {0, 1}) {
+    m_splitter.SetKeepPaneRatio(keepsRatio);
+    m_splitter.RecalcLayout();
+    const SString state = m_splitter.GetState();
+    const std::vector<int> widths = Widths(), heights = Heights();
+    m_frame->SendMessageW(WM_DPICHANGED, MAKEWPARAM(192, 192));
+    EXPECT_EQ(m_splitter.GetState().Left(15), SString(WTEXT("splitter 1 192 ")));
+    EXPECT_EQ(m_splitter.Pane(1, 1).top - m_splitter.Pane(0, 0).bottom, 14);
+    int ideal = 0, minimum = 0;
+    m_splitter.GetColumnInfo(0, &ideal, &minimum);
+    EXPECT_EQ(minimum, 22);
+    if (!keepsRatio) {
+      EXPECT_EQ(Widths()[0], 2 * widths[0]);
+    }
+    m_frame->SendMessageW(WM_DPICHANGED, MAKEWPARAM(96, 96));
+    EXPECT_EQ(m_splitter.GetState(), state);
+    EXPECT_EQ(Widths(), widths);
+    EXPECT_EQ(Heights(), heights);
+    ExpectPanesInPlace();
+  }
+}
+
+// Below a window that is not the library's nobody passes the change on; the system tells each child.
+TEST_F(Splitters, BelowAnotherWindowTheSystemTellsOfTheDpi) {
+  constexpr UINT kAfterParent = 0x02E3;  // WM_DPICHANGED_AFTERPARENT
+  const auto gap = [](const Splitter& splitter) { return splitter.Pane(0, 1).left - splitter.Pane(0, 0).right; };
+  const HWND parent = ::CreateWindowExW(0, WTEXT("STATIC"), nullptr, WS_POPUP | WS_VISIBLE, 0, 0, 400, 300, nullptr,
+                                        nullptr, nullptr, nullptr);
+  Splitter splitter;
+  ASSERT_TRUE(splitter.CreateStatic(SWnd::FromHandle(parent), 1, 2));
+  for (int i = 0; i < 2; ++i) splitter.AddPane(0, i, &test::PaneView::classPaneView, SSize(50, 40));
+  splitter.MoveWindow(SRect(0, 0, 400, 300));
+  splitter.SendMessageW(WM_DPICHANGED, MAKEWPARAM(192, 192));
+  EXPECT_EQ(gap(splitter), 14);
+  splitter.SendMessageW(kAfterParent);
+  EXPECT_EQ(gap(splitter), ::MulDiv(7, static_cast<int>(::GetDpiForWindow(splitter.m_hWnd)), 96));
+  ::DestroyWindow(parent);
+
+  MakeStatic(1, 2);
+  m_frame->SendMessageW(WM_DPICHANGED, MAKEWPARAM(192, 192));
+  m_splitter.SendMessageW(kAfterParent);
+  EXPECT_EQ(gap(m_splitter), 14) << "the frame has passed it on";
+}
+
 // A collapsed pane opens again to the size that it had, in pixels of the new resolution.
 TEST_F(Splitters, CollapsedPanesFollowTheDpi) {
   MakeStatic(1, 2);

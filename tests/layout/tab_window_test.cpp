@@ -319,4 +319,24 @@ TEST_F(TabWindows, SizesFollowTheDpi) {
   EXPECT_EQ(Place(0xEA00).left, 212);
 }
 
+// There and back everything is as it was, and so is the state that a program keeps.
+TEST_F(TabWindows, TheFormerDpiBringsTheFormerPlaces) {
+  Add(WTEXT("one"));
+  Add(WTEXT("two"));
+  m_tabs.ActivateTab(1);
+  m_tabs.SetBeamWidth(137);
+  const SString state = m_tabs.GetState();
+  std::vector<SRect> places;
+  for (const UINT id : {0xE900, 0xE901, 0xEA00, 0xEA01, 0xEA10, 0xEA20}) places.push_back(Place(id));
+  const int width = m_tabs.GetTabBeam()->GetTabWidth(1);
+  m_frame->SendMessageW(WM_DPICHANGED, MAKEWPARAM(192, 192));
+  EXPECT_EQ(m_tabs.GetState(), state) << "a share of the strip is no number of pixels";
+  EXPECT_GT(m_tabs.GetTabBeam()->GetTabWidth(1), width);
+  m_frame->SendMessageW(WM_DPICHANGED, MAKEWPARAM(96, 96));
+  EXPECT_EQ(m_tabs.GetState(), state);
+  EXPECT_EQ(m_tabs.GetTabBeam()->GetTabWidth(1), width);
+  std::size_t next = 0;
+  for (const UINT id : {0xE900, 0xE901, 0xEA00, 0xEA01, 0xEA10, 0xEA20}) EXPECT_EQ(Place(id), places[next++]) << id;
+}
+
 }  // namespace

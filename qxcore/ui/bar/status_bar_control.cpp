@@ -15,6 +15,7 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(
     reflected<WM_DRAWITEM, &SStatusBar::DrawItem>(), on<WM_SETTEXT, &SStatusBar::OnSetText>(),
     on<WM_GETTEXT, &SStatusBar::OnGetText>(), on<WM_GETTEXTLENGTH, &SStatusBar::OnGetTextLength>(),
     on<SB_SETMINHEIGHT, &SStatusBar::OnSetMinHeight>(), on<WM_DPICHANGED, &SStatusBar::OnDpiChanged>(),
+    on<0x02E3 /* WM_DPICHANGED_AFTERPARENT */, &SStatusBar::OnDpiChangedAfterParent>(),
     on<WM_SETTINGCHANGE, &SStatusBar::OnSettingChange>(), on<WM_GETOBJECT, &SStatusBar::OnGetObject>())
 
 namespace {

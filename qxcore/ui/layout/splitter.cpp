@@ -23,7 +23,9 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(
     on<WM_PARENTNOTIFY, &SSplitterWnd::OnParentNotify>(), on<WM_HSCROLL, &SSplitterWnd::OnHScroll>(),
     on<WM_VSCROLL, &SSplitterWnd::OnVScroll>(), on<WM_SYSCOMMAND, &SSplitterWnd::OnSysCommand>(),
     on<WM_DISPLAYCHANGE, &SSplitterWnd::OnDisplayChange>(), on<WM_SYSCOLORCHANGE, &SSplitterWnd::OnSysColorChange>(),
-    on<0x02E0 /* WM_DPICHANGED */, &SSplitterWnd::OnDpiChanged>(), on<WM_GETOBJECT, &SSplitterWnd::OnGetObject>())
+    on<0x02E0 /* WM_DPICHANGED */, &SSplitterWnd::OnDpiChanged>(),
+    on<0x02E3 /* WM_DPICHANGED_AFTERPARENT */, &SSplitterWnd::OnDpiChangedAfterParent>(),
+    on<WM_GETOBJECT, &SSplitterWnd::OnGetObject>())
 
 SSplitterWnd::SSplitterWnd() { m_panes.GrowTo(5); }
 SSplitterWnd::~SSplitterWnd() = default;

@@ -19,6 +19,7 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(
     on<WM_SETFOCUS, &STabBeam::OnSetFocus>(), on<WM_KILLFOCUS, &STabBeam::OnKillFocus>(),
     on<WM_SETFONT, &STabBeam::OnSetFont>(), on<WM_SYSCOLORCHANGE, &STabBeam::OnSysColorChange>(),
     on<WM_SETTINGCHANGE, &STabBeam::OnWinIniChange>(), on<0x02E0 /* WM_DPICHANGED */, &STabBeam::OnDpiChanged>(),
+    on<0x02E3 /* WM_DPICHANGED_AFTERPARENT */, &STabBeam::OnDpiChangedAfterParent>(),
     on<WM_GETOBJECT, &STabBeam::OnGetObject>())
 
 STabBeam::STabBeam() = default;

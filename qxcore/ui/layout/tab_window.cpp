@@ -24,8 +24,9 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(
     on<WM_PARENTNOTIFY, &STabWnd::OnParentNotify>(), on<WM_HSCROLL, &STabWnd::OnHScroll>(),
     on<WM_VSCROLL, &STabWnd::OnVScroll>(), on<WM_SYSCOMMAND, &STabWnd::OnSysCommand>(),
     on<WM_SYSCOLORCHANGE, &STabWnd::OnSysColorChange>(), on<WM_SETTINGCHANGE, &STabWnd::OnSettingChange>(),
-    on<0x02E0 /* WM_DPICHANGED */, &STabWnd::OnDpiChanged>(), on<kSMsgTabSetCurrent, &STabWnd::OnTabSetCurrent>(),
-    notify<kSTabBeamId, kSTabChanging, &STabWnd::OnTabChanging>(),
+    on<0x02E0 /* WM_DPICHANGED */, &STabWnd::OnDpiChanged>(),
+    on<0x02E3 /* WM_DPICHANGED_AFTERPARENT */, &STabWnd::OnDpiChangedAfterParent>(),
+    on<kSMsgTabSetCurrent, &STabWnd::OnTabSetCurrent>(), notify<kSTabBeamId, kSTabChanging, &STabWnd::OnTabChanging>(),
     notify<kSTabBeamId, kSTabChanged, &STabWnd::OnTabChanged>())
 
 STabWnd::STabWnd() { ReadMetrics(96); }

@@ -256,6 +256,9 @@ class QXCORE_API SWnd : public SCmdTarget {
   // A top-level window reads the interface's metrics again and passes the change to its descendants.
   void OnSysColorChange();
   LRESULT OnDpiChanged(WPARAM wParam, LPARAM lParam);
+  // For a class whose sizes follow the DPI, as the handler of WM_DPICHANGED_AFTERPARENT: below a window that is not the
+  // library's, sends the window the WM_DPICHANGED that nobody else passes on.
+  LRESULT OnDpiChangedAfterParent(WPARAM wParam, LPARAM lParam);
   void OnSettingChange(UINT what, LPCWSTR area);
   void OnFontChange();
   void OnThemeChanged();

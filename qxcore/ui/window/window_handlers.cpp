@@ -198,6 +198,15 @@ LRESULT SWnd::OnDpiChanged(WPARAM wParam, LPARAM) {
   return FromHandlePermanent(window) == this ? Default() : 0;
 }
 
+// A top-level window of the library has passed WM_DPICHANGED on. Another one does not, but the system tells each of its
+// children.
+LRESULT SWnd::OnDpiChangedAfterParent(WPARAM, LPARAM) {
+  if (FromHandlePermanent(::GetAncestor(m_hWnd, GA_ROOT)) != nullptr) return Default();
+  const UINT dpi = ::GetDpiForWindow(m_hWnd);
+  SUpdateUISysData(static_cast<int>(dpi));
+  return SendMessageW(WM_DPICHANGED, MAKEWPARAM(dpi, dpi));
+}
+
 // --- the state of menu items ---
 
 // Every item is asked for before it is shown. An item that opens a menu with commands of its own is left alone.
