@@ -128,10 +128,17 @@ class FilesTest(ToolCase):
         self.assertEqual(result.returncode, 1)
         self.assertEqual([native(line) for line in result.stdout.decode("utf-8").splitlines()], list(self.paths("b/seen")))
         self.assertEqual(errors.count("\n"), 1, errors)
-        self.assertIn("dddd: ", errors)
+        self.assertRegex(errors, "^qxtool: [^ ]*\\.\\.\\.[^ ]*dddd: the path is too long; a folder's may have 255 characters\n$")
+        self.assertLess(len(errors), 220)
         report = json.loads(self.run_tool("find", "--json", ".").stdout.decode("utf-8"))
         self.assertEqual((len(report["entries"]), len(report["errors"])), (1, 1))
-        self.assertIn("incorrect", report["errors"][0]["error"])
+        self.assertIn("too long", report["errors"][0]["error"])
+        self.assertGreater(len(report["errors"][0]["folder"]), 255)
+        named = ("d" * 40 + "/") * 8
+        for words in (["find", named], ["convert", "--to", "UTF-8", "--recursive", "--in-place", named]):
+            self.assert_one_line(self.run_tool(*words), 1, "...", "the path is too long")
+        self.assert_one_line(self.run_tool("convert", "--to", "UTF-8", "--recursive", "--in-place", "d" * 40), 1, "...",
+                             "the path is too long")
 
     def test_interruption_ends_a_walk(self):
         process = subprocess.Popen(TOOL + ["find", "/"], stdout=subprocess.PIPE, stderr=subprocess.PIPE)
@@ -167,7 +174,7 @@ class FilesTest(ToolCase):
     def test_wrong_usage(self):
         self.make("file")
         for arguments, code, word in ((["find"], 2, "DIR"), (["find", "none"], 1, "no such folder"),
-                                      (["find", "file"], 1, "no such folder"), (["find", ".", "--match", "x"], 2, "--match"),
+                                      (["find", "file"], 1, "it is no folder"), (["find", ".", "--match", "x"], 2, "--match"),
                                       (["find", ".", "--reject", "0x"], 2, "--reject"), (["find", ".", "s/*.c"], 2, "s/*.c"),
                                       (["sort", "none"], 1, "none"), (["sort", "--by", "size", "file"], 2, "--by"),
                                       (["sort", "--by", "length", "--ignore-case", "file"], 2, "--ignore-case"),

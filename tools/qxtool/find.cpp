@@ -10,6 +10,7 @@
 #include "tools/common/failure.h"
 #include "tools/common/progress_bar.h"
 #include "tools/common/standard_streams.h"
+#include "tools/common/unread_folder.h"
 #include "tools/common/utf8.h"
 #include "tools/qxtool/attributes.h"
 #include "tools/qxtool/commands.h"
@@ -47,11 +48,12 @@ class UnreadFolders final : public SFindFailureSink {
   void Tell() {
     for (; m_told < m_all.size(); ++m_told) {
       FlushPrinted();  // so that both streams say things in the same order
-      Complain(ToUtf8(m_all[m_told].folder) + ": " + SystemText(m_all[m_told].error));
+      Complain(ShortenedPath(m_all[m_told].folder) + ": " + Why(m_all[m_told]));
     }
     if (!m_isComplete) throw Failure{"memory is out"};
   }
   const std::vector<Unread>& All() const { return m_all; }
+  static std::string Why(const Unread& unread) { return WhyNotSearched(unread.folder, unread.error); }
 
  private:
   std::vector<Unread> m_all;
@@ -174,7 +176,7 @@ void PrintErrors(const std::vector<Unread>& unread) {
   const char* separator = "";
   for (const Unread& one : unread) {
     Print(separator + std::string("\n{\"folder\":") + JsonString(one.folder) +
-          ",\"error\":" + JsonString(FromUtf8(SystemText(one.error))) + "}");
+          ",\"error\":" + JsonString(FromUtf8(UnreadFolders::Why(one))) + "}");
     separator = ",";
   }
 }
@@ -183,8 +185,7 @@ void PrintErrors(const std::vector<Unread>& unread) {
 
 int Find(const FindOptions& options) {
   const Wanted wanted(options);
-  const SString folder = SFile::NormalizeDirectoryName(console::NameOf(options.folder));
-  if (!SFile::IsDirectory(folder)) throw Failure{"there is no such folder", kFailed, options.folder};
+  const SString folder = FolderToSearch(console::NameOf(options.folder));
   const bool isRoot = folder[folder.Length() - 1] == '\\';
   const SString mask = folder + (isRoot ? WTEXT("") : WTEXT("\\")) +
                        (Wanted::IsFoundByFinder(options) ? MaskOf(options.mask) : SString(kEverything));

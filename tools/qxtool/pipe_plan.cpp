@@ -7,6 +7,7 @@
 #include "qxcore/system/file/recurse_find.h"
 #include "tools/common/console.h"
 #include "tools/common/failure.h"
+#include "tools/common/unread_folder.h"
 #include "tools/common/utf8.h"
 
 namespace fs = std::filesystem;
@@ -21,7 +22,7 @@ class Plan {
     for (const std::string& file : m_options.files) {
       const SString name = console::NameOf(file);
       if (file != "-" && SFile::IsDirectory(name)) {
-        AddFolder(file, SFile::NormalizeDirectoryName(name));
+        AddFolder(file, FolderToSearch(name));
       } else {
         Add(file, fs::path(console::PathOf(console::NativeOf(file))).filename());
       }
@@ -49,9 +50,11 @@ class Plan {
       const fs::path top = console::PathOf(SFile::ToNative(name));
       Add(path, console::PathOf(path).lexically_relative(top));
     }
-    if (finder.GetFailures().GetCount() > 0)
-      throw Failure{SystemText(finder.GetFailures().GetFirstError()), kFailed,
-                    ToUtf8(finder.GetFailures().GetFirstFolder())};
+    const SFindFailures& failures = finder.GetFailures();
+    if (failures.GetCount() > 0) {
+      const SString& unread = failures.GetFirstFolder();
+      throw Failure{WhyNotSearched(unread, failures.GetFirstError()), kFailed, ShortenedPath(unread)};
+    }
   }
 
   static std::string Native(const fs::path& path) {

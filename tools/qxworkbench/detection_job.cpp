@@ -7,6 +7,7 @@
 #include "qxcore/system/file/file.h"
 #include "tools/common/console.h"
 #include "tools/common/failure.h"
+#include "tools/common/unread_folder.h"
 #include "tools/common/utf8.h"
 
 namespace {
@@ -81,21 +82,22 @@ class DetectionJob::Large {
   std::thread m_thread;
 };
 
+static std::string WhyOf(const SFindFailures& failures) {
+  return WhyNotSearched(failures.GetFirstFolder(), failures.GetFirstError());
+}
+
 DetectionJob::DetectionJob(DocumentList& documents, std::function<void()> wake)
     : m_documents(documents), m_wake(std::move(wake)) {}
 
 DetectionJob::~DetectionJob() { Cancel(); }
 
 void DetectionJob::Open(const SString& folder) {
-  const SString whole = SFile::NormalizeDirectoryName(folder);
-  if (whole.IsEmpty() || !SFile::Exists(whole))
-    throw Failure{"there is no such folder", kFailed, ToUtf8(ShownPath(folder))};
-  if (!SFile::IsDirectory(whole)) throw Failure{"it is no folder", kFailed, ToUtf8(ShownPath(folder))};
+  const SString whole = FolderToSearch(folder);
   auto finder = std::make_unique<SRecurseFindFiles>();
   const int found = finder->FindFile(Backslashed(whole) + WTEXT("*"));
   const SFindFailures& failures = finder->GetFailures();
   if (!found && !failures.IsEmpty())
-    throw Failure{SystemText(failures.GetFirstError()), kFailed, ToUtf8(ShownPath(failures.GetFirstFolder()))};
+    throw Failure{WhyOf(failures), kFailed, ShortenedPath(failures.GetFirstFolder())};
   Cancel();
   m_documents.Clear();
   m_wasCancelled = false;
@@ -172,7 +174,7 @@ void DetectionJob::Enter(int number, const Finding& finding) {
 SString DetectionJob::Failures() const {
   if (m_finder == nullptr || m_finder->GetFailures().IsEmpty()) return SString();
   const SFindFailures& failures = m_finder->GetFailures();
-  std::string text = ToUtf8(ShownPath(failures.GetFirstFolder())) + ": " + SystemText(failures.GetFirstError());
+  std::string text = ShortenedPath(failures.GetFirstFolder()) + ": " + WhyOf(failures);
   if (failures.GetCount() > 1) text += " (and " + std::to_string(failures.GetCount() - 1) + " other folders)";
   return FromUtf8(text);
 }
