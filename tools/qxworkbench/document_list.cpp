@@ -20,10 +20,14 @@ void DocumentList::Clear() {
   m_documents.clear();
   m_order.clear();
   m_selected = 0;
+  m_encodingNames.clear();
+  m_largestSize = 0;
+  m_hasWarnings = false;
 }
 
 int DocumentList::Add(Document document) {
   const int number = Count();
+  NoteTexts(document);
   SString folded = Folded(document.name);
   m_documents.push_back({std::move(document), std::move(folded)});
   Insert(number);
@@ -39,7 +43,14 @@ void DocumentList::SetFinding(int number, const Finding& finding) {
   document.encodingName = finding.encoding;
   if (finding.error.empty()) document.bytes = finding.bytes;
   document.warning = finding.error.empty() ? finding.warning : FromUtf8(finding.error);
+  NoteTexts(document);
   if (movesRow) Insert(number);
+}
+
+void DocumentList::NoteTexts(const Document& document) {
+  if (!document.encodingName.IsEmpty()) m_encodingNames.insert(document.encodingName);
+  m_largestSize = std::max(m_largestSize, document.bytes);
+  m_hasWarnings |= !document.warning.IsEmpty();
 }
 
 int DocumentList::RowOf(int number) const {

@@ -1,6 +1,7 @@
 // The files of the open folder: what is known of each, their order in the list, and which ones are selected.
 #pragma once
 
+#include <set>
 #include <string>
 #include <vector>
 
@@ -42,6 +43,11 @@ class DocumentList {
   // The document with this name, in any case of letters and in either spelling; -1 for none.
   int Find(const SString& name) const;
 
+  // What the columns must have room for: the encodings that occur, the largest file, whether any has a warning.
+  const std::set<SString>& EncodingNames() const { return m_encodingNames; }
+  unsigned long long LargestSize() const { return m_largestSize; }
+  bool HasWarnings() const { return m_hasWarnings; }
+
   // How many could not be looked at.
   int FailedCount() const;
 
@@ -61,6 +67,7 @@ class DocumentList {
     Document document;
     SString folded;  // the name, by which names are compared
   };
+  void NoteTexts(const Document& document);
   const Entry& EntryAt(int number) const { return m_documents[static_cast<std::size_t>(number)]; }
   bool IsBefore(int a, int b) const;
   void Insert(int number);
@@ -70,4 +77,7 @@ class DocumentList {
   Column m_column = Column::kName;
   bool m_isDescending = false;
   int m_selected = 0;
+  std::set<SString> m_encodingNames;
+  unsigned long long m_largestSize = 0;
+  bool m_hasWarnings = false;
 };

@@ -18,12 +18,12 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(LineView, SView, on<WM_CREATE, &LineView::OnCreate>
 
 int LineView::OnCreate(CREATESTRUCTW* create) {
   if (SView::OnCreate(create) == -1) return -1;
+  m_dpi = static_cast<int>(::GetDpiForWindow(m_hWnd));
   ReadFont();
   return 0;
 }
 
 void LineView::ReadFont() {
-  m_dpi = static_cast<int>(::GetDpiForWindow(m_hWnd));
   m_font = MakeFont(m_dpi);
   SClientDC dc(m_hWnd);
   const SSelectObject font(dc, m_font);
@@ -221,6 +221,7 @@ void LineView::OnSettingChange(UINT what, LPCWSTR area) {
 
 LRESULT LineView::OnDpiChanged(WPARAM wParam, LPARAM lParam) {
   const LRESULT result = SView::OnDpiChanged(wParam, lParam);
+  m_dpi = LOWORD(wParam);
   ReadFont();
   RowsChanged();
   Invalidate(0);

@@ -41,7 +41,6 @@ class LineView : public SView {
   int RowAt(SPoint point) const;  // -1 for none
   int RowHeight() const { return m_rowHeight; }
   int Left() const { return m_left; }  // how far the content is scrolled to the left, in pixels
-  int CharacterWidth() const { return m_characterWidth; }
   int Scaled(int pixels) const { return ::MulDiv(pixels, m_dpi, 96); }
   HFONT Font() const { return m_font; }
   SRect RowsRect() const;

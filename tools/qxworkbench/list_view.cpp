@@ -16,6 +16,7 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(FileListView, LineView, on<WM_LBUTTONDOWN, &FileLis
 namespace {
 
 constexpr LPCWSTR kHeads[kColumnCount] = {WTEXT("Name"), WTEXT("Encoding"), WTEXT("Size"), WTEXT("Warning")};
+constexpr LPCWSTR kAscending = WTEXT(" \u25B2"), kDescending = WTEXT(" \u25BC");
 constexpr int kPadding = 4;
 
 // Digits in groups of three.
@@ -43,12 +44,31 @@ HFONT FileListView::MakeFont(int dpi) { return SGetDefaultUIFont(dpi); }
 
 // --- painting ---
 
-// The size takes what nine digits need, the encoding what its longest usual names need, as far as half of the list is
-// left for name and warning.
+void FileListView::OnDraw(SDC* dc) {
+  MeasureColumns(dc);
+  LineView::OnDraw(dc);
+}
+
+void FileListView::MeasureColumns(SDC* dc) {
+  const SSelectObject font(*dc, Font());
+  const auto needed = [&](Column column) -> int& { return m_needed[static_cast<int>(column)]; };
+  const auto width = [&](const SString& text) {
+    return static_cast<int>(dc->GetTextExtent(text).cx) + 2 * Scaled(kPadding);
+  };
+  for (int i = 0; i < kColumnCount; ++i) m_needed[i] = width(kHeads[i] + SString(kAscending));
+  for (const SString& name : m_documents.EncodingNames())
+    needed(Column::kEncoding) = std::max(needed(Column::kEncoding), width(name));
+  needed(Column::kSize) = std::max(needed(Column::kSize), width(SizeText(m_documents.LargestSize())));
+}
+
+// Size and encoding take what their widest text needs, as far as half of the list is left for name and warning. These
+// share the rest; without a warning, its head is enough.
 SRect FileListView::ColumnRect(Column column, const SRect& row) const {
-  const int size = std::min(row.Width() / 5, 11 * CharacterWidth() + 2 * Scaled(kPadding));
-  const int encoding = std::min(row.Width() / 2 - size, 28 * CharacterWidth() + 2 * Scaled(kPadding));
-  const int name = (row.Width() - size - encoding) * 55 / 100;
+  const auto needed = [&](Column of) { return m_needed[static_cast<int>(of)]; };
+  const int size = std::min(row.Width() / 5, needed(Column::kSize));
+  const int encoding = std::min(row.Width() / 2 - size, needed(Column::kEncoding));
+  const int rest = row.Width() - size - encoding, share = rest * 45 / 100;
+  const int name = rest - (m_documents.HasWarnings() ? share : std::min(share, needed(Column::kWarning)));
   const int edges[] = {0, name, name + encoding, name + encoding + size, row.Width()};
   const auto at = static_cast<std::size_t>(column);
   return SRect(row.left + edges[at], row.top, row.left + edges[at + 1], row.bottom);
@@ -98,12 +118,16 @@ void FileListView::DrawHead(SDC* dc, const SRect& rect) {
     SRect cell = ColumnRect(column, rect);
     dc->ExtTextOutW(cell.left, cell.top, ETO_OPAQUE, &cell, SStringView());
     dc->DrawEdge(cell, EDGE_RAISED, BF_RECT);
-    SString text(kHeads[i]);
-    if (column == m_documents.SortColumn()) text += m_documents.IsDescending() ? WTEXT(" \u25BC") : WTEXT(" \u25B2");
     SRect inner(cell.left + Scaled(kPadding), cell.top, cell.right - Scaled(kPadding), cell.bottom);
     const UINT alignment = column == Column::kSize ? DT_RIGHT : DT_LEFT;
-    dc->DrawTextW(text, inner, alignment | DT_SINGLELINE | DT_VCENTER | DT_NOPREFIX | DT_END_ELLIPSIS);
+    dc->DrawTextW(HeadText(column), inner, alignment | DT_SINGLELINE | DT_VCENTER | DT_NOPREFIX | DT_END_ELLIPSIS);
   }
+}
+
+SString FileListView::HeadText(Column column) const {
+  SString text(kHeads[static_cast<int>(column)]);
+  if (column == m_documents.SortColumn()) text += m_documents.IsDescending() ? kDescending : kAscending;
+  return text;
 }
 
 // --- changes ---

@@ -23,6 +23,7 @@ class FileListView : public LineView {
   void SelectAll();
 
   int PreCreateWindow(CREATESTRUCTW* create) override;
+  void OnDraw(SDC* dc) override;
 
  protected:
   int RowCount() const override { return m_documents.Count(); }
@@ -39,6 +40,8 @@ class FileListView : public LineView {
   QXCORE_DECLARE_MESSAGE_MAP()
 
  private:
+  void MeasureColumns(SDC* dc);
+  SString HeadText(Column column) const;
   SRect ColumnRect(Column column, const SRect& row) const;
   SString CellText(const Document& document, Column column) const;
   void DrawCell(SDC* dc, const SString& text, const SRect& cell, UINT alignment);
@@ -47,6 +50,7 @@ class FileListView : public LineView {
   void Tell(UINT command);
 
   DocumentList& m_documents;
-  int m_focused = -1;  // a document's number
-  int m_anchor = -1;   // where a range begins
+  int m_focused = -1;               // a document's number
+  int m_anchor = -1;                // where a range begins
+  int m_needed[kColumnCount] = {};  // pixels for the widest text, as the list was painted last
 };
