@@ -21,7 +21,7 @@ class Board : public test::Window {
       if (message == WM_PAINT) return *result = 0, Paint(), 1;
       const bool isInput = (message >= WM_KEYFIRST && message <= WM_KEYLAST) ||
                            (message >= WM_MOUSEFIRST && message <= WM_MOUSELAST && message != WM_MOUSEMOVE);
-      if (isInput || message == WM_COMMAND || message == WM_CLOSE)
+      if (isInput || message == WM_COMMAND || message == WM_CLOSE || message == WM_DROPFILES)
         m_got.push_back({nullptr, message, wParam, lParam, 0, {}});
       if (message == WM_ACTIVATE) m_isActive = LOWORD(wParam) != WA_INACTIVE;
       if (message == WM_CLOSE) return *result = 0, 1;
@@ -241,6 +241,47 @@ TEST_F(Screen, AMenuEndsWithTheKeyboard) {
   hand.join();
   ::DestroyMenu(menu);
   m_client.GiveKeyboard(kTitle);
+}
+
+// --- drag and drop ---
+
+// Names with blanks and other letters, at the point where they were dropped; a child that accepts files gets its own.
+TEST_F(Screen, FilesAreDropped) {
+  const auto drop = [this](const Board& target, POINT point, const char* uris) {
+    m_board.m_got.clear();
+    bool isTaken = false;
+    const POINT onScreen = OnScreen(point.x, point.y);
+    std::thread hand([&] { isTaken = m_client.Drop(kTitle, onScreen, uris); });
+    test::PumpUntil([&] { return target.Got(WM_DROPFILES); });
+    hand.join();
+    EXPECT_TRUE(isTaken);
+  };
+  ::DragAcceptFiles(m_board.m_hWnd, TRUE);
+  drop(m_board, {33, 44}, "file:///tmp/a%20folder\r\nfile:///tmp/Gr%C3%BC%C3%9Fe.txt\r\n");
+  ASSERT_TRUE(m_board.Got(WM_DROPFILES));
+  const auto files = reinterpret_cast<HDROP>(m_board.First(WM_DROPFILES).wParam);
+  ASSERT_EQ(::DragQueryFileW(files, ~UINT{0}, nullptr, 0), 2u);
+  WCHAR name[100];
+  EXPECT_EQ(::DragQueryFileW(files, 0, name, 100), 15u);
+  EXPECT_EQ(SString(name), SString(WTEXT("C:\\tmp\\a folder")));
+  EXPECT_EQ(::DragQueryFileW(files, 1, name, 8), 7u) << "cut to the room";
+  ::DragQueryFileW(files, 1, name, 100);
+  EXPECT_EQ(SString(name), SString(WTEXT("C:\\tmp\\Gr\u00FC\u00DFe.txt")));
+  POINT point{};
+  EXPECT_TRUE(::DragQueryPoint(files, &point));
+  EXPECT_EQ(SPoint(point), SPoint(33, 44));
+  ::DragFinish(files);
+
+  Board child;
+  ASSERT_TRUE(child.CreateEx(WS_EX_ACCEPTFILES, nullptr, nullptr, WS_CHILD | WS_VISIBLE, 100, 100, 50, 50,
+                             m_board.m_hWnd, nullptr));
+  drop(child, {110, 120}, "file:///tmp\r\n");
+  EXPECT_FALSE(m_board.Got(WM_DROPFILES));
+  ASSERT_TRUE(child.Got(WM_DROPFILES));
+  const auto inside = reinterpret_cast<HDROP>(child.First(WM_DROPFILES).wParam);
+  EXPECT_TRUE(::DragQueryPoint(inside, &point));
+  EXPECT_EQ(SPoint(point), SPoint(10, 20));
+  ::DragFinish(inside);
 }
 
 // --- the clipboard ---

@@ -6,6 +6,7 @@
 #include <dlfcn.h>
 #include <poll.h>
 
+#include <algorithm>
 #include <atomic>
 #include <cstring>
 #include <stdexcept>
@@ -142,6 +143,77 @@ void XClient::TakeKeyboard() {
 void XClient::GiveKeyboard(const std::string& title) {
   XSetInputFocus(m_state->server, m_state->Find(title), RevertToPointerRoot, CurrentTime);
   XSync(m_state->server, False);
+}
+
+// --- drag and drop ---
+
+namespace {
+
+// The source's side of XDND, version 5.
+class DragSource {
+ public:
+  DragSource(::Display* server, ::Window own, ::Window target, const std::string& uris)
+      : m_server(server), m_own(own), m_target(target), m_uris(uris) {}
+
+  bool Run(POINT point) {
+    XSetSelectionOwner(m_server, Name("XdndSelection"), m_own, CurrentTime);
+    Tell("XdndEnter", 5L << 24, static_cast<long>(Name("text/uri-list")), 0, 0);
+    Tell("XdndPosition", 0, point.x << 16 | point.y, CurrentTime, static_cast<long>(Name("XdndActionCopy")));
+    const bool isWelcome = WaitFor("XdndStatus") & 1;
+    if (!isWelcome) return Tell("XdndLeave", 0, 0, 0, 0), false;
+    Tell("XdndDrop", 0, CurrentTime, 0, 0);
+    return WaitFor("XdndFinished") & 1;
+  }
+
+ private:
+  Atom Name(const char* name) const { return XInternAtom(m_server, name, False); }
+  void Tell(const char* message, long a, long b, long c, long d) {
+    XEvent event{};
+    event.xclient.type = ClientMessage;
+    event.xclient.window = m_target;
+    event.xclient.message_type = Name(message);
+    event.xclient.format = 32;
+    const long data[] = {static_cast<long>(m_own), a, b, c, d};
+    std::copy_n(data, 5, event.xclient.data.l);
+    XSendEvent(m_server, m_target, False, NoEventMask, &event);
+    XFlush(m_server);
+  }
+  // The flags of the target's message; 0 when it does not come. Meanwhile the target asks for the files.
+  long WaitFor(const char* message) {
+    for (int tries = 0; tries < 250; ++tries) {
+      pollfd waiting{ConnectionNumber(m_server), POLLIN, 0};
+      poll(&waiting, 1, 20);
+      while (XPending(m_server) > 0) {
+        XEvent event;
+        XNextEvent(m_server, &event);
+        if (event.type == SelectionRequest) Serve(event.xselectionrequest);
+        const bool isIt = event.type == ClientMessage && event.xclient.message_type == Name(message);
+        if (isIt) return event.xclient.data.l[1];
+      }
+    }
+    return 0;
+  }
+  void Serve(const XSelectionRequestEvent& request) {
+    XChangeProperty(m_server, request.requestor, request.property, request.target, 8, PropModeReplace,
+                    reinterpret_cast<const unsigned char*>(m_uris.data()), static_cast<int>(m_uris.size()));
+    XEvent answer{};
+    answer.xselection = {
+        SelectionNotify,  0,           False, m_server, request.requestor, request.selection, request.target,
+        request.property, request.time};
+    XSendEvent(m_server, request.requestor, False, NoEventMask, &answer);
+    XFlush(m_server);
+  }
+
+  ::Display* m_server;
+  ::Window m_own, m_target;
+  std::string m_uris;
+};
+
+}  // namespace
+
+bool XClient::Drop(const std::string& title, POINT point, const std::string& uris) {
+  Move(point);
+  return DragSource(m_state->server, m_state->own, m_state->Find(title), uris).Run(point);
 }
 
 // --- the clipboard ---

@@ -39,6 +39,11 @@ class XClient {
   void TakeKeyboard();
   void GiveKeyboard(const std::string& title);
 
+  // --- drag and drop ---
+  // Drags files to a point of the window with this title and drops them there; `uris` has a line for each. Returns true
+  // once the window has taken them, false when it refuses and after five seconds. The window's thread must not wait.
+  bool Drop(const std::string& title, POINT point, const std::string& uris);
+
   // --- the clipboard ---
   // Asks the owner of the clipboard for its text; Answer() returns true once it is there.
   void AskForText();
