@@ -304,6 +304,18 @@ TEST_F(HiddenParts, TheEdgeOfAShrinkingFrameMovesAlong) {
   Check(child, "its former place is outside");
 }
 
+// A frame that grows inwards, as with a menu, moves the client area with all that it shows.
+TEST_F(HiddenParts, TheClientAreaMovesWithinTheWindow) {
+  Show(top);
+  Show(child);
+  for (const DWORD style : {DWORD{WS_DLGFRAME}, DWORD{0}}) {
+    SetWindowLongW(top, GWL_STYLE, static_cast<LONG>(WS_POPUP | WS_CLIPCHILDREN | WS_VISIBLE | style));
+    SetWindowPos(top, nullptr, 0, 0, 0, 0, SWP_NOMOVE | SWP_NOSIZE | SWP_NOZORDER | SWP_NOACTIVATE | SWP_FRAMECHANGED);
+    Check(top, "the client area");
+    Check(child, "a window in it");
+  }
+}
+
 TEST_F(HiddenParts, ChildrenThatScroll) {
   Show(child);
   const HWND other = Make(top, SRect(75, 20, 115, 50));

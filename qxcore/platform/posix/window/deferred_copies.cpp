@@ -47,8 +47,7 @@ void Extend(DeferredCopy& copy, const Stay& stay, const RECT& oldWindow) {
 
 bool StaysValid(const Placing& placing, const Window* window) {
   constexpr UINT kNothingStays = SWP_NOCOPYBITS | SWP_SHOWWINDOW | SWP_HIDEWINDOW;
-  return !placing.isUnpainted && !(placing.place.flags & kNothingStays) && IsShown(window) &&
-         window->parent != Desktop();
+  return !placing.isUnpainted && !(placing.place.flags & kNothingStays) && IsShown(window);
 }
 
 // For one more.
@@ -135,11 +134,30 @@ bool CopyLater(const Placing& placing) {
   try {
     const Guard guard;
     Window* window = FindWindowObject(handle);
-    return window != nullptr && StaysValid(placing, window) && Note(deferred, window, placing);
+    return window != nullptr && window->IsChild() && StaysValid(placing, window) && Note(deferred, window, placing);
   } catch (const std::bad_alloc&) {
     PaintAnew(handle);
     return false;
   }
+}
+
+void ShiftClient(const Placing& placing) {
+  if (g_painter.movePixels == nullptr) return;
+  Canvas canvas;
+  MovedPixels moved;
+  {
+    const Guard guard;
+    const Window* window = FindWindowObject(placing.place.hwnd);
+    if (window == nullptr || window->parent != Desktop() || !StaysValid(placing, window)) return;
+    const Stay stay = StayOf(placing.from, placing.to);
+    moved.dx = stay.kept.left - (stay.source.x - placing.from.window.left);
+    moved.dy = stay.kept.top - (stay.source.y - placing.from.window.top);
+    VisibleRegion(window, false, &moved.to);
+    moved.to.Intersect(stay.kept);
+    canvas = {window->handle, window->surface, {Width(window->window), Height(window->window)}};
+  }
+  if (canvas.surface == nullptr || moved.to.IsEmpty() || (moved.dx == 0 && moved.dy == 0)) return;
+  if (!g_painter.movePixels(canvas.top, canvas.surface, canvas.size, &moved, 1)) PaintAnew(canvas.top);
 }
 
 void CopyBefore(HWND top, const RECT& used) {

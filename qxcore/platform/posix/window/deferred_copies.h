@@ -31,6 +31,9 @@ struct DeferredCopies {
 // Notes where the pixels are that stay valid through a change of place. Returns whether this window began to wait.
 // Without memory for the note it is painted anew. Without the lock.
 bool CopyLater(const Placing& placing);
+// The surface of a top-level window moves with it, and only the client area may lie elsewhere on it: moves its pixels.
+// Without the lock.
+void ShiftClient(const Placing& placing);
 // Copies all that waits for the calling thread. Without the lock.
 void CopyNow();
 // The same if somebody is about to draw on or to read from a part of a top-level window, relative to it, that the

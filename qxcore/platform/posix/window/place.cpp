@@ -216,6 +216,7 @@ bool Finish(Placing& placing) {
 bool PlaceNow(Placing& placing) {
   if (!Begin(placing, Uncovers::Now)) return false;
   if (CopyLater(placing)) CopyNow();
+  ShiftClient(placing);
   return Finish(placing);
 }
 
