@@ -1,5 +1,7 @@
 #include "qxcore/stream/encoding/internal/utf8_blocks.h"
 
+#include <cstddef>
+
 #include "qxcore/platform/internal/processor.h"
 #include "qxcore/stream/encoding/internal/utf8_blocks_avx2.h"
 

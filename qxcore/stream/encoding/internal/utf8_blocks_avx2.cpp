@@ -5,6 +5,7 @@
 #include <immintrin.h>
 
 #include <algorithm>
+#include <cstddef>
 
 #define QXCORE_TARGET __attribute__((target("avx2")))
 

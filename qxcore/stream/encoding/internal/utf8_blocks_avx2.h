@@ -2,7 +2,7 @@
 // nothing needs numbers of 64 bits, which are slow in 32-bit programs.
 #pragma once
 
-#include "qxcore/stream/encoding/internal/utf8_blocks.h"
+#include "qxcore/stream/encoding/internal/utf8_block_walk.h"
 
 #if defined(__x86_64__) || defined(__i386__)
 #define QXCORE_HAS_UTF8_BLOCKS_AVX2

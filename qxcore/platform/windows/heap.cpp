@@ -1,4 +1,12 @@
-#include "qxcore/platform/windows/large_memory.h"
+// Large blocks live apart from the C runtime's heap.
+//
+// That heap copies a large block whenever it grows, and gives each back to the system at once, so that every page of
+// the next one is made and cleared anew, which takes longer than to fill it. Here a large block is a region of the
+// address space of its own; it grows where it stands as long as the addresses behind it are free. Regions that were
+// freed are kept for the next blocks: at most 32 MB that nobody uses, as much as the heap of other systems holds back.
+// They are given back when memory runs short.
+
+#include "qxcore/platform/internal/heap.h"
 
 #include <malloc.h>
 
@@ -209,10 +217,10 @@ bool ResizeInPlace(Region* region, std::size_t bytes) {
 }
 
 void* Move(void* block, std::size_t before, std::size_t size) {
-  void* moved = size >= kLeastLarge ? AllocateLarge(size, size > before) : AllocateApart(size);
+  void* moved = size >= kLeastLarge ? AllocateLarge(size, size > before) : AllocateMemory(size);
   if (moved == nullptr) return nullptr;
   std::memcpy(moved, block, std::min(before, size));
-  FreeApart(block);
+  FreeMemory(block);
   return moved;
 }
 
@@ -225,21 +233,21 @@ void* ResizeLarge(void* block, std::size_t size) {
 
 }  // namespace
 
-void* AllocateApart(std::size_t size) noexcept {
+void* AllocateMemory(std::size_t size) noexcept {
   if (size >= kLeastLarge) return AllocateLarge(size, false);
   void* block = std::malloc(size);
   return block == nullptr && g_spare.GiveBack() ? std::malloc(size) : block;
 }
 
-void* ResizeApart(void* block, std::size_t size) noexcept {
-  if (block == nullptr) return AllocateApart(size);
+void* ResizeMemory(void* block, std::size_t size) noexcept {
+  if (block == nullptr) return AllocateMemory(size);
   if (IsLarge(block)) return ResizeLarge(block, size);
   if (size >= kLeastLarge) return Move(block, _msize(block), size);
   void* resized = std::realloc(block, size);
   return resized == nullptr && g_spare.GiveBack() ? std::realloc(block, size) : resized;
 }
 
-void FreeApart(void* block) noexcept {
+void FreeMemory(void* block) noexcept {
   if (IsLarge(block)) return g_spare.Keep(Region::Of(block));
   std::free(block);
 }
