@@ -24,6 +24,7 @@ struct OpenMap : Map {
   using __STree::CompareKey;
   using __STree::GetVoid;
   using __STree::KeyOf;
+  void* FindVoid(long key) const { return __STree::Find(key); }
 
   // The number of black entries on every way down; -1 where an invariant does not hold.
   static int BlackHeight(const Entry* entry, const Entry* parent) {
@@ -127,6 +128,9 @@ TEST(Tree, UntypedInsertion_ReplacesAndFindsUnconstructedEntries) {
     void* found;
     EXPECT_FALSE(map.GetVoid(map.KeyOf(&source), &found));
     EXPECT_EQ(found, payload);
+    EXPECT_EQ(map.FindVoid(map.KeyOf(&source)), payload);
+    const SMapEntry<int, Counted> absent{6, Counted(60)};
+    EXPECT_EQ(map.FindVoid(map.KeyOf(&absent)), nullptr);
     Counted::failAt = 1;
     EXPECT_THROW(map.AddCopy(&source), CopyFailed);
     Counted::failAt = 0;

@@ -350,7 +350,7 @@ TEST(StringTable, Lists_BreakWhereTheRulesSayIt) {
       {WTEXT(",x,"), WTEXT(","), {WTEXT(""), WTEXT("x"), WTEXT("")}},
       {WTEXT("x;,;y"), WTEXT(",;"), {WTEXT("x"), WTEXT("y")}},
       {WTEXT("a\\,b,c\\\\,\\"), WTEXT(","), {WTEXT("a,b"), WTEXT("c\\"), WTEXT("\\")}},
-      {WTEXT("x\x2028y"), WTEXT("\x2028"), {WTEXT("x"), WTEXT("y")}},
+      {WTEXT("x\x2028y\x2029z"), WTEXT("\x2028"), {WTEXT("x"), WTEXT("y\x2029z")}},
       {WTEXT("x,y"), nullptr, {WTEXT("x,y")}},
       {WTEXT(""), WTEXT(","), {}},
   };

@@ -96,8 +96,7 @@ void DetectionJob::Open(const SString& folder) {
   auto finder = std::make_unique<SRecurseFindFiles>();
   const int found = finder->FindFile(Backslashed(whole) + WTEXT("*"));
   const SFindFailures& failures = finder->GetFailures();
-  if (!found && !failures.IsEmpty())
-    throw Failure{WhyOf(failures), kFailed, ShortenedPath(failures.GetFirstFolder())};
+  if (!found && !failures.IsEmpty()) throw Failure{WhyOf(failures), kFailed, ShortenedPath(failures.GetFirstFolder())};
   Cancel();
   m_documents.Clear();
   m_wasCancelled = false;
