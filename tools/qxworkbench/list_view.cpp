@@ -61,12 +61,12 @@ void FileListView::MeasureColumns(SDC* dc) {
   needed(Column::kSize) = std::max(needed(Column::kSize), width(SizeText(m_documents.LargestSize())));
 }
 
-// Size and encoding take what their widest text needs, as far as half of the list is left for name and warning. These
-// share the rest; without a warning, its head is enough.
+// Size and encoding take what their widest text needs, as far as two fifths of the list are left for name and warning.
+// These share the rest; without a warning, its head is enough.
 SRect FileListView::ColumnRect(Column column, const SRect& row) const {
   const auto needed = [&](Column of) { return m_needed[static_cast<int>(of)]; };
   const int size = std::min(row.Width() / 5, needed(Column::kSize));
-  const int encoding = std::min(row.Width() / 2 - size, needed(Column::kEncoding));
+  const int encoding = std::min(row.Width() * 3 / 5 - size, needed(Column::kEncoding));
   const int rest = row.Width() - size - encoding, share = rest * 45 / 100;
   const int name = rest - (m_documents.HasWarnings() ? share : std::min(share, needed(Column::kWarning)));
   const int edges[] = {0, name, name + encoding, name + encoding + size, row.Width()};

@@ -1,17 +1,18 @@
-// The display that shows nothing: a screen of a fixed size. QXCORE_DPI in the environment is its resolution.
+// The display that shows nothing: a screen of a fixed size, as it would be measured with a rule. QXCORE_DPI in the
+// environment is its resolution.
 
 #include "qxcore/platform/posix/display/module.h"
 
 namespace platform {
 namespace {
 
-constexpr SIZE kScreen{1280, 1024};
+constexpr SIZE kScreen{1280, 1024};  // at the usual resolution
 constexpr UINT kUsualDpi = 96;
 
 class HeadlessDisplay final : public Display {
  public:
-  SIZE ScreenSize() override { return kScreen; }
-  RECT WorkArea() override { return {0, 0, kScreen.cx, kScreen.cy}; }
+  SIZE ScreenSize() override { return m_size; }
+  RECT WorkArea() override { return {0, 0, m_size.cx, m_size.cy}; }
   UINT Dpi() override { return m_dpi; }
   int Monitors() override { return 0; }
   void Show(const ShownWindow&) override {}
@@ -27,7 +28,10 @@ class HeadlessDisplay final : public Display {
   bool Serves(DWORD) override { return false; }
 
  private:
+  static LONG Scaled(LONG length, UINT dpi) { return MulDiv(length, static_cast<int>(dpi), kUsualDpi); }
+
   const UINT m_dpi = DpiOfEnvironment() != 0 ? DpiOfEnvironment() : kUsualDpi;
+  const SIZE m_size{Scaled(kScreen.cx, m_dpi), Scaled(kScreen.cy, m_dpi)};
 };
 
 }  // namespace
