@@ -49,6 +49,27 @@ TEST(Exceptions, EachHasItsCodeTextAndName) {
   EXPECT_THROW(throw SEIOMismatchedBOM(), SEEncodingException);
 }
 
+template <class... Exceptions>
+void ExpectOwnTexts() {
+  std::set<std::uint32_t> codes;
+  std::set<std::basic_string<WCHAR>> texts;
+  const auto add = [&](const SException& made) {
+    codes.insert(static_cast<std::uint32_t>(made.GetCode()));
+    texts.insert(made.GetText());
+  };
+  (add(Exceptions()), ...);
+  EXPECT_EQ(codes.size(), sizeof...(Exceptions));
+  EXPECT_EQ(texts.size(), sizeof...(Exceptions));
+}
+
+TEST(Exceptions, NoTwoShareACodeOrAText) {
+  ExpectOwnTexts<SEEOFException, SEIODiskFullException, SEIOAbortedException, SEIOCantOpenForReading,
+                 SEIOCantOpenForWriting, SEIOWriteFailed, SEIOCouldNotTrunc, SEIOPushBackFull, SEIOResetInvalid,
+                 SEIONoUnicodeBOM, SEIOMismatchedBOM, SEIODetectFailed, SEIOInvalidEncoding, SEIONonASCII,
+                 SEIOCantMap_OEM_UTF16, SEIOCantMap_UTF8_UTF16, SEIOCantMap_MBCS_UTF16, SEIOCantMap_OEM_MBCS,
+                 SEIOCantMap_UTF16_MBCS, SEIOCantMap_UTF16_UTF8>();
+}
+
 TEST(Exceptions, IOException_TellsErrno) {
   errno = ENOENT;
   SEIOException thrown;

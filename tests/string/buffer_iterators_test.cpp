@@ -98,6 +98,11 @@ TEST(StringBuffer, ClearedInPlace_IsAnEmptyText) {
   EXPECT_GE(buffer.GetCapacity(), 100) << "the room stays";
   buffer += WTEXT("new");
   EXPECT_EQ(buffer.Detach(), WTEXT("new"));
+  buffer += WTEXT("of two");
+  SStringBuffer copy(buffer);
+  copy.Clear();
+  EXPECT_TRUE(copy.IsEmpty());
+  EXPECT_EQ(buffer.Detach(), WTEXT("of two"));
 }
 
 TEST(StringBuffer, LargeContent_AppendsPartsOfItself) {
