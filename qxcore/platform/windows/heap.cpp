@@ -107,14 +107,14 @@ void Release(Region* region) {
 
 class Spare {
  public:
-  // The largest kept region of those that the bytes fit into and that are no larger than `most`, or null. The caller
-  // says by Use what becomes of it.
-  Region* Take(std::size_t bytes, std::size_t most) {
+  // A kept region that the bytes fit into, or null: the largest one for a block that grows, else the smallest. The
+  // caller says by Use what becomes of it.
+  Region* Take(std::size_t bytes, bool grows) {
     std::lock_guard hold(m_lock);
     Region** best = nullptr;
     for (Region** at = &m_kept; *at != nullptr; at = &(*at)->next) {
-      if ((*at)->bytes < bytes || (*at)->bytes > most) continue;
-      if (best == nullptr || (*at)->bytes > (*best)->bytes) best = at;
+      if ((*at)->bytes < bytes) continue;
+      if (best == nullptr || ((*at)->bytes > (*best)->bytes) == grows) best = at;
     }
     if (best == nullptr) return nullptr;
     Region* region = *best;
@@ -195,7 +195,7 @@ const struct Closer {
 void* AllocateLarge(std::size_t size, bool grows) {
   if (size > kMostSize) return nullptr;
   const std::size_t bytes = BytesFor(size);
-  Region* region = g_spare.Take(bytes, grows ? SIZE_MAX : bytes * 2);
+  Region* region = g_spare.Take(bytes, grows);
   if (region != nullptr) {
     g_spare.Use(region, region->bytes, bytes);
     return region->Block();
