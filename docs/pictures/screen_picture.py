@@ -16,6 +16,9 @@ import tempfile
 import time
 import zlib
 
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "tests/support"))
+import x_server  # noqa: E402
+
 
 def png(width, height, rows):
     def chunk(kind, data):
@@ -63,15 +66,7 @@ def settled(path):
 def main():
     out, width, height, ready, *program = sys.argv[1:]
     pathlib.Path(ready).unlink(missing_ok=True)
-    with tempfile.TemporaryDirectory() as folder:
-        read, write = os.pipe()
-        screen = ["-screen", "0", f"{width}x{height}x24", "-fbdir", folder, "-nolisten", "tcp"]
-        server = subprocess.Popen(["Xvfb", "-displayfd", str(write), *screen], pass_fds=[write], stderr=subprocess.DEVNULL)
-        os.close(write)
-        with os.fdopen(read) as numbers:
-            number = numbers.readline().strip()
-        environment = dict(os.environ, DISPLAY=f":{number}", QXCORE_DISPLAY="sdl")
-        environment.pop("XAUTHORITY", None)
+    with tempfile.TemporaryDirectory() as folder, x_server.running(width, height, folder) as environment:
         shown = subprocess.Popen(program, env=environment)
         try:
             wait_for(lambda: os.path.exists(ready))
@@ -79,8 +74,6 @@ def main():
         finally:
             shown.terminate()
             shown.wait()
-            server.terminate()
-            server.wait()
 
 
 main()

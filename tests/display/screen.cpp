@@ -1,6 +1,7 @@
 // The real screen: windows, mouse, keyboard and clipboard of an X server, with another client that has the hands and
 // the eyes. screen_test.py starts the server and this program.
 
+#include <atomic>
 #include <thread>
 
 #include "qxcore/platform/win32/clipboard.h"
@@ -251,7 +252,7 @@ TEST_F(Screen, FilesAreDropped) {
     m_board.m_got.clear();
     bool isTaken = false;
     const POINT onScreen = OnScreen(point.x, point.y);
-    std::thread hand([&] { isTaken = m_client.Drop(kTitle, onScreen, uris); });
+    std::thread hand([&] { isTaken = m_client.Drop(onScreen, uris); });
     test::PumpUntil([&] { return target.Got(WM_DROPFILES); });
     hand.join();
     EXPECT_TRUE(isTaken);
@@ -282,6 +283,15 @@ TEST_F(Screen, FilesAreDropped) {
   EXPECT_TRUE(::DragQueryPoint(inside, &point));
   EXPECT_EQ(SPoint(point), SPoint(10, 20));
   ::DragFinish(inside);
+
+  m_board.EnableWindow(0);  // as behind a modal dialog
+  std::atomic<bool> isTaken = false;
+  const POINT onScreen = OnScreen(33, 44);
+  std::thread hand([&] { isTaken = m_client.Drop(onScreen, "file:///tmp\r\n"); });
+  m_board.m_got.clear();
+  EXPECT_TRUE(test::PumpUntil([&] { return isTaken.load(); }));
+  hand.join();
+  EXPECT_FALSE(m_board.Got(WM_DROPFILES));
 }
 
 // --- the clipboard ---

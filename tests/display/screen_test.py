@@ -6,34 +6,20 @@ usage: screen_test.py PROGRAM [ARGS]
 Left out, and said so, where there is no Xvfb.
 """
 
-import os
-import shutil
+import pathlib
 import subprocess
 import sys
 
+sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[1] / "support"))
+import x_server  # noqa: E402
+
 
 def main():
-    if not shutil.which("Xvfb"):
+    if not x_server.is_installed():
         print("left out: the tests of the real screen need Xvfb")
         return 0
-    read, write = os.pipe()
-    server = subprocess.Popen(
-        ["Xvfb", "-displayfd", str(write), "-screen", "0", "1280x1024x24", "-nolisten", "tcp"],
-        pass_fds=[write],
-        stderr=subprocess.DEVNULL,
-    )
-    os.close(write)
-    try:
-        with os.fdopen(read) as numbers:
-            number = numbers.readline().strip()
-        if not number:
-            sys.exit("Xvfb does not start")
-        environment = dict(os.environ, DISPLAY=f":{number}", QXCORE_DISPLAY="sdl")
-        environment.pop("XAUTHORITY", None)
+    with x_server.running() as environment:
         return subprocess.run(sys.argv[1:], env=environment, timeout=300).returncode
-    finally:
-        server.terminate()
-        server.wait()
 
 
 if __name__ == "__main__":

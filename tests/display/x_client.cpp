@@ -64,6 +64,27 @@ struct XClient::State {
     return found;
   }
   ::Window Find(const std::string& title) const { return Find(title, root); }
+  // The window at the pointer that says it takes drops, found from the outside in as every source of a drag does.
+  ::Window FindDropTarget() const {
+    const Atom aware = XInternAtom(server, "XdndAware", False);
+    ::Window window = root, inside = root, found = None;
+    while (inside != None && found == None) {
+      window = inside;
+      ::Window ignored;
+      int x, y;
+      unsigned buttons;
+      if (!XQueryPointer(server, window, &ignored, &inside, &x, &y, &x, &y, &buttons)) return None;
+      if (inside != None && HasProperty(inside, aware)) found = inside;
+    }
+    return found;
+  }
+  bool HasProperty(::Window window, Atom name) const {
+    int count = 0;
+    Atom* names = XListProperties(server, window, &count);
+    const bool has = std::find(names, names + count, name) != names + count;
+    if (names != nullptr) XFree(names);
+    return has;
+  }
 };
 
 XClient::XClient() : m_state(std::make_unique<State>()) {}
@@ -112,6 +133,21 @@ std::vector<std::uint32_t> XClient::Pixels(const RECT& rect) {
 
 // --- windows ---
 
+std::vector<std::string> XClient::Titles() {
+  std::vector<std::string> titles;
+  ::Window ignored, parent, *children = nullptr;
+  unsigned count = 0;
+  XQueryTree(m_state->server, m_state->root, &ignored, &parent, &children, &count);
+  for (unsigned i = 0; i < count; ++i) {
+    XWindowAttributes attributes{};
+    XGetWindowAttributes(m_state->server, children[i], &attributes);
+    const std::string title = m_state->NameOf(children[i]);
+    if (attributes.map_state == IsViewable && !title.empty()) titles.push_back(title);
+  }
+  if (children != nullptr) XFree(children);
+  return titles;
+}
+
 bool XClient::HasWindow(const std::string& title) { return m_state->Find(title) != None; }
 
 void XClient::Place(const std::string& title, const RECT& rect) {
@@ -155,9 +191,15 @@ class DragSource {
   DragSource(::Display* server, ::Window own, ::Window target, const std::string& uris)
       : m_server(server), m_own(own), m_target(target), m_uris(uris) {}
 
+  // Like file managers it offers more kinds than fit the first message, which then stand in a property.
   bool Run(POINT point) {
     XSetSelectionOwner(m_server, Name("XdndSelection"), m_own, CurrentTime);
-    Tell("XdndEnter", 5L << 24, static_cast<long>(Name("text/uri-list")), 0, 0);
+    const Atom kinds[] = {Name("application/x-files"), Name("application/x-icons"), Name("text/uri-list"),
+                          Name("text/plain")};
+    XChangeProperty(m_server, m_own, Name("XdndTypeList"), XA_ATOM, 32, PropModeReplace,
+                    reinterpret_cast<const unsigned char*>(kinds), 4);
+    Tell("XdndEnter", 5L << 24 | 1, static_cast<long>(kinds[0]), static_cast<long>(kinds[1]),
+         static_cast<long>(kinds[2]));
     Tell("XdndPosition", 0, point.x << 16 | point.y, CurrentTime, static_cast<long>(Name("XdndActionCopy")));
     const bool isWelcome = WaitFor("XdndStatus") & 1;
     if (!isWelcome) return Tell("XdndLeave", 0, 0, 0, 0), false;
@@ -211,9 +253,10 @@ class DragSource {
 
 }  // namespace
 
-bool XClient::Drop(const std::string& title, POINT point, const std::string& uris) {
+bool XClient::Drop(POINT point, const std::string& uris) {
   Move(point);
-  return DragSource(m_state->server, m_state->own, m_state->Find(title), uris).Run(point);
+  const ::Window target = m_state->FindDropTarget();
+  return target != None && DragSource(m_state->server, m_state->own, target, uris).Run(point);
 }
 
 // --- the clipboard ---

@@ -33,6 +33,8 @@ class XClient {
 
   // --- what window managers and other programs do to the window with this title ---
   bool HasWindow(const std::string& title);
+  // The titles of the windows that are shown.
+  std::vector<std::string> Titles();
   void Place(const std::string& title, const RECT& rect);
   void AskToClose(const std::string& title);
   // Takes the keyboard for a window of its own, and gives it back.
@@ -40,9 +42,10 @@ class XClient {
   void GiveKeyboard(const std::string& title);
 
   // --- drag and drop ---
-  // Drags files to a point of the window with this title and drops them there; `uris` has a line for each. Returns true
-  // once the window has taken them, false when it refuses and after five seconds. The window's thread must not wait.
-  bool Drop(const std::string& title, POINT point, const std::string& uris);
+  // Drags files to a point of the screen and drops them there; `uris` has a line for each. Returns true once the window
+  // at that point has taken them, false when none there takes drops, when it refuses and after five seconds. The
+  // window's thread must not wait.
+  bool Drop(POINT point, const std::string& uris);
 
   // --- the clipboard ---
   // Asks the owner of the clipboard for its text; Answer() returns true once it is there.

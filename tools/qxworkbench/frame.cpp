@@ -312,12 +312,15 @@ PreviewView* WorkbenchFrame::ShowPreview(int number) {
 
 LRESULT WorkbenchFrame::OnDropFiles(WPARAM drop, LPARAM) {
   const auto files = reinterpret_cast<HDROP>(drop);
-  SString path;
+  const UINT count = ::DragQueryFileW(files, ~UINT{0}, nullptr, 0);
   const UINT length = ::DragQueryFileW(files, 0, nullptr, 0);
-  std::vector<WCHAR> text(length + 1);
-  if (::DragQueryFileW(files, 0, text.data(), length + 1) != 0) path = SString(text.data());
+  std::vector<WCHAR> path(length + 1);
+  ::DragQueryFileW(files, 0, path.data(), length + 1);
   ::DragFinish(files);
-  Try([&] { OpenFolder(path); });
+  Try([&] {
+    if (count > 1) throw Failure{"one folder can be open, and " + std::to_string(count) + " were dropped"};
+    OpenFolder(path.data());
+  });
   return 0;
 }
 

@@ -155,9 +155,9 @@ void Cancel(const Call& call) {
   if (!call.frame.CancelWork()) throw Failure{"there is nothing to cancel"};
 }
 
-// A name without what would begin another line or column.
-std::string OnOneLine(const SString& name) {
-  std::string text = ToUtf8(name);
+// A name, or a text with one, without what would begin another line or column.
+std::string OnOneLine(const SString& shown) {
+  std::string text = ToUtf8(shown);
   std::replace_if(
       text.begin(), text.end(), [](char c) { return c >= 0 && c < ' '; }, '?');
   return text;
@@ -186,7 +186,7 @@ void PrintIt(const Call& call) {
   if (what == "list") {
     Print(ListText(call.frame.Documents()));
   } else if (what == "status") {
-    Print(ToUtf8(call.frame.StatusText()) + "\n");
+    Print(OnOneLine(call.frame.StatusText()) + "\n");
   } else if (what == "preview") {
     Print(PreviewLines(call.frame));
   } else if (what == "splitter") {

@@ -41,8 +41,9 @@ class Locked {
   const Drop* m_drop;
 };
 
-// The window that accepts files at a point of the screen; null for none.
+// The window that accepts files at a point of the screen; null for none. Behind a modal dialog there is none.
 HWND AcceptingWindow(HWND top, POINT point) {
+  if (!::IsWindowEnabled(top)) return nullptr;
   HWND window = top;
   for (HWND child = top; child != nullptr;) {
     window = child;
