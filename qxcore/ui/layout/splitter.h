@@ -283,10 +283,12 @@ class QXCORE_API SSplitterWnd : public SWnd {
 
   // --- geometry ---
   int Metric(int index) const;
-  void MoveChildren(SDeferredMoves& moves, UINT firstId, UINT lastId, const SRect& inside);
-  SRect ChildRect(UINT id, const SRect& inside) const;
-  SRect PaneRect(int row, int column, const SRect& inside) const;
-  SRect ScrollBarRect(bool rows, int at, const SRect& inside) const;
+  struct Grid;
+  Grid LaidOut() const;
+  void MoveChildren(SDeferredMoves& moves, UINT firstId, UINT lastId, const Grid& grid);
+  SRect ChildRect(UINT id, const Grid& grid) const;
+  SRect PaneRect(int row, int column, const Grid& grid) const;
+  SRect ScrollBarRect(bool rows, int at, const Grid& grid) const;
   SRect BoxRect(int code, const SRect& inside) const;
   SRect BarRect(int code, const SRect& inside) const;
   int TrackerThickness(bool rows) const;

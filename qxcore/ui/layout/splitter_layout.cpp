@@ -17,6 +17,12 @@ void SSplitterWnd::GetInsideRect(SRect* rect) const {
 
 // --- layout ---
 
+// Where the columns and the rows begin.
+struct SSplitterWnd::Grid {
+  SRect inside;
+  int left[kSMaxPanes], top[kSMaxPanes];
+};
+
 void SSplitterWnd::RecalcLayout() {
   if (m_hWnd == nullptr || m_rowCount == 0) return;
   SRect inside;
@@ -24,51 +30,59 @@ void SSplitterWnd::RecalcLayout() {
   SSizePanes(m_columns.GetArray(), m_columnCount, inside.Width(), m_gapX, m_keepRatio);
   SSizePanes(m_rows.GetArray(), m_rowCount, inside.Height(), m_gapY, m_keepRatio);
 
+  const Grid grid = LaidOut();
   SDeferredMoves moves((m_columnCount + 1) * (m_rowCount + 1) + 1);
-  MoveChildren(moves, kSHorzScrollBarId, kSSizeBoxId, inside);
-  MoveChildren(moves, kSPaneId, kSHorzScrollBarId - 1, inside);
+  if (m_scrollStyle != 0) MoveChildren(moves, kSHorzScrollBarId, kSSizeBoxId, grid);
+  MoveChildren(moves, kSPaneId, kSHorzScrollBarId - 1, grid);
   moves.End();
   if (m_hWnd != nullptr) InvalidateRect(nullptr, 0);
 }
 
-void SSplitterWnd::MoveChildren(SDeferredMoves& moves, UINT firstId, UINT lastId, const SRect& inside) {
+SSplitterWnd::Grid SSplitterWnd::LaidOut() const {
+  Grid grid;
+  GetInsideRect(&grid.inside);
+  for (int i = 0; i < m_columnCount; ++i) {
+    grid.left[i] = grid.inside.left + SPaneStart(m_columns.GetArray(), i, m_gapX);
+  }
+  for (int i = 0; i < m_rowCount; ++i) grid.top[i] = grid.inside.top + SPaneStart(m_rows.GetArray(), i, m_gapY);
+  return grid;
+}
+
+void SSplitterWnd::MoveChildren(SDeferredMoves& moves, UINT firstId, UINT lastId, const Grid& grid) {
   for (HWND child = ::GetWindow(m_hWnd, GW_CHILD); child != nullptr; child = ::GetWindow(child, GW_HWNDNEXT)) {
     const UINT id = static_cast<UINT>(::GetDlgCtrlID(child));
     if (id < firstId || id > lastId) continue;
     if (id == kSSizeBoxId) SUpdateSizeBox(child, m_hWnd);
-    moves.Move(child, ChildRect(id, inside));
+    moves.Move(child, ChildRect(id, grid));
   }
 }
 
 // Children outside of the grid get an empty rectangle.
-SRect SSplitterWnd::ChildRect(UINT id, const SRect& inside) const {
+SRect SSplitterWnd::ChildRect(UINT id, const Grid& grid) const {
   if (id == kSSizeBoxId) {
-    return SRect(inside.BottomRight(), SSize(Metric(SM_CXVSCROLL), Metric(SM_CYHSCROLL)));
+    return SRect(grid.inside.BottomRight(), SSize(Metric(SM_CXVSCROLL), Metric(SM_CYHSCROLL)));
   }
-  if (id >= kSVertScrollBarId) return ScrollBarRect(true, static_cast<int>(id - kSVertScrollBarId), inside);
-  if (id >= kSHorzScrollBarId) return ScrollBarRect(false, static_cast<int>(id - kSHorzScrollBarId), inside);
+  if (id >= kSVertScrollBarId) return ScrollBarRect(true, static_cast<int>(id - kSVertScrollBarId), grid);
+  if (id >= kSHorzScrollBarId) return ScrollBarRect(false, static_cast<int>(id - kSHorzScrollBarId), grid);
   const int place = static_cast<int>(id - kSPaneId);
-  return PaneRect(place / kSMaxPanes, place % kSMaxPanes, inside);
+  return PaneRect(place / kSMaxPanes, place % kSMaxPanes, grid);
 }
 
-SRect SSplitterWnd::PaneRect(int row, int column, const SRect& inside) const {
+SRect SSplitterWnd::PaneRect(int row, int column, const Grid& grid) const {
   if (!IsPlace(row, column)) return SRect();
-  const SPoint corner(inside.left + SPaneStart(m_columns.GetArray(), column, m_gapX),
-                      inside.top + SPaneStart(m_rows.GetArray(), row, m_gapY));
+  const SPoint corner(grid.left[column], grid.top[row]);
   SRect rect(corner, SSize(m_columns[column].m_current, m_rows[row].m_current));
   if (!rect.IsEmpty()) rect.Inflate(m_borderShareX, m_borderShareY);
   return rect;
 }
 
 // The upright bar of a row, or the lying one of a column; the first leaves room for the split box.
-SRect SSplitterWnd::ScrollBarRect(bool rows, int at, const SRect& inside) const {
+SRect SSplitterWnd::ScrollBarRect(bool rows, int at, const Grid& grid) const {
   if (at >= Count(rows)) return SRect();
-  const SPaneInfo* panes = Table(rows).GetArray();
   const int room = at == 0 && CanGrow(rows) ? Thickness(rows) : 0;
-  const int start = SPaneStart(panes, at, Gap(rows)) + room;
-  const int length = std::max(panes[at].m_current - room, 0);
-  if (rows) return SRect(SPoint(inside.right, inside.top + start), SSize(Metric(SM_CXVSCROLL), length));
-  return SRect(SPoint(inside.left + start, inside.bottom), SSize(length, Metric(SM_CYHSCROLL)));
+  const int length = std::max(Table(rows)[at].m_current - room, 0);
+  if (rows) return SRect(SPoint(grid.inside.right, grid.top[at] + room), SSize(Metric(SM_CXVSCROLL), length));
+  return SRect(SPoint(grid.left[at] + room, grid.inside.bottom), SSize(length, Metric(SM_CYHSCROLL)));
 }
 
 // --- bars and boxes ---
