@@ -25,9 +25,15 @@ SObject* SHandleMap::FromHandle(void* handle) {
   return made;
 }
 
-void SHandleMap::SetPermanent(void* handle, SObject* object) { m_permanent.Add(handle, object); }
+void SHandleMap::SetPermanent(void* handle, SObject* object) {
+  ++m_changes;
+  m_permanent.Add(handle, object);
+}
 
-void SHandleMap::RemovePermanent(void* handle) { m_permanent.Remove(handle); }
+void SHandleMap::RemovePermanent(void* handle) {
+  ++m_changes;
+  m_permanent.Remove(handle);
+}
 
 void SHandleMap::DiscardTemporary(void* handle) {
   SObject* object = FromHandleTemporary(handle);

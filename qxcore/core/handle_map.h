@@ -38,6 +38,8 @@ class QXCORE_API SHandleMap {
   // Destroys all temporary objects, in the order of their handles, then the discarded ones.
   void DeleteTempMap();
 
+  // Changes whenever the permanent map does: what was found in it stays true as long as this number does.
+  unsigned GetPermanentChanges() const { return m_changes; }
   int GetPermanentCount() const { return m_permanent.GetCount(); }  // entries of the permanent map
   int GetTemporaryCount() const { return m_temporary.GetCount(); }  // entries of the temporary map
 
@@ -56,4 +58,5 @@ class QXCORE_API SHandleMap {
   SMap<void*, SObject*> m_permanent;
   SMap<void*, SObject*> m_temporary;
   SMap<void*, SObject*> m_discarded;  // by the object itself
+  unsigned m_changes = 0;
 };

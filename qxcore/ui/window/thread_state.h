@@ -44,6 +44,9 @@ class QXCORE_API SWndThreadState {
   static SWndThreadState& Get();
 
   HWND m_lastOwn = nullptr;           // the window of this thread that got a message last, until its end
+  HWND m_lastAsked = nullptr;         // the window whose object was asked for last,
+  SWnd* m_lastObject = nullptr;       // that object, or null,
+  unsigned m_lastChanges = 0;         // and what SHandleMap::GetPermanentChanges was then
   SWnd* m_pending = nullptr;          // the object whose window is being created, until the hook has seen it
   SCurrentMessage m_current = {};     // the innermost message that is being handled
   HHOOK m_creationHook = nullptr;     // installed while m_pending waits for its window

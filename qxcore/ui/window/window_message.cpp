@@ -1,5 +1,6 @@
 // The road of a message: from the window procedure through the object to its handler.
 
+#include "qxcore/core/handle_map.h"
 #include "qxcore/platform/internal/own_window.h"
 #include "qxcore/ui/app/temp_maps.h"
 #include "qxcore/ui/frame/dialog.h"
@@ -34,6 +35,17 @@ constexpr std::uint64_t Bit(int shape) { return std::uint64_t{1} << shape; }
 constexpr std::uint64_t kMessageShapes = (Bit(53) - Bit(1)) & ~(Bit(2) | Bit(4) | Bit(47) | Bit(49) | Bit(50));
 bool HandlesMessages(std::uintptr_t shape) { return shape <= 52 && (kMessageShapes >> shape & 1) != 0; }
 
+// The object of a window, or null. Messages come in runs for one window, so the last answer is remembered.
+SWnd* ObjectOf(SWndThreadState& state, HWND window) {
+  const unsigned changes = SWnd::HandleMap().GetPermanentChanges();
+  if (window != state.m_lastAsked || changes != state.m_lastChanges) {
+    state.m_lastObject = SWnd::FromHandlePermanent(window);
+    state.m_lastAsked = window;
+    state.m_lastChanges = changes;
+  }
+  return state.m_lastObject;
+}
+
 // What a message returns whose handler threw.
 LRESULT RefusalOf(UINT message) { return message == WM_CREATE ? -1 : 0; }
 
@@ -43,7 +55,7 @@ LRESULT CALLBACK SWindowProcedure(HWND window, UINT message, WPARAM wParam, LPAR
   SWndThreadState& state = SWndThreadState::Get();
   state.m_lastOwn = window;
   const LRESULT result = SGuarded(state, RefusalOf(message), [&] {
-    SWnd* object = SWnd::FromHandlePermanent(window);
+    SWnd* object = ObjectOf(state, window);
     if (object == nullptr) return ::DefWindowProcW(window, message, wParam, lParam);
     const CurrentMessage current(state, {window, message, wParam, lParam});
     if (message == WM_INITDIALOG && object->IsKindOf(&SDlg::classSDlg)) {
