@@ -133,9 +133,37 @@ class Grid {
   static constexpr int kColumns = 4, kRows = 3, kCount = kColumns * kRows;
 
   explicit Grid(HWND top) : m_top(top) {
-    for (int i = 0; i < kCount; ++i) {
-      m_windows[i] = CreateWindowExW(0, WTEXT("WindowContexts"), WTEXT(""), WS_CHILD | WS_VISIBLE, 0, 0, 0, 0, top,
-                                     nullptr, nullptr, nullptr);
+    for (HWND& window : m_windows) window = Make(SRect());
+  }
+
+  // One of the windows comes or goes, or moves by itself, beside the others.
+  void DisturbOne() {
+    const int i = Roll(kCount);
+    HWND& window = m_windows[i];
+    const int show = IsWindowVisible(window) ? SW_HIDE : SW_SHOWNA;
+    switch (Roll(6)) {
+      case 0:
+        ShowWindow(window, show);
+        break;
+      case 1:
+        SetWindowLongW(window, GWL_STYLE, GetWindowLongW(window, GWL_STYLE) ^ WS_VISIBLE);
+        break;
+      case 2:
+        SendMessageW(window, WM_SETREDRAW, !IsWindowVisible(window), 0);
+        break;
+      case 3:
+        DestroyWindow(window);
+        window = Make(m_places[i] = PlaceBeside(i));
+        break;
+      case 4:
+        m_places[i] = PlaceBeside(i);
+        MoveWindow(window, m_places[i].left, m_places[i].top, m_places[i].Width(), m_places[i].Height(), TRUE);
+        break;
+      case 5:
+        ShowWindow(m_top, SW_HIDE);
+        ShowWindow(window, show);
+        ShowWindow(m_top, SW_SHOWNA);
+        break;
     }
   }
 
@@ -144,7 +172,7 @@ class Grid {
     const std::array<int, kColumns + 1> x = Edges<kColumns>(120);
     const std::array<int, kRows + 1> y = Edges<kRows>(90);
     if (Roll(3) == 0) std::swap(m_cells[Roll(kCount)], m_cells[Roll(kCount)]);
-    m_former = m_places;
+    m_former = Shown();
     HDWP batch = BeginDeferWindowPos(kCount);
     for (int i = 0; i < kCount; ++i) {
       const int column = m_cells[i] % kColumns, row = m_cells[i] / kColumns;
@@ -162,6 +190,7 @@ class Grid {
   void Check() {
     const HRGN invalid = CreateRectRgn(0, 0, 0, 0);
     for (int i = 0; i < kCount; ++i) {
+      if (!IsWindowVisible(m_windows[i])) continue;
       GetUpdateRgn(m_windows[i], invalid, FALSE);
       SClientDC dc(m_windows[i]);
       for (int y = 0; y < m_places[i].Height(); y += 2) {
@@ -172,9 +201,10 @@ class Grid {
       }
     }
     GetUpdateRgn(m_top, invalid, FALSE);
+    const Places shown = Shown();
     for (int y = 0; y < 90; ++y) {
-      for (int x = 0; x < 120; ++x) {
-        const bool wasUncovered = IsIn(m_former, x, y) && !IsIn(m_places, x, y);
+      for (int x = 0; x < 140; ++x) {
+        const bool wasUncovered = IsIn(m_former, x, y) && !IsIn(shown, x, y);
         ASSERT_TRUE(!wasUncovered || PtInRegion(invalid, x, y)) << x << ", " << y;
       }
     }
@@ -193,6 +223,17 @@ class Grid {
  private:
   using Places = std::array<SRect, kCount>;
 
+  HWND Make(const SRect& place) {
+    return CreateWindowExW(0, WTEXT("WindowContexts"), WTEXT(""), WS_CHILD | WS_VISIBLE, place.left, place.top,
+                           place.Width(), place.Height(), m_top, nullptr, nullptr, nullptr);
+  }
+  SRect PlaceBeside(int i) { return SRect(SPoint(120, 7 * i), SSize(Roll(20), Roll(7))); }
+  Places Shown() const {
+    Places shown = m_places;
+    for (int i = 0; i < kCount; ++i)
+      if (!IsWindowVisible(m_windows[i])) shown[i] = SRect();
+    return shown;
+  }
   static COLORREF Color(int i) { return RGB(20 * i + 10, 255 - 20 * i, 7 * i); }
   static bool IsIn(const Places& places, int x, int y) {
     return std::any_of(places.begin(), places.end(), [&](const SRect& place) { return place.Contains(SPoint(x, y)); });
@@ -213,11 +254,13 @@ class Grid {
   std::mt19937 m_random{7};
 };
 
-// However often they move before anybody looks.
+// However often they move before anybody looks, and whatever happens to one of them meanwhile.
 TEST_F(WindowContexts, WhatMovesTogetherKeepsItsPixelsOrIsInvalid) {
   ShowWindow(child, SW_HIDE);
+  SetWindowPos(top, nullptr, 0, 0, 140, 90, SWP_NOMOVE | SWP_NOZORDER);
   Grid grid(top);
-  for (int step = 0; step < 300; ++step) {
+  for (int step = 0; step < 600; ++step) {
+    if (step % 3 == 0) grid.DisturbOne();
     grid.Paint();
     for (int moves = step % 3; moves >= 0; --moves) grid.MoveAll();
     grid.Check();

@@ -2,6 +2,7 @@
 
 #include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/atom.h"
+#include "qxcore/platform/posix/window/children_area.h"
 #include "qxcore/platform/posix/window/destroy.h"
 #include "qxcore/platform/posix/window/place.h"
 #include "qxcore/platform/posix/window/send.h"
@@ -117,6 +118,7 @@ void PlaceFirst(HWND handle, const CREATESTRUCTW& create) {
     Window* window = FindWindowObject(handle);
     if (window == nullptr) return;
     window->window = rect;
+    SceneChanged(window);
     const POINT origin = ParentOrigin(window);
     rect = Moved(rect, origin.x, origin.y);
   }

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "qxcore/platform/posix/window/children_area.h"
 #include "qxcore/platform/posix/window/paint.h"
 #include "qxcore/platform/posix/window/place.h"
 #include "qxcore/platform/posix/window/send.h"
@@ -79,7 +80,7 @@ LONG_PTR SetStyle(HWND handle, int index, DWORD wanted) {
     Window* window = FindWindowObject(handle);
     if (window == nullptr) return 0;
     (index == GWL_STYLE ? window->style : window->exStyle) = styles.styleNew;
-    ++g_scene;
+    SceneChanged(window);
   }
   Send(handle, WM_STYLECHANGED, static_cast<WPARAM>(index), reinterpret_cast<LPARAM>(&styles));
   return static_cast<LONG>(styles.styleOld);

@@ -127,16 +127,13 @@ bool CopyAll(DeferredCopies& deferred) {
 
 }  // namespace
 
-bool CopyLater(const Placing& placing) {
-  if (g_painter.movePixels == nullptr) return false;
-  DeferredCopies& deferred = CurrentThread()->deferredCopies;
-  const HWND handle = placing.place.hwnd;
+bool CopyLater(Window* window, const Placing& placing) {
+  if (g_painter.movePixels == nullptr || !window->IsChild() || !StaysValid(placing, window)) return false;
   try {
-    const Guard guard;
-    Window* window = FindWindowObject(handle);
-    return window != nullptr && window->IsChild() && StaysValid(placing, window) && Note(deferred, window, placing);
+    return Note(CurrentThread()->deferredCopies, window, placing);
   } catch (const std::bad_alloc&) {
-    PaintAnew(handle);
+    Invalidate(window, Region(AtOrigin(window->window)), Erase::Yes, Children::All);
+    window->frameUpdate |= window->wantsPaint;
     return false;
   }
 }

@@ -28,9 +28,9 @@ struct DeferredCopies {
   List<MovedPixels> moves;  // room for as many, so that copying takes no memory of the model
 };
 
-// Notes where the pixels are that stay valid through a change of place. Returns whether this window began to wait.
-// Without memory for the note it is painted anew. Without the lock.
-bool CopyLater(const Placing& placing);
+// Under the lock: notes where the pixels are that stay valid through a change of place. Returns whether this window
+// began to wait. Without memory for the note it is painted anew.
+bool CopyLater(Window* window, const Placing& placing);
 // The surface of a top-level window moves with it, and only the client area may lie elsewhere on it: moves its pixels.
 // Without the lock.
 void ShiftClient(const Placing& placing);

@@ -3,6 +3,7 @@
 
 #include <iterator>
 
+#include "qxcore/platform/posix/window/children_area.h"
 #include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/frame.h"
 #include "qxcore/platform/posix/window/paint.h"
@@ -47,38 +48,6 @@ void InvalidateChildren(Window* window, const Region& region, Erase erase, Child
   if (areAllInvalid) window->childrenInvalidAt = g_scene;
 }
 
-// Boxes that are taken from a region together, which is cheaper than one by one.
-class Cuts {
- public:
-  explicit Cuts(Region* region) : m_region(region) {}
-  Cuts(const Cuts&) = delete;
-  Cuts& operator=(const Cuts&) = delete;
-  ~Cuts() { Make(); }
-  void Add(const RECT& rect) {
-    if (m_region->Misses(rect)) return;
-    if (m_count == std::size(m_boxes)) Make();
-    m_boxes[m_count++] = {rect.left, rect.top, rect.right, rect.bottom};
-  }
-
- private:
-  void Make() {
-    if (m_count > 0) m_region->Subtract(Region(m_boxes, m_count));
-    m_count = 0;
-  }
-  Region* m_region;
-  std::size_t m_count = 0;
-  pixman_box32_t m_boxes[64];
-};
-
-// Takes the children's places away.
-void SubtractChildren(const Window* window, Region* region) {
-  const RECT client = ClientInWindow(window), bounds = Moved(region->Bounds(), -client.left, -client.top);
-  Cuts cuts(region);
-  for (const Window* child = window->firstChild; child != nullptr; child = child->next)
-    if (child->IsVisible() && !IsEmpty(Common(child->window, bounds)))
-      cuts.Add(Moved(child->window, client.left, client.top));
-}
-
 void MarkInvalid(Window* window, const Region& region, Erase erase) {
   const RECT client = ClientInWindow(window);
   if (!Same(Common(region.Bounds(), client), region.Bounds())) window->frameUpdate = true;
@@ -95,9 +64,24 @@ Region SiblingsAbove(const Window* window) {
   return region;
 }
 
-}  // namespace
+// All of the window but the part that is kept of it. Where that is to be painted as it is, as after sizes to and fro,
+// there is nothing to add.
+void InvalidateAround(Window* window, const RECT& whole, const RECT& kept) {
+  const RECT sides[] = {{whole.left, whole.top, whole.right, kept.top},
+                        {whole.left, kept.top, kept.left, kept.bottom},
+                        {kept.right, kept.top, whole.right, kept.bottom},
+                        {whole.left, kept.bottom, whole.right, whole.bottom}};
+  const bool isMarked = window->firstChild == nullptr && window->eraseUpdate &&
+                        (window->frameUpdate || Same(ClientInWindow(window), whole));
+  pixman_box32_t added[std::size(sides)];
+  std::size_t count = 0;
+  for (const RECT& side : sides)
+    if (!IsEmpty(side) && !(isMarked && window->update.Holds(side)))
+      added[count++] = {side.left, side.top, side.right, side.bottom};
+  if (count > 0) Invalidate(window, Region(added, count), Erase::Yes, Children::All);
+}
 
-std::uint64_t g_scene = 1;
+}  // namespace
 
 RECT ClipByParents(const Window* window) {
   RECT clip = AtOrigin(window->window);
@@ -111,7 +95,8 @@ RECT ClipByParents(const Window* window) {
 }
 
 bool IsUnpainted(const Window* window) {
-  return window->firstChild == nullptr && window->wantsPaint && IsAllInvalid(window, ClipByParents(window));
+  const bool isMarked = window->wantsPaint && window->eraseUpdate && window->frameUpdate;
+  return isMarked && window->firstChild == nullptr && IsAllInvalid(window, ClipByParents(window));
 }
 
 void SetWantsPaint(Window* window, bool wants) {
@@ -200,20 +185,25 @@ void SpoilByOrder(Window* window) {
   }
 }
 
-bool Uncover(Window* parent, Region* uncovered, Children children) {
+void UncoverBetween(Window* parent, Region uncovered) {
+  if (!IsShown(parent)) return;
   const RECT client = ClientInWindow(parent);
-  uncovered->Move(client.left, client.top);
-  uncovered->Intersect(client);
-  if (uncovered->IsEmpty()) return false;
-  Invalidate(parent, *uncovered, Erase::Yes, children);
-  return true;
+  uncovered.Move(client.left, client.top);
+  uncovered.Intersect(Common(client, ClipByParents(parent)));
+  if (!uncovered.IsEmpty()) MarkInvalid(parent, uncovered, Erase::Yes);
 }
 
 bool UncoverByMove(Window* window, const RECT& oldWindow) {
-  if (IsRoot(window->parent)) return false;
+  Window* parent = window->parent;
+  if (IsRoot(parent)) return false;
+  const RECT client = ClientInWindow(parent);
   Region uncovered(oldWindow);
   if (IsShown(window)) uncovered.Subtract(window->window);
-  return Uncover(window->parent, &uncovered, Children::All);
+  uncovered.Move(client.left, client.top);
+  uncovered.Intersect(client);
+  if (uncovered.IsEmpty()) return false;
+  Invalidate(parent, uncovered, Erase::Yes, Children::All);
+  return true;
 }
 
 void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
@@ -236,9 +226,11 @@ void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, b
   const RECT oldPlace = Moved(oldClient, -oldWindow.left, -oldWindow.top);
   if (sameSize && Same(oldPlace, ClientInWindow(window)) && !redraws) return;
   // Of what the children showed nothing is left outside, and nowhere when all of the window is given up.
-  Region outside(whole);
-  if (!(flags & SWP_NOCOPYBITS)) outside.Subtract(kept);
-  Invalidate(window, outside, Erase::Yes, Children::All);
+  if (flags & SWP_NOCOPYBITS) {
+    Invalidate(window, Region(whole), Erase::Yes, Children::All);
+  } else {
+    InvalidateAround(window, whole, kept);
+  }
   if (redraws) Invalidate(window, Region(whole), Erase::Yes, Children::Unclipped);
 }
 

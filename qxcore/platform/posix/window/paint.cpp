@@ -2,6 +2,7 @@
 
 #include "qxcore/platform/posix/window/paint.h"
 
+#include "qxcore/platform/posix/window/children_area.h"
 #include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/default_proc.h"
 #include "qxcore/platform/posix/window/deferred_copies.h"
@@ -96,9 +97,10 @@ LRESULT DefaultSetRedraw(HWND handle, BOOL redraw) {
   if (window == nullptr) return 0;
   if (redraw) {
     window->style |= WS_VISIBLE;
-    ++g_scene;
+    SceneChanged(window);
   } else {
     window->style &= ~WS_VISIBLE;
+    SceneChanged(window);
     DropPaint(window);
   }
   return 0;

@@ -7,11 +7,6 @@ namespace platform::model {
 
 // All under the lock, up to EraseNow.
 
-// The number of the scene: it changes whenever a window comes to light, moves or gets another size. While it is the
-// same, a window remembers that all its children are invalid as a whole; validating one of them makes it forget.
-// Without that, every one of many siblings that goes would ask all the others.
-extern std::uint64_t g_scene;
-
 enum class Erase { No, Yes };
 enum class Children { No, Unclipped, All };
 // Adds to what must be painted of a window, and of the children that lie there: none, those that the style
@@ -31,9 +26,8 @@ void SetWantsPaint(Window* window, bool wants);
 // After a change of place of a window that was shown: what comes to light of the parent and of siblings. Returns
 // whether anything did.
 bool UncoverByMove(Window* window, const RECT& oldWindow);
-// The same for what several children left, relative to the parent's client area; the region is changed. `children`: No
-// where none of the others can lie there.
-bool Uncover(Window* parent, Region* uncovered, Children children);
+// The same for what came to light between the children of a window, relative to its client area.
+void UncoverBetween(Window* parent, Region uncovered);
 // After a change of place: what must be painted of the window itself.
 void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags);
 // After a change in the Z order: where the window and its siblings overlap.

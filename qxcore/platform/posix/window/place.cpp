@@ -3,6 +3,7 @@
 #include "qxcore/platform/posix/window/place.h"
 
 #include "qxcore/platform/posix/window/activate.h"
+#include "qxcore/platform/posix/window/children_area.h"
 #include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/default_proc.h"
 #include "qxcore/platform/posix/window/deferred_copies.h"
@@ -69,21 +70,13 @@ void Settle(const Window* window, WINDOWPOS& place) {
 }
 
 // The new rectangles; asks the window for its client area when the size or the frame changes.
-NewPlace Measure(HWND handle, const WINDOWPOS& place) {
-  RECT oldWindow{}, oldClient{};
-  {
-    const Guard guard;
-    const Window* window = FindWindowObject(handle);
-    if (window == nullptr) return {};
-    oldWindow = window->window;
-    oldClient = window->client;
-  }
+NewPlace Measure(const WINDOWPOS& place, const NewPlace& now) {
   const RECT moved{place.x, place.y, place.x + place.cx, place.y + place.cy};
   const bool asks = (place.flags & SWP_FRAMECHANGED) || !(place.flags & SWP_NOSIZE);
-  if (!asks) return {moved, Moved(oldClient, moved.left - oldWindow.left, moved.top - oldWindow.top)};
+  if (!asks) return {moved, Moved(now.client, moved.left - now.window.left, moved.top - now.window.top)};
   WINDOWPOS copy = place;
-  NCCALCSIZE_PARAMS parameters{{moved, oldWindow, oldClient}, &copy};
-  Send(handle, WM_NCCALCSIZE, TRUE, reinterpret_cast<LPARAM>(&parameters));
+  NCCALCSIZE_PARAMS parameters{{moved, now.window, now.client}, &copy};
+  Send(place.hwnd, WM_NCCALCSIZE, TRUE, reinterpret_cast<LPARAM>(&parameters));
   return {moved, parameters.rgrc[0]};
 }
 
@@ -128,11 +121,12 @@ void Apply(Window* window, Placing& placing, Uncovers uncovers) {
   const NewPlace& to = placing.to;
   const RECT oldClient = window->client;
   const bool moves = window->window.left != to.window.left || window->window.top != to.window.top;
-  const bool takesPixels = moves && window->IsChild() && IsShown(window) && !(place.flags & SWP_NOREDRAW);
-  Region hidden;
-  if (takesPixels) hidden = HiddenPart(window, uncovers);
+  const bool wasVisible = window->IsVisible();
   placing.from = {window->window, window->client};
   placing.wasShown = IsShown(window);
+  const bool takesPixels = moves && window->IsChild() && placing.wasShown && !(place.flags & SWP_NOREDRAW);
+  Region hidden;
+  if (takesPixels) hidden = HiddenPart(window, uncovers);
   placing.isUnpainted = IsUnpainted(window);
   if (!(place.flags & SWP_NOZORDER)) Reorder(window, place.hwndInsertAfter);
   window->window = to.window;
@@ -142,7 +136,7 @@ void Apply(Window* window, Placing& placing, Uncovers uncovers) {
     window->style &= ~WS_VISIBLE;
     DropPaint(window);
   }
-  if (window->IsVisible()) ++g_scene;
+  if (wasVisible || window->IsVisible()) SceneChanged(window);
   if (oldClient.left == to.client.left && oldClient.top == to.client.top) place.flags |= kNoClientMove;
   if (Width(oldClient) == Width(to.client) && Height(oldClient) == Height(to.client)) place.flags |= kNoClientSize;
   if (place.flags & SWP_NOREDRAW) return;
@@ -152,17 +146,31 @@ void Apply(Window* window, Placing& placing, Uncovers uncovers) {
   placing.isUnpainted |= IsUnpainted(window);
 }
 
-// Whether pixels that wait to be copied would be looked for in the wrong place afterwards. In a batch, siblings may
-// move.
-bool MovesOthers(const Placing& placing, Uncovers uncovers) {
+// Under the lock: whether pixels that wait to be copied would be looked for in the wrong place afterwards. In a batch,
+// siblings may move.
+bool MovesOthers(const Window* window, const Placing& placing, Uncovers uncovers) {
   const DeferredCopies& deferred = CurrentThread()->deferredCopies;
   if (deferred.copies.empty()) return false;
-  const Guard guard;
-  const Window* window = FindWindowObject(placing.place.hwnd);
-  if (window == nullptr) return false;
   if (uncovers == Uncovers::Later && HandleOf(window->parent) == deferred.parent) return false;
   const RECT &from = window->client, &to = placing.to.client;
   return from.left != to.left || from.top != to.top || placing.place.flags & (SWP_SHOWWINDOW | SWP_HIDEWINDOW);
+}
+
+// The request as the window wants it, and the place that it asks for. False when there is no such window any more.
+bool Propose(Placing& placing) {
+  WINDOWPOS& place = placing.place;
+  const HWND handle = place.hwnd;
+  if (!(place.flags & SWP_NOSENDCHANGING)) Send(handle, WM_WINDOWPOSCHANGING, 0, reinterpret_cast<LPARAM>(&place));
+  NewPlace now;
+  {
+    const Guard guard;
+    const Window* window = Expect(handle);
+    if (window == nullptr) return false;
+    Settle(window, place);
+    now = {window->window, window->client};
+  }
+  placing.to = Measure(place, now);
+  return true;
 }
 
 HWND ParentHandle(HWND handle) {
@@ -174,21 +182,20 @@ HWND ParentHandle(HWND handle) {
 }  // namespace
 
 bool Begin(Placing& placing, Uncovers uncovers) {
-  WINDOWPOS& place = placing.place;
-  const HWND handle = place.hwnd;
-  if (!(place.flags & SWP_NOSENDCHANGING)) Send(handle, WM_WINDOWPOSCHANGING, 0, reinterpret_cast<LPARAM>(&place));
-  {
-    const Guard guard;
-    const Window* window = Expect(handle);
-    if (window == nullptr) return false;
-    Settle(window, place);
-  }
-  placing.to = Measure(handle, place);
-  if (MovesOthers(placing, uncovers)) CopyNow();
+  if (!Propose(placing)) return false;
+  const HWND handle = placing.place.hwnd;
   const Guard guard;
   Window* window = Expect(handle);
+  if (window != nullptr && MovesOthers(window, placing, uncovers)) {
+    {
+      const Unguarded unguarded;
+      CopyNow();
+    }
+    window = Expect(handle);
+  }
   if (window == nullptr) return false;
   Apply(window, placing, uncovers);
+  placing.isWaiting = CopyLater(window, placing);
   return placing.isDone = true;
 }
 
@@ -215,7 +222,7 @@ bool Finish(Placing& placing) {
 
 bool PlaceNow(Placing& placing) {
   if (!Begin(placing, Uncovers::Now)) return false;
-  if (CopyLater(placing)) CopyNow();
+  if (placing.isWaiting) CopyNow();
   ShiftClient(placing);
   return Finish(placing);
 }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "qxcore/platform/posix/window/children_area.h"
 #include "qxcore/platform/posix/window/controls.h"
 #include "qxcore/platform/posix/window/deferred_copies.h"
 #include "qxcore/platform/posix/window/paint.h"
@@ -20,34 +21,29 @@ struct Batch : OnModelHeap {
   Batch& operator=(const Batch&) = delete;
 
   List<Placing> placings;
-  // For windows that move together; their room is made at the beginning.
-  List<pixman_box32_t> left, taken;
+  // For windows that move together.
+  HWND parent = nullptr;
+  Region before;  // what the parent's children covered
 };
 
-pixman_box32_t BoxOf(const RECT& rect) { return {rect.left, rect.top, rect.right, rect.bottom}; }
-
-std::size_t CountShownChildren(const Window* parent) {
-  std::size_t count = 0;
-  for (const Window* child = parent->firstChild; child != nullptr; child = child->next) count += child->IsVisible();
-  return count;
+// What comes to light of the parent when all are in their new places: nothing where one window made room for another.
+// All of it, when there is no memory to say what.
+Region Uncovered(const Batch& batch, Window* parent) {
+  try {
+    Region uncovered = batch.before;
+    uncovered.Subtract(AreaOfChildren(parent).covered);
+    for (const Placing& placing : batch.placings)
+      if (placing.wasShown && placing.place.flags & SWP_NOREDRAW) uncovered.Subtract(placing.from.window);
+    return uncovered;
+  } catch (const std::bad_alloc&) {
+    return Region(AtOrigin(parent->client));
+  }
 }
 
-// Under the lock: what comes to light of the parent when all are in their new places. Where one window made room for
-// another, nothing does.
-void UncoverTogether(Batch* batch) {
-  auto &left = batch->left, &taken = batch->taken;
-  Window* parent = nullptr;
-  for (const Placing& placing : batch->placings) {
-    Window* window = placing.isDone ? FindWindowObject(placing.place.hwnd) : nullptr;
-    if (window == nullptr || !placing.wasShown || placing.place.flags & SWP_NOREDRAW) continue;
-    parent = window->parent;
-    left.push_back(BoxOf(placing.from.window));
-    if (IsShown(window)) taken.push_back(BoxOf(window->window));
-  }
-  if (parent == nullptr || IsRoot(parent)) return;
-  Region uncovered(left.data(), left.size());
-  uncovered.Subtract(Region(taken.data(), taken.size()));
-  Uncover(parent, &uncovered, CountShownChildren(parent) == taken.size() ? Children::No : Children::All);
+void UncoverTogether(const Batch& batch) {
+  const Guard guard;
+  Window* parent = FindWindowObject(batch.parent);
+  if (parent != nullptr) UncoverBetween(parent, Uncovered(batch, parent));
 }
 
 // A context that is open would draw where pixels wait.
@@ -63,14 +59,8 @@ void CopyIfInUse(HWND handle) {
 // Windows that may be erased later change the screen once, all together, before they hear of it.
 bool PlaceTogether(Batch* batch) {
   bool isDone = true;
-  for (Placing& placing : batch->placings) {
-    isDone &= Begin(placing, Uncovers::Later);
-    if (placing.isDone) CopyLater(placing);
-  }
-  {
-    const Guard guard;
-    UncoverTogether(batch);
-  }
+  for (Placing& placing : batch->placings) isDone &= Begin(placing, Uncovers::Later);
+  UncoverTogether(*batch);
   CopyIfInUse(CurrentThread()->deferredCopies.parent);
   for (Placing& placing : batch->placings) isDone &= placing.isDone && IsWindow(placing.place.hwnd) && Finish(placing);
   return isDone;
@@ -83,8 +73,8 @@ bool PlaceOneByOne(Batch* batch) {
 }
 
 // The parent of the windows, which is one as published; null where it is not, and for none.
-const Window* ParentOf(const Batch& batch) {
-  const Window* parent = nullptr;
+Window* ParentOf(const Batch& batch) {
+  Window* parent = nullptr;
   for (const Placing& placing : batch.placings) {
     const Window* window = FindWindowObject(placing.place.hwnd);
     if (window == nullptr) continue;
@@ -94,22 +84,10 @@ const Window* ParentOf(const Batch& batch) {
   return parent;
 }
 
-// Whether the children of the windows' parent, and the parent itself, lie clear of all others. What one hid of another
-// could not be told any more once both have moved.
-bool AreApart(Batch* batch, const Window* parent) {
-  List<pixman_box32_t>& places = batch->left;
+bool ShowsWhole(const Window* window) {
   Region visible;
-  VisibleRegion(parent, false, &visible);
-  if (!visible.Covers(visible.Bounds())) return false;
-  long long sum = 0;
-  for (const Window* window = parent->firstChild; window != nullptr; window = window->next) {
-    if (!window->IsVisible()) continue;
-    places.push_back(BoxOf(window->window));
-    sum += static_cast<long long>(Width(window->window)) * Height(window->window);
-  }
-  const bool areApart = Region(places.data(), places.size()).Area() == sum;
-  places.clear();
-  return areApart;
+  VisibleRegion(window, false, &visible);
+  return visible.Covers(visible.Bounds());
 }
 
 bool MayEraseLater(const Batch& batch) {
@@ -117,15 +95,19 @@ bool MayEraseLater(const Batch& batch) {
                      [](const Placing& placing) { return (placing.place.flags & SWP_DEFERERASE) != 0; });
 }
 
+// Whether the children of the windows' parent, and the parent itself, lie clear of all others. What one hid of another
+// could not be told any more once both have moved.
 bool CanMoveTogether(Batch* batch) {
   if (!MayEraseLater(*batch)) return false;
   return OrNoMemory<bool>(false, [batch] {
     const Guard guard;
-    batch->left.reserve(batch->placings.size());
-    batch->taken.reserve(batch->placings.size());
-    const Window* parent = ParentOf(*batch);
-    if (parent == nullptr || IsRoot(parent)) return false;
-    return AreApart(batch, parent);
+    Window* parent = ParentOf(*batch);
+    if (parent == nullptr || IsRoot(parent) || !ShowsWhole(parent)) return false;
+    const ChildrenArea& children = AreaOfChildren(parent);
+    if (!children.areApart) return false;
+    batch->parent = parent->handle;
+    batch->before = children.covered;
+    return true;
   });
 }
 

@@ -15,12 +15,13 @@ struct Placing {
   WINDOWPOS place;
   NewPlace from{}, to{};
   bool wasShown = false, spoilsParent = false, isUnpainted = false, isDone = false;
+  bool isWaiting = false;  // the window's pixels wait to be copied, since this request
 };
 
 enum class Uncovers { Now, Later };
 
-// The first half: the window is in its new place, and its pixels are where they were. What it left comes to light now,
-// or the caller sees to that. False when there is no such window any more.
+// The first half: the window is in its new place, and its pixels, where they were, are noted (deferred_copies.h). What
+// it left comes to light now, or the caller sees to that. False when there is no such window any more.
 bool Begin(Placing& placing, Uncovers uncovers);
 
 // The second half: the display, activation, what must be erased at once, and what the window hears of it.

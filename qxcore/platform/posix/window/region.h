@@ -35,7 +35,9 @@ class Region {
   void Subtract(const RECT& rect) { Subtract(Region(rect)); }
   void Intersect(const RECT& rect) { Intersect(Region(rect)); }
   void Intersect(const Region& other) { pixman_region32_intersect(&m_region, &m_region, &other.m_region); }
-  void Move(int dx, int dy) { pixman_region32_translate(&m_region, dx, dy); }
+  void Move(int dx, int dy) {
+    if (dx != 0 || dy != 0) pixman_region32_translate(&m_region, dx, dy);
+  }
   RECT Bounds() const {
     const pixman_box32_t* box = pixman_region32_extents(const_cast<pixman_region32_t*>(&m_region));
     return {box->x1, box->y1, box->x2, box->y2};
@@ -44,6 +46,11 @@ class Region {
   bool Misses(const RECT& rect) const {
     pixman_box32_t box{rect.left, rect.top, rect.right, rect.bottom};
     return pixman_region32_contains_rectangle(const_cast<pixman_region32_t*>(&m_region), &box) == PIXMAN_REGION_OUT;
+  }
+  // Whether all of the rectangle lies in it.
+  bool Holds(const RECT& rect) const {
+    pixman_box32_t box{rect.left, rect.top, rect.right, rect.bottom};
+    return pixman_region32_contains_rectangle(const_cast<pixman_region32_t*>(&m_region), &box) == PIXMAN_REGION_IN;
   }
   // Whether it is one rectangle that holds the given one.
   bool Covers(const RECT& rect) const {

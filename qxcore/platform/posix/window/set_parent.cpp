@@ -1,5 +1,6 @@
 // Moving a window to another parent: it is hidden, moved in the tree, and shown again.
 
+#include "qxcore/platform/posix/window/children_area.h"
 #include "qxcore/platform/posix/window/paint.h"
 #include "qxcore/platform/posix/window/send.h"
 #include "qxcore/platform/posix/window/tree.h"
@@ -34,6 +35,7 @@ HWND SetParent(HWND handle, HWND newParent) {
     const POINT after = ParentOrigin(window);
     window->window = Moved(window->window, before.x - after.x, before.y - after.y);
     window->client = Moved(window->client, before.x - after.x, before.y - after.y);
+    SceneChanged(window);
   }
   SetWindowPos(handle, HWND_TOP, place.x, place.y, 0, 0, SWP_NOSIZE | (wasVisible ? 0u : SWP_NOACTIVATE));
   if (wasVisible) ShowWindow(handle, SW_SHOW);

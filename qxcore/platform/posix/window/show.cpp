@@ -2,6 +2,7 @@
 
 #include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/activate.h"
+#include "qxcore/platform/posix/window/children_area.h"
 #include "qxcore/platform/posix/window/default_proc.h"
 #include "qxcore/platform/posix/window/paint.h"
 #include "qxcore/platform/posix/window/place.h"
@@ -94,7 +95,7 @@ void ToggleStyle(HWND handle, bool visible) {
   Window* window = FindWindowObject(handle);
   if (window == nullptr) return;
   window->style = visible ? window->style | WS_VISIBLE : window->style & ~WS_VISIBLE;
-  ++g_scene;
+  SceneChanged(window);
 }
 
 struct Plan {

@@ -3,6 +3,7 @@
 #include "qxcore/platform/internal/own_window.h"
 #include "qxcore/platform/posix/display/display.h"
 #include "qxcore/platform/posix/window/atom.h"
+#include "qxcore/platform/posix/window/children_area.h"
 #include "qxcore/platform/posix/window/paint.h"
 #include "qxcore/platform/posix/window/queue.h"
 
@@ -56,10 +57,11 @@ void Link(Window* window, Window* parent, Window* after) {
   (window->previous != nullptr ? window->previous->next : parent->firstChild) = window;
   (window->next != nullptr ? window->next->previous : parent->lastChild) = window;
   for (Window* above = parent; above != nullptr; above = above->parent) above->childPaints += window->childPaints;
-  if (window->IsVisible()) ++g_scene;
+  if (window->IsVisible()) SceneChanged(window);
 }
 
 void Unlink(Window* window) {
+  if (window->IsVisible()) SceneChanged(window);
   Window* parent = window->parent;
   (window->previous != nullptr ? window->previous->next : parent->firstChild) = window->next;
   (window->next != nullptr ? window->next->previous : parent->lastChild) = window->previous;

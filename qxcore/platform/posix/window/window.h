@@ -29,6 +29,13 @@ struct Property {
   HANDLE value;
 };
 
+// See children_area.h.
+struct ChildrenArea {
+  Region covered;
+  bool areApart = true;  // none of them lies over another
+  bool isKnown = false;
+};
+
 struct Window : OnModelHeap {
   HWND handle = nullptr;
   Thread* thread = nullptr;  // null for the two roots
@@ -69,7 +76,8 @@ struct Window : OnModelHeap {
   bool eraseUpdate = false, frameUpdate = false, internalPaint = false;
   bool wantsPaint = false;
   int childPaints = 0;                  // windows below this one, itself included, that want WM_PAINT
-  std::uint64_t childrenInvalidAt = 0;  // the scene (paint.h) in which nothing could be added to what is below
+  std::uint64_t childrenInvalidAt = 0;  // the scene in which nothing could be added to what is to be painted below
+  ChildrenArea children;
 
   // Numbers in lists that may have been given up since: what stands there names its window.
   std::size_t placing = 0;       // in the last batch
