@@ -294,6 +294,15 @@ TEST_F(Screen, FilesAreDropped) {
   EXPECT_FALSE(m_board.Got(WM_DROPFILES));
 }
 
+// The answers to a program that has gone reach nobody, and end nothing.
+TEST_F(Screen, ADragEndsWithItsProgram) {
+  ::DragAcceptFiles(m_board.m_hWnd, TRUE);
+  m_client.BeginDragAndGo(OnScreen(33, 44));
+  m_client.Type("x");
+  EXPECT_TRUE(Waits(WM_CHAR));
+  EXPECT_FALSE(m_board.Got(WM_DROPFILES));
+}
+
 // --- the clipboard ---
 
 SString ClipboardText(const SWnd& window) {

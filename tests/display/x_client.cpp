@@ -193,6 +193,13 @@ class DragSource {
 
   // Like file managers it offers more kinds than fit the first message, which then stand in a property.
   bool Run(POINT point) {
+    Enter(point);
+    const bool isWelcome = WaitFor("XdndStatus") & 1;
+    if (!isWelcome) return Tell("XdndLeave", 0, 0, 0, 0), false;
+    Tell("XdndDrop", 0, CurrentTime, 0, 0);
+    return WaitFor("XdndFinished") & 1;
+  }
+  void Enter(POINT point) {
     XSetSelectionOwner(m_server, Name("XdndSelection"), m_own, CurrentTime);
     const Atom kinds[] = {Name("application/x-files"), Name("application/x-icons"), Name("text/uri-list"),
                           Name("text/plain")};
@@ -201,10 +208,6 @@ class DragSource {
     Tell("XdndEnter", 5L << 24 | 1, static_cast<long>(kinds[0]), static_cast<long>(kinds[1]),
          static_cast<long>(kinds[2]));
     Tell("XdndPosition", 0, point.x << 16 | point.y, CurrentTime, static_cast<long>(Name("XdndActionCopy")));
-    const bool isWelcome = WaitFor("XdndStatus") & 1;
-    if (!isWelcome) return Tell("XdndLeave", 0, 0, 0, 0), false;
-    Tell("XdndDrop", 0, CurrentTime, 0, 0);
-    return WaitFor("XdndFinished") & 1;
   }
 
  private:
@@ -257,6 +260,14 @@ bool XClient::Drop(POINT point, const std::string& uris) {
   Move(point);
   const ::Window target = m_state->FindDropTarget();
   return target != None && DragSource(m_state->server, m_state->own, target, uris).Run(point);
+}
+
+void XClient::BeginDragAndGo(POINT point) {
+  Move(point);
+  const ::Window brief = XCreateSimpleWindow(m_state->server, m_state->root, 1200, 900, 20, 20, 0, 0, 0);
+  DragSource(m_state->server, brief, m_state->FindDropTarget(), "").Enter(point);
+  XDestroyWindow(m_state->server, brief);
+  XSync(m_state->server, False);
 }
 
 // --- the clipboard ---

@@ -46,6 +46,8 @@ class XClient {
   // at that point has taken them, false when none there takes drops, when it refuses and after five seconds. The
   // window's thread must not wait.
   bool Drop(POINT point, const std::string& uris);
+  // Begins a drag there with a window that goes at once, as that of a program that ends meanwhile.
+  void BeginDragAndGo(POINT point);
 
   // --- the clipboard ---
   // Asks the owner of the clipboard for its text; Answer() returns true once it is there.

@@ -51,6 +51,12 @@ unsigned ChosenDpi(::Display* server) {
   return dpi >= 48 && dpi <= 960 ? static_cast<unsigned>(dpi + 0.5) : 0;
 }
 
+XErrorHandler g_formerHandler = nullptr;
+
+int OnError(::Display* server, XErrorEvent* error) {
+  return error->error_code == BadWindow ? 0 : g_formerHandler(server, error);
+}
+
 // A connection beside SDL's, for questions alone.
 ::Display* TheServer() {
   static ::Display* const server = XOpenDisplay(nullptr);
@@ -71,6 +77,10 @@ bool FindPointer(int* x, int* y) {
   unsigned buttons = 0;
   return server != nullptr &&
          XQueryPointer(server, DefaultRootWindow(server), &root, &child, x, y, &inWindowX, &inWindowY, &buttons);
+}
+
+void OutliveWindows() {
+  if (g_formerHandler == nullptr) g_formerHandler = XSetErrorHandler(&OnError);
 }
 
 void NameWindow(SDL_Window* window, const std::string& name) {

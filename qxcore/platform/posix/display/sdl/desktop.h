@@ -17,6 +17,11 @@ Desktop AskDesktop();
 // Where the pointer is now; SDL's own answer is that of the last event. False without an X server.
 bool FindPointer(int* x, int* y);
 
+// Goes on after the errors of a server that a program cannot avoid: those of windows that have gone. A window of
+// another program may go while it is answered; and SDL wakes itself by an event to one of our windows, over a second
+// connection, which the server may read after the window was destroyed on the first. Xlib would end the process.
+void OutliveWindows();
+
 // Names a window in UTF-8 for the window manager. SDL's own way needs a locale that has the characters.
 void NameWindow(SDL_Window* window, const std::string& name);
 

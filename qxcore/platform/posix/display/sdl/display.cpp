@@ -418,5 +418,6 @@ extern "C" __attribute__((visibility("default"))) platform::Display* qxcore_open
     *reason = SDL_GetError();
     return nullptr;
   }
+  platform::sdl::OutliveWindows();
   return new platform::sdl::SdlDisplay(events);
 }
