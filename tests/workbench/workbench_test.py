@@ -93,6 +93,12 @@ class WorkbenchTest(unittest.TestCase):
         shown = self.run_done("open texts\nkey home\nkey down\nwait\nkey enter\nwait\nprint preview\n")
         self.assertEqual(shown, GERMAN)
 
+    def test_escape_brings_the_splitter_back(self):
+        moves = "key f8\nkey right\nkey right\n"
+        before, moved, after = self.run_done(f"split 300\nprint splitter\n{moves}wait\nprint splitter\nkey escape\nwait\nprint splitter\n").splitlines()
+        self.assertNotEqual(before, moved)
+        self.assertEqual(after, before)
+
     def test_a_preview_in_another_encoding(self):
         self.write("a.txt", GERMAN, "cp850")
         shown = self.run_done("open texts\npreview a.txt as Cp850\nprint preview\n")
@@ -197,6 +203,22 @@ class WorkbenchTest(unittest.TestCase):
         for name in before:
             name = name.removeprefix("texts/")
             self.assertEqual((self.folder / "out" / name).read_bytes(), self.converted_by_tool(name, "UTF-8"), name)
+
+    def test_a_file_is_converted_as_it_is_shown(self):
+        self.write("a.txt", GERMAN, "cp850")
+        self.run_done("open texts\nselect all\npreview a.txt as Cp850\nanswer yes\nconvert UTF-8\nwait\n")
+        self.assertEqual((self.texts / "a.txt").read_text(encoding="utf-8"), GERMAN)
+
+    def test_converted_files_are_read_in_their_new_encoding(self):
+        """By the list, by a preview and by the next conversion, also where detection would find another one."""
+        self.write("a.txt", GERMAN)
+        shown = self.run_done("open texts\nselect all\npreview a.txt\nanswer yes\nconvert Cp850\nprint list\nprint preview\n"
+                              "answer yes\nconvert UTF-16\nprint list\n").splitlines()
+        size = len(GERMAN.encode("cp850"))
+        self.assertEqual(shown[0].split("\t")[:3], ["a.txt", "OEM - Multilingual Latin I", str(size)])
+        self.assertEqual("\n".join(shown[1:3]) + "\n", GERMAN)
+        self.assertEqual(shown[3].split("\t")[1], "Unicode")
+        self.assertEqual((self.texts / "a.txt").read_text(encoding="utf-16le"), GERMAN)
 
     def test_the_question_in_each_mode(self):
         """Without losses the default is to convert; with losses it is not; abort never guesses."""

@@ -18,6 +18,7 @@
 struct ConversionItem {
   std::string native;  // the file, as an argument
   SString name;        // as the list shows it
+  int number = -1;     // in the list
   Encoding from = 0;   // what it is read in
   std::string target;  // where it goes, a path of the system
   SString losses;      // what the trial found would be lost; empty for nothing
@@ -44,6 +45,8 @@ class ConversionJob {
   const std::vector<ConversionItem>& Items() const { return m_items; }
   Encoding Target() const { return m_to; }
   int Total() const { return static_cast<int>(m_items.size()); }
+  // How many of the conversion itself are done.
+  int DoneWriting() const { return m_isTrialOver ? static_cast<int>(m_next) : 0; }
   // How many files are done, each counted once in the trial and once in the conversion.
   int Done() const { return static_cast<int>(m_next) + (m_isTrialOver ? Total() : 0); }
 

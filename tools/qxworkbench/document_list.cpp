@@ -1,8 +1,10 @@
 #include "tools/qxworkbench/document_list.h"
 
 #include <algorithm>
+#include <filesystem>
 #include <utility>
 
+#include "tools/common/console.h"
 #include "tools/common/utf8.h"
 
 namespace {
@@ -45,6 +47,16 @@ void DocumentList::SetFinding(int number, const Finding& finding) {
   document.warning = finding.error.empty() ? finding.warning : FromUtf8(finding.error);
   NoteTexts(document);
   if (movesRow) Insert(number);
+}
+
+void DocumentList::SetConverted(int number, Encoding encoding) {
+  Finding finding;
+  finding.value = encoding;
+  finding.encoding = ShownName(encoding);
+  std::error_code error;
+  finding.bytes = std::filesystem::file_size(console::PathOf(At(number).native), error);
+  if (error) finding.bytes = At(number).bytes;
+  SetFinding(number, finding);
 }
 
 void DocumentList::NoteTexts(const Document& document) {

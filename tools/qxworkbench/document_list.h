@@ -34,6 +34,8 @@ class DocumentList {
   int Add(Document document);
   // Notes what detection found, and moves the document to its row.
   void SetFinding(int number, const Finding& finding);
+  // Notes that the file was converted to an encoding.
+  void SetConverted(int number, Encoding encoding);
 
   int Count() const { return static_cast<int>(m_documents.size()); }
   const Document& At(int number) const { return m_documents[static_cast<std::size_t>(number)].document; }

@@ -89,6 +89,13 @@ void WorkbenchFrame::MakeBar() {
   Say(WTEXT("Open a folder to begin, or drop one here."));
 }
 
+// Without work to cancel, Escape belongs to what has the keyboard.
+int WorkbenchFrame::PreTranslateMessage(MSG* message) {
+  const bool isEscape = message->message == WM_KEYDOWN && message->wParam == VK_ESCAPE;
+  if (isEscape && !m_bar.InProgress()) return SWnd::PreTranslateMessage(message);
+  return SDockSiteFrameWnd::PreTranslateMessage(message);
+}
+
 void WorkbenchFrame::OnDestroy() {
   m_detection.Cancel();
   m_conversion.Cancel();
@@ -179,6 +186,7 @@ void WorkbenchFrame::StepDetection() {
 
 void WorkbenchFrame::StepConversion() {
   if (m_conversion.IsRunning()) m_conversion.Step(Slice());
+  EnterConverted();
   ShowProgress(m_conversion.Done(), 2 * m_conversion.Total());
   if (CancelWasPressed(m_conversion.Done())) m_conversion.Cancel();
   if (m_conversion.IsRunning()) return;
@@ -189,6 +197,22 @@ void WorkbenchFrame::StepConversion() {
     Report(result);
   } else {
     Say(result);
+  }
+}
+
+// What was converted in its place is from now on read in its new encoding. Another folder may be open by then.
+void WorkbenchFrame::EnterConverted() {
+  for (; m_entered < m_conversion.DoneWriting(); ++m_entered) {
+    const ConversionItem& item = m_conversion.Items()[static_cast<std::size_t>(m_entered)];
+    if (!item.isWritten || item.target != item.native) continue;
+    if (item.number < m_documents.Count() && m_documents.At(item.number).native == item.native)
+      m_documents.SetConverted(item.number, m_conversion.Target());
+    if (PreviewView* preview = FindPreview(item.native)) preview->SetDetected(m_conversion.Target());
+  }
+  if (m_conversion.GetPhase() == ConversionJob::kEnded) {
+    m_list->ListChanged();
+  } else {
+    ShowList();
   }
 }
 
@@ -294,13 +318,19 @@ void WorkbenchFrame::OpenFolder(const SString& folder) {
 
 PreviewView* WorkbenchFrame::CurrentPreview() const { return static_cast<PreviewView*>(m_tabs.GetActiveTab()); }
 
-PreviewView* WorkbenchFrame::ShowPreview(int number) {
-  const Document& document = m_documents.At(number);
+PreviewView* WorkbenchFrame::FindPreview(const std::string& native) const {
   for (int tab = 0; tab < m_tabs.GetTabCount(); ++tab) {
     auto* preview = static_cast<PreviewView*>(m_tabs.GetTabWindow(tab));
-    if (preview->File() != document.native) continue;
-    m_tabs.ActivateTab(tab);
-    return preview;
+    if (preview->File() == native) return preview;
+  }
+  return nullptr;
+}
+
+PreviewView* WorkbenchFrame::ShowPreview(int number) {
+  const Document& document = m_documents.At(number);
+  if (PreviewView* shown = FindPreview(document.native)) {
+    m_tabs.ActivateTab(m_tabs.GetTabIndex(shown));
+    return shown;
   }
   const Encoding encoding = document.encoding != 0 ? document.encoding : Encodings::kANSI;
   auto* preview = new PreviewView(document.name, document.native, encoding);  // ends with its window
@@ -370,25 +400,27 @@ void WorkbenchFrame::OnAbout() {
 
 // --- conversion ---
 
+// As the user sees it; what has no preview, as detected.
+Encoding WorkbenchFrame::ReadAs(const Document& document) const {
+  const PreviewView* preview = FindPreview(document.native);
+  return (preview != nullptr ? preview->Text().GetEncoding() : document.encoding) & Encodings::kValueMask;
+}
+
 void WorkbenchFrame::ConvertSelected(Encoding to, const SString& folder) {
   if (m_conversion.IsRunning()) throw Failure{"a conversion runs already"};
   RequireOnThisMachine(to);
   std::vector<ConversionItem> items;
   for (const int number : m_documents.Selected()) {
     const Document& document = m_documents.At(number);
-    ConversionItem item{document.native,
-                        document.name,
-                        document.encoding & Encodings::kValueMask,
-                        TargetOf(document, folder),
-                        SString(),
-                        "",
-                        false};
+    ConversionItem item{
+        document.native, document.name, number, ReadAs(document), TargetOf(document, folder), SString(), "", false};
     if (document.state == Document::State::kWaiting) item.error = "its encoding is not known yet";
     if (document.state == Document::State::kFailed) item.error = ToUtf8(document.warning);
     items.push_back(std::move(item));
   }
   if (items.empty()) throw Failure{"no file is selected"};
   m_workBegan = ::GetTickCount();
+  m_entered = 0;
   m_conversion.Start(std::move(items), to);
 }
 

@@ -51,6 +51,7 @@ class WorkbenchFrame : public SDockSiteFrameWnd {
   // Cancels as soon as this many files of a job are done; -1 never.
   void CancelAfter(int count) { m_cancelAfter = count; }
 
+  int PreTranslateMessage(MSG* message) override;
   int OnCreateClient(CREATESTRUCTW* create, SCreateContext* context) override;
 
  protected:
@@ -88,8 +89,11 @@ class WorkbenchFrame : public SDockSiteFrameWnd {
   void RestoreSplitter();
   void StepDetection();
   void StepConversion();
+  void EnterConverted();
   bool StepPreviews();
   void AskAndWrite();
+  Encoding ReadAs(const Document& document) const;
+  PreviewView* FindPreview(const std::string& native) const;
   void ShowList();
   TimeSlice Slice() const;
   void ShowProgress(int done, int total);
@@ -110,6 +114,7 @@ class WorkbenchFrame : public SDockSiteFrameWnd {
   FileListView* m_list = nullptr;  // ends with its window
   std::function<void(const SString&)> m_reporter;
   int m_cancelAfter = -1;
+  int m_entered = 0;      // how many converted files the list knows of
   DWORD m_workBegan = 0;  // milliseconds
   DWORD m_listShown = 0;  // the same
   bool m_wasDetecting = false;

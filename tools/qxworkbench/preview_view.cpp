@@ -62,6 +62,11 @@ void PreviewView::Show(Encoding encoding) {
   Invalidate(0);
 }
 
+void PreviewView::SetDetected(Encoding detected) {
+  m_detected = detected;
+  Show(detected);
+}
+
 void PreviewView::GoToPart(int part) {
   m_text.GoToPart(part);
   m_rowsShown = 0;

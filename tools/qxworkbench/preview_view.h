@@ -14,6 +14,8 @@ class PreviewView : public LineView {
   // Decodes on for a while. True while another step has something to do at once.
   bool Step();
   void Show(Encoding encoding);  // decodes anew
+  // The file has other contents now, in this encoding.
+  void SetDetected(Encoding detected);
   void GoToPart(int part);
 
   const std::string& File() const { return m_native; }

@@ -219,10 +219,10 @@ void Split(const Call& call) {
 
 // A key, sent to where the keyboard is, as the loop takes it from the queue.
 void Key(const Call& call) {
-  static const std::map<std::string, WPARAM> keys = {{"up", VK_UP},        {"down", VK_DOWN},     {"home", VK_HOME},
-                                                     {"end", VK_END},      {"pageup", VK_PRIOR},  {"pagedown", VK_NEXT},
-                                                     {"enter", VK_RETURN}, {"space", VK_SPACE},   {"f5", VK_F5},
-                                                     {"f6", VK_F6},        {"escape", VK_ESCAPE}, {"tab", VK_TAB}};
+  static const std::map<std::string, WPARAM> keys = {
+      {"up", VK_UP},         {"down", VK_DOWN},    {"home", VK_HOME},   {"end", VK_END},   {"pageup", VK_PRIOR},
+      {"pagedown", VK_NEXT}, {"enter", VK_RETURN}, {"space", VK_SPACE}, {"f5", VK_F5},     {"f6", VK_F6},
+      {"escape", VK_ESCAPE}, {"tab", VK_TAB},      {"f8", VK_F8},       {"left", VK_LEFT}, {"right", VK_RIGHT}};
   const auto key = keys.find(call.Word(1));
   if (key == keys.end()) throw Failure{"there is no such key", kFailed, call.Word(1)};
   ::PostMessageW(::GetFocus(), WM_KEYDOWN, key->second, 1);
