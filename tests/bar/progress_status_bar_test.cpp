@@ -162,6 +162,39 @@ TEST_F(ProgressBars, Cursor_IsAnArrowOverTheButtonOnly) {
   EXPECT_EQ(::GetCursor(), wait);
 }
 
+// Before the window is made, and after it went: what is kept is kept, and nobody loses the focus.
+TEST_F(ProgressBars, WithoutAWindow_NothingIsShown) {
+  m_frame->SetFocus();
+  const SString text(WTEXT("early"));
+  SProgressStatusBar bar;
+  SStatusBarLayout layout;
+  for (const bool isAfterwards : {false, true}) {
+    if (isAfterwards) {
+      ASSERT_TRUE(bar.Create(m_frame, 0, WS_CHILD, 9));
+      bar.UpdatePaneStrings();
+      EXPECT_EQ(test::PartText(bar, 0), WTEXT("early")) << "the panes came before the control";
+      bar.DestroyWindow();
+    }
+    EXPECT_EQ(bar.InsertPane(0, 20, kSPaneMain | kSPaneAutoSize), 1);
+    EXPECT_EQ(bar.SetMainPaneText(&text), 1);
+    EXPECT_EQ(bar.GetPaneWidth(0), test::WidthOf(m_bar, text.View()));
+    layout.InsertPane(0, 20, 0);
+    layout.Attach(&bar);
+    EXPECT_EQ(layout.Activate(1), 1);
+    EXPECT_EQ(layout.SetPaneText(0, &text), 1);
+    SRect rect;
+    EXPECT_EQ(bar.GetPaneRect(0, &rect), 0);
+    bar.StartProgress(1);
+    EXPECT_TRUE(bar.InProgress());
+    EXPECT_EQ(::GetFocus(), m_frame->m_hWnd);
+    bar.EndProgress();
+    EXPECT_FALSE(bar.InProgress());
+    bar.UpdatePaneStrings();
+    EXPECT_GT(bar.GetBarLayout(1, 1).cy, 0);
+    layout.Detach();
+  }
+}
+
 TEST(CustomProgress, Positions_OfTheWholeRangeOf64Bits) {
   using Limits = std::numeric_limits<std::int64_t>;
   SCustomProgressCtrl progress;

@@ -1,5 +1,6 @@
 // A status bar in its frame: what it makes of its panes, and what its control then shows.
 
+#include <climits>
 #include <random>
 
 #include "qxcore/ui/accessible/accessible.h"
@@ -19,14 +20,21 @@ using test::PartType;
 class Bar : public SStatusBar {
  public:
   int OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* result) override {
-    if (message == SB_SETTEXTW) m_sent.push_back(LOBYTE(wParam));
-    return SStatusBar::OnWndMsg(message, wParam, lParam, result);
+    if (message != SB_SETTEXTW) return SStatusBar::OnWndMsg(message, wParam, lParam, result);
+    m_sent.push_back(LOBYTE(wParam));
+    m_deepest = std::max(m_deepest, ++m_depth);
+    *result = DefWindowProcW(message, wParam, lParam);
+    if (m_paintsAtOnce) UpdateWindow();
+    --m_depth;
+    return 1;
   }
   void Paint() {
     Invalidate();
     UpdateWindow();
   }
   std::vector<int> m_sent;
+  bool m_paintsAtOnce = false;  // as some systems do
+  int m_depth = 0, m_deepest = 0;
 };
 
 class StatusBars : public test::UiTest {
@@ -186,6 +194,16 @@ TEST_F(StatusBars, Texts_AreSentOnceAndWhenTheyAreDue) {
   EXPECT_EQ(m_bar.m_sent, (std::vector<int>{1, 0}));
   EXPECT_EQ(PartText(m_bar, 0), WTEXT("later"));
 
+  // Where the control paints as soon as it gets a text, one text does not lead into the next.
+  m_bar.m_paintsAtOnce = true;
+  for (int i = 2; i < 40; ++i) m_bar.InsertPane(i, 5, 0);
+  m_bar.m_sent.clear();
+  m_bar.m_deepest = 0;
+  m_bar.Paint();
+  EXPECT_EQ(m_bar.m_sent.size(), 40u);
+  EXPECT_EQ(m_bar.m_deepest, 1);
+  m_bar.m_paintsAtOnce = false;
+
   m_bar.m_sent.clear();
   EXPECT_EQ(m_bar.SetPaneWidth(0, 50), 1);
   EXPECT_EQ(m_bar.SetPaneWidth(0, 60), 1);
@@ -245,6 +263,55 @@ TEST_F(StatusBars, OwnerDrawnPane_IsPaintedInGrey) {
   }
   EXPECT_GT(grey, 20);
   EXPECT_EQ(darker, 0);
+}
+
+// Letters of a right-to-left script stand from the right to the left, whichever side the pane's text begins at.
+TEST_F(StatusBars, RightToLeftText_StandsInItsOrder) {
+  const WCHAR shin = 0x05E9, vav = 0x05D5;
+  const auto picture = [this](const SRect& rect) {
+    std::vector<COLORREF> pixels;
+    SClientDC dc(m_bar.m_hWnd);
+    for (int y = rect.top; y < rect.bottom; ++y) {
+      for (int x = rect.left; x < rect.right; ++x) pixels.push_back(dc.GetPixel(SPoint(x, y)));
+    }
+    return pixels;
+  };
+  for (const DWORD style : {DWORD{SBT_NOBORDERS}, DWORD{SBT_NOBORDERS | SBT_RTLREADING}}) {
+    const WCHAR both[] = {shin, vav, 0}, first[] = {shin, 0};
+    ASSERT_EQ(m_bar.InsertPane(0, 60, style), 1);
+    SetText(0, both);
+    m_bar.Paint();
+    const SRect part = PartRect(m_bar, 0);
+    const int narrow = test::WidthOf(m_bar, SStringView(&vav, 1)), wide = test::WidthOf(m_bar, SStringView(&shin, 1));
+    ASSERT_LT(narrow, wide);
+    const bool isAtRight = (style & SBT_RTLREADING) != 0;
+    const int left = isAtRight ? part.right - 3 - narrow - wide : part.left + 3;
+    const auto shown = picture(SRect(left + narrow, part.top, left + narrow + wide, part.bottom));
+    SetText(0, first);
+    m_bar.Paint();
+    const int alone = isAtRight ? part.right - 3 - wide : part.left + 3;
+    EXPECT_EQ(shown, picture(SRect(alone, part.top, alone + wide, part.bottom))) << "the first letter is the right one";
+    m_bar.DeletePane(0);
+  }
+}
+
+// The control takes texts for its first 255 parts; the number behind them is that of its simple mode.
+TEST_F(StatusBars, PanesBeyondThoseOfTheControl_AreKeptAndDisturbNone) {
+  for (int i = 0; i < 300; ++i) {
+    m_bar.InsertPane(i, 1, i == 299 ? DWORD{kSPaneMain} : 0);
+    SetText(i, SString(static_cast<long>(i)).GetSafePointer());
+  }
+  m_bar.Paint();
+  EXPECT_EQ(m_bar.GetPaneCount(), 300);
+  ASSERT_EQ(PartsOf(m_bar).size(), 255u);
+  for (int i = 0; i < 255; ++i) ASSERT_EQ(PartText(m_bar, i), SString(static_cast<long>(i)).View());
+  SRect rect;
+  EXPECT_EQ(m_bar.GetPaneRect(255, &rect), 0);
+  EXPECT_EQ(m_bar.GetPaneText(kSMainPane), WTEXT("299"));
+  EXPECT_EQ(m_bar.MakeAccessible()->GetChildCount(), 300);
+  for (int i = 0; i < 50; ++i) m_bar.DeletePane(0);
+  m_bar.Paint();
+  EXPECT_EQ(PartText(m_bar, 249), WTEXT("299")) << "what moves forward is shown";
 }
 
 // --- layouts ---
@@ -327,6 +394,14 @@ TEST_F(StatusBars, AnotherDpi_ScalesEverythingAndComesBack) {
   EXPECT_EQ(test::PlaceOf(m_bar), place);
 }
 
+TEST_F(StatusBars, WidthsAtTheEndOfTheirType_StayThereAtAnyDpi) {
+  m_bar.InsertPane(0, INT_MAX, 0);
+  m_frame->SendMessageW(WM_DPICHANGED, MAKEWPARAM(192, 192));
+  EXPECT_EQ(m_bar.GetPaneWidth(0), INT_MAX);
+  EXPECT_EQ(PartsOf(m_bar)[0], INT_MAX);
+  m_frame->SendMessageW(WM_DPICHANGED, MAKEWPARAM(96, 96));
+}
+
 // --- bars in general ---
 
 class PlainBar : public SCtrlBar {
@@ -360,6 +435,50 @@ TEST_F(StatusBars, Bars_TakeTheirStripsInTurn) {
   EXPECT_EQ(test::PlaceOf(m_bar).bottom, 10) << "a bar keeps its height";
   EXPECT_EQ(test::PlaceOf(client).Height(), 0);
   client.DestroyWindow();
+
+  // Asked for their space alone, bars take no more of an area than there is, and say how much they want.
+  bars[0].ShowWindow(SW_SHOWNA);
+  SSizeParent asked{nullptr, SRect(0, 0, 50, 90), SSize(), 0};
+  for (PlainBar& bar : bars) bar.SendMessageW(kSMsgSizeParent, 0, reinterpret_cast<LPARAM>(&asked));
+  EXPECT_EQ(asked.m_rect, SRect(30, 20, 30, 90));
+  EXPECT_EQ(asked.m_used, SSize(50 + 30 + 30, 50)) << "an upper bar adds to the height, the others to the width";
+}
+
+// What a bar does while it is asked for its place: it may take away its layout, another bar, or itself.
+TEST_F(StatusBars, Bars_ThatGoWhileTheyAreLaidOut) {
+  class Going : public PlainBar {
+   public:
+    SSize GetBarLayout(int stretch, int horizontal) override {
+      if (m_onLayout) m_onLayout();
+      return PlainBar::GetBarLayout(stretch, horizontal);
+    }
+    std::function<void()> m_onLayout;
+  };
+  m_bar.InsertPane(0, 50, 0);
+  SStatusBarLayout layout;
+  layout.InsertPane(0, 30, 0);
+  layout.Attach(&m_bar);
+  layout.Activate(1);
+  test::Window client;
+  ASSERT_TRUE(client.Create(nullptr, nullptr, WS_VISIBLE, SRect(), m_frame, kSFirstPane));
+  PlainBar other;
+  Going bar;
+  other.SetBarStyle(kSBarAtTop);
+  ASSERT_TRUE(other.Create(nullptr, nullptr, WS_VISIBLE, SRect(), m_frame, 100u));
+  ASSERT_TRUE(bar.Create(nullptr, nullptr, WS_VISIBLE, SRect(), m_frame, 101u));
+  bar.SetWindowPos(HWND_TOP, 0, 0, 0, 0, SWP_NOMOVE | SWP_NOSIZE);
+  bar.m_onLayout = [&] { layout.Detach(); };
+  m_frame->RecalcLayout();
+  EXPECT_EQ(PartsOf(m_bar).size(), 1u);
+  const int height = m_bar.GetBarLayout(1, 1).cy;
+  EXPECT_EQ(test::PlaceOf(client), SRect(0, 20, 400, 300 - 20 - height));
+  bar.m_onLayout = [&] { other.DestroyWindow(); };
+  m_frame->RecalcLayout();
+  EXPECT_EQ(test::PlaceOf(client), SRect(0, 0, 400, 300 - 20 - height));
+  bar.m_onLayout = [&] { bar.DestroyWindow(); };
+  m_frame->RecalcLayout();
+  m_frame->RecalcLayout();
+  EXPECT_EQ(test::PlaceOf(client), SRect(0, 0, 400, 300 - height));
 }
 
 TEST(CtrlBar, Offsets_AreThoseOfTheStyleAndTheFields) {

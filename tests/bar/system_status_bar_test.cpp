@@ -17,6 +17,10 @@ class SystemStatusBar : public test::UiTest {
     const INITCOMMONCONTROLSEX classes = {sizeof classes, ICC_BAR_CLASSES | ICC_PROGRESS_CLASS};
     ASSERT_TRUE(::InitCommonControlsEx(&classes));
     m_parent.m_handler = [this](UINT message, WPARAM wParam, LPARAM lParam, LRESULT*) {
+      if (message == WM_NCLBUTTONDOWN || message == WM_NCLBUTTONUP) {
+        m_notified.insert(m_notified.end(), {static_cast<int>(message), static_cast<int>(wParam)});
+        return 1;
+      }
       if (message == WM_NOTIFY) {
         const auto& mouse = *reinterpret_cast<const NMMOUSE*>(lParam);
         m_notified.push_back(static_cast<int>(mouse.hdr.code));
@@ -200,6 +204,10 @@ TEST_F(SystemStatusBar, Grip_IsAsWideAsAScrollBar) {
   EXPECT_EQ(hit(299), HTBOTTOMRIGHT);
   EXPECT_EQ(hit(grip), HTBOTTOMRIGHT);
   EXPECT_EQ(hit(grip - 1), HTCLIENT);
+  for (const UINT message : {UINT{WM_NCLBUTTONDOWN}, UINT{WM_NCLBUTTONUP}}) Send(message, HTBOTTOMRIGHT);
+  test::PumpAll();
+  EXPECT_EQ(m_notified, (std::vector<int>{WM_NCLBUTTONDOWN, HTBOTTOMRIGHT, WM_NCLBUTTONUP, HTBOTTOMRIGHT}))
+      << "it is the parent that is sized";
   m_parent.ShowWindow(SW_MAXIMIZE);
   EXPECT_EQ(hit(299), HTCLIENT) << "a maximised parent is not sized";
 }

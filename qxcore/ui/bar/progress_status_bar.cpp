@@ -78,7 +78,7 @@ void SProgressStatusBar::StartProgress(int cancellable) {
     PlaceProgress();
   }
   m_progress.EnableWindow(1);
-  if (!cancellable) return;
+  if (!cancellable || m_cancel.m_hWnd == nullptr) return;
   m_cancel.EnableWindow(1);
   m_cancel.SetFocus();
 }

@@ -4,6 +4,7 @@
 
 #include <utility>
 
+#include "qxcore/ui/app/internal/scaled_pixels.h"
 #include "qxcore/ui/app/ui_font.h"
 #include "qxcore/ui/app/ui_sys_data.h"
 #include "qxcore/ui/bar/internal/auto_size.h"
@@ -115,7 +116,7 @@ HFONT SStatusBar::GetBarFont() const { return SGetDefaultUIFont(m_dpi); }
 void SStatusBar::SetDpi(int dpi) {
   if (dpi <= 0 || dpi == m_dpi) return;
   for (std::int32_t* pixels : {&m_leftBorder, &m_topBorder, &m_rightBorder, &m_bottomBorder, &m_minHeight}) {
-    *pixels = ::MulDiv(*pixels, dpi, m_dpi);
+    *pixels = SScaledPixels(*pixels, dpi, m_dpi);
   }
   m_panes.ScaleWidths(m_dpi, dpi);
   m_dpi = dpi;

@@ -12,7 +12,7 @@
 // bar.SetPaneText(kSMainPane, &text, 1);
 // ```
 // Widths are pixels of the bar's DPI: those of 96 dots an inch until the window is created; from then on those of its
-// screen. When the DPI changes, the widths and borders that the bar holds are scaled. The control shows the first 256
+// screen. When the DPI changes, the widths and borders that the bar holds are scaled. The control shows the first 255
 // panes. The index kSMainPane (-1) names the main pane. An invalid index gives 0, or the empty string, and changes
 // nothing.
 //
@@ -135,4 +135,5 @@ class QXCORE_API SStatusBar : public SCtrlBar {
 
   SStatusBarLayout* m_attached = nullptr;  // all that are attached, a list
   int m_dpi = 96;
+  bool m_isSending = false;  // the texts that are dirty
 };

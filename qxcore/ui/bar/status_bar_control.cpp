@@ -20,8 +20,8 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(
 
 namespace {
 
-constexpr int kMostPanes = 256;  // of the control
-constexpr int kPadding = 6;      // of each pane
+constexpr int kMostPanes = SB_SIMPLEID;  // the control takes no text for a pane of this index
+constexpr int kPadding = 6;              // of each pane
 constexpr COLORREF kOwnerDrawnText = 0x00808080;
 
 // The three numbers of SB_GETBORDERS.
@@ -89,7 +89,7 @@ SSize SStatusBar::GetBarLayout(int, int) {
 
 // The record may go while the control handles the message.
 void SStatusBar::SendText(SStatusBarPane& pane, int controlIndex) {
-  if (m_hWnd == nullptr || (pane.m_flags & SStatusBarPane::kTextDirty) == 0) return;
+  if (m_hWnd == nullptr || controlIndex >= kMostPanes || (pane.m_flags & SStatusBarPane::kTextDirty) == 0) return;
   pane.m_flags &= ~SStatusBarPane::kTextDirty;
   const SString text = pane.m_text;
   const std::uint32_t style = pane.m_style;
@@ -99,7 +99,13 @@ void SStatusBar::SendText(SStatusBarPane& pane, int controlIndex) {
   SendMessageW(SB_SETTEXTW, static_cast<DWORD>(controlIndex) | type, reinterpret_cast<LPARAM>(shown));
 }
 
+// A control may paint as soon as it gets a text, and painting comes back here.
 void SStatusBar::UpdatePaneStrings() {
+  if (m_isSending) return;
+  struct Sending {
+    bool& flag;
+    ~Sending() { flag = false; }
+  } sending{m_isSending = true};
   for (int i = 0; i < m_panes.GetCount(); ++i) SendText(m_panes[i], SControlIndex(i, m_splice, ExtraCount()));
   for (int i = 0; i < ExtraCount(); ++i) SendText(m_layout->m_panes[i], m_splice + i);
 }

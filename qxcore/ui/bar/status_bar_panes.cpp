@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "qxcore/core/exception.h"
+#include "qxcore/ui/app/internal/scaled_pixels.h"
 
 int SStatusBarPanes::Find(int index) const {
   if (index == kSMainPane) return FindMain();
@@ -80,5 +81,5 @@ int SStatusBarPanes::GetPaneWidth(int index) const {
 }
 
 void SStatusBarPanes::ScaleWidths(int fromDpi, int toDpi) {
-  for (SStatusBarPane& pane : *this) pane.m_width = ::MulDiv(pane.m_width, toDpi, fromDpi);
+  for (SStatusBarPane& pane : *this) pane.m_width = SScaledPixels(pane.m_width, toDpi, fromDpi);
 }

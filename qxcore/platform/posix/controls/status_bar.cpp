@@ -224,6 +224,9 @@ LRESULT Handle(HWND window, StatusBar& bar, UINT message, WPARAM wParam, LPARAM 
       return Repaint(window), 0;
     case WM_NCHITTEST:
       return OnHitTest(window, lParam);
+    case WM_NCLBUTTONDOWN:  // on the grip, which is the parent's
+    case WM_NCLBUTTONUP:
+      return PostMessageW(GetParent(window), message, wParam, lParam), 0;
     case WM_LBUTTONUP:
       return OnMouse(window, bar, NM_CLICK, lParam);
     case WM_LBUTTONDBLCLK:
