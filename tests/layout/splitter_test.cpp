@@ -176,7 +176,7 @@ TEST_F(Splitters, LimitsOfTheGrid) {
 }
 
 TEST_F(Splitters, SplitBoxesAreSixPixelsLong) {
-  MakeDynamic(2, 2);
+  MakeDynamic(2, 3);
   const SRect inside = m_splitter.Inside();
   EXPECT_EQ(m_splitter.HitTest(SPoint(inside.right, inside.top + 5)), kSHitVertSplitBox);
   EXPECT_EQ(m_splitter.HitTest(SPoint(inside.right, inside.top + 6)), kSHitNothing);
@@ -185,6 +185,10 @@ TEST_F(Splitters, SplitBoxesAreSixPixelsLong) {
   // The scroll bars begin behind them.
   EXPECT_EQ(PlaceIn(m_splitter, 0xEA00u), SRect(inside.left + 7, inside.bottom, inside.right, 298));
   EXPECT_EQ(PlaceIn(m_splitter, 0xEA10u), SRect(inside.right, inside.top + 7, 398, inside.bottom));
+  ASSERT_TRUE(m_splitter.SplitColumn(100));
+  const SRect second = m_splitter.Pane(0, 1);
+  EXPECT_EQ(PlaceIn(m_splitter, 0xEA00u), SRect(inside.left + 7, inside.bottom, inside.left + 100, 298));
+  EXPECT_EQ(PlaceIn(m_splitter, 0xEA01u), SRect(second.left, inside.bottom, second.right, 298)) << "no box lies there";
 }
 
 TEST_F(Splitters, HitRectsAndLimits) {
@@ -566,6 +570,17 @@ TEST_F(Splitters, CollapsedPanesFollowTheDpi) {
   ASSERT_EQ(Widths()[0], 0);
   ASSERT_TRUE(m_splitter.ToggleBar(kSHitColumnBar));
   EXPECT_EQ(Widths()[0], 200);
+}
+
+TEST_F(Splitters, CollapsedPanesKeepTheirSizeWhenOthersGo) {
+  MakeDynamic(1, 4);
+  for (const int place : {230, 130, 60}) ASSERT_TRUE(m_splitter.SplitColumn(place));
+  const int size = Widths()[1];
+  ASSERT_TRUE(m_splitter.ToggleBar(kSHitColumnBar + 1));
+  m_splitter.DeleteColumn(0);
+  ASSERT_EQ(Widths()[0], 0);
+  ASSERT_TRUE(m_splitter.ToggleBar(kSHitColumnBar));
+  EXPECT_EQ(Widths()[0], size);
 }
 
 // The windows that were moved in one splitter, by their identifiers.

@@ -143,7 +143,7 @@ TEST_F(Beams, RandomSequences_TheSameTabStaysCurrent) {
   SWnd* current = nullptr;
   for (int step = 0; step < 3000; ++step) {
     const int count = static_cast<int>(model.size());
-    switch (below(4)) {
+    switch (below(5)) {
       case 0:
       case 1: {
         const int at = below(count + 1);
@@ -171,6 +171,9 @@ TEST_F(Beams, RandomSequences_TheSameTabStaysCurrent) {
           ASSERT_LE(m_beam.GetFirstVisible(), at);
           ASSERT_GE(m_beam.GetLastVisible(), at);
         }
+        break;
+      default:
+        m_beam.SetFirstVisible(below(count + 1));
         break;
     }
     ASSERT_EQ(m_beam.GetCount(), static_cast<int>(model.size()));

@@ -69,6 +69,7 @@ int SFrameWnd::OnCreate(CREATESTRUCTW* create) {
 
 int SFrameWnd::OnCreateHelper(CREATESTRUCTW* create, SCreateContext* context) {
   if (SWnd::OnCreate(create) == -1) return -1;
+  m_isInLayout = false;
   if (!OnCreateClient(create, context)) return -1;
   RecalcLayout();
   return 0;
@@ -170,21 +171,27 @@ int SFrameWnd::OnWndMsg(UINT message, WPARAM wParam, LPARAM lParam, LRESULT* res
 
 void SFrameWnd::RecalcLayout() {
   if (m_hWnd == nullptr || std::exchange(m_isInLayout, true)) return;
+  // A bar may end the frame.
   struct Running {
-    bool& flag;
-    ~Running() { flag = false; }
-  } running{m_isInLayout};
+    SFrameWnd* frame;
+    const HWND window = frame->m_hWnd;
+    ~Running() {
+      if (FromHandlePermanent(window) == frame) frame->m_isInLayout = false;
+    }
+  } running{this};
   SSizeParent layout{::BeginDeferWindowPos(8), GetClientRect(), SSize(), 1};
   if (layout.m_batch == nullptr) throw SEOutOfMemory();
   HWND client = nullptr;
-  for (HWND child = ::GetWindow(m_hWnd, GW_CHILD); child != nullptr; child = ::GetWindow(child, GW_HWNDNEXT)) {
+  for (HWND child = ::GetWindow(m_hWnd, GW_CHILD); child != nullptr;) {
+    const HWND next = ::GetWindow(child, GW_HWNDNEXT);
     if (::GetWindowLongPtrW(child, GWLP_ID) == static_cast<LONG_PTR>(kSFirstPane)) {
       client = child;
     } else {
       SSent(::SendMessageW(child, kSMsgSizeParent, 0, reinterpret_cast<LPARAM>(&layout)));
     }
+    child = ::IsWindow(child) ? ::GetWindow(child, GW_HWNDNEXT) : next;
   }
-  if (client != nullptr && layout.m_batch != nullptr) {
+  if (::IsWindow(client) && layout.m_batch != nullptr) {
     layout.m_batch = ::DeferWindowPos(layout.m_batch, client, nullptr, layout.m_rect.left, layout.m_rect.top,
                                       std::max(layout.m_rect.Width(), 0), std::max(layout.m_rect.Height(), 0),
                                       SWP_NOZORDER | SWP_NOACTIVATE);

@@ -297,6 +297,7 @@ class QXCORE_API SSplitterWnd : public SWnd {
 
   // --- tracking ---
   void MoveTracker(SPoint topLeft);
+  void TrackSize(bool rows, int bar, int place, int begin, int end);
   void MoveBarTo(bool rows, int bar, int size);
 
   // --- keyboard ---
@@ -304,6 +305,7 @@ class QXCORE_API SSplitterWnd : public SWnd {
   int NextBar(int code) const;
   void EnterBar(int code);
   void LeaveBars();
+  void EndUse();
   void CancelBars();
   bool OnBarKey(UINT key);
   void OpenBar(int code);

@@ -111,6 +111,12 @@ void SSplitterWnd::EnterBar(int code) {
 
 void SSplitterWnd::LeaveBars() { InvalidateBar(std::exchange(m_keyboardBar, 0)); }
 
+// Before rows and columns come or go: what the user moves may be another one then.
+void SSplitterWnd::EndUse() {
+  StopTracking(0);
+  LeaveBars();
+}
+
 void SSplitterWnd::CancelBars() {
   if (m_rowsBefore.GetCount() == m_rowCount) m_rows = m_rowsBefore;
   if (m_columnsBefore.GetCount() == m_columnCount) m_columns = m_columnsBefore;
@@ -143,6 +149,7 @@ void SSplitterWnd::OnKeyDown(UINT key, UINT, UINT) {
 // Returns false for a key that means nothing on a bar.
 bool SSplitterWnd::OnBarKey(UINT key) {
   const int code = m_keyboardBar;
+  const HWND window = m_hWnd;
   switch (key) {
     case VK_F8:
       DoKeyboardSplit();
@@ -152,6 +159,7 @@ bool SSplitterWnd::OnBarKey(UINT key) {
       return true;
     case VK_ESCAPE:
       CancelBars();
+      if (FromHandlePermanent(window) != this) return true;
       [[fallthrough]];
     case VK_TAB:
     case VK_F6:
@@ -178,9 +186,11 @@ void SSplitterWnd::OpenBar(int code) {
     return;
   }
   const bool rows = SIsOfRows(code);
+  const HWND window = m_hWnd;
   const int middle = (Table(rows)[0].m_current - Gap(rows)) / 2;
   const bool isDone = rows ? SplitRow(middle) : SplitColumn(middle);
-  if (isDone && m_keyboardBar == code) EnterBar(rows ? kSHitRowBar : kSHitColumnBar);
+  if (!isDone || FromHandlePermanent(window) != this) return;
+  if (m_keyboardBar == code) EnterBar(rows ? kSHitRowBar : kSHitColumnBar);
 }
 
 int SSplitterWnd::ToggleBar(int code) {

@@ -1,5 +1,6 @@
 // Where everything lies.
 
+#include "qxcore/ui/app/internal/scaled_pixels.h"
 #include "qxcore/ui/layout/internal/deferred_moves.h"
 #include "qxcore/ui/layout/internal/size_box.h"
 #include "qxcore/ui/layout/internal/splitter_codes.h"
@@ -23,8 +24,10 @@ struct SSplitterWnd::Grid {
   int left[kSMaxPanes], top[kSMaxPanes];
 };
 
+// A pane that is sized may end the splitter.
 void SSplitterWnd::RecalcLayout() {
   if (m_hWnd == nullptr || m_rowCount == 0) return;
+  const HWND window = m_hWnd;
   SRect inside;
   GetInsideRect(&inside);
   SSizePanes(m_columns.GetArray(), m_columnCount, inside.Width(), m_gapX, m_keepRatio);
@@ -35,7 +38,7 @@ void SSplitterWnd::RecalcLayout() {
   if (m_scrollStyle != 0) MoveChildren(moves, kSHorzScrollBarId, kSSizeBoxId, grid);
   MoveChildren(moves, kSPaneId, kSHorzScrollBarId - 1, grid);
   moves.End();
-  if (m_hWnd != nullptr) InvalidateRect(nullptr, 0);
+  if (FromHandlePermanent(window) == this) InvalidateRect(nullptr, 0);
 }
 
 SSplitterWnd::Grid SSplitterWnd::LaidOut() const {
@@ -145,9 +148,10 @@ void SSplitterWnd::InvalidateBar(int code) {
   OnDrawSplitter(nullptr, kSplitBar, code >= kSHitRowBar ? BarRect(code, inside) : BoxRect(code, inside));
 }
 
-// --- what changes the layout ---
+// --- what changes the layout: a drag would end at a place of the former one ---
 
 void SSplitterWnd::OnSize(UINT type, int, int) {
+  StopTracking(0);
   if (type != SIZE_MINIMIZED) RecalcLayout();
 }
 
@@ -157,6 +161,7 @@ void SSplitterWnd::OnDisplayChange(UINT, int, int) {
 }
 
 LRESULT SSplitterWnd::OnDpiChanged(WPARAM wParam, LPARAM) {
+  StopTracking(0);
   ScaleTo(LOWORD(wParam));
   RecalcLayout();
   return 0;
@@ -165,8 +170,8 @@ LRESULT SSplitterWnd::OnDpiChanged(WPARAM wParam, LPARAM) {
 // Shares are no pixels.
 static void Scale(STableDumb<SPaneInfo>& table, int dpi, int former, bool scaleIdeals) {
   for (SPaneInfo& info : table) {
-    info.m_min = ::MulDiv(info.m_min, dpi, former);
-    if (scaleIdeals) info.m_ideal = ::MulDiv(info.m_ideal, dpi, former);
+    info.m_min = SScaledPixels(info.m_min, dpi, former);
+    if (scaleIdeals) info.m_ideal = SScaledPixels(info.m_ideal, dpi, former);
   }
 }
 
@@ -175,13 +180,13 @@ void SSplitterWnd::ScaleTo(int dpi) {
   if (dpi <= 0 || dpi == former) return;
   for (int* size :
        {&m_barWidth, &m_barHeight, &m_borderShareX, &m_borderShareY, &m_gapX, &m_gapY, &m_borderX, &m_borderY}) {
-    *size = ::MulDiv(*size, dpi, former);
+    *size = SScaledPixels(*size, dpi, former);
   }
   for (STableDumb<SPaneInfo>* table : {&m_rows, &m_columns, &m_rowsBefore, &m_columnsBefore}) {
     Scale(*table, dpi, former, !m_keepRatio);
   }
   for (STableDumb<int>* sizes : {&m_openRows, &m_openColumns}) {
-    for (int& size : *sizes) size = ::MulDiv(size, dpi, former);
+    for (int& size : *sizes) size = SScaledPixels(size, dpi, former);
   }
   m_dpi = dpi;
 }

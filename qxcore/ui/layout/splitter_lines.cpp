@@ -26,9 +26,11 @@ int SSplitterWnd::Split(bool rows, int before) {
   }
   const int minimum = panes[line].m_min;
   const int first = before - start;
+  if (first < minimum || first < 0) return 0;
   const int second = panes[line].m_current - first - Gap(rows);
   const bool isLaidOut = panes[line].m_current > 0;
-  if (first < minimum || first < 0 || (isLaidOut && (second < minimum || second < 0))) return 0;
+  if (isLaidOut && (second < minimum || second < 0)) return 0;
+  StopTracking(0);
   if (!InsertLine(rows, line + 1)) return 0;
 
   SPaneInfo* changed = Table(rows).GetArray();
@@ -80,18 +82,22 @@ void SSplitterWnd::DeleteLine(bool rows, int at) {
   int row = -1, column = -1;
   GetActivePane(&row, &column);
   const bool hadFocus = (rows ? row : column) == at;
-  LeaveBars();
+  EndUse();
+  const HWND window = m_hWnd;
   RemoveLine(rows, at);
-  if (m_hWnd == nullptr) return;
+  if (FromHandlePermanent(window) != this) return;
   RecalcLayout();
-  if (hadFocus) SetActivePane(std::min(row, m_rowCount - 1), std::min(column, m_columnCount - 1));
+  if (hadFocus && FromHandlePermanent(window) == this)
+    SetActivePane(std::min(row, m_rowCount - 1), std::min(column, m_columnCount - 1));
 }
 
+// A pane that is destroyed may end the splitter.
 void SSplitterWnd::RemoveLine(bool rows, int at) {
+  const HWND window = m_hWnd;
   for (int across = 0; across < Count(!rows); ++across) {
     rows ? DeletePane(at, across) : DeletePane(across, at);
+    if (FromHandlePermanent(window) != this) return;
   }
-  if (m_hWnd == nullptr) return;
   if (const HWND bar = ::GetDlgItem(m_hWnd, static_cast<int>(ScrollBarId(rows, at)))) SSent(::DestroyWindow(bar));
   for (int line = at + 1; line < Count(rows); ++line) RenumberLine(rows, line, line - 1);
   --(rows ? m_rowCount : m_columnCount);

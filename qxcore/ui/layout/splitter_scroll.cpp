@@ -57,13 +57,14 @@ int SSplitterWnd::DoScroll(SView* view, UINT code, int scroll) {
   int row = 0, column = 0;
   if (!IsChildPane(view, &row, &column)) return 0;
   int done = 0;
+  const HWND window = m_hWnd;
   const auto along = [&](bool columns, int line, UINT part) {
     if (part == 0xFF || ::GetDlgItem(m_hWnd, BarId(columns, line)) == nullptr) return;
     done = 1;
     if (scroll) ScrollLine(columns, line, part, 0);
   };
   along(true, column, code & 0xFF);
-  along(false, row, code >> 8 & 0xFF);
+  if (FromHandlePermanent(window) == this) along(false, row, code >> 8 & 0xFF);
   return done;
 }
 
@@ -84,9 +85,10 @@ int SSplitterWnd::ScrollPaneBy(bool columns, int line, int distance, int scroll)
 int SSplitterWnd::DoScrollBy(SView* view, SSize distance, int scroll) {
   int row = 0, column = 0;
   if (!IsChildPane(view, &row, &column)) return 0;
+  const HWND window = m_hWnd;
   const int horizontal = ScrollPaneBy(true, column, distance.cx, scroll);
-  const int vertical = ScrollPaneBy(false, row, distance.cy, scroll);
-  return horizontal || vertical;
+  const bool lives = FromHandlePermanent(window) == this;
+  return (lives && ScrollPaneBy(false, row, distance.cy, scroll)) || horizontal;
 }
 
 // The wheel comes here when the pane under the pointer does not want it.

@@ -1,5 +1,8 @@
 // The sizes as text: "splitter 1 DPI KEEP-RATIO rows N (ideal open)... columns N (ideal open)...".
 
+#include <limits>
+
+#include "qxcore/ui/app/internal/scaled_pixels.h"
 #include "qxcore/ui/layout/internal/state_text.h"
 #include "qxcore/ui/layout/splitter.h"
 
@@ -10,7 +13,7 @@ struct Line {
 };
 using Lines = STableDumb<Line>;
 
-constexpr int kMostPixels = 1 << 24;
+constexpr int kMostPixels = std::numeric_limits<int>::max();
 
 void Write(SStateWriter& writer, SStringView name, const STableDumb<SPaneInfo>& infos, const STableDumb<int>& open) {
   writer.Word(name).Number(infos.GetCount());
@@ -42,7 +45,7 @@ bool SSplitterWnd::SetGrid(int rows, int columns) {
   const bool isStatic = m_paneClass == nullptr;
   if (isStatic && (rows != m_rowCount || columns != m_columnCount)) return false;
   const int formerRows = m_rowCount;
-  LeaveBars();
+  EndUse();
   if (!GrowTo(true, rows)) return false;
   if (!GrowTo(false, columns)) return ShrinkTo(true, formerRows), false;
   ShrinkTo(true, rows);
@@ -66,8 +69,8 @@ int SSplitterWnd::SetState(const SString& state) {
   for (const bool isRow : {true, false}) {
     const Lines& lines = isRow ? rows : columns;
     for (int i = 0; i < lines.GetCount(); ++i) {
-      Table(isRow)[i].m_ideal = keepRatio ? lines[i].m_ideal : ::MulDiv(lines[i].m_ideal, m_dpi, dpi);
-      OpenSizes(isRow)[i] = ::MulDiv(lines[i].m_open, m_dpi, dpi);
+      Table(isRow)[i].m_ideal = keepRatio ? lines[i].m_ideal : SScaledPixels(lines[i].m_ideal, m_dpi, dpi);
+      OpenSizes(isRow)[i] = SScaledPixels(lines[i].m_open, m_dpi, dpi);
     }
   }
   RecalcLayout();

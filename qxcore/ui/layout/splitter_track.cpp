@@ -7,7 +7,7 @@
 
 // The tracker lies over the panes, so they must not be clipped while it is shown.
 void SSplitterWnd::StartTracking(int code) {
-  if (code == kSHitNothing || m_isTracking) return;
+  if (code == kSHitNothing || m_isTracking || m_hWnd == nullptr) return;
   GetHitRect(code, &m_tracker);
   m_trackedFrom = m_tracker;
   m_trackedCode = code;
@@ -58,19 +58,23 @@ void SSplitterWnd::MoveTracker(SPoint topLeft) {
 // --- what a drag comes to ---
 
 void SSplitterWnd::TrackRowSize(int y, int row) {
-  if (row < 0 || row + 1 >= m_rowCount) return;
   SRect inside;
   GetInsideRect(&inside);
-  const int top = inside.top + SPaneStart(m_rows.GetArray(), row, m_gapY);
-  MoveBarTo(true, row, y + TrackerThickness(true) / 2 - top);
+  TrackSize(true, row, y, inside.top, inside.bottom);
 }
 
 void SSplitterWnd::TrackColumnSize(int x, int column) {
-  if (column < 0 || column + 1 >= m_columnCount) return;
   SRect inside;
   GetInsideRect(&inside);
-  const int left = inside.left + SPaneStart(m_columns.GetArray(), column, m_gapX);
-  MoveBarTo(false, column, x + TrackerThickness(false) / 2 - left);
+  TrackSize(false, column, x, inside.left, inside.right);
+}
+
+// Beyond the ends of the panes every place means the same.
+void SSplitterWnd::TrackSize(bool rows, int bar, int place, int begin, int end) {
+  if (bar < 0 || bar >= Count(rows) - 1) return;
+  const int half = TrackerThickness(rows) / 2;
+  const int start = begin + SPaneStart(std::as_const(Table(rows)).GetArray(), bar, Gap(rows));
+  MoveBarTo(rows, bar, std::clamp(place, begin - half - 1, end) + half - start);
 }
 
 // In a dynamic splitter a pane that would be below its minimum goes.

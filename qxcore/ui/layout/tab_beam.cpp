@@ -4,6 +4,7 @@
 
 #include <memory>
 
+#include "qxcore/ui/app/internal/scaled_pixels.h"
 #include "qxcore/ui/window/message_entries.h"
 #include "qxcore/ui/window/thread_state.h"
 
@@ -21,6 +22,8 @@ QXCORE_IMPLEMENT_MESSAGE_MAP(
     on<WM_SETTINGCHANGE, &STabBeam::OnWinIniChange>(), on<0x02E0 /* WM_DPICHANGED */, &STabBeam::OnDpiChanged>(),
     on<0x02E3 /* WM_DPICHANGED_AFTERPARENT */, &STabBeam::OnDpiChangedAfterParent>(),
     on<WM_GETOBJECT, &STabBeam::OnGetObject>())
+
+static constexpr int kMostSpacing = 0xFFFF;
 
 STabBeam::STabBeam() = default;
 
@@ -193,7 +196,7 @@ void STabBeam::MeasureAll() {
 }
 
 void STabBeam::SetSpacing(int spacing) {
-  m_spacing = std::max(spacing, 0);
+  m_spacing = std::clamp(spacing, 0, kMostSpacing);
   MeasureAll();
 }
 
@@ -248,10 +251,10 @@ void STabBeam::ReadButtonSize() { m_buttons.SetSize(::GetSystemMetricsForDpi(SM_
 void STabBeam::ChangeDpi(int dpi) {
   if (dpi <= 0 || dpi == m_dpi) return;
   const int former = std::exchange(m_dpi, dpi);
-  m_spacing = ::MulDiv(m_spacing, dpi, former);
+  m_spacing = std::min(SScaledPixels(m_spacing, dpi, former), kMostSpacing);
   LOGFONTW description;
   const bool staysGiven = m_hasGivenFont && m_font.GetLogFont(&description);
-  if (staysGiven) description.lfHeight = ::MulDiv(description.lfHeight, dpi, former);
+  if (staysGiven) description.lfHeight = SScaledPixels(description.lfHeight, dpi, former);
   MakeFonts(staysGiven ? &description : nullptr);
   MeasureAll();
 }

@@ -82,7 +82,8 @@ class QXCORE_API STabBeam : public SWnd {
   // Whether a tab is empty; it is then written in the font for empty tabs. New tabs are not.
   void SetTabEmpty(int index, int empty);
   int GetTabEmpty(int index) const;
-  // The space between tabs, in pixels of the window's DPI; not negative. All tabs are measured anew.
+  // The space between tabs, in pixels of the window's DPI, 0 to 65,535; beyond the ends, the nearest. All tabs are
+  // measured anew.
   void SetSpacing(int spacing);
   int GetSpacing() const { return m_spacing; }
   // Where a tab is in the client area; its right part may be outside. Empty for an invalid index.

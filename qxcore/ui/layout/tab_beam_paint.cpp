@@ -31,8 +31,9 @@ void STabBeam::DrawAll(SDC* dc) {
   SFillWithSystemColor(*dc, client, COLOR_3DFACE);
   SFillWithSystemColor(*dc, SRect(client.left, client.top, client.right, client.top + line), COLOR_3DDKSHADOW);
   const STabStrip strip = Strip();
-  int end = m_first, right = strip.m_origin;
-  for (; end < m_count && right < client.right; ++end) right += m_tabs[end]->m_width + m_spacing;
+  int end = m_first;
+  std::int64_t right = strip.m_origin;
+  for (; end < m_count && right < client.right; ++end) right += std::int64_t{m_tabs[end]->m_width} + m_spacing;
   for (int i = 0; i < m_count; ++i) {
     if (i < m_first || i >= end) m_tabs[i]->m_drawn = m_tabs[i]->m_textArea = SRect();
   }

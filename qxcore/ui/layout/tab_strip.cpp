@@ -1,16 +1,17 @@
 #include "qxcore/ui/layout/tab_strip.h"
 
-int STabStrip::Offset(int tab) const {
-  int offset = m_origin;
-  for (int i = m_first; i < tab; ++i) offset += Step(i);
-  for (int i = tab; i < m_first; ++i) offset -= Step(i);
-  return offset;
+#include <limits>
+
+static int Saturated(std::int64_t place) {
+  using Limits = std::numeric_limits<int>;
+  return static_cast<int>(std::clamp<std::int64_t>(place, Limits::min(), Limits::max()));
 }
 
-int STabStrip::RightEdge(int tab) const { return Offset(tab) + Step(tab) + m_spacing; }
+int STabStrip::Offset(int tab) const { return Saturated(Start(tab)); }
+int STabStrip::RightEdge(int tab) const { return Saturated(Start(tab) + Step(tab) + m_spacing); }
 
 int STabStrip::TabAt(int x) const {
-  int left = m_origin;
+  std::int64_t left = m_origin;
   if (x < left) return -1;
   for (int i = m_first; i < m_count; ++i) {
     left += Step(i);
@@ -21,14 +22,14 @@ int STabStrip::TabAt(int x) const {
 
 int STabStrip::LastVisible() const {
   if (m_first >= m_count) return m_first;
-  int right = m_origin + Step(m_first) + m_spacing;
+  std::int64_t right = m_origin + Step(m_first) + m_spacing;
   int last = m_first;
   while (last + 1 < m_count && right + Step(last + 1) <= m_width) right += Step(++last);
   return last;
 }
 
 int STabStrip::SmallestFirstThatShows(int tab) const {
-  int right = m_origin + Step(tab) + m_spacing;
+  std::int64_t right = m_origin + Step(tab) + m_spacing;
   int first = tab;
   while (first > 0 && right + Step(first - 1) <= m_width) right += Step(--first);
   return first;

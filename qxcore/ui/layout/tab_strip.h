@@ -6,6 +6,8 @@
 // For the user-interface thread.
 #pragma once
 
+#include <cstdint>
+
 #include "qxcore/container/node_pool.h"
 #include "qxcore/graphics/rect.h"
 #include "qxcore/string/string.h"
@@ -35,7 +37,8 @@ struct QXCORE_API STabStrip {
   int m_origin;         // where the first visible tab begins
   int m_width;          // of the beam
 
-  // Where a tab begins, 0 to the count; for tabs before the first visible one below the origin.
+  // Where a tab begins, 0 to the count; for tabs before the first visible one below the origin. Places stop at the
+  // ends of int.
   int Offset(int tab) const;
   // Where it ends, if it is visible.
   int RightEdge(int tab) const;
@@ -49,7 +52,13 @@ struct QXCORE_API STabStrip {
   int SmallestFirstThatShows(int tab) const;
 
  private:
-  int Step(int tab) const { return m_tabs[tab]->m_width + m_spacing; }
+  std::int64_t Step(int tab) const { return std::int64_t{m_tabs[tab]->m_width} + m_spacing; }
+  std::int64_t Start(int tab) const {
+    std::int64_t start = m_origin;
+    for (int i = m_first; i < tab; ++i) start += Step(i);
+    for (int i = tab; i < m_first; ++i) start -= Step(i);
+    return start;
+  }
 };
 
 // What a scroll button does.

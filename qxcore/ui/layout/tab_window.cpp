@@ -56,13 +56,16 @@ int STabWnd::OnCreate(CREATESTRUCTW* create) {
   m_nextId = m_firstId = kSFirstTabId;
   m_flags &= ~kHasScrollBars;
   ReadMetrics(static_cast<int>(::GetDpiForWindow(m_hWnd)));
-  return m_beam.Create(this, WS_CHILD | WS_VISIBLE | WS_CLIPSIBLINGS, kSTabBeamId) ? 0 : -1;
+  if (!m_beam.Create(this, WS_CHILD | WS_VISIBLE | WS_CLIPSIBLINGS, kSTabBeamId)) return -1;
+  if (m_noTabWnd != nullptr) SetNoTabWnd(m_noTabWnd);
+  return 0;
 }
 
 // The beam's object can be used for another window afterwards.
 void STabWnd::OnDestroy() {
   StopDrag();
   m_shown = nullptr;
+  m_noTabWnd = nullptr;  // it goes as well
   while (m_beam.GetCount() > 0) m_beam.DeleteTab(m_beam.GetCount() - 1);
   SWnd::OnDestroy();
 }
@@ -95,8 +98,9 @@ SWnd* STabWnd::InsertTab(int index, SClassInfo* windowClass, LPCWSTR text, SCrea
   }
   SCreateContext* from = context != nullptr ? context : &m_context;
   if (!window->Create(nullptr, nullptr, WS_CHILD, SRect(), this, id != 0 ? id : GetNextID(), from)) return nullptr;
+  const HWND self = m_hWnd;
   const int inserted = EnterTab(index, window, text);
-  return GetTabWindow(inserted);
+  return FromHandlePermanent(self) == this ? GetTabWindow(inserted) : nullptr;
 }
 
 SWnd* STabWnd::AddTab(SClassInfo* windowClass, LPCWSTR text, SCreateContext* context, UINT id) {
@@ -150,13 +154,13 @@ int STabWnd::DetachTab(SWnd* window) {
 
 // A window that destroys itself takes its tab along.
 void STabWnd::OnParentNotify(UINT message, LPARAM lParam) {
-  const HWND child = reinterpret_cast<HWND>(lParam);
+  const HWND window = m_hWnd, child = reinterpret_cast<HWND>(lParam);
   if (LOWORD(message) == WM_DESTROY) {
     if (m_noTabWnd->GetSafeHwnd() == child) m_noTabWnd = nullptr;
     const int index = GetTabIndex(FromHandlePermanent(child));
     if (index >= 0) RemoveTab(index);
   }
-  if (m_hWnd != nullptr) SWnd::OnParentNotify(message, lParam);
+  if (FromHandlePermanent(window) == this) SWnd::OnParentNotify(message, lParam);
 }
 
 // --- what is shown ---
@@ -178,22 +182,29 @@ int STabWnd::ActivateTab(int index, int focus) {
   return 1;
 }
 
+void STabWnd::ActivateView(SWnd* window) {
+  SFrameWnd* frame = GetParentFrame();
+  SView* view = SObjectCast<SView>(window, &SView::classSView);
+  if (frame != nullptr && view != nullptr) frame->SetActiveView(view);
+}
+
 // The new window is visible and has the focus before the former one goes, so that neither a hole nor a window
-// outside is seen in between.
+// outside is seen in between. Whoever hears of it may end the whole.
 void STabWnd::ShowCurrent(bool focus) {
+  const HWND self = m_hWnd;
   SWnd* window = m_beam.GetCount() > 0 ? ShownWindow() : m_noTabWnd;
   const HWND former = m_shown;
   const HWND shown = window->GetSafeHwnd();
   const bool takesFocus = focus || HoldsFocus(former);
   m_shown = shown;
   RecalcLayout(0);
-  if (m_shown != shown) return;
-  SFrameWnd* frame = GetParentFrame();
-  SView* view = SObjectCast<SView>(window, &SView::classSView);
-  if (takesFocus && frame != nullptr && view != nullptr) frame->SetActiveView(view);
-  if (takesFocus && window != nullptr) SPaneFocus::Enter(window, false);
+  const auto lives = [&] { return FromHandlePermanent(self) == this; };
+  const auto isCurrent = [&] { return lives() && m_shown == shown && shown != nullptr; };
+  if (takesFocus && isCurrent()) ActivateView(window);
+  if (takesFocus && isCurrent()) SPaneFocus::Enter(window, false);
+  if (!lives()) return;
   if (former != nullptr && former != m_shown && ::IsWindow(former)) SSent(::ShowWindow(former, SW_HIDE));
-  if (m_hWnd != nullptr && shown == nullptr) InvalidateRect(nullptr, 0);
+  if (lives() && m_shown == nullptr) InvalidateRect(nullptr, 0);
 }
 
 void STabWnd::SetNoTabText(LPCWSTR text) {
@@ -203,7 +214,7 @@ void STabWnd::SetNoTabText(LPCWSTR text) {
 
 void STabWnd::SetNoTabWnd(SWnd* window, int redraw) {
   m_noTabWnd = window;
-  if (window != nullptr && m_hWnd != nullptr && ::GetParent(window->m_hWnd) != m_hWnd) {
+  if (window->GetSafeHwnd() != nullptr && m_hWnd != nullptr && ::GetParent(window->m_hWnd) != m_hWnd) {
     window->ShowWindow(SW_HIDE);
     window->ModifyStyle(WS_POPUP, WS_CHILD);
     window->SetParent(this);
@@ -298,7 +309,7 @@ int STabWnd::SetState(const SString& state) {
   m_shareOfBeam = beam;
   m_shareOfClient = client;
   RecalcLayout(1);
-  if (shown > 0) ActivateTab(shown - 1, 0);
   m_beam.SetFirstVisible(first);
+  if (shown > 0) ActivateTab(shown - 1, 0);
   return 1;
 }

@@ -95,8 +95,8 @@ class QXCORE_API STabWnd : public SWnd {
 
   // The shown tab, the first visible one and the share of the beam as a line of text.
   SString GetState() const;
-  // Takes them back at any size. Returns 0 and changes nothing for an invalid text; tabs that do not exist are left
-  // alone.
+  // Takes them back at any size; the shown tab is then visible. Returns 0 and changes nothing for an invalid text; tabs
+  // that do not exist are left alone.
   int SetState(const SString& state);
 
   int OnCmdMsg(UINT id, int code, void* extra, S_CMDHANDLERINFO* info) override;
@@ -161,6 +161,7 @@ class QXCORE_API STabWnd : public SWnd {
   SWnd* ShownWindow() const;
   int EnterTab(int index, SWnd* window, LPCWSTR text);
   void RemoveTab(int index);
+  void ActivateView(SWnd* window);
   void ShowCurrent(bool focus);
   bool HoldsFocus(HWND window) const;
   void PassToShown(UINT message, UINT code, UINT position, SScrollBar* bar);

@@ -1,5 +1,6 @@
 // Where the beam, the scroll bars and the shown window lie, the border between beam and scroll bar, the keyboard.
 
+#include "qxcore/ui/app/internal/scaled_pixels.h"
 #include "qxcore/ui/layout/internal/buffered_paint.h"
 #include "qxcore/ui/layout/internal/deferred_moves.h"
 #include "qxcore/ui/layout/internal/edges.h"
@@ -14,7 +15,7 @@ struct STabWnd::Places {
 // The gap is stated for 96 dots an inch, and the two lines by which the beam is higher as well.
 void STabWnd::ReadMetrics(int dpi) {
   const UINT dots = static_cast<UINT>(dpi);
-  m_gap = ::MulDiv(m_gap, dpi, m_dpi);
+  m_gap = SScaledPixels(m_gap, dpi, m_dpi);
   m_dpi = dpi;
   m_vertWidth = ::GetSystemMetricsForDpi(SM_CXVSCROLL, dots);
   m_horzHeight = ::GetSystemMetricsForDpi(SM_CXHSCROLL, dots);
@@ -65,8 +66,10 @@ STabWnd::Places STabWnd::FindPlaces() const {
   return places;
 }
 
+// The window that is sized may end the whole.
 void STabWnd::RecalcLayout(int redraw) {
   if (m_hWnd == nullptr) return;
+  const HWND self = m_hWnd;
   MakeScrollBars();
   KeepShare(GetClientRect().Width());
   const Places places = FindPlaces();
@@ -83,7 +86,7 @@ void STabWnd::RecalcLayout(int redraw) {
   place(box, places.m_box);
   if (m_shown != nullptr) moves.Move(m_shown, places.m_window, SWP_SHOWWINDOW);
   moves.End();
-  if (m_hWnd == nullptr) return;
+  if (FromHandlePermanent(self) != this) return;
   InvalidateRect(nullptr, 0);
   if (redraw) m_beam.InvalidateRect(nullptr, 0);
 }

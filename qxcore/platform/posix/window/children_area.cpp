@@ -55,14 +55,15 @@ const ChildrenArea& AreaOfChildren(Window* parent) {
   for (const Window* child = parent->firstChild; child != nullptr; child = child->next) ++count;
   List<pixman_box32_t> boxes;
   boxes.reserve(count);
+  constexpr long long kLargest = 1LL << 60;  // no screen is as large
   long long sum = 0;
   for (const Window* child = parent->firstChild; child != nullptr; child = child->next) {
     if (!child->IsVisible() || IsEmpty(child->window)) continue;
     boxes.push_back(BoxOf(child->window));
-    sum += static_cast<long long>(Width(child->window)) * Height(child->window);
+    if (sum <= kLargest) sum += static_cast<long long>(Width(child->window)) * Height(child->window);
   }
   children.covered = Region(boxes.data(), boxes.size());
-  children.areApart = children.covered.Area() == sum;
+  children.areApart = sum <= kLargest && children.covered.Area() == sum;
   children.isKnown = true;
   return children;
 }
