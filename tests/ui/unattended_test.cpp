@@ -66,6 +66,36 @@ TEST_F(Unattended, MessageBoxes) {
   EXPECT_TRUE(m_owner.IsWindowEnabled());
 }
 
+// One line or many, short ones or such that must be broken: all of the text is to be seen.
+TEST_F(Unattended, ABoxHasRoomForItsText) {
+  const SetInteractiveMode mode(kInteractiveShow);
+  SString wide, high, both;
+  for (int i = 0; i < 120; ++i) wide += WTEXT("many words that follow ");
+  for (int i = 0; i < 20; ++i) high += WTEXT("a line\n");
+  for (int i = 0; i < 12; ++i) both += wide.Left(400) + WTEXT("\n");
+  for (const SString& text : {SString(WTEXT("?")), wide, high, both}) {
+    SRect place, needed;
+    m_owner.m_handler = [&](UINT message, WPARAM, LPARAM, LRESULT*) {
+      const HWND box = ::GetLastActivePopup(m_owner.m_hWnd);
+      if (message != WM_TIMER || box == m_owner.m_hWnd) return 0;
+      const SWnd* shown = SWnd::FromHandle(::GetDlgItem(box, 0xFFFF));
+      place = shown->GetClientRect();
+      needed = SRect(0, 0, place.right, 0);
+      SClientDC dc(shown->m_hWnd);
+      const SSelectObject font(dc, shown->GetFont() != nullptr ? shown->GetFont() : SGetDefaultUIFont());
+      dc.DrawTextW(text, needed, DT_CALCRECT | DT_WORDBREAK | DT_NOPREFIX);
+      ::PostMessageW(box, WM_COMMAND, IDOK, 0);
+      return 1;
+    };
+    m_owner.SetTimer(1, 10);
+    EXPECT_EQ(m_owner.MessageBoxW(text, WTEXT("box"), MB_OK), IDOK);
+    m_owner.KillTimer(1);
+    EXPECT_GT(place.right, 0);
+    EXPECT_GE(place.right, needed.right) << testing::PrintToString(text);
+    EXPECT_GE(place.bottom, needed.bottom) << testing::PrintToString(text);
+  }
+}
+
 TEST_F(Unattended, ErrorReports) {
   const auto report = [] { return SShowError(WTEXT("broken: %s %n")), 0; };
   EXPECT_EQ(In(kInteractiveAnswer, report), "0");

@@ -132,15 +132,17 @@ std::string Files(int count) { return std::to_string(count) + (count == 1 ? " fi
 
 constexpr int kMostLines = 12;  // of a question, so that it fits a screen
 
-// "\n  NAME: TEXT" for each item that has one, as far as there is room.
+// "\n  NAME: TEXT" for each item that has one, as far as there is room. The text is often the same for all.
 template <class TextOf>
 std::string Lines(const std::vector<ConversionItem>& items, int count, TextOf textOf) {
   std::string lines;
+  std::string former;
   int shown = 0;
   for (const ConversionItem& item : items) {
     const std::string text = textOf(item);
     if (text.empty() || shown == kMostLines) continue;
-    lines += "\n  " + ToUtf8(item.name) + ": " + text;
+    lines += "\n  " + ToUtf8(item.name) + ": " + (text == former ? "the same" : text);
+    former = text;
     ++shown;
   }
   if (count > shown) lines += "\n  and " + Files(count - shown) + " more";

@@ -61,6 +61,15 @@ SIZE TextSize(LPCWSTR text, int count, bool) {
   return size;
 }
 
+SIZE BrokenTextSize(LPCWSTR text, int width) {
+  RECT rect{0, 0, width, 0};
+  HDC dc = GetDC(nullptr);
+  SelectObject(dc, GetStockObject(DEFAULT_GUI_FONT));
+  DrawTextW(dc, text, -1, &rect, DT_CALCRECT | DT_WORDBREAK | DT_NOPREFIX);
+  ReleaseDC(nullptr, dc);
+  return {rect.right, rect.bottom};
+}
+
 // The base units are the average width of the 52 letters, rounded, and the line's height.
 HFONT DialogFont(LPCWSTR face, int height, int weight, bool isItalic, SIZE* units) {
   constexpr int kLetters = 52;
@@ -95,6 +104,7 @@ bool PixelsOf(void* window, platform::ShownPixels* pixels) {
   painter.freeRegion = FreeRegion;
   painter.controlBrush = ControlBrush;
   painter.textSize = TextSize;
+  painter.brokenTextSize = BrokenTextSize;
   painter.dialogFont = DialogFont;
   painter.pixels = PixelsOf;
   painter.movePixels = MovePixels;

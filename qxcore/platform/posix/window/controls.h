@@ -45,6 +45,8 @@ struct Painter {
   HBRUSH (*controlBrush)(HDC context, UINT message) = nullptr;
   // The width of a text in the menu or dialog font, and the font's height, in pixels.
   SIZE (*textSize)(LPCWSTR text, int count, bool isMenu) = nullptr;
+  // The size of a text in the dialog font, broken into lines of at most `width` pixels.
+  SIZE (*brokenTextSize)(LPCWSTR text, int width) = nullptr;
   // A font for a dialog, of the given height in pixels (negative: of the characters), and its dialog base units.
   HFONT (*dialogFont)(LPCWSTR face, int height, int weight, bool isItalic, SIZE* units) = nullptr;
   // The pixels of a top-level window; false before anything was drawn.

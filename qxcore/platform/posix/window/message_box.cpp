@@ -64,7 +64,8 @@ constexpr int kButtonWidth = 50, kButtonHeight = 14, kMargin = 7, kGap = 4;
 constexpr int kButtonClass = 0x80, kStaticClass = 0x82;
 constexpr int kTextId = 0xFFFF, kCharacterWidth = 4, kLineHeight = 8;
 
-SIZE TextSize(LPCWSTR text) {
+// Where no text can be measured.
+SIZE EstimatedSize(LPCWSTR text) {
   int lines = 1, width = 0, widest = 0;
   for (; *text != 0; ++text) {
     if (*text == '\n') {
@@ -75,6 +76,17 @@ SIZE TextSize(LPCWSTR text) {
     }
   }
   return {std::min(widest, 80) * kCharacterWidth, (lines + widest / 80) * kLineHeight};
+}
+
+// Enough dialog units for a number of pixels.
+int DialogUnits(LONG pixels, int perBase, int base) { return static_cast<int>((pixels * perBase + base - 1) / base); }
+
+// In dialog units, with lines of at most five eighths of the screen.
+SIZE TextSize(LPCWSTR text) {
+  if (g_painter.brokenTextSize == nullptr) return EstimatedSize(text);
+  const SIZE size = g_painter.brokenTextSize(text, GetSystemMetrics(SM_CXSCREEN) * 5 / 8);
+  const LONG base = GetDialogBaseUnits();
+  return {DialogUnits(size.cx, 4, LOWORD(base)), DialogUnits(size.cy, 8, HIWORD(base))};
 }
 
 INT_PTR CALLBACK Procedure(HWND dialog, UINT message, WPARAM wParam, LPARAM lParam) {
