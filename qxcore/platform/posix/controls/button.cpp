@@ -114,7 +114,7 @@ void PaintPush(HWND window, const Button* button, HDC dc, RECT rect, LPCWSTR tex
 }
 
 void PaintCheck(HWND window, const Button* button, HDC dc, RECT rect, LPCWSTR text) {
-  const int size = MulDiv(13, static_cast<int>(GetDpiForSystem()), 96);
+  const int size = model::Scaled(13), gap = model::Scaled(4);
   const int top = (rect.top + rect.bottom - size) / 2;
   const bool isLeft = StyleOf(window) & BS_LEFTTEXT;
   RECT box{rect.left, top, rect.left + size, top + size};
@@ -126,7 +126,7 @@ void PaintCheck(HWND window, const Button* button, HDC dc, RECT rect, LPCWSTR te
   DrawFrameControl(dc, &box, DFC_BUTTON,
                    shape | (button->check != BST_UNCHECKED ? DFCS_CHECKED : 0u) |
                        (button->isPushed ? DFCS_PUSHED : 0u) | (IsWindowEnabled(window) ? 0u : DFCS_INACTIVE));
-  (isLeft ? rect.right : rect.left) += isLeft ? -size - 4 : size + 4;
+  (isLeft ? rect.right : rect.left) += isLeft ? -size - gap : size + gap;
   PaintText(dc, rect, text, IsWindowEnabled(window) ? COLOR_WINDOWTEXT : COLOR_GRAYTEXT, button->font,
             DT_SINGLELINE | DT_VCENTER);
   if (button->hasFocus) DrawFocusRect(dc, &rect);
@@ -140,7 +140,8 @@ void PaintGroup(HWND window, const Button* button, HDC dc, RECT rect, LPCWSTR te
   RECT frame = rect;
   frame.top += size.bottom / 2;
   DrawEdge(dc, &frame, EDGE_ETCHED, BF_RECT);
-  const RECT label{rect.left + 8, rect.top, rect.left + 10 + size.right, rect.top + size.bottom};
+  const int left = rect.left + model::Scaled(8);
+  const RECT label{left, rect.top, left + 2 + size.right, rect.top + size.bottom};
   FillRect(dc, &label, GetSysColorBrush(COLOR_3DFACE));
   PaintText(dc, model::Inflated(label, -1, 0), text, IsWindowEnabled(window) ? COLOR_WINDOWTEXT : COLOR_GRAYTEXT,
             button->font, DT_SINGLELINE);

@@ -114,7 +114,7 @@ void PaintItem(HDC dc, const MenuItem& item, RECT rect, bool isHighlighted, int 
   PaintText(dc, rect, item.text.c_str() + tab + 1, color, nullptr, DT_SINGLELINE | DT_VCENTER | DT_RIGHT);
 }
 
-constexpr int kBarIndent = 6, kPopupIndent = 20;
+constexpr int kBarIndent = 6, kPopupIndent = 20;  // at 96 dots an inch
 
 void PaintMenuBar(HDC dc, const Frame& frame) {
   if (frame.menu == nullptr) return;
@@ -122,7 +122,7 @@ void PaintMenuBar(HDC dc, const Frame& frame) {
   const Items all = ItemsOf(frame.menu);
   for (std::size_t i = 0; i < all.items.size(); ++i)
     PaintItem(dc, all.items[i], Moved(all.items[i].place, frame.menuBar.left, frame.menuBar.top),
-              static_cast<int>(i) == all.highlighted, kBarIndent);
+              static_cast<int>(i) == all.highlighted, Scaled(kBarIndent));
 }
 
 void PaintNonClient(HWND window) {
@@ -149,7 +149,7 @@ void PaintPopup(HWND window, HMENU menu) {
   DrawEdge(dc, &rect, EDGE_RAISED, BF_RECT);
   const Items all = ItemsOf(menu);
   for (std::size_t i = 0; i < all.items.size(); ++i) {
-    PaintItem(dc, all.items[i], all.items[i].place, static_cast<int>(i) == all.highlighted, kPopupIndent);
+    PaintItem(dc, all.items[i], all.items[i].place, static_cast<int>(i) == all.highlighted, Scaled(kPopupIndent));
     if (all.items[i].subMenu == nullptr) continue;
     RECT arrow = all.items[i].place;
     arrow.left = arrow.right - GetSystemMetrics(SM_CXMENUCHECK);

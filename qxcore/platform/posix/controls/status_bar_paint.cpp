@@ -8,7 +8,7 @@ namespace platform::controls {
 
 namespace {
 
-constexpr int kTextIndent = 3;
+constexpr int kTextIndent = 3;  // at 96 dots an inch
 
 COLORREF BackgroundOf(const StatusBar& bar) {
   return bar.background == CLR_DEFAULT ? GetSysColor(COLOR_3DFACE) : bar.background;
@@ -21,8 +21,9 @@ void Fill(HDC dc, const RECT& rect, COLORREF color) {
 
 // A text is indented at the side where it begins, and may fill the part to its other edge.
 RECT Indented(RECT rect, UINT side) {
-  if (side != DT_RIGHT) rect.left += kTextIndent;
-  if (side != DT_LEFT) rect.right -= kTextIndent;
+  const int indent = model::Scaled(kTextIndent);
+  if (side != DT_RIGHT) rect.left += indent;
+  if (side != DT_LEFT) rect.right -= indent;
   return rect;
 }
 

@@ -45,6 +45,12 @@ void DrawRing(HDC dc, RECT& rect, Ring ring, UINT flags) {
 
 // --- marks, scaled to a square ---
 
+// The breadth of a line that is one pixel in a control of the usual size.
+int LineBreadth(const RECT& control) {
+  constexpr int kUsualSize = 16;
+  return std::max<int>(1, (std::min(control.right - control.left, control.bottom - control.top) + 4) / kUsualSize);
+}
+
 // A filled triangle that points up, down, left or right (the DFCS_SCROLL numbers).
 void DrawArrow(HDC dc, const RECT& rect, UINT direction, int color) {
   int size = std::min(rect.right - rect.left, rect.bottom - rect.top);
@@ -93,11 +99,12 @@ void DrawPush(HDC dc, RECT* rect, UINT state) {
 void DrawScrollPart(HDC dc, RECT rect, UINT state) {
   if (state & DFCS_SCROLLSIZEGRIP) {
     // Diagonal ridges toward the bottom right corner.
-    for (int step = 2; step < std::min(rect.right - rect.left, rect.bottom - rect.top) - 2; step += 4) {
+    int broad = LineBreadth(rect), size = std::min(rect.right - rect.left, rect.bottom - rect.top);
+    for (int step = 2 * broad; step < size - 2 * broad; step += 4 * broad) {
       for (int i = 0; i <= step; ++i) {
-        int x = rect.right - 2 - i, y = rect.bottom - 2 - step + i;
-        Fill(dc, x, y, x + 1, y + 1, COLOR_BTNSHADOW);
-        Fill(dc, x, y - 1, x + 1, y, COLOR_BTNHIGHLIGHT);
+        int x = rect.right - 2 * broad - i, y = rect.bottom - 2 * broad - step + i;
+        Fill(dc, x, y, x + 1, y + broad, COLOR_BTNSHADOW);
+        Fill(dc, x, y - broad, x + 1, y, COLOR_BTNHIGHLIGHT);
       }
     }
     return;
@@ -137,6 +144,7 @@ void DrawButton(HDC dc, RECT* rect, UINT state) {
 }
 
 void DrawCaptionButton(HDC dc, RECT rect, UINT state) {
+  int line = LineBreadth(rect), broad = 2 * line;
   DrawPush(dc, &rect, state);
   if (state & DFCS_PUSHED) OffsetRect(&rect, 1, 1);
   int color = MarkColor(state), margin = std::max(2, (rect.right - rect.left) / 5);
@@ -145,16 +153,19 @@ void DrawCaptionButton(HDC dc, RECT rect, UINT state) {
   switch (state & 7) {
     case DFCS_CAPTIONCLOSE:
       for (int i = 0; i < size; ++i) {
-        Fill(dc, rect.left + i, rect.top + i, rect.left + i + 2, rect.top + i + 1, color);
-        Fill(dc, rect.left + i, rect.top + size - 1 - i, rect.left + i + 2, rect.top + size - i, color);
+        Fill(dc, rect.left + i, rect.top + i, rect.left + i + broad, rect.top + i + 1, color);
+        Fill(dc, rect.left + i, rect.top + size - 1 - i, rect.left + i + broad, rect.top + size - i, color);
       }
       break;
     case DFCS_CAPTIONMIN:
-      Fill(dc, rect.left, rect.bottom - 2, rect.right - 2, rect.bottom, color);
+      Fill(dc, rect.left, rect.bottom - broad, rect.right - broad, rect.bottom, color);
       break;
     default:
-      Fill(dc, rect.left, rect.top, rect.right, rect.top + 2, color);
-      FrameRect(dc, &rect, GetSysColorBrush(color));
+      Fill(dc, rect.left, rect.top, rect.right, rect.top + broad, color);
+      for (int i = 0; i < line; ++i) {
+        FrameRect(dc, &rect, GetSysColorBrush(color));
+        InflateRect(&rect, -1, -1);
+      }
   }
 }
 

@@ -11,14 +11,15 @@
 namespace platform::model {
 namespace {
 
-constexpr int kBesideText = 6;      // pixels at each side of a text in the bar
-constexpr int kUsualCharacter = 6;  // pixels, where no text can be measured
+// At 96 dots an inch.
+constexpr int kBesideText = 6;      // at each side of a text in the bar
+constexpr int kUsualCharacter = 6;  // where no text can be measured
 constexpr int kCheckArea = 20, kArrowArea = 16, kPopupBorder = 3;
 
 int TextWidth(const Text& text) {
   const auto ampersands = static_cast<int>(std::count(text.begin(), text.end(), u'&'));
   if (g_painter.textSize != nullptr) return g_painter.textSize(text.data(), static_cast<int>(text.size()), true).cx;
-  return (static_cast<int>(text.size()) - ampersands) * kUsualCharacter;
+  return (static_cast<int>(text.size()) - ampersands) * Scaled(kUsualCharacter);
 }
 
 HMENU MenuOf(HWND handle) {
@@ -66,7 +67,7 @@ int MenuBarHeight(HWND handle, int width) {
     List<MenuItem> items = ItemsOf(menu);
     int x = 0, y = 0;
     for (MenuItem& item : items) {
-      const int wide = TextWidth(item.text) + 2 * kBesideText;
+      const int wide = TextWidth(item.text) + 2 * Scaled(kBesideText);
       if (x > 0 && (x + wide > width || (item.type & (MFT_MENUBREAK | MFT_MENUBARBREAK)))) {
         x = 0;
         y += row;
@@ -86,7 +87,7 @@ SIZE MeasurePopup(HMENU menu) {
     int widest = 0, y = kPopupBorder;
     for (MenuItem& item : items) {
       const int high = item.type & MFT_SEPARATOR ? row / 2 : row;
-      widest = std::max(widest, kCheckArea + TextWidth(item.text) + kArrowArea);
+      widest = std::max(widest, Scaled(kCheckArea) + TextWidth(item.text) + Scaled(kArrowArea));
       item.place = {kPopupBorder, y, 0, y + high};
       y += high;
     }

@@ -1,4 +1,4 @@
-// Small sums on rectangles, for the model alone.
+// Small sums on lengths and rectangles, for the model and what paints for it.
 #pragma once
 
 #include <algorithm>
@@ -7,6 +7,8 @@
 
 namespace platform::model {
 
+// A length at 96 dots an inch, on the screen.
+inline int Scaled(int length) { return MulDiv(length, static_cast<int>(GetDpiForSystem()), 96); }
 inline int Width(const RECT& rect) { return rect.right - rect.left; }
 inline int Height(const RECT& rect) { return rect.bottom - rect.top; }
 inline RECT Moved(const RECT& rect, int dx, int dy) {
