@@ -11,6 +11,8 @@
 
 namespace {
 
+int Scaled(int pixels) { return ::MulDiv(pixels, static_cast<int>(::GetDpiForSystem()), 96); }
+
 class Pane : public SView {
   QXCORE_DECLARE_CREATABLE_CLASS(Pane)
  public:
@@ -20,12 +22,10 @@ class Pane : public SView {
     const SSelectObject font(*dc, SGetDefaultUIFont(static_cast<int>(::GetDpiForWindow(m_hWnd))));
     dc->SetTextColor(::GetSysColor(COLOR_WINDOWTEXT));
     dc->SetBkColor(::GetSysColor(COLOR_WINDOW));
-    dc->TextOutW(8, 8, WTEXT("notes"));
+    dc->TextOutW(Scaled(8), Scaled(8), WTEXT("notes"));
   }
 };
 QXCORE_IMPLEMENT_CREATABLE_CLASS(Pane, SView, 1)
-
-int Scaled(int pixels) { return ::MulDiv(pixels, static_cast<int>(::GetDpiForSystem()), 96); }
 
 void UseDarkColors() {
   const int elements[] = {COLOR_WINDOW,    COLOR_WINDOWTEXT,    COLOR_3DFACE,   COLOR_BTNTEXT,
@@ -90,6 +90,10 @@ bool SplitterAndTabs(const char* folder, const char* suffix) {
   splitter.AddPane(0, 1, &tabs, SSize(0, 0));
   for (LPCWSTR text : {WTEXT("first"), WTEXT("second")}) tabs.AddTab(&Pane::classPane, text);
   frame->RecalcLayout();
+  for (const int bar : {SB_HORZ, SB_VERT}) {
+    SCROLLINFO info = {sizeof info, SIF_ALL, 0, 99, 40, 0, 0};  // as of a text that is longer than its window
+    tabs.GetTabScrollBar(bar)->SetInfo(&info);
+  }
   bool isDone = Save(*frame, folder, "splitter-and-tabs", suffix);
   tabs.AddTab(&Pane::classPane, WTEXT("empty"));
   tabs.GetTabBeam()->SetTabEmpty(2, 1);

@@ -65,6 +65,7 @@ int WorkbenchFrame::OnCreateClient(CREATESTRUCTW*, SCreateContext*) {
   if (m_tabs.Create(&m_splitter, nullptr, nullptr, WS_CHILD | WS_VISIBLE, SSplitterWnd::IdFromRowCol(0, 1)) == 0)
     return 0;
   m_tabs.GetTabBeam()->SetScrollButtons(1, 0);
+  m_tabs.ShowScrollBar(SB_BOTH, 0);  // until there is something to scroll
   m_tabs.SetNoTabText(WTEXT("Enter, or a double click on a file, shows its text here."));
   m_splitter.AddPane(0, 0, m_list, SSize(width / 2, 0));
   m_splitter.AddPane(0, 1, &m_tabs, SSize(0, 0));
@@ -336,6 +337,7 @@ PreviewView* WorkbenchFrame::ShowPreview(int number) {
   auto* preview = new PreviewView(document.name, document.native, encoding);  // ends with its window
   if (!preview->Create(nullptr, nullptr, WS_CHILD, SRect(), &m_tabs, m_tabs.GetNextID())) return nullptr;
   const auto behind = static_cast<int>(document.name.View().find_last_of(WTEXT("\\/")) + 1);
+  m_tabs.ShowScrollBar(SB_BOTH, 1);
   m_tabs.ActivateTab(m_tabs.AddTab(preview, document.name.Mid(behind)));
   return preview;
 }
@@ -373,7 +375,9 @@ void WorkbenchFrame::OnClosePreview() {
   int tab = -1;
   if (m_tabs.GetActiveTab(&tab) == nullptr) return;
   m_tabs.DeleteTab(tab);
-  if (m_tabs.GetTabCount() == 0) m_list->SetFocus();
+  if (m_tabs.GetTabCount() > 0) return;
+  m_tabs.ShowScrollBar(SB_BOTH, 0);
+  m_list->SetFocus();
 }
 
 void WorkbenchFrame::OnPart(UINT id) {

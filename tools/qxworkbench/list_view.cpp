@@ -99,7 +99,7 @@ void FileListView::DrawRow(SDC* dc, int row, const SRect& rect) {
   const int number = m_documents.NumberAt(row);
   const Document& document = m_documents.At(number);
   const bool hasFocus = GetFocus() == this;
-  const int back = !document.isSelected ? COLOR_WINDOW : hasFocus ? COLOR_HIGHLIGHT : COLOR_3DFACE;
+  const int back = !document.isSelected ? COLOR_WINDOW : hasFocus ? COLOR_HIGHLIGHT : COLOR_3DLIGHT;
   const int text = !document.isSelected ? COLOR_WINDOWTEXT : hasFocus ? COLOR_HIGHLIGHTTEXT : COLOR_BTNTEXT;
   dc->SetBkColor(::GetSysColor(back));
   dc->SetTextColor(::GetSysColor(text));

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "qxcore/graphics/color.h"
 #include "qxcore/ui/app/ui_font.h"
 #include "qxcore/ui/window/message_entries.h"
 #include "tools/common/utf8.h"
@@ -26,6 +27,15 @@ SString Drawable(SStringView line) {
     }
   }
   return text;
+}
+
+// What the heading fades to: the second colour of captions, or where both are one, something away from the text's.
+COLORREF SecondHeadingColor() {
+  const COLORREF first = ::GetSysColor(COLOR_ACTIVECAPTION), second = ::GetSysColor(COLOR_GRADIENTACTIVECAPTION);
+  if (first != second) return second;
+  double hue = 0, saturation = 0, lightness = 0;
+  SColor(::GetSysColor(COLOR_CAPTIONTEXT)).GetHSLColor(&hue, &saturation, &lightness);
+  return SColor::GetMediumColor(first, lightness < 0.5 ? SColor::White : SColor::Black, 6, 10);
 }
 
 }  // namespace
@@ -86,8 +96,7 @@ SString PreviewView::Heading() const {
 
 void PreviewView::DrawHead(SDC* dc, const SRect& rect) {
   SDrawGradient gradient;
-  gradient.SetGradient(SDrawGradient::VERT, ::GetSysColor(COLOR_ACTIVECAPTION),
-                       ::GetSysColor(COLOR_GRADIENTACTIVECAPTION), rect);
+  gradient.SetGradient(SDrawGradient::VERT, ::GetSysColor(COLOR_ACTIVECAPTION), SecondHeadingColor(), rect);
   SDrawBackground(gradient).Draw(*dc, rect);
   const SSelectObject font(*dc, SGetDefaultUIFont(static_cast<int>(::GetDpiForWindow(m_hWnd))));
   dc->SetTextColor(::GetSysColor(COLOR_CAPTIONTEXT));
