@@ -4,24 +4,48 @@
 
 namespace {
 
-constexpr int kElements[] = {COLOR_WINDOW,      COLOR_WINDOWTEXT,  COLOR_3DFACE,        COLOR_BTNTEXT,
-                             COLOR_3DSHADOW,    COLOR_3DHIGHLIGHT, COLOR_3DLIGHT,       COLOR_3DDKSHADOW,
-                             COLOR_MENU,        COLOR_MENUTEXT,    COLOR_ACTIVECAPTION, COLOR_GRADIENTACTIVECAPTION,
-                             COLOR_CAPTIONTEXT, COLOR_HIGHLIGHT,   COLOR_HIGHLIGHTTEXT, COLOR_MENUBAR,
-                             COLOR_SCROLLBAR,   COLOR_GRAYTEXT};
-constexpr COLORREF kColors[] = {RGB(32, 32, 32),    RGB(232, 232, 232), RGB(52, 52, 52),    RGB(232, 232, 232),
-                                RGB(30, 30, 30),    RGB(80, 80, 80),    RGB(64, 64, 64),    RGB(12, 12, 12),
-                                RGB(44, 44, 44),    RGB(232, 232, 232), RGB(30, 60, 110),   RGB(50, 50, 60),
-                                RGB(255, 255, 255), RGB(40, 90, 160),   RGB(255, 255, 255), RGB(44, 44, 44),
-                                RGB(40, 40, 40),    RGB(140, 140, 140)};
-constexpr int kCount = static_cast<int>(std::size(kElements));
-static_assert(std::size(kColors) == std::size(kElements));
+struct Color {
+  int element;
+  COLORREF value;
+};
+constexpr Color kColors[] = {{COLOR_WINDOW, RGB(32, 32, 32)},
+                             {COLOR_WINDOWTEXT, RGB(232, 232, 232)},
+                             {COLOR_3DFACE, RGB(52, 52, 52)},
+                             {COLOR_BTNTEXT, RGB(232, 232, 232)},
+                             {COLOR_3DSHADOW, RGB(30, 30, 30)},
+                             {COLOR_3DHIGHLIGHT, RGB(80, 80, 80)},
+                             {COLOR_3DLIGHT, RGB(64, 64, 64)},
+                             {COLOR_3DDKSHADOW, RGB(12, 12, 12)},
+                             {COLOR_MENU, RGB(44, 44, 44)},
+                             {COLOR_MENUTEXT, RGB(232, 232, 232)},
+                             {COLOR_ACTIVECAPTION, RGB(30, 60, 110)},
+                             {COLOR_GRADIENTACTIVECAPTION, RGB(50, 50, 60)},
+                             {COLOR_CAPTIONTEXT, RGB(255, 255, 255)},
+                             {COLOR_INACTIVECAPTION, RGB(50, 50, 50)},
+                             {COLOR_GRADIENTINACTIVECAPTION, RGB(50, 50, 50)},
+                             {COLOR_INACTIVECAPTIONTEXT, RGB(170, 170, 170)},
+                             {COLOR_HIGHLIGHT, RGB(40, 90, 160)},
+                             {COLOR_HIGHLIGHTTEXT, RGB(255, 255, 255)},
+                             {COLOR_MENUBAR, RGB(44, 44, 44)},
+                             {COLOR_SCROLLBAR, RGB(40, 40, 40)},
+                             {COLOR_GRAYTEXT, RGB(140, 140, 140)}};
+constexpr int kCount = static_cast<int>(std::size(kColors));
+
+void SetColors(const std::vector<COLORREF>& values) {
+  int elements[kCount];
+  for (int i = 0; i < kCount; ++i) elements[i] = kColors[i].element;
+  ::SetSysColors(kCount, elements, values.data());
+}
 
 }  // namespace
 
 DarkColors::DarkColors() {
-  for (const int element : kElements) m_former.push_back(::GetSysColor(element));
-  ::SetSysColors(kCount, kElements, kColors);
+  std::vector<COLORREF> dark;
+  for (const Color& color : kColors) {
+    m_former.push_back(::GetSysColor(color.element));
+    dark.push_back(color.value);
+  }
+  SetColors(dark);
 }
 
-DarkColors::~DarkColors() { ::SetSysColors(kCount, kElements, m_former.data()); }
+DarkColors::~DarkColors() { SetColors(m_former); }
