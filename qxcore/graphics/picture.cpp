@@ -1,5 +1,6 @@
 #include "qxcore/graphics/picture.h"
 
+#include <algorithm>
 #include <cstring>
 #include <new>
 
@@ -129,12 +130,63 @@ bool GetPixels(HBITMAP bitmap, platform::Pixels* pixels) {
   return lines == pixels->height;
 }
 
+class WholeBitmap final : public platform::PixelRows {
+ public:
+  explicit WholeBitmap(const platform::Pixels& pixels) : m_pixels(pixels) {}
+  SIZE Size() const override { return {m_pixels.width, m_pixels.height}; }
+  const std::uint32_t* Read(int, int* count) override {
+    *count = m_pixels.height;
+    return m_pixels.data.data();
+  }
+
+ private:
+  const platform::Pixels& m_pixels;
+};
+
+// What a context shows, a few rows at a time, so that there is no copy of all of it.
+class ContextRows final : public platform::PixelRows {
+ public:
+  ContextRows(const SDC& source, const SRect& area)
+      : m_source(source), m_area(area), m_band(source), m_isMade(m_bitmap.CreatePixels(area.Width(), kBandRows)) {}
+  bool IsMade() const { return m_isMade; }
+  SIZE Size() const override { return m_area.Size(); }
+  const std::uint32_t* Read(int first, int* count) override {
+    *count = std::min(kBandRows, m_area.Height() - first);
+    {
+      const SSelectObject selected(m_band, m_bitmap.m_hObject);
+      const SRect rows(0, 0, m_area.Width(), *count);
+      if (!m_band.BitBlt(rows, m_source, SPoint(m_area.left, m_area.top + first))) return nullptr;
+    }
+    ::GdiFlush();
+    return m_bitmap.GetBits();
+  }
+
+ private:
+  static constexpr int kBandRows = 64;
+  const SDC& m_source;
+  const SRect m_area;
+  SMemoryDC m_band;
+  SBitmap m_bitmap;
+  bool m_isMade;
+};
+
+HRESULT Write(const SString& file, platform::PixelRows& rows) {
+  std::vector<BYTE> bytes;
+  HRESULT result = platform::EncodePng(rows, &bytes);
+  return result == S_OK ? WriteBytes(file, bytes) : result;
+}
+
 HRESULT Write(const SString& file, HBITMAP bitmap) {
   platform::Pixels pixels;
   if (!GetPixels(bitmap, &pixels)) return E_INVALIDARG;
-  std::vector<BYTE> bytes;
-  HRESULT result = platform::EncodePng(pixels, &bytes);
-  return result == S_OK ? WriteBytes(file, bytes) : result;
+  WholeBitmap rows(pixels);
+  return Write(file, rows);
+}
+
+HRESULT Write(const SString& file, const SDC& source, const SRect& area) {
+  if (source.GetSafeHdc() == nullptr || area.IsEmpty()) return E_INVALIDARG;
+  ContextRows rows(source, area);
+  return rows.IsMade() ? Write(file, rows) : E_OUTOFMEMORY;
 }
 
 HRESULT Read(const SString& file, SBitmap* bitmap) {
@@ -164,6 +216,10 @@ HRESULT WithMemory(F work) {
 
 HRESULT SWritePicture(const SString& file, HBITMAP bitmap) {
   return WithMemory([&] { return Write(file, bitmap); });
+}
+
+HRESULT SWritePicture(const SString& file, const SDC& source, const SRect& area) {
+  return WithMemory([&] { return Write(file, source, area); });
 }
 
 HRESULT SReadPicture(const SString& file, SBitmap* bitmap) {

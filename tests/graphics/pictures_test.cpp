@@ -81,14 +81,30 @@ TEST(PictureFiles, KeepEveryPixel) {
   test::TempFolder folder;
   SString file = SString(folder.Path().c_str()) + WTEXT("\\picture.png");
   std::mt19937 random(1);
-  for (SSize size : {SSize(1, 1), SSize(3, 7), SSize(200, 120)}) {
+  for (SSize size : {SSize(1, 1), SSize(3, 7), SSize(200, 120), SSize(31, 64), SSize(17, 129)}) {
     SBitmap bitmap, again;
     ASSERT_TRUE(bitmap.CreatePixels(size.cx, size.cy));
     for (int i = 0; i < size.cx * size.cy; ++i) bitmap.GetBits()[i] = random() & 0xFFFFFF;
+    const auto holds = [&](const SRect& area) {
+      if (SReadPicture(file, &again) != S_OK || again.GetSize() != area.Size()) return false;
+      for (int y = 0; y < area.Height(); ++y) {
+        const std::uint32_t *row = again.GetBits() + y * area.Width(),
+                            *of = bitmap.GetBits() + (area.top + y) * size.cx + area.left;
+        if (!std::equal(row, row + area.Width(), of)) return false;
+      }
+      return true;
+    };
+    const SRect whole(SPoint(), size), part(size.cx / 3, size.cy / 4, size.cx, size.cy);
     ASSERT_EQ(SWritePicture(file, bitmap), S_OK);
-    ASSERT_EQ(SReadPicture(file, &again), S_OK);
-    ASSERT_EQ(again.GetSize(), size);
-    for (int i = 0; i < size.cx * size.cy; ++i) ASSERT_EQ(again.GetBits()[i], bitmap.GetBits()[i]);
+    EXPECT_TRUE(holds(whole)) << size.cy;
+    SMemoryDC dc;
+    const SSelectObject selected(dc, bitmap);
+    for (const SRect& area : {part, whole}) {
+      ASSERT_EQ(SWritePicture(file, dc, area), S_OK);
+      EXPECT_TRUE(holds(area)) << size.cy;
+    }
+    EXPECT_EQ(SWritePicture(file, dc, SRect(3, 3, 3, 9)), E_INVALIDARG);
+    EXPECT_TRUE(holds(whole)) << "as it was";
   }
 }
 

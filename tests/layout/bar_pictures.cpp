@@ -40,17 +40,8 @@ void UseDarkColors() {
 
 bool Save(SWnd& window, const char* folder, const char* name, const char* suffix) {
   ::RedrawWindow(window.m_hWnd, nullptr, nullptr, RDW_INVALIDATE | RDW_UPDATENOW | RDW_ALLCHILDREN);
-  SBitmap bitmap;
-  const SRect rect = window.GetClientRect();
-  bitmap.CreatePixels(rect.Width(), rect.Height());
-  SClientDC from(window.m_hWnd);
-  {
-    SMemoryDC dc;
-    const SSelectObject selected(dc, bitmap);
-    dc.BitBlt(rect, from, SPoint());
-  }
   const SString file = SFile::FromNative(std::string(folder) + "/" + name + suffix + ".png");
-  return SWritePicture(file, bitmap) == S_OK;
+  return SWritePicture(file, SClientDC(window.m_hWnd), window.GetClientRect()) == S_OK;
 }
 
 void Show(SStatusBar& bar, int pane, LPCWSTR text) {

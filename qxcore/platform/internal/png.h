@@ -17,8 +17,20 @@ struct Pixels {
 
 constexpr int kLargestSide = 32767;
 
+// Where a picture comes from that is written. Nothing here throws.
+class PixelRows {
+ public:
+  virtual SIZE Size() const = 0;
+  // Rows from `first` on, as Pixels has them, and how many there are, at least one; valid until the next call. Each row
+  // is asked for once, from the top on. Null when they cannot be had.
+  virtual const std::uint32_t* Read(int first, int* count) = 0;
+
+ protected:
+  ~PixelRows() = default;
+};
+
 // The bytes of a file with these pixels; 0, or an error code with *bytes empty. May throw std::bad_alloc.
-HRESULT EncodePng(const Pixels& pixels, std::vector<BYTE>* bytes);
+HRESULT EncodePng(PixelRows& rows, std::vector<BYTE>* bytes);
 
 // The pixels of a file, transparent parts laid over white. 0, ERROR_INVALID_DATA as an HRESULT for bytes that are no
 // PNG, are damaged or have a side of more than kLargestSide; *pixels is empty then. May throw std::bad_alloc.

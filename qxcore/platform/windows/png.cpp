@@ -67,33 +67,43 @@ HRESULT MakeStream(IStream** stream) {
   return create ? create(nullptr, TRUE, stream) : E_NOTIMPL;
 }
 
-std::vector<BYTE> WithoutPadding(const Pixels& pixels) {
-  std::vector<BYTE> rows;
-  rows.reserve(pixels.data.size() * 3);
-  for (std::uint32_t pixel : pixels.data) {
-    for (int shift : {0, 8, 16}) rows.push_back(static_cast<BYTE>(pixel >> shift));
+void WithoutPadding(const std::uint32_t* pixels, std::size_t count, std::vector<BYTE>* bytes) {
+  bytes->clear();
+  bytes->reserve(count * 3);
+  for (std::size_t i = 0; i < count; ++i) {
+    for (int shift : {0, 8, 16}) bytes->push_back(static_cast<BYTE>(pixels[i] >> shift));
   }
-  return rows;
 }
 
 // Stops at the first failure.
 #define RETURN_IF_FAILED(call) \
   if (HRESULT result = (call); FAILED(result)) return result
 
-HRESULT Write(IWICImagingFactory* factory, const Pixels& pixels, IStream* stream) {
+HRESULT WriteRows(IWICBitmapFrameEncode* frame, PixelRows& rows) {
+  const SIZE size = rows.Size();
+  std::vector<BYTE> bytes;
+  for (int first = 0, count = 0; first < size.cy; first += count) {
+    const std::uint32_t* pixels = rows.Read(first, &count);
+    if (pixels == nullptr) return E_FAIL;
+    WithoutPadding(pixels, static_cast<std::size_t>(size.cx) * static_cast<std::size_t>(count), &bytes);
+    const UINT stride = static_cast<UINT>(size.cx) * 3;
+    RETURN_IF_FAILED(
+        frame->WritePixels(static_cast<UINT>(count), stride, static_cast<UINT>(bytes.size()), bytes.data()));
+  }
+  return S_OK;
+}
+
+HRESULT Write(IWICImagingFactory* factory, PixelRows& rows, IStream* stream) {
   Interface<IWICBitmapEncoder> encoder;
   RETURN_IF_FAILED(factory->CreateEncoder(GUID_ContainerFormatPng, nullptr, &encoder));
   RETURN_IF_FAILED(encoder->Initialize(stream, WICBitmapEncoderNoCache));
   Interface<IWICBitmapFrameEncode> frame;
   RETURN_IF_FAILED(encoder->CreateNewFrame(&frame, nullptr));
   RETURN_IF_FAILED(frame->Initialize(nullptr));
-  RETURN_IF_FAILED(frame->SetSize(static_cast<UINT>(pixels.width), static_cast<UINT>(pixels.height)));
+  RETURN_IF_FAILED(frame->SetSize(static_cast<UINT>(rows.Size().cx), static_cast<UINT>(rows.Size().cy)));
   WICPixelFormatGUID format = GUID_WICPixelFormat24bppBGR;
   RETURN_IF_FAILED(frame->SetPixelFormat(&format));
-  std::vector<BYTE> rows = WithoutPadding(pixels);
-  UINT stride = static_cast<UINT>(pixels.width) * 3;
-  RETURN_IF_FAILED(
-      frame->WritePixels(static_cast<UINT>(pixels.height), stride, static_cast<UINT>(rows.size()), rows.data()));
+  RETURN_IF_FAILED(WriteRows(frame.get(), rows));
   RETURN_IF_FAILED(frame->Commit());
   return encoder->Commit();
 }
@@ -140,14 +150,14 @@ HRESULT Read(IWICImagingFactory* factory, IStream* stream, Pixels* pixels) {
 
 }  // namespace
 
-HRESULT EncodePng(const Pixels& pixels, std::vector<BYTE>* bytes) {
+HRESULT EncodePng(PixelRows& rows, std::vector<BYTE>* bytes) {
   bytes->clear();
   Com com;
   Interface<IWICImagingFactory> factory;
   Interface<IStream> stream;
   RETURN_IF_FAILED(MakeFactory(&factory));
   RETURN_IF_FAILED(MakeStream(&stream));
-  RETURN_IF_FAILED(Write(factory.get(), pixels, stream.get()));
+  RETURN_IF_FAILED(Write(factory.get(), rows, stream.get()));
   HRESULT result = ReadAll(stream.get(), bytes);
   if (FAILED(result)) bytes->clear();
   return result;

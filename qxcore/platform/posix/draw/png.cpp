@@ -34,20 +34,23 @@ void Append(png_structp png, png_bytep piece, std::size_t count) {
 }
 
 // Windows and drawings are flat: filters take time and make them larger.
-bool WriteRows(png_structp png, png_infop info, const Pixels& pixels) {
+bool WriteRows(png_structp png, png_infop info, PixelRows& rows) {
   constexpr int kFastest = 1;
+  const SIZE size = rows.Size();
   if (setjmp(png_jmpbuf(png))) return false;
-  png_set_IHDR(png, info, static_cast<png_uint_32>(pixels.width), static_cast<png_uint_32>(pixels.height), 8,
-               PNG_COLOR_TYPE_RGB, PNG_INTERLACE_NONE, PNG_COMPRESSION_TYPE_DEFAULT, PNG_FILTER_TYPE_DEFAULT);
+  png_set_IHDR(png, info, static_cast<png_uint_32>(size.cx), static_cast<png_uint_32>(size.cy), 8, PNG_COLOR_TYPE_RGB,
+               PNG_INTERLACE_NONE, PNG_COMPRESSION_TYPE_DEFAULT, PNG_FILTER_TYPE_DEFAULT);
   png_set_sRGB(png, info, PNG_sRGB_INTENT_PERCEPTUAL);
   png_set_compression_level(png, kFastest);
   png_set_filter(png, PNG_FILTER_TYPE_BASE, PNG_FILTER_NONE);
   png_write_info(png, info);
   png_set_bgr(png);
   png_set_filler(png, 0, PNG_FILLER_AFTER);
-  const auto* row = reinterpret_cast<png_const_bytep>(pixels.data.data());
-  for (int y = 0; y < pixels.height; ++y, row += std::size_t{4} * static_cast<unsigned>(pixels.width))
-    png_write_row(png, row);
+  for (int first = 0, count = 0; first < size.cy; first += count) {
+    const std::uint32_t* row = rows.Read(first, &count);
+    if (row == nullptr) return false;
+    for (int y = 0; y < count; ++y, row += size.cx) png_write_row(png, reinterpret_cast<png_const_bytep>(row));
+  }
   png_write_end(png, info);
   return true;
 }
@@ -57,12 +60,12 @@ void Leave(png_structp png, png_const_charp) { png_longjmp(png, 1); }
 
 }  // namespace
 
-HRESULT EncodePng(const Pixels& pixels, std::vector<BYTE>* bytes) {
+HRESULT EncodePng(PixelRows& rows, std::vector<BYTE>* bytes) {
   bytes->clear();
   png_structp png = png_create_write_struct(PNG_LIBPNG_VER_STRING, nullptr, &Leave, &Quiet);
   png_infop info = png != nullptr ? png_create_info_struct(png) : nullptr;
   if (info != nullptr) png_set_write_fn(png, bytes, &Append, nullptr);
-  const bool isWritten = info != nullptr && WriteRows(png, info, pixels);
+  const bool isWritten = info != nullptr && WriteRows(png, info, rows);
   png_destroy_write_struct(&png, &info);
   if (isWritten) return S_OK;
   bytes->clear();
