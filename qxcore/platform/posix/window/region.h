@@ -39,8 +39,8 @@ class Region {
     if (dx != 0 || dy != 0) pixman_region32_translate(&m_region, dx, dy);
   }
   RECT Bounds() const {
-    const pixman_box32_t* box = pixman_region32_extents(const_cast<pixman_region32_t*>(&m_region));
-    return {box->x1, box->y1, box->x2, box->y2};
+    const pixman_box32_t& box = m_region.extents;
+    return {box.x1, box.y1, box.x2, box.y2};
   }
   // Whether none of it lies in the rectangle; cheaper than an intersection.
   bool Misses(const RECT& rect) const {
@@ -55,8 +55,8 @@ class Region {
   // Whether it is one rectangle that holds the given one.
   bool Covers(const RECT& rect) const {
     const RECT bounds = Bounds();
-    return pixman_region32_n_rects(const_cast<pixman_region32_t*>(&m_region)) == 1 && bounds.left <= rect.left &&
-           bounds.top <= rect.top && bounds.right >= rect.right && bounds.bottom >= rect.bottom;
+    return bounds.left <= rect.left && bounds.top <= rect.top && bounds.right >= rect.right &&
+           bounds.bottom >= rect.bottom && pixman_region32_n_rects(const_cast<pixman_region32_t*>(&m_region)) == 1;
   }
   long long Area() const {
     int count = 0;
