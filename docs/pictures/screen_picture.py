@@ -4,7 +4,7 @@
 usage: screen_picture.py OUT.png WIDTH HEIGHT READY PROGRAM [ARGS]
 
 The picture is taken once the file READY is there, which the program writes when its window is complete, and the screen
-no longer changes. Then the program is ended.
+no longer changes. Then the file READY.taken is made, at which the program is to end.
 """
 
 import os
@@ -65,14 +65,19 @@ def settled(path):
 
 def main():
     out, width, height, ready, *program = sys.argv[1:]
-    pathlib.Path(ready).unlink(missing_ok=True)
+    taken = pathlib.Path(ready + ".taken")
+    for file in (pathlib.Path(ready), taken):
+        file.unlink(missing_ok=True)
     with tempfile.TemporaryDirectory() as folder, x_server.running(width, height, folder) as environment:
         shown = subprocess.Popen(program, env=environment)
         try:
             wait_for(lambda: os.path.exists(ready))
             pathlib.Path(out).write_bytes(png(*settled(pathlib.Path(folder) / "Xvfb_screen0")))
+            taken.touch()
+            if shown.wait(timeout=60) != 0:
+                sys.exit("the program failed")
         finally:
-            shown.terminate()
+            shown.kill()
             shown.wait()
 
 
