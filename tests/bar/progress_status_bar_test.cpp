@@ -67,7 +67,12 @@ TEST_F(ProgressBars, WithCancel_TheButtonStandsInTheCorner) {
   Button().GetWindowTextW(&label);
   EXPECT_EQ(label, WTEXT("Cancel"));
   const SRect button = test::PlaceOf(Button());
-  EXPECT_EQ(button.Width(), test::WidthOf(m_bar, WTEXT("Cancel")) + 20);
+  SRect text;
+  SClientDC dc(m_bar.m_hWnd);
+  const SSelectObject font(dc, m_bar.GetFont());
+  dc.DrawTextW(WTEXT("Cancel"), text, DT_CALCRECT | DT_SINGLELINE);
+  EXPECT_EQ(button.Size(), text.Size() + SSize(20, 0));
+  EXPECT_EQ(Button().GetStyle() & 0xF00, 0x300u);
   EXPECT_EQ(button.BottomRight(), Area().BottomRight());
   EXPECT_EQ(test::PlaceOf(Progress()), SRect(Area().left, Area().top, button.left, Area().bottom));
   EXPECT_TRUE(IsShown(Button()));
@@ -102,7 +107,10 @@ TEST_F(ProgressBars, WithoutAMainPane_TheClientAreaIsTaken) {
 TEST_F(ProgressBars, Cancel_IsRequestedByMouseAndKeys) {
   m_frame->SetFocus();
   for (WPARAM key : {WPARAM{0}, WPARAM{VK_ESCAPE}, WPARAM{VK_RETURN}}) {
+    Button().EnableWindow(0);
+    Progress().EnableWindow(0);
     m_bar.StartProgress(1);
+    EXPECT_TRUE(Button().IsWindowEnabled() && Progress().IsWindowEnabled());
     EXPECT_EQ(::GetFocus(), Button().m_hWnd);
     EXPECT_EQ(Flags() & SProgressStatusBar::kCancelRequested, 0u);
     if (key == 0) {
@@ -160,6 +168,11 @@ TEST_F(ProgressBars, Cursor_IsAnArrowOverTheButtonOnly) {
   EXPECT_EQ(::GetCursor(), ::LoadCursorW(nullptr, IDC_ARROW));
   m_bar.EndProgress();
   EXPECT_EQ(::GetCursor(), wait);
+  // What was shown before the progress began is not its affair.
+  m_bar.StartProgress(0);
+  ::SetCursor(::LoadCursorW(nullptr, IDC_CROSS));
+  m_bar.EndProgress();
+  EXPECT_EQ(::GetCursor(), ::LoadCursorW(nullptr, IDC_CROSS));
 }
 
 // Before the window is made, and after it went: what is kept is kept, and nobody loses the focus.
@@ -298,6 +311,32 @@ TEST_F(StatusTexts, Windows_AreDisabledAsLongAsTheMessage) {
   EXPECT_EQ(SModalState::State(), 1);
   EXPECT_TRUE(m_frame->IsWindowEnabled());
   EXPECT_EQ(m_app.GetWaitCount(), 0);
+}
+
+// What the owner window gets: each text once, and the end once.
+TEST_F(StatusTexts, Messages_AreSentToTheOwner) {
+  std::vector<WideString> sent;
+  test::Window owner([&sent](UINT message, WPARAM wParam, LPARAM, LRESULT*) {
+    if (message != 0x047B) return 0;
+    sent.push_back(wParam != 0 ? reinterpret_cast<LPCWSTR>(wParam) : WTEXT("-"));
+    return 1;
+  });
+  ASSERT_TRUE(owner.Popup());
+  m_app.m_mainWnd = &owner;
+  {
+    SSetStatusBarText message(WTEXT("one"));
+    message.Reset();
+  }
+  EXPECT_EQ(sent, (std::vector<WideString>{WTEXT("one"), WTEXT("-")}));
+  sent.clear();
+  {
+    const SSetStatusBarText quiet;
+    EXPECT_TRUE(sent.empty());
+    EXPECT_EQ(m_app.GetWaitCount(), 1);
+  }
+  EXPECT_EQ(sent, std::vector<WideString>{WTEXT("-")});
+  m_app.m_mainWnd = m_frame;
+  owner.DestroyWindow();
 }
 
 TEST(StatusTextsAlone, WithoutAnApplication_NothingHappens) {

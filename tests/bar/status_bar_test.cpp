@@ -90,6 +90,30 @@ TEST_F(StatusBars, Create_StandsAtTheBottomWithItsOwnHeight) {
   fixed->DestroyWindow();
 }
 
+// Borders of the style lie around the client area, make the bar higher, and leave the panes less room.
+TEST_F(StatusBars, Borders_TakeTheirRoom) {
+  constexpr DWORD kAll = kSBarBorderLeft | kSBarBorderTop | kSBarBorderRight | kSBarBorderBottom;
+  m_bar.InsertPane(0, 0, kSPaneStretch);
+  Frame* fixed = Frame::Make(WS_POPUP | WS_VISIBLE);
+  for (const DWORD kind : {DWORD{0}, DWORD{kSBarBorder3d}}) {
+    const SUISysData& measures = *SGetUISysData();
+    const int width = kind ? measures.m_edgeWidth : measures.m_borderWidth;
+    const int height = kind ? measures.m_edgeHeight : measures.m_borderHeight;
+    Bar bar;
+    ASSERT_TRUE(bar.Create(fixed, kAll | kind));
+    EXPECT_EQ(bar.GetBarStyle(), kAll | kind) << "only another style loses its kinds of border";
+    bar.InsertPane(0, 0, kSPaneStretch);
+    bar.InsertPane(1, 30, 0);
+    fixed->RecalcLayout();
+    EXPECT_EQ(bar.GetBarLayout(1, 1).cy, m_bar.GetBarLayout(1, 1).cy + 2 * height);
+    const SRect place = bar.GetWindowRect();
+    EXPECT_EQ(bar.GetClientRect().Size(), place.Size() - SSize(2 * width, 2 * height));
+    EXPECT_EQ(PartsOf(bar)[1], place.Width() - 2 * width);
+    EXPECT_EQ(PartsOf(bar)[0], place.Width() - 2 * width - 36 - 2);
+  }
+  fixed->DestroyWindow();
+}
+
 TEST_F(StatusBars, RandomChanges_ShowWhatASecondReadingSays) {
   std::mt19937 random(4);
   const auto number = [&](int below) { return static_cast<int>(random() % static_cast<unsigned>(below)); };
@@ -246,23 +270,49 @@ TEST_F(StatusBars, MaximisedParent_LeavesTheGripsRoomToThePanes) {
   EXPECT_EQ(hit(restored.left + 2, restored.top + 2), HTCLIENT);
 }
 
+// Drawn on a context of its own, to be compared pixel by pixel.
 TEST_F(StatusBars, OwnerDrawnPane_IsPaintedInGrey) {
-  m_bar.InsertPane(0, 100, kSPaneOwnerDraw);
-  SetText(0, WTEXT("IIIIIIII"));
+  m_bar.InsertPane(0, 20, 0);
+  m_bar.InsertPane(1, 100, kSPaneOwnerDraw);
+  SetText(1, WTEXT("R&D IIII"));
   m_bar.Paint();
-  EXPECT_EQ(PartType(m_bar, 0) & SBT_OWNERDRAW, SBT_OWNERDRAW);
-  const SRect rect = PartRect(m_bar, 0);
-  SClientDC dc(m_bar.m_hWnd);
-  int grey = 0, darker = 0;
-  for (int y = rect.top; y < rect.bottom; ++y) {
-    for (int x = rect.left; x < rect.right; ++x) {
-      const int red = GetRValue(dc.GetPixel(SPoint(x, y)));
-      grey += red >= 128 && red < 200;  // smoothed glyphs have few pixels of the whole colour
-      darker += red < 128;
+  EXPECT_EQ(PartType(m_bar, 1) & SBT_OWNERDRAW, SBT_OWNERDRAW);
+  const SRect client = m_bar.GetClientRect();
+  const auto picture = [&](auto draw) {
+    SMemoryDC dc;
+    SBitmap bitmap;
+    bitmap.CreatePixels(client.Width(), client.Height());
+    const SSelectObject selected(dc, bitmap);
+    const SSelectObject font(dc, m_bar.GetFont());
+    dc.FillSolidRect(client, ::GetSysColor(COLOR_3DFACE));
+    dc.SetBkColor(RGB(1, 2, 3));
+    dc.SetTextColor(RGB(4, 5, 6));
+    draw(dc);
+    EXPECT_EQ(dc.GetBkColor(), RGB(1, 2, 3)) << "the colours are those from before";
+    EXPECT_EQ(dc.GetTextColor(), RGB(4, 5, 6));
+    std::vector<COLORREF> pixels;
+    for (int y = 0; y < client.bottom; ++y) {
+      for (int x = 0; x < 140; ++x) pixels.push_back(dc.GetPixel(SPoint(x, y)));
     }
-  }
-  EXPECT_GT(grey, 20);
-  EXPECT_EQ(darker, 0);
+    return pixels;
+  };
+  const auto expected = picture([&](SDC& dc) {
+    SRect rect = PartRect(m_bar, 1);
+    rect.left += 3;
+    const COLORREF background = dc.SetBkColor(::GetSysColor(COLOR_3DFACE)), foreground = dc.SetTextColor(0x808080);
+    dc.DrawTextW(WTEXT("R&D IIII"), rect, DT_SINGLELINE | DT_VCENTER | DT_NOPREFIX);
+    dc.SetBkColor(background);
+    dc.SetTextColor(foreground);
+  });
+  const auto drawn = picture([&](SDC& dc) {
+    DRAWITEMSTRUCT item = {};
+    item.itemID = 1;
+    item.hwndItem = m_bar.m_hWnd;
+    item.hDC = dc.GetSafeHdc();
+    m_bar.SendMessageW(0xBC2B, 0, reinterpret_cast<LPARAM>(&item));
+  });
+  EXPECT_EQ(drawn, expected);
+  EXPECT_GT(std::count_if(drawn.begin(), drawn.end(), [](COLORREF color) { return GetRValue(color) < 200; }), 20);
 }
 
 // Letters of a right-to-left script stand from the right to the left, whichever side the pane's text begins at.
@@ -486,7 +536,8 @@ TEST(CtrlBar, Offsets_AreThoseOfTheStyleAndTheFields) {
   const SUISysData& measures = *SGetUISysData();
   EXPECT_EQ(bar.SetBarStyle(kSBarBorderLeft | kSBarBorderBottom), 0u);
   EXPECT_EQ(bar.SetBarStyle(kSBarBorderLeft | kSBarBorderBottom | kSBarBorder3d), kSBarBorderLeft | kSBarBorderBottom);
-  EXPECT_EQ(bar.m_changes.size(), 2u);
+  const DWORD first = kSBarBorderLeft | kSBarBorderBottom;
+  EXPECT_EQ(bar.m_changes, (std::vector<std::pair<DWORD, DWORD>>{{0, first}, {first, first | kSBarBorder3d}}));
   bar.SetBorders(1, 2, 3, 4);
   SRect rect(0, 0, 100, 100);
   bar.CalcNCOffsets(&rect, 1);
@@ -504,6 +555,8 @@ struct Order : SStatusBar {
     EXPECT_EQ(SlotOf(&Order::OnBarStyleChange), last + 1);
     EXPECT_EQ(SlotOf(&Order::GetBarLayout), last + 2);
     EXPECT_EQ(SlotOf(&Order::GetCustomLayout), last + 3);
+    EXPECT_EQ(kSMsgSizeParent, 0x0361u);
+    EXPECT_EQ(kSMsgStatusText, 0x047Bu);
     if (sizeof(void*) != 4) return;  // elsewhere a class may begin in the padding of its base
     const auto offset = [this](const auto& field) {
       return static_cast<int>(reinterpret_cast<const char*>(&field) - reinterpret_cast<const char*>(this));

@@ -89,6 +89,35 @@ TEST_F(SystemStatusBar, Parts_HaveTheRectanglesBetweenTheirEdges) {
   EXPECT_EQ(PartRect(m_bar, 2), SRect(22, 2, 400, 25));
   EXPECT_EQ(SetParts(std::vector<int>(256, 5)), 1);
   EXPECT_EQ(PartsOf(m_bar).size(), 256u);
+  EXPECT_EQ(SetParts(std::vector<int>(257, 5)), IsWine()) << "documented: at most 256";
+}
+
+// A new text is seen without more ado; tabs part what stands at the left, in the middle and at the right.
+TEST_F(SystemStatusBar, Texts_ArePaintedInTheirThirds) {
+  Make();
+  SetParts({-1});
+  const auto inked = [this] {
+    m_bar.UpdateWindow();
+    const SRect rect = PartRect(m_bar, 0);
+    SClientDC dc(m_bar.m_hWnd);
+    std::string thirds(3, ' ');
+    for (int y = rect.top + 3; y < rect.bottom - 3; ++y) {
+      for (int x = rect.left + 3; x < rect.right - 3; ++x) {
+        if (GetRValue(dc.GetPixel(SPoint(x, y))) < 100) thirds[static_cast<std::size_t>(x * 3 / rect.right)] = 'x';
+      }
+    }
+    return thirds;
+  };
+  EXPECT_EQ(inked(), "   ");
+  const std::pair<LPCWSTR, const char*> cases[] = {{WTEXT("mm"), "x  "},
+                                                   {WTEXT("\tmm"), " x "},
+                                                   {WTEXT("\t\tmm"), "  x"},
+                                                   {WTEXT("mm\tmm\tmm"), "xxx"},
+                                                   {WTEXT("mm\t\tmm"), "x x"}};
+  for (const auto& [text, expected] : cases) {
+    SetText(0, text);
+    EXPECT_EQ(inked(), expected);
+  }
 }
 
 TEST_F(SystemStatusBar, Texts_AreKeptWithTheirType) {

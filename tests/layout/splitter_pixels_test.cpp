@@ -38,8 +38,20 @@ TEST_F(Splitters, ChildrenHaveTheirIdentifiersAndPlaces) {
   }
   EXPECT_EQ(PlaceIn(m_splitter, 0xEA20u), SRect(398 - bar, 298 - bar, 398, 298));
   int row = 0, column = 0;
-  EXPECT_TRUE(m_splitter.IsChildPane(m_splitter.GetPane(1, 2), &row, &column));
+  EXPECT_TRUE(m_splitter.IsChildPane(m_splitter.GetDlgItem(0xE912), &row, &column));
   EXPECT_EQ(row * 10 + column, 12);
+  int height = 0, minimum = 0, fixed = 0;
+  m_splitter.SetRowInfo(0, 40, 10, 1);
+  m_splitter.GetRowInfo(0, &height, &minimum, &fixed);
+  EXPECT_EQ(height * 1000 + minimum * 10 + fixed, 40101);
+  // The box is a grip only where it sizes the window around.
+  const HWND box = ::GetDlgItem(m_splitter.m_hWnd, 0xEA20);
+  const auto kind = [box] { return (::GetWindowLongW(box, GWL_STYLE) & 0x18) | (::IsWindowEnabled(box) ? 1 : 0); };
+  EXPECT_EQ(kind(), 0x08);
+  m_frame->ModifyStyle(0, WS_THICKFRAME);
+  m_splitter.RecalcLayout();
+  EXPECT_EQ(kind(), 0x11);
+  m_frame->ModifyStyle(WS_THICKFRAME, 0);
   EXPECT_FALSE(m_splitter.IsChildPane(m_splitter.GetDlgItem(0xEA00)));
   m_splitter.SetScrollStyle(WS_VSCROLL);
   EXPECT_EQ(m_splitter.GetDlgItem(0xEA00), nullptr);
@@ -72,10 +84,14 @@ TEST_F(Splitters, LimitsOfTheGrid) {
 TEST_F(Splitters, SplitBoxesAreSixPixelsLong) {
   MakeDynamic(2, 3);
   const SRect inside = m_splitter.Inside();
-  EXPECT_EQ(m_splitter.HitTest(SPoint(inside.right, inside.top + 5)), kSHitVertSplitBox);
+  SRect rect;
+  m_splitter.GetHitRect(kSHitVertSplitBox, &rect);
+  EXPECT_EQ(rect, SRect(2, 0, inside.right, 4)) << "the tracker of a new bar at the edge";
+  EXPECT_EQ(m_splitter.Limit(), SRect(2, 2, inside.right, inside.bottom - 4));
+  EXPECT_EQ(m_splitter.HitTest(SPoint(inside.right, inside.top + 5)), 1);
   EXPECT_EQ(m_splitter.HitTest(SPoint(inside.right, inside.top + 6)), kSHitNothing);
-  EXPECT_EQ(m_splitter.HitTest(SPoint(inside.left + 5, inside.bottom)), kSHitHorzSplitBox);
-  EXPECT_EQ(m_splitter.HitTest(SPoint(inside.left + 6, inside.bottom)), kSHitNothing);
+  EXPECT_EQ(m_splitter.HitTest(SPoint(inside.left + 5, inside.bottom)), 2);
+  EXPECT_EQ(m_splitter.HitTest(SPoint(inside.left + 6, inside.bottom)), 0);
   // The scroll bars begin behind them.
   EXPECT_EQ(PlaceIn(m_splitter, 0xEA00u), SRect(inside.left + 7, inside.bottom, inside.right, 298));
   EXPECT_EQ(PlaceIn(m_splitter, 0xEA10u), SRect(inside.right, inside.top + 7, 398, inside.bottom));
@@ -88,6 +104,8 @@ TEST_F(Splitters, SplitBoxesAreSixPixelsLong) {
 TEST_F(Splitters, HitRectsAndLimits) {
   MakeStatic(2, 2);
   SRect rect;
+  EXPECT_EQ(m_splitter.HitTest(SPoint(10, 42)), 101);
+  EXPECT_EQ(m_splitter.HitTest(SPoint(52, 10)), 201);
   m_splitter.GetHitRect(kSHitRowBar, &rect);
   EXPECT_EQ(rect, SRect(2, 40, 398, 44)) << "four pixels, two before the bar";
   EXPECT_EQ(m_splitter.Limit(), SRect(2, 2, 398, 294));

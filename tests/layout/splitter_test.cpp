@@ -21,6 +21,11 @@ TEST_F(Splitters, ADraggedBarLiesUnderTheMouse) {
   Drag(m_splitter, SPoint(55 + 100, 100), SPoint(2000, 100));
   EXPECT_EQ(Widths(), (std::vector<int>{389, 0})) << "as far as there is room";
   ExpectPanesInPlace();
+  Drag(m_splitter, SPoint(395, 100), SPoint(150 + 5, 100));
+  Drag(m_splitter, SPoint(155, 100), SPoint(-50, 100));
+  EXPECT_EQ(Widths(), (std::vector<int>{0, 389}));
+  m_splitter.ToggleBar(kSHitColumnBar);
+  EXPECT_EQ(Widths()[0], 149) << "it opens as wide as it was before the drag";
   // Without a move, and when the drag is given up, nothing changes.
   const std::vector<int> before = Heights();
   Drag(m_splitter, SPoint(100, 43), SPoint(100, 43));
@@ -40,9 +45,18 @@ TEST_F(Splitters, ADraggedBarLiesUnderTheMouse) {
 }
 
 TEST_F(Splitters, RealInput_DragsABar) {
-  MakeStatic(1, 2);
+  MakeStatic(2, 2);
   m_frame->ActivateFrame();
   test::PumpAll();
+  const auto cursorAt = [this](SPoint at) {
+    m_splitter.ClientToScreen(&at);
+    ::SetCursorPos(at.x, at.y);
+    m_splitter.SendMessageW(WM_SETCURSOR, reinterpret_cast<WPARAM>(m_splitter.m_hWnd), HTCLIENT);
+    return ::GetCursor();
+  };
+  EXPECT_EQ(cursorAt(SPoint(55, 100)), ::LoadCursorW(nullptr, IDC_SIZEWE));
+  EXPECT_EQ(cursorAt(SPoint(100, 45)), ::LoadCursorW(nullptr, IDC_SIZENS));
+  EXPECT_EQ(cursorAt(SPoint(0, 0)), ::LoadCursorW(nullptr, IDC_ARROW));
   test::RealMouse(m_splitter, SPoint(55, 100));
   test::RealMouse(m_splitter, SPoint(55, 100), MOUSEEVENTF_LEFTDOWN);
   ASSERT_TRUE(test::PumpUntil([this] { return m_splitter.IsTracking(); }));
@@ -69,10 +83,13 @@ TEST_F(Splitters, PanesComeOutOfTheSplitBoxesAndGoAtTheEdges) {
   EXPECT_NE(m_splitter.GetDlgItem(0xEA01), nullptr);
   EXPECT_NE(m_splitter.GetDlgItem(0xEA12), nullptr);
   SWnd* survivor = m_splitter.GetPane(1, 1);
+  const HWND bar = ::GetDlgItem(m_splitter.m_hWnd, 0xEA11);
   // The first row's bar goes up to the edge: the row goes.
   Drag(m_splitter, SPoint(200, inside.top + 53), SPoint(200, inside.top));
   EXPECT_EQ(m_splitter.GetRowCount(), 2);
   EXPECT_EQ(m_splitter.GetPane(0, 1), survivor);
+  EXPECT_EQ(::GetDlgItem(m_splitter.m_hWnd, 0xEA10), bar) << "a scroll bar stays with its row";
+  EXPECT_EQ(m_splitter.GetDlgItem(0xEA12), nullptr);
   // The last row's bar goes down to the edge: the row goes.
   Mouse(m_splitter, WM_LBUTTONDOWN, m_splitter.MiddleOf(kSHitRowBar));
   Mouse(m_splitter, WM_MOUSEMOVE, SPoint(200, 2000));

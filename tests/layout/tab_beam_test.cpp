@@ -238,6 +238,12 @@ TEST_F(Beams, AHeldButtonGoesOnScrolling) {
 
   m_beam.Scroll(kSTabToPrevious);
   EXPECT_EQ(m_beam.GetFirstVisible(), first - 1);
+  // The system takes the mouse away.
+  Mouse(m_beam, WM_LBUTTONDOWN, SPoint(3, 3));
+  m_beam.SendMessageW(WM_CANCELMODE);
+  EXPECT_EQ(SWnd::GetCapture(), nullptr);
+  m_beam.SendMessageW(WM_TIMER, 1);
+  EXPECT_EQ(m_beam.GetFirstVisible(), first - 2);
   m_beam.Scroll(kSTabToFirst);
   m_beam.Scroll(kSTabToPrevious);
   m_beam.Scroll(4);
@@ -276,9 +282,15 @@ TEST_F(Beams, AGivenFontStays) {
   m_beam.SendMessageW(WM_SETFONT, reinterpret_cast<WPARAM>(given.GetSafeHandle()), 0);
   m_beam.SendMessageW(WM_DPICHANGED, MAKEWPARAM(192, 192));
   EXPECT_EQ(describe().lfHeight, -40);
+  m_beam.SetScrollButtons(1, 1);
+  m_beam.InsertTab(0, WTEXT("x"), nullptr, 500);
+  m_beam.SendMessageW(WM_SETTINGCHANGE);
+  EXPECT_EQ(m_beam.GetTabWidth(0), 500);
   m_beam.m_buttons.m_width = 1;  // as if the system's metric had changed
   m_beam.SendMessageW(WM_SETTINGCHANGE);
   EXPECT_GT(m_beam.m_buttons.m_width, 1);
+  EXPECT_EQ(m_beam.m_buttons.m_areaWidth, 2 * m_beam.m_buttons.m_width);
+  EXPECT_EQ(m_beam.GetTabWidth(0), m_beam.TextWidth(WTEXT("x"), false) + 16) << "every tab is measured again";
   EXPECT_EQ(describe().lfHeight, -40);
   EXPECT_EQ(describe().lfWeight, FW_BOLD);
   m_beam.SendMessageW(WM_DPICHANGED, MAKEWPARAM(96, 96));

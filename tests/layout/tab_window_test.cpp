@@ -27,6 +27,9 @@ class Tabs : public STabWnd {
     EXPECT_EQ(m_beamHundredfold, 0);
   }
   bool HasScrollBars() const { return m_flags & 1; }
+  bool HasNoTabWindow() const { return m_noTabWnd != nullptr; }
+  // As if the system's metrics had changed.
+  void ForgetMetrics() { m_vertWidth = m_horzHeight = m_beamHeight = 1; }
 };
 
 class TabWindows : public test::UiTest {
@@ -108,6 +111,13 @@ TEST_F(TabWindows, TheBeamKeepsItsShare) {
   EXPECT_EQ(m_tabs.GetBeamWidth(), 200);
   Drag(m_tabs, SPoint(100, 100), SPoint(150, 100));
   EXPECT_EQ(m_tabs.GetBeamWidth(), 200) << "elsewhere nothing is dragged";
+  for (const bool isCancelled : {true, false}) {
+    Mouse(m_tabs, WM_LBUTTONDOWN, SPoint(203, 290));
+    isCancelled ? static_cast<void>(m_tabs.SendMessageW(WM_CANCELMODE)) : static_cast<void>(::ReleaseCapture());
+    EXPECT_EQ(SWnd::GetCapture(), nullptr);
+    Mouse(m_tabs, WM_MOUSEMOVE, SPoint(150, 290));
+    EXPECT_EQ(m_tabs.GetBeamWidth(), 200) << "the drag was taken away";
+  }
 }
 
 TEST_F(TabWindows, AChosenTabIsShownAndHasTheFocus) {
@@ -127,6 +137,11 @@ TEST_F(TabWindows, AChosenTabIsShownAndHasTheFocus) {
 
   EXPECT_TRUE(m_tabs.ActivateTab(0, 0));
   EXPECT_EQ(SWnd::GetFocus(), first) << "the former window had the focus";
+  m_frame->EnableWindow(0);
+  EXPECT_TRUE(m_tabs.ActivateTab(1));
+  EXPECT_EQ(m_frame->GetActiveView(), second) << "commands go to what is seen, though nothing can have the focus";
+  m_frame->EnableWindow(1);
+  EXPECT_TRUE(m_tabs.ActivateTab(0));
   EXPECT_FALSE(m_tabs.ActivateTab(2));
   EXPECT_EQ(m_tabs.SendMessageW(kSMsgTabSetCurrent, 1), 1);
   EXPECT_EQ(m_tabs.GetActiveTab(), second);
@@ -221,6 +236,8 @@ TEST_F(TabWindows, WithoutATabAWindowIsShown) {
   EXPECT_FALSE(nothing.IsWindowVisible());
   m_tabs.DeleteTab(0);
   EXPECT_TRUE(nothing.IsWindowVisible());
+  nothing.DestroyWindow();
+  EXPECT_FALSE(m_tabs.HasNoTabWindow()) << "its object may have gone along";
 }
 
 // More tabs than there are identifiers below those of the scroll bars.
@@ -272,25 +289,33 @@ TEST_F(TabWindows, KeysGoFromTabToTabAndToTheBeam) {
   EXPECT_EQ(SWnd::GetFocus(), first);
 }
 
-// Tabs in a pane of a splitter: F6 visits them all.
+// Tabs in a splitter in a splitter: F6 visits them all, and Shift+F6 the same way back.
 TEST_F(TabWindows, F6GoesThroughNestedWindows) {
   auto* frame = new SFrameWnd;
   ASSERT_TRUE(frame->Create(nullptr, nullptr, WS_POPUP | WS_VISIBLE, SRect(0, 0, 400, 300)));
-  SSplitterWnd splitter;
+  SSplitterWnd outer, inner;
   Tabs tabs;
-  ASSERT_TRUE(splitter.CreateStatic(frame, 1, 2));
-  ASSERT_TRUE(tabs.Create(&splitter, nullptr, nullptr, WS_CHILD, SSplitterWnd::IdFromRowCol(0, 1)));
-  SWnd* view = splitter.AddPane(0, 0, &PaneView::classPaneView, SSize(100, 0));
-  ASSERT_EQ(splitter.AddPane(0, 1, &tabs, SSize()), &tabs);
+  ASSERT_TRUE(outer.CreateStatic(frame, 1, 2));
+  ASSERT_TRUE(inner.CreateStatic(&outer, 1, 2, WS_CHILD, SSplitterWnd::IdFromRowCol(0, 1)));
+  ASSERT_TRUE(tabs.Create(&inner, nullptr, nullptr, WS_CHILD, SSplitterWnd::IdFromRowCol(0, 1)));
+  SWnd* first = outer.AddPane(0, 0, &PaneView::classPaneView, SSize(100, 0));
+  SWnd* second = inner.AddPane(0, 0, &PaneView::classPaneView, SSize(100, 0));
+  inner.AddPane(0, 1, &tabs, SSize());
+  outer.AddPane(0, 1, &inner, SSize());
   SWnd* tab = tabs.AddTab(&PaneView::classPaneView, WTEXT("one"));
   frame->ActivateFrame();
-  splitter.SetActivePane(0, 0);
-  std::vector<SWnd*> visited;
-  for (int i = 0; i < 4; ++i) {
-    visited.push_back(SWnd::GetFocus());
-    Key(::GetFocus(), VK_F6);
-  }
-  EXPECT_EQ(visited, (std::vector<SWnd*>{view, tab, tabs.GetTabBeam(), view}));
+  const auto visited = [&] {
+    std::vector<SWnd*> windows;
+    outer.SetActivePane(0, 0);
+    for (int i = 0; i < 5; ++i) {
+      windows.push_back(SWnd::GetFocus());
+      Key(::GetFocus(), VK_F6);
+    }
+    return windows;
+  };
+  EXPECT_EQ(visited(), (std::vector<SWnd*>{first, second, tab, tabs.GetTabBeam(), first}));
+  const test::KeyIsDown shift(VK_SHIFT);
+  EXPECT_EQ(visited(), (std::vector<SWnd*>{first, tabs.GetTabBeam(), tab, second, first}));
   frame->DestroyWindow();
 }
 
@@ -337,6 +362,9 @@ TEST_F(TabWindows, TheFormerDpiBringsTheFormerPlaces) {
   EXPECT_EQ(m_tabs.GetTabBeam()->GetTabWidth(1), width);
   std::size_t next = 0;
   for (const UINT id : {0xE900, 0xE901, 0xEA00, 0xEA01, 0xEA10, 0xEA20}) EXPECT_EQ(Place(id), places[next++]) << id;
+  m_tabs.ForgetMetrics();
+  m_tabs.SendMessageW(WM_SETTINGCHANGE);
+  EXPECT_EQ(Place(0xEA10), places[4]);
 }
 
 }  // namespace

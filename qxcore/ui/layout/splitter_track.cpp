@@ -69,12 +69,13 @@ void SSplitterWnd::TrackColumnSize(int x, int column) {
   TrackSize(false, column, x, inside.left, inside.right);
 }
 
-// Beyond the ends of the panes every place means the same.
+// A tracker cannot leave the panes, so at their begin it stands for a bar that lies there, and at the end for one that
+// leaves no room behind it; so do all places beyond.
 void SSplitterWnd::TrackSize(bool rows, int bar, int place, int begin, int end) {
   if (bar < 0 || bar >= Count(rows) - 1) return;
   const int half = TrackerThickness(rows) / 2;
   const int start = begin + SPaneStart(std::as_const(Table(rows)).GetArray(), bar, Gap(rows));
-  MoveBarTo(rows, bar, std::clamp(place, begin - half - 1, end) + half - start);
+  MoveBarTo(rows, bar, (place <= begin ? begin : std::min(place, end) + half) - start);
 }
 
 // In a dynamic splitter a pane that would be below its minimum goes.
