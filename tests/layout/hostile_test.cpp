@@ -246,6 +246,37 @@ TEST_F(Hostile, NumbersAtTheEndsOfTheirTypes) {
   beam.UpdateWindow();
 }
 
+// Windows with less room than their parts need: every point, the mouse, the keyboard and painting.
+TEST_F(Hostile, WindowsOfNoSize) {
+  SCreateContext context = test::PaneContext();
+  Splitter splitter;
+  ASSERT_TRUE(splitter.Create(m_frame, 3, 3, SSize(10, 10), &context, WS_CHILD | WS_VISIBLE | WS_HSCROLL | WS_VSCROLL));
+  ASSERT_TRUE(splitter.SplitColumn(50));
+  ASSERT_TRUE(splitter.SplitRow(50));
+  STabWnd tabs;
+  ASSERT_TRUE(tabs.Create(m_frame, nullptr, nullptr, WS_CHILD | WS_VISIBLE, 9));
+  for (int i = 0; i < 3; ++i) tabs.AddTab(&test::PaneView::classPaneView, WTEXT("tab"));
+  tabs.GetTabBeam()->SetScrollButtons(1, 0);
+  m_frame->ActivateFrame();
+  for (const SSize size : {SSize(0, 0), SSize(1, 1), SSize(0, 300), SSize(300, 0), SSize(5, 20), SSize(20, 5)}) {
+    splitter.MoveWindow(SRect(SPoint(), size));
+    tabs.MoveWindow(SRect(SPoint(), size));
+    ASSERT_NO_FATAL_FAILURE(splitter.ExpectWhole());
+    for (SWnd* window :
+         {static_cast<SWnd*>(&splitter), static_cast<SWnd*>(&tabs), static_cast<SWnd*>(tabs.GetTabBeam())}) {
+      for (int y = 0; y <= size.cy; y += 4) {
+        for (int x = 0; x <= size.cx; x += 4) test::Drag(*window, SPoint(x, y), SPoint(x + 3, y + 3));
+      }
+      window->Invalidate();
+      window->UpdateWindow();
+      EXPECT_EQ(SWnd::GetCapture(), nullptr);
+    }
+    splitter.DoKeyboardSplit();
+    for (const WPARAM key : {VK_HOME, VK_END, VK_LEFT, VK_DOWN, VK_RETURN, VK_ESCAPE}) test::Key(splitter.m_hWnd, key);
+    ASSERT_NO_FATAL_FAILURE(splitter.ExpectWhole());
+  }
+}
+
 // --- calls without a window: before it is made, and after it went ---
 
 TEST_F(Hostile, WithoutAWindowNothingHappens) {
