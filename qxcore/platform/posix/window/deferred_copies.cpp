@@ -45,9 +45,9 @@ void Extend(DeferredCopy& copy, const Stay& stay, const RECT& oldWindow) {
   copy.at.y += copy.kept.top - former.top;
 }
 
-bool StaysValid(const Placing& placing, const Window* window) {
+bool StaysValid(const Placing& placing) {
   constexpr UINT kNothingStays = SWP_NOCOPYBITS | SWP_SHOWWINDOW | SWP_HIDEWINDOW;
-  return !placing.isUnpainted && !(placing.place.flags & kNothingStays) && IsShown(window);
+  return !placing.isUnpainted && !(placing.place.flags & kNothingStays) && placing.isShown;
 }
 
 // For one more.
@@ -128,7 +128,7 @@ bool CopyAll(DeferredCopies& deferred) {
 }  // namespace
 
 bool CopyLater(Window* window, const Placing& placing) {
-  if (g_painter.movePixels == nullptr || !window->IsChild() || !StaysValid(placing, window)) return false;
+  if (g_painter.movePixels == nullptr || !window->IsChild() || !StaysValid(placing)) return false;
   try {
     return Note(CurrentThread()->deferredCopies, window, placing);
   } catch (const std::bad_alloc&) {
@@ -145,7 +145,7 @@ void ShiftClient(const Placing& placing) {
   {
     const Guard guard;
     const Window* window = FindWindowObject(placing.place.hwnd);
-    if (window == nullptr || window->parent != Desktop() || !StaysValid(placing, window)) return;
+    if (window == nullptr || window->parent != Desktop() || !StaysValid(placing)) return;
     const Stay stay = StayOf(placing.from, placing.to);
     moved.dx = stay.kept.left - (stay.source.x - placing.from.window.left);
     moved.dy = stay.kept.top - (stay.source.y - placing.from.window.top);

@@ -207,7 +207,6 @@ bool UncoverByMove(Window* window, const RECT& oldWindow) {
 }
 
 void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags) {
-  if (!IsShown(window)) return;
   const RECT whole = AtOrigin(window->window);
   if (!wasShown) {
     Invalidate(window, Region(whole), Erase::Yes, Children::All);

@@ -28,7 +28,7 @@ void SetWantsPaint(Window* window, bool wants);
 bool UncoverByMove(Window* window, const RECT& oldWindow);
 // The same for what came to light between the children of a window, relative to its client area.
 void UncoverBetween(Window* parent, Region uncovered);
-// After a change of place: what must be painted of the window itself.
+// After a change of place of a window that shows: what must be painted of it.
 void SpoilByMove(Window* window, const RECT& oldWindow, const RECT& oldClient, bool wasShown, UINT flags);
 // After a change in the Z order: where the window and its siblings overlap.
 void SpoilByOrder(Window* window);

@@ -107,7 +107,7 @@ Region HiddenPart(const Window* window, Uncovers uncovers) {
 
 // What was hidden moves along, and may show now.
 void SpoilHidden(Window* window, Region hidden, const Placing& placing) {
-  if (hidden.IsEmpty() || !IsShown(window)) return;
+  if (hidden.IsEmpty() || !placing.isShown) return;
   const NewPlace &from = placing.from, &to = placing.to;
   const int dx = to.client.left - to.window.left - (from.client.left - from.window.left);
   const int dy = to.client.top - to.window.top - (from.client.top - from.window.top);
@@ -136,13 +136,14 @@ void Apply(Window* window, Placing& placing, Uncovers uncovers) {
     window->style &= ~WS_VISIBLE;
     DropPaint(window);
   }
+  placing.isShown = window->IsVisible() == wasVisible ? placing.wasShown : IsShown(window);
   if (wasVisible || window->IsVisible()) SceneChanged(window);
   if (oldClient.left == to.client.left && oldClient.top == to.client.top) place.flags |= kNoClientMove;
   if (Width(oldClient) == Width(to.client) && Height(oldClient) == Height(to.client)) place.flags |= kNoClientSize;
   if (place.flags & SWP_NOREDRAW) return;
   if (placing.wasShown && uncovers == Uncovers::Now) placing.spoilsParent = UncoverByMove(window, placing.from.window);
   SpoilHidden(window, std::move(hidden), placing);
-  SpoilByMove(window, placing.from.window, oldClient, placing.wasShown, place.flags);
+  if (placing.isShown) SpoilByMove(window, placing.from.window, oldClient, placing.wasShown, place.flags);
   placing.isUnpainted |= IsUnpainted(window);
 }
 
@@ -214,9 +215,8 @@ bool Finish(Placing& placing) {
     if (const HWND parent = placing.spoilsParent ? ParentHandle(handle) : nullptr) EraseNow(parent);
     EraseNow(handle);
   }
-  if ((place.flags & kAnyChange) != kNoChange && IsWindow(handle)) {
+  if ((place.flags & kAnyChange) != kNoChange)
     Send(handle, WM_WINDOWPOSCHANGED, 0, reinterpret_cast<LPARAM>(&place));
-  }
   return IsWindow(handle);
 }
 

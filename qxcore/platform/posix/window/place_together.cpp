@@ -62,7 +62,7 @@ bool PlaceTogether(Batch* batch) {
   for (Placing& placing : batch->placings) isDone &= Begin(placing, Uncovers::Later);
   UncoverTogether(*batch);
   CopyIfInUse(CurrentThread()->deferredCopies.parent);
-  for (Placing& placing : batch->placings) isDone &= placing.isDone && IsWindow(placing.place.hwnd) && Finish(placing);
+  for (Placing& placing : batch->placings) isDone &= placing.isDone && Finish(placing);
   return isDone;
 }
 

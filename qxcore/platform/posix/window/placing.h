@@ -14,7 +14,7 @@ struct NewPlace {
 struct Placing {
   WINDOWPOS place;
   NewPlace from{}, to{};
-  bool wasShown = false, spoilsParent = false, isUnpainted = false, isDone = false;
+  bool wasShown = false, isShown = false, spoilsParent = false, isUnpainted = false, isDone = false;
   bool isWaiting = false;  // the window's pixels wait to be copied, since this request
 };
 
