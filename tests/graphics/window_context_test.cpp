@@ -206,6 +206,9 @@ class Grid {
       for (int x = 0; x < 140; ++x) {
         const bool wasUncovered = IsIn(m_former, x, y) && !IsIn(shown, x, y);
         ASSERT_TRUE(!wasUncovered || PtInRegion(invalid, x, y)) << x << ", " << y;
+        if (m_isAllInvalid) {
+          ASSERT_EQ(!PtInRegion(invalid, x, y), IsIn(shown, x, y)) << x << ", " << y;
+        }
       }
     }
     DeleteObject(invalid);
@@ -218,6 +221,11 @@ class Grid {
       ValidateRect(m_windows[i], nullptr);
     }
     ValidateRect(m_top, nullptr);
+    m_isAllInvalid = false;
+  }
+  void InvalidateAll() {
+    InvalidateRect(m_top, nullptr, TRUE);
+    m_isAllInvalid = true;
   }
 
  private:
@@ -251,6 +259,7 @@ class Grid {
   std::array<HWND, kCount> m_windows = {};
   std::array<int, kCount> m_cells = {0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11};
   Places m_places, m_former;
+  bool m_isAllInvalid = false;  // the parent, where none of the windows lies
   std::mt19937 m_random{7};
 };
 
@@ -262,6 +271,7 @@ TEST_F(WindowContexts, WhatMovesTogetherKeepsItsPixelsOrIsInvalid) {
   for (int step = 0; step < 600; ++step) {
     if (step % 3 == 0) grid.DisturbOne();
     grid.Paint();
+    if (step % 5 == 0) grid.InvalidateAll();
     for (int moves = step % 3; moves >= 0; --moves) grid.MoveAll();
     grid.Check();
     if (HasFatalFailure()) FAIL() << "step " << step;
@@ -380,14 +390,16 @@ TEST_F(WindowContexts, WhatLayBelowAnotherWindowOfABatchIsInvalid) {
   };
   const COLORREF below = RGB(0, 0, 200);
   for (const int shift : {0, 7}) {
-    const HWND large = make(SRect(0, 0, 60, 60)), small = make(SRect(10, 10, 30, 30));
+    const HWND large = make(SRect(0, 14, 60, 74)), small = make(SRect(10, 10, 30, 30));
+    const HWND flat = make(SRect(80, 10, 90, 12));  // ends above the large one, which does not lie below the whole row
     SetWindowPos(small, HWND_TOP, 0, 0, 0, 0, SWP_NOMOVE | SWP_NOSIZE | SWP_NOACTIVATE);
+    SetWindowPos(flat, small, 0, 0, 0, 0, SWP_NOMOVE | SWP_NOSIZE | SWP_NOACTIVATE);
     SClientDC(large).FillSolidRect(SRect(0, 0, 100, 100), below);
     ValidateRect(large, nullptr);
     HDWP batch = BeginDeferWindowPos(2);
     constexpr UINT kFlags = SWP_NOSIZE | SWP_NOZORDER | SWP_NOACTIVATE | SWP_DEFERERASE;
     batch = DeferWindowPos(batch, small, nullptr, 70, 65, 0, 0, kFlags);
-    batch = DeferWindowPos(batch, large, nullptr, shift, shift, 0, 0, kFlags);
+    batch = DeferWindowPos(batch, large, nullptr, shift, 14 + shift, 0, 0, kFlags);
     ASSERT_TRUE(EndDeferWindowPos(batch));
     const HRGN invalid = CreateRectRgn(0, 0, 0, 0);
     GetUpdateRgn(large, invalid, FALSE);
@@ -399,8 +411,7 @@ TEST_F(WindowContexts, WhatLayBelowAnotherWindowOfABatchIsInvalid) {
       }
     }
     DeleteObject(invalid);
-    DestroyWindow(small);
-    DestroyWindow(large);
+    for (const HWND window : {large, small, flat}) DestroyWindow(window);
   }
 }
 

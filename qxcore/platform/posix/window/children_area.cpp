@@ -39,6 +39,22 @@ void SubtractOneByOne(const Window* window, Region* region) {
     if (child->IsVisible() && !IsEmpty(Common(child->window, bounds))) cuts.Add(child->window);
 }
 
+// Whether the visible children lie in rows as those of a splitter do: each to the right of the one before it and as
+// high, or below it and all of its row. Then they lie apart, which takes no region to find out.
+bool LieInRows(const Window* parent) {
+  const Window* former = nullptr;
+  for (const Window* child = parent->firstChild; child != nullptr; child = child->next) {
+    if (!child->IsVisible() || IsEmpty(child->window)) continue;
+    const RECT& place = child->window;
+    if (former != nullptr && place.top < former->window.bottom) {
+      const RECT& row = former->window;
+      if (place.top != row.top || place.bottom != row.bottom || place.left < row.right) return false;
+    }
+    former = child;
+  }
+  return true;
+}
+
 }  // namespace
 
 std::uint64_t g_scene = 1;
@@ -66,6 +82,10 @@ const ChildrenArea& AreaOfChildren(Window* parent) {
   children.areApart = sum <= kLargest && children.covered.Area() == sum;
   children.isKnown = true;
   return children;
+}
+
+bool AreChildrenApart(Window* parent) {
+  return (!parent->children.isKnown && LieInRows(parent)) || AreaOfChildren(parent).areApart;
 }
 
 void SubtractChildren(const Window* window, Region* region) {

@@ -13,6 +13,8 @@ void SceneChanged(Window* window);
 
 // Remembered until one of the children changes. Throws std::bad_alloc.
 const ChildrenArea& AreaOfChildren(Window* parent);
+// Whether no visible child lies over another. Throws std::bad_alloc.
+bool AreChildrenApart(Window* parent);
 
 // Takes the children's places from a region that is relative to the window.
 void SubtractChildren(const Window* window, Region* region);

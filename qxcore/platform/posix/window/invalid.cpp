@@ -94,6 +94,10 @@ RECT ClipByParents(const Window* window) {
   return clip;
 }
 
+bool IsClientInvalid(const Window* window) {
+  return window->wantsPaint && window->eraseUpdate && window->update.Covers(ClientInWindow(window));
+}
+
 bool IsUnpainted(const Window* window) {
   const bool isMarked = window->wantsPaint && window->eraseUpdate && window->frameUpdate;
   return isMarked && window->firstChild == nullptr && IsAllInvalid(window, ClipByParents(window));
@@ -136,8 +140,18 @@ void Invalidate(Window* window, const Region& region, Erase erase, Children chil
   const bool clips = window->style & WS_CLIPCHILDREN;
   if (children == Children::All || (children == Children::Unclipped && !clips))
     InvalidateChildren(window, part, erase, children);
-  if (clips) SubtractChildren(window, &part);
-  if (!part.IsEmpty()) MarkInvalid(window, part, erase);
+  if (!clips) return MarkInvalid(window, part, erase);
+  // All of the client area stays one rectangle: nothing can be added to it, whatever the children do.
+  const bool isAll = part.Covers(ClientInWindow(window));
+  const Region all = isAll ? part : Region();
+  SubtractChildren(window, &part);
+  if (!part.IsEmpty()) MarkInvalid(window, isAll ? all : part, erase);
+}
+
+Region UpdateOf(const Window* window) {
+  Region update = window->update;
+  if (window->style & WS_CLIPCHILDREN) SubtractChildren(window, &update);
+  return update;
 }
 
 void Validate(Window* window, const Region* region, Children children) {

@@ -38,7 +38,7 @@ Due TakeDue(HWND handle) {
   ForgetAllInvalid(window);
   const RECT client = ClientInWindow(window);
   window->update.Intersect(client);
-  due.client = window->update;
+  due.client = UpdateOf(window);
   due.client.Move(-client.left, -client.top);
   if (window->update.IsEmpty() && !window->internalPaint) SetWantsPaint(window, false);
   return due;
@@ -141,7 +141,7 @@ BOOL GetUpdateRect(HWND handle, LPRECT rect, BOOL erase) {
   const Window* window = Expect(handle);
   if (window == nullptr) return FALSE;
   const RECT client = ClientInWindow(window);
-  Region region = window->update;
+  Region region = UpdateOf(window);
   region.Intersect(client);
   if (rect != nullptr) *rect = region.IsEmpty() ? RECT{} : Moved(region.Bounds(), -client.left, -client.top);
   return !region.IsEmpty();
@@ -154,7 +154,7 @@ int GetUpdateRgn(HWND handle, HRGN target, BOOL erase) {
   pixman_region32_t* result = platform::g_painter.region != nullptr ? platform::g_painter.region(target) : nullptr;
   if (window == nullptr || result == nullptr) return 0;
   const RECT client = ClientInWindow(window);
-  Region region = window->update;
+  Region region = UpdateOf(window);
   region.Intersect(client);
   region.Move(-client.left, -client.top);
   pixman_region32_copy(result, region.Pixman());

@@ -12,10 +12,14 @@ enum class Children { No, Unclipped, All };
 // Adds to what must be painted of a window, and of the children that lie there: none, those that the style
 // WS_CLIPCHILDREN does not keep out, or all.
 void Invalidate(Window* window, const Region& region, Erase erase, Children children);
+// What must be painted of a window itself: without its children's places, where it leaves them out.
+Region UpdateOf(const Window* window);
 // Takes away, the children's as well if asked.
 void Validate(Window* window, const Region* region, Children children);
 // Something was taken from what is to be painted of the window.
 void ForgetAllInvalid(Window* window);
+// Whether all of the client area is to be erased and painted.
+bool IsClientInvalid(const Window* window);
 // Whether a window without children has nothing on the screen that is worth keeping: all that shows of it is yet to be
 // erased and painted.
 bool IsUnpainted(const Window* window);

@@ -215,8 +215,7 @@ bool Finish(Placing& placing) {
     if (const HWND parent = placing.spoilsParent ? ParentHandle(handle) : nullptr) EraseNow(parent);
     EraseNow(handle);
   }
-  if ((place.flags & kAnyChange) != kNoChange)
-    Send(handle, WM_WINDOWPOSCHANGED, 0, reinterpret_cast<LPARAM>(&place));
+  if ((place.flags & kAnyChange) != kNoChange) Send(handle, WM_WINDOWPOSCHANGED, 0, reinterpret_cast<LPARAM>(&place));
   return IsWindow(handle);
 }
 

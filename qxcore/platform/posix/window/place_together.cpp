@@ -23,7 +23,7 @@ struct Batch : OnModelHeap {
   List<Placing> placings;
   // For windows that move together.
   HWND parent = nullptr;
-  Region before;  // what the parent's children covered
+  Region before;  // what the parent's children covered; all of its client area, where that is invalid anyway
 };
 
 // What comes to light of the parent when all are in their new places: nothing where one window made room for another.
@@ -43,7 +43,7 @@ Region Uncovered(const Batch& batch, Window* parent) {
 void UncoverTogether(const Batch& batch) {
   const Guard guard;
   Window* parent = FindWindowObject(batch.parent);
-  if (parent != nullptr) UncoverBetween(parent, Uncovered(batch, parent));
+  if (parent != nullptr && !IsClientInvalid(parent)) UncoverBetween(parent, Uncovered(batch, parent));
 }
 
 // A context that is open would draw where pixels wait.
@@ -103,10 +103,9 @@ bool CanMoveTogether(Batch* batch) {
     const Guard guard;
     Window* parent = ParentOf(*batch);
     if (parent == nullptr || IsRoot(parent) || !ShowsWhole(parent)) return false;
-    const ChildrenArea& children = AreaOfChildren(parent);
-    if (!children.areApart) return false;
+    if (!AreChildrenApart(parent)) return false;
     batch->parent = parent->handle;
-    batch->before = children.covered;
+    batch->before = IsClientInvalid(parent) ? Region(AtOrigin(parent->client)) : AreaOfChildren(parent).covered;
     return true;
   });
 }

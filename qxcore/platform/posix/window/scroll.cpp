@@ -219,7 +219,7 @@ int ScrollWindowEx(HWND handle, int dx, int dy, const RECT* rect, const RECT* cl
       exposed.Subtract(Common(Moved(Common(area, clipped), dx, dy), clipped));
       // What was to be painted moves along.
       const RECT inWindow = ClientInWindow(window);
-      Region waiting = window->update;
+      Region waiting = UpdateOf(window);
       waiting.Move(-inWindow.left, -inWindow.top);
       waiting.Intersect(area);
       waiting.Move(dx, dy);

@@ -71,7 +71,7 @@ struct Window : OnModelHeap {
   bool restoreToMaximized = false;
   bool needsSize = false;  // WM_SIZE and WM_MOVE come with the first showing
 
-  // What must be painted.
+  // What must be painted. Where a window leaves its children out, parts that they cover may be in it (UpdateOf).
   Region update;
   bool eraseUpdate = false, frameUpdate = false, internalPaint = false;
   bool wantsPaint = false;
