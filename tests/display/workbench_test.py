@@ -23,6 +23,7 @@ import x_server  # noqa: E402
 
 LIMIT = 60  # seconds
 INSIDE = (300, 300)  # a point of the window, which comes up at 20, 20
+KEYS = {"/": "slash", "-": "minus", "_": "Shift_L+underscore"}  # of the letters of a temporary folder
 NOBODY = ["setpriv", "--reuid=65534", "--regid=65534", "--clear-groups"]
 
 
@@ -82,20 +83,23 @@ class ScreenCase(unittest.TestCase):
             (path / name).write_text("Größe", encoding="utf-8")
         return path
 
-
-class DropTest(ScreenCase):
-    def start_and_wait(self, *wrapper):
-        """Starts a workbench that writes its list and its status whenever go() has been called."""
+    def start_and_wait(self, *wrapper, shows="print list\necho -\nprint status\n", first=""):
+        """Starts a workbench that writes what it shows whenever ready for the next turn and told to."""
         self.turn = 0
-        turns = "".join(f"-echo ready\npause go{turn}\nprint list\necho -\nprint status\n" for turn in range(10))
-        (self.folder / "script.txt").write_text(turns)
+        turns = "".join(f"-echo ready\npause go{turn}\n{shows}" for turn in range(10))
+        (self.folder / "script.txt").write_text(first + turns)
         self.workbench = self.start([*wrapper, WORKBENCH, "--script", "script.txt"])
         self.assertEqual(self.line(self.workbench), "ready", "the workbench does not come up")
 
-    def go(self):
-        """The names in the list and the status, once all work is done."""
+    def next_turn(self):
         (self.folder / f"go{self.turn}").touch()
         self.turn += 1
+
+
+class DropTest(ScreenCase):
+    def go(self):
+        """The names in the list and the status, once all work is done."""
+        self.next_turn()
         names = []
         while (line := self.line(self.workbench)) != "-":
             names.append(line.split("\t")[0])
@@ -168,6 +172,70 @@ class DropTest(ScreenCase):
         self.wait_for(lambda titles: titles == [f"{folder} – qxcore workbench"])
         self.drop(other)
         self.wait_for_title(f"{other} – qxcore workbench")
+
+
+class HandTest(ScreenCase):
+    """Mouse and keyboard of the server, through the window system to the parts of the window."""
+
+    def start_and_wait(self, folder):
+        super().start_and_wait(shows="print splitter\n", first=f"size 800 500\nsplit 300\nopen {folder}\n")
+        self.wait_for_title(f"{folder} – qxcore workbench")
+
+    def list_width(self):
+        """Of the list, in pixels; the state names the ideal width and the minimum of each column last."""
+        self.next_turn()
+        state = self.line(self.workbench)
+        self.assertEqual(self.line(self.workbench), "ready")
+        columns = state.split(" columns ")[1].split()
+        return int(columns[1])
+
+    def test_a_bar_is_dragged(self):
+        self.start_and_wait(self.texts("texts", "a.txt"))
+        before = self.list_width()
+        bar = 20 + 4 + 2 + before + 3  # the window, its border, that of the splitter, the middle of the bar
+        self.do("drag", bar, 300, bar + 100, 310)
+        self.assertEqual(self.list_width(), before + 100)
+
+    def test_the_bar_by_the_keyboard(self):
+        self.start_and_wait(self.texts("texts", "a.txt"))
+        before = self.list_width()
+        self.do("keys", "F8", "Right", "Right", "Control_L+Left")
+        self.assertEqual(self.list_width(), before + 15)
+        self.do("keys", "Home")
+        self.assertEqual(self.list_width(), 60)
+        self.do("keys", "Return")
+        self.assertEqual(self.list_width(), 0)
+        self.do("keys", "Return")
+        self.assertEqual(self.list_width(), 60)
+        self.do("keys", "Escape")
+        self.assertEqual(self.list_width(), before)
+
+    def test_by_the_keyboard_alone(self):
+        """Show two files, choose an encoding, convert, answer: what is seen is what the file then holds."""
+        folder = self.texts("texts", "a.txt", "b.txt")
+        (folder / "b.txt").write_bytes("Größe".encode("cp850"))
+        self.start([WORKBENCH])
+        self.wait_for_title("qxcore workbench")
+        self.do("keys", "Control_L+o")
+        self.wait_for_title("Open Folder")
+        self.do("keys", "Control_L+a", *(KEYS.get(c, c) for c in str(folder)), "Return")
+        self.wait_for_title(f"{folder} – qxcore workbench")
+        self.do("keys", "Home", "Return", "F6", "F6", "Down", "Return")  # from the list to a preview, its tab, and back
+        self.do("keys", "Control_L+Tab", "Control_L+Tab")
+        self.do("keys", "Alt_L+p", "o")
+        self.wait_for_title("View As")
+        self.do("keys", "Control_L+a", "c", "p", "8", "5", "0", "Return")
+        self.wait_for(lambda titles: "View As" not in titles)
+        self.do("keys", "Control_L+e")
+        self.wait_for_title("Convert")
+        self.do("keys", "Return")  # UTF-8 is proposed
+        self.wait_for(lambda titles: titles.count("Convert") == 1)
+        end = time.monotonic() + LIMIT
+        while (folder / "b.txt").read_bytes() != "Größe".encode():
+            self.assertLess(time.monotonic(), end, (folder / "b.txt").read_bytes())
+            self.do("keys", "y")  # to the question, once it is there
+            time.sleep(0.05)
+        self.assertEqual((folder / "a.txt").read_bytes(), "Größe".encode())
 
 
 if __name__ == "__main__":

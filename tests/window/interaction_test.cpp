@@ -94,6 +94,23 @@ TEST(MessageList, MenuByKeyboard) {
   ExpectRecord("menu", record.Text());
 }
 
+// The keyboard is usually with a child, and the menu is the frame's.
+TEST(Input, AKeyOfAChildOpensTheMenu) {
+  Record record;
+  const HWND top = MakeFrame();
+  const HWND child = Make(WTEXT("child"), WS_CHILD | WS_VISIBLE, top);
+  SetFocus(child);
+  g_menuOwner = top;
+  {
+    const Steps steps({{WM_INITMENUPOPUP, [] { PostKeys(VK_DOWN, VK_RETURN); }}});
+    SendMessageW(child, WM_SYSCHAR, 'f', 1 << 29);
+    Pump();
+  }
+  DestroyWindow(top);
+  for (const char* line : {"top WM_INITMENUPOPUP", "top WM_COMMAND 65 none"})
+    EXPECT_NE(record.Text().find(line), std::string::npos) << line << " in\n" << record.Text();
+}
+
 // A message of the mouse at a point of the screen; the loops of the system read the message's own point.
 void PostMouse(HWND window, UINT message, POINT screen) {
   SetCursorPos(screen.x, screen.y);

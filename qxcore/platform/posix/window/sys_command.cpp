@@ -213,10 +213,11 @@ LRESULT DefaultSysCommand(HWND handle, WPARAM command, LPARAM lParam) {
       }
       break;
     case SC_KEYMENU:
+      // A child has no menu: its top-level window's is meant.
       if (lParam == VK_SPACE) {
-        UseSystemMenu(handle);
+        UseSystemMenu(GetAncestor(handle, GA_ROOT));
       } else {
-        UseMenuBarByKey(handle, static_cast<WCHAR>(lParam));
+        UseMenuBarByKey(GetAncestor(handle, GA_ROOT), static_cast<WCHAR>(lParam));
       }
       break;
     default:
