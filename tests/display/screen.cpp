@@ -229,6 +229,41 @@ TEST_F(Screen, AMenuIsUsedByTheMouse) {
   EXPECT_TRUE(Waits(WM_CHAR));
 }
 
+// As fingers do it: Alt is held while the menu comes up, and is released then.
+TEST_F(Screen, AMenuIsUsedByTheKeyboard) {
+  const HMENU bar = ::CreateMenu(), file = ::CreatePopupMenu();
+  ::AppendMenuW(file, MF_STRING, kMenuCommand, WTEXT("&First"));
+  ::AppendMenuW(file, MF_STRING, kMenuCommand + 1, WTEXT("&Second"));
+  ::AppendMenuW(bar, MF_POPUP, reinterpret_cast<UINT_PTR>(file), WTEXT("&File"));
+  ::SetMenu(m_board.m_hWnd, bar);
+  ASSERT_TRUE(test::PumpUntil([&] { return IsOnScreen(); }));
+  std::thread hand([&] {
+    m_client.Key("Alt_L", true);
+    m_client.Type("f");
+    ::Sleep(300);
+    m_client.Key("Alt_L", false);
+    ::Sleep(100);
+    m_client.Type("s");
+  });
+  EXPECT_TRUE(Waits(WM_COMMAND));
+  hand.join();
+  if (m_board.Got(WM_COMMAND)) {
+    EXPECT_EQ(m_board.First(WM_COMMAND).wParam, static_cast<WPARAM>(kMenuCommand + 1));
+  }
+  EXPECT_TRUE(test::PumpUntil([] { return ::GetKeyState(VK_MENU) >= 0; }));
+}
+
+// Another program that takes the keyboard while Alt is held gets its release.
+TEST_F(Screen, NoModifierStaysDown) {
+  m_client.Key("Alt_L", true);
+  EXPECT_TRUE(test::PumpUntil([] { return ::GetKeyState(VK_MENU) < 0; }));
+  m_client.TakeKeyboard();
+  EXPECT_TRUE(test::PumpUntil([&] { return !m_board.m_isActive && ::GetKeyState(VK_MENU) >= 0; }));
+  m_client.Key("Alt_L", false);
+  m_client.GiveKeyboard(kTitle);
+  EXPECT_TRUE(test::PumpUntil([&] { return m_board.m_isActive; }));
+}
+
 // Another program that takes the keyboard ends the menu.
 TEST_F(Screen, AMenuEndsWithTheKeyboard) {
   const HMENU menu = ::CreatePopupMenu();

@@ -63,6 +63,15 @@ int OnError(::Display* server, XErrorEvent* error) {
   return server;
 }
 
+// The pointer's place, and which buttons and modifiers are held.
+bool AskPointer(int* x, int* y, unsigned* held) {
+  ::Display* server = TheServer();
+  ::Window root = None, child = None;
+  int inWindowX = 0, inWindowY = 0;
+  return server != nullptr &&
+         XQueryPointer(server, DefaultRootWindow(server), &root, &child, x, y, &inWindowX, &inWindowY, held);
+}
+
 }  // namespace
 
 Desktop AskDesktop() {
@@ -71,12 +80,15 @@ Desktop AskDesktop() {
 }
 
 bool FindPointer(int* x, int* y) {
-  ::Display* server = TheServer();
-  ::Window root = None, child = None;
-  int inWindowX = 0, inWindowY = 0;
-  unsigned buttons = 0;
-  return server != nullptr &&
-         XQueryPointer(server, DefaultRootWindow(server), &root, &child, x, y, &inWindowX, &inWindowY, &buttons);
+  unsigned held = 0;
+  return AskPointer(x, y, &held);
+}
+
+bool IsModifierHeld(WORD key) {
+  int x = 0, y = 0;
+  unsigned held = 0;
+  const unsigned mask = key == VK_SHIFT ? ShiftMask : key == VK_CONTROL ? ControlMask : Mod1Mask;
+  return AskPointer(&x, &y, &held) && (held & mask) != 0;
 }
 
 void OutliveWindows() {

@@ -3,6 +3,8 @@
 
 #include <string>
 
+#include "qxcore/platform/win32.h"
+
 struct SDL_Window;
 
 namespace platform::sdl {
@@ -16,6 +18,9 @@ Desktop AskDesktop();
 
 // Where the pointer is now; SDL's own answer is that of the last event. False without an X server.
 bool FindPointer(int* x, int* y);
+
+// Whether Shift, Control or Alt (by the virtual number) is held down, in whatever window. False without an X server.
+bool IsModifierHeld(WORD key);
 
 // Goes on after the errors of a server that a program cannot avoid: those of windows that have gone. A window of
 // another program may go while it is answered; and SDL wakes itself by an event to one of our windows, over a second

@@ -59,6 +59,8 @@ class SdlDisplay final : public Display {
   void OnMotion(const SDL_MouseMotionEvent& event);
   void OnWheel(const SDL_MouseWheelEvent& event);
   void OnKey(const SDL_KeyboardEvent& event);
+  bool TakeModifier(WORD key, bool isUp);
+  void LoseKeyboard();
   void OnText(std::string_view text);
   void OnDrop(const SDL_DropEvent& event);
   void OnPlace(HWND window);
@@ -71,6 +73,7 @@ class SdlDisplay final : public Display {
   std::vector<std::unique_ptr<ScreenWindow>> m_windows;
   HWND m_active = nullptr;  // as the model has it
   bool m_focusChanged = false;
+  std::vector<WORD> m_modifiers;   // those that were reported as down
   bool m_movesUnderMouse = false;  // a window is moved while a button is down
   POINT m_followed{};              // where the pointer was then
   Uint32 m_lastFlush = 0;
@@ -216,8 +219,7 @@ void SdlDisplay::Wait(DWORD milliseconds) {
   for (; hasEvent; hasEvent = SDL_PollEvent(&event)) Handle(event);
   FollowPointer();
   if (std::exchange(m_focusChanged, false) && SDL_GetKeyboardFocus() == nullptr) {
-    m_active = nullptr;
-    m_events.Activated(nullptr);
+    LoseKeyboard();
   }
 }
 
@@ -368,9 +370,32 @@ char16_t SdlDisplay::TakeCharacter(const SDL_Keysym& symbol) {
   return isPrinting && !(symbol.mod & (KMOD_CTRL | KMOD_ALT)) ? DisplayEvents::kNoCharacter : DisplayEvents::kByLayout;
 }
 
+// Whether a modifier has changed. With each change of the window that has the keyboard, a popup's included, SDL reports
+// all keys as released, and then those that are still held as pressed.
+bool SdlDisplay::TakeModifier(WORD key, bool isUp) {
+  const auto known = std::find(m_modifiers.begin(), m_modifiers.end(), key);
+  if (isUp) {
+    if (known == m_modifiers.end() || IsModifierHeld(key)) return false;
+    m_modifiers.erase(known);
+  } else {
+    if (known != m_modifiers.end()) return false;
+    m_modifiers.push_back(key);
+  }
+  return true;
+}
+
+// Where another program has the keyboard, nobody hears which keys are released.
+void SdlDisplay::LoseKeyboard() {
+  for (const WORD key : std::exchange(m_modifiers, {})) m_events.Key(key, 0, true, false, DisplayEvents::kByLayout);
+  m_active = nullptr;
+  m_events.Activated(nullptr);
+}
+
 void SdlDisplay::OnKey(const SDL_KeyboardEvent& event) {
   const Key key = KeyOf(event.keysym);
   const bool isUp = event.type == SDL_KEYUP;
+  const bool isModifier = key.number == VK_SHIFT || key.number == VK_CONTROL || key.number == VK_MENU;
+  if (isModifier && !TakeModifier(key.number, isUp)) return;
   const char16_t character = isUp ? DisplayEvents::kByLayout : TakeCharacter(event.keysym);
   if (key.number != 0) {
     m_events.Key(key.number, static_cast<WORD>(event.keysym.scancode & 0xFF), isUp, key.isExtended, character);
