@@ -165,6 +165,34 @@ TEST_F(Hostile, AFrameEndsWhileItsBarsTakeTheirPlaces) {
   EXPECT_EQ(bar.m_hWnd, nullptr);
 }
 
+// A window that moves from one splitter or tab window to another stands in one of them only.
+TEST_F(Hostile, AWindowChangesItsPlace) {
+  Splitter splitters[2];
+  STabWnd tabs[2];
+  test::Window window, other;
+  ASSERT_TRUE(window.Child(m_frame));
+  ASSERT_TRUE(other.Child(m_frame));
+  for (Splitter& splitter : splitters) ASSERT_TRUE(splitter.CreateStatic(m_frame, 1, 2));
+  for (STabWnd& tab : tabs) ASSERT_TRUE(tab.Create(m_frame, nullptr, nullptr));
+  splitters[0].AddPane(0, 0, &window, SSize(50, 0));
+  splitters[0].AddPane(0, 1, &other, SSize(50, 0));
+  EXPECT_EQ(splitters[1].AddPane(0, 0, &window, SSize(70, 0)), &window);
+  EXPECT_FALSE(splitters[0].CanActivateNext());
+  EXPECT_EQ(tabs[0].AddTab(&window, WTEXT("first")), 0);
+  EXPECT_EQ(splitters[1].GetPane(0, 0), nullptr);
+  EXPECT_EQ(tabs[1].AddTab(&window, WTEXT("second")), 0);
+  EXPECT_EQ(tabs[0].GetTabCount(), 0);
+  const SRect place = test::PlaceIn(tabs[1], window.m_hWnd);
+  tabs[0].MoveWindow(SRect(0, 0, 77, 77));
+  splitters[0].RecalcLayout();
+  EXPECT_EQ(test::PlaceIn(tabs[1], window.m_hWnd), place) << "the former places move it no more";
+  EXPECT_EQ(splitters[0].AddPane(0, 0, &window, SSize(50, 0)), &window);
+  EXPECT_EQ(tabs[1].GetTabCount(), 0);
+  EXPECT_TRUE(window.IsWindowVisible());
+  EXPECT_TRUE(splitters[0].CanActivateNext());
+  splitters[0].ExpectWhole();
+}
+
 // --- a drag that is overtaken ---
 
 TEST_F(Hostile, AChangedGeometryEndsADrag) {

@@ -99,6 +99,9 @@ TEST_F(Oleacc, FindsTheBarsOfASplitter) {
   int width = -1;
   splitter.GetColumnInfo(0, &width, nullptr);
   EXPECT_EQ(width, 0);
+  splitter.DestroyWindow();
+  EXPECT_EQ(found.Act(2), CO_E_OBJNOTCONNECTED) << "whoever still holds the object learns that its window went";
+  EXPECT_EQ(found.Role(0), -1);
 }
 
 TEST_F(Oleacc, FindsTheTabsOfABeam) {

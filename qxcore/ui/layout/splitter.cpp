@@ -4,6 +4,7 @@
 
 #include "qxcore/ui/frame/frame.h"
 #include "qxcore/ui/frame/view.h"
+#include "qxcore/ui/layout/internal/adopt.h"
 #include "qxcore/ui/layout/internal/size_box.h"
 #include "qxcore/ui/window/internal/route_up.h"
 #include "qxcore/ui/window/message_entries.h"
@@ -137,8 +138,7 @@ SWnd* SSplitterWnd::AddPane(int row, int column, SWnd* window, SIZE size) {
   if (m_hWnd == nullptr || !IsPlace(row, column) || handle == nullptr) return nullptr;
   if (SWnd* present = GetPane(row, column); present != nullptr && present != window) return nullptr;
   ForgetPane(handle);
-  window->ModifyStyle(WS_POPUP, WS_CHILD);
-  if (::GetParent(handle) != m_hWnd) window->SetParent(this);
+  SAdopt(window, this);
   window->SetDlgCtrlID(static_cast<int>(IdFromRowCol(row, column)));
   window->ShowWindow(SW_SHOWNA);
   return EnterPane(window, size, row, column);

@@ -117,7 +117,7 @@ class QXCORE_API SSplitterWnd : public SWnd {
   // is. The pane that fills the grid lays everything out. A null context is the one of Create. Returns the pane; null
   // for an invalid or occupied place, a class that is no window, and when the window cannot be made.
   SWnd* AddPane(int row, int column, SClassInfo* paneClass, SIZE size, SCreateContext* context = nullptr);
-  // The same with a window that exists. Returns it, or null.
+  // The same with a window that exists; another splitter or tab window gives it up. Returns it, or null.
   SWnd* AddPane(int row, int column, SWnd* window, SIZE size);
 
   // --- panes ---

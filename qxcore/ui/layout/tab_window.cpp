@@ -5,6 +5,7 @@
 #include "qxcore/ui/control/scroll_bar.h"
 #include "qxcore/ui/frame/frame.h"
 #include "qxcore/ui/frame/view.h"
+#include "qxcore/ui/layout/internal/adopt.h"
 #include "qxcore/ui/layout/internal/pane_focus.h"
 #include "qxcore/ui/layout/internal/size_box.h"
 #include "qxcore/ui/layout/internal/state_text.h"
@@ -113,8 +114,7 @@ int STabWnd::InsertTab(int index, SWnd* window, LPCWSTR text) {
     return -1;
   }
   window->ShowWindow(SW_HIDE);
-  window->ModifyStyle(WS_POPUP, WS_CHILD);
-  if (::GetParent(handle) != m_hWnd) window->SetParent(this);
+  SAdopt(window, this);
   window->SetDlgCtrlID(static_cast<int>(GetNextID()));
   return EnterTab(index, window, text);
 }
@@ -216,8 +216,7 @@ void STabWnd::SetNoTabWnd(SWnd* window, int redraw) {
   m_noTabWnd = window;
   if (window->GetSafeHwnd() != nullptr && m_hWnd != nullptr && ::GetParent(window->m_hWnd) != m_hWnd) {
     window->ShowWindow(SW_HIDE);
-    window->ModifyStyle(WS_POPUP, WS_CHILD);
-    window->SetParent(this);
+    SAdopt(window, this);
   }
   if (redraw && m_hWnd != nullptr && m_beam.GetCount() == 0) ShowCurrent(false);
 }

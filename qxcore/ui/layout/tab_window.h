@@ -54,7 +54,8 @@ class QXCORE_API STabWnd : public SWnd {
   // window; null for an invalid index, a class that is no window, and when it cannot be made.
   SWnd* InsertTab(int index, SClassInfo* windowClass, LPCWSTR text, SCreateContext* context = nullptr, UINT id = 0);
   SWnd* AddTab(SClassInfo* windowClass, LPCWSTR text, SCreateContext* context = nullptr, UINT id = 0);
-  // The same with a window that exists and that an object is bound to. Returns its index; -1 on failure.
+  // The same with a window that exists and that an object is bound to; another tab window or splitter gives it up.
+  // Returns its index; -1 on failure.
   int InsertTab(int index, SWnd* window, LPCWSTR text);
   int AddTab(SWnd* window, LPCWSTR text);
   // Removes a tab and destroys its window; if it was shown, the next one is. Returns 0 for an invalid index.
