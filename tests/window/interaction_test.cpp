@@ -111,6 +111,27 @@ TEST(Input, AKeyOfAChildOpensTheMenu) {
     EXPECT_NE(record.Text().find(line), std::string::npos) << line << " in\n" << record.Text();
 }
 
+TEST(Input, TheSystemMenuOffersWhatCanBeDone) {
+  const HWND top = MakeFrame();
+  g_menuOwner = top;
+  for (const bool isLarge : {false, true}) {
+    if (isLarge) ShowWindow(top, SW_MAXIMIZE);
+    {
+      const Steps steps({{WM_INITMENUPOPUP, [] { PostKeys(VK_ESCAPE, VK_ESCAPE); }}});
+      SendMessageW(top, WM_SYSCOMMAND, SC_KEYMENU, ' ');
+      Pump();
+    }
+    const auto isGrey = [top](UINT command) {
+      return (GetMenuState(GetSystemMenu(top, FALSE), command, MF_BYCOMMAND) & (MF_GRAYED | MF_DISABLED)) != 0;
+    };
+    EXPECT_EQ(isGrey(SC_RESTORE), !isLarge);
+    for (const UINT command : {SC_MOVE, SC_SIZE, SC_MAXIMIZE}) EXPECT_EQ(isGrey(command), isLarge) << command;
+    EXPECT_FALSE(isGrey(SC_MINIMIZE));
+    EXPECT_FALSE(isGrey(SC_CLOSE));
+  }
+  DestroyWindow(top);
+}
+
 // A message of the mouse at a point of the screen; the loops of the system read the message's own point.
 void PostMouse(HWND window, UINT message, POINT screen) {
   SetCursorPos(screen.x, screen.y);

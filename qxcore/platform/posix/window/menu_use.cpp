@@ -38,9 +38,24 @@ void UseMenuBarByMouse(HWND window, POINT point) {
   });
 }
 
+// What cannot be done to the window as it is now is grey.
+static void UpdateSystemMenu(HWND window, HMENU menu) {
+  const auto style = static_cast<DWORD>(GetWindowLongW(window, GWL_STYLE));
+  const bool isSmall = style & WS_MINIMIZE, isLarge = style & WS_MAXIMIZE;
+  const auto allow = [menu](UINT command, bool isPossible) {
+    EnableMenuItem(menu, command, isPossible ? MF_ENABLED : MF_GRAYED);
+  };
+  allow(SC_RESTORE, isSmall || isLarge);
+  allow(SC_MOVE, !isLarge);
+  allow(SC_SIZE, (style & WS_THICKFRAME) && !isSmall && !isLarge);
+  allow(SC_MINIMIZE, (style & WS_MINIMIZEBOX) && !isSmall);
+  allow(SC_MAXIMIZE, (style & WS_MAXIMIZEBOX) && !isLarge);
+}
+
 void UseSystemMenu(HWND window) {
   const HMENU menu = GetSystemMenu(window, FALSE);
   if (menu == nullptr) return;
+  UpdateSystemMenu(window, menu);
   OrNoMemory<int>(0, [&] {
     MenuLoop loop(window, menu, 0, false, true);
     if (!loop.Begin()) return 0;

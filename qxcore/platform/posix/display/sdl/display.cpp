@@ -179,9 +179,9 @@ void SdlDisplay::Flush() {
 void SdlDisplay::Close(HWND handle) {
   if (!IsOwnThread()) return;
   const bool wasPopup = Find(handle) != nullptr && Find(handle)->IsPopup();
-  std::erase_if(m_windows, [&](const auto& window) { return window->Handle() == handle; });
   if (m_active == handle) m_active = nullptr;
-  if (wasPopup) GiveKeyboardTo(m_active);
+  if (wasPopup) GiveKeyboardTo(m_active);  // before it goes, or keys in between would reach nobody
+  std::erase_if(m_windows, [&](const auto& window) { return window->Handle() == handle; });
 }
 
 void SdlDisplay::SetCursor(int shape) {
