@@ -80,6 +80,13 @@ class WorkbenchTest(unittest.TestCase):
         self.write_three()
         self.assertEqual(len(self.run_done("drop texts\nprint list\n").splitlines()), 3)
 
+    def test_of_several_dropped_folders_none_is_opened(self):
+        self.write_three()
+        result = self.run_script("open texts\n-drop texts/below texts\nprint list\n")
+        self.assertEqual(result.returncode, 0)
+        self.assertIn("script.txt:2: one folder can be open, and 2 were dropped", result.stderr.decode())
+        self.assertEqual(len(result.stdout.decode().splitlines()), 3)
+
     def test_a_window_that_nobody_sees_is_an_error(self):
         if ON_WINE:
             self.skipTest("there is a screen")

@@ -94,15 +94,20 @@ struct Call {
 
 void Open(const Call& call) { call.frame.OpenFolder(console::NameOf(call.Word(1))); }
 
-// A drop as the system sends it.
+// A drop as the system sends it: the paths, each with its end, and one more end.
 void Drop(const Call& call) {
-  const SString path = console::NameOf(call.Word(1));
-  const std::size_t size = sizeof(DropBlock) + (static_cast<std::size_t>(path.Length()) + 2) * sizeof(WCHAR);
+  std::vector<WCHAR> paths;
+  for (std::size_t at = 1; at == 1 || at < call.words.size(); ++at) {
+    const SString path = console::NameOf(call.Word(at));
+    paths.insert(paths.end(), path.View().begin(), path.View().end());
+    paths.push_back(0);
+  }
+  const std::size_t size = sizeof(DropBlock) + (paths.size() + 1) * sizeof(WCHAR);
   const HGLOBAL block = ::GlobalAlloc(GMEM_MOVEABLE | GMEM_ZEROINIT, size);
   auto* drop = static_cast<DropBlock*>(::GlobalLock(block));
   drop->files = sizeof(DropBlock);
   drop->isWide = 1;
-  std::copy_n(path.View().data(), path.Length(), reinterpret_cast<WCHAR*>(drop + 1));
+  std::copy(paths.begin(), paths.end(), reinterpret_cast<WCHAR*>(drop + 1));
   ::GlobalUnlock(block);
   call.frame.SendMessageW(WM_DROPFILES, reinterpret_cast<WPARAM>(block));
 }
