@@ -171,6 +171,9 @@ class Walk {
     while (platform::IsUtf8Continuation(*lead)) --lead;
     const platform::Utf8Step step = platform::StepUtf8(lead, m_end);
     if (!step.isValid && !step.isCut) {
+      const std::ptrdiff_t strays = at - lead - 1;  // which were counted as continuations
+      m_nonAscii += strays;
+      m_continuations -= strays;
       Reject();
       return at;
     }
