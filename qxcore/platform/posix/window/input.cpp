@@ -10,7 +10,8 @@
 namespace platform::model {
 namespace {
 
-BYTE g_asyncKeys[256];  // 0x80: down now; 0x01: pressed since the last question
+BYTE g_asyncKeys[256];         // 0x80: down now; 0x01: pressed since the last question
+HWND g_pressedOver = nullptr;  // the window below the mouse when a button was pressed that is down still
 
 bool IsMouse(UINT message) { return message >= WM_MOUSEFIRST && message <= WM_MOUSELAST; }
 
@@ -27,10 +28,12 @@ Window* WindowAt(Window* root, POINT point) {
   return nullptr;
 }
 
-// The thread that gets the mouse: whose window has it captured, or lies below it.
+// The thread that gets the mouse: whose window has it captured, or lies below it. Over the bare screen it is the one
+// that has still to handle a press, for it may capture the mouse then, and has to hear of the release.
 Thread* MouseThread(POINT point, Thread* reporter) {
   if (reporter->capture != nullptr && FindWindowObject(reporter->capture) != nullptr) return reporter;
-  Window* window = WindowAt(Desktop(), point);
+  const Window* window = WindowAt(Desktop(), point);
+  if (window == nullptr) window = FindWindowObject(g_pressedOver);
   return window != nullptr ? window->thread : nullptr;
 }
 
@@ -76,6 +79,8 @@ void Enqueue(Thread* thread, const MSG& message, UINT flag, WCHAR typed = 0) {
   Wake(thread);
 }
 
+bool IsButtonDown() { return (g_asyncKeys[VK_LBUTTON] | g_asyncKeys[VK_RBUTTON] | g_asyncKeys[VK_MBUTTON]) & 0x80; }
+
 // The key state as the thread sees it changes when it takes the message.
 void NoteTaken(Thread* thread, const MSG& message) {
   if (IsMouse(message.message)) {
@@ -96,8 +101,11 @@ WORD MouseKeys(const Thread* thread) {
 
 void ReportMouse(UINT message, POINT point, int data) {
   g_cursorPoint = point;
+  const bool isFirst = !IsButtonDown();
   if (const BYTE key = ButtonKey(message)) NoteKey(g_asyncKeys, key, IsButtonUp(message));
+  if (isFirst && IsButtonDown()) g_pressedOver = HandleOf(WindowAt(Desktop(), point));
   Thread* thread = MouseThread(point, CurrentThread());
+  if (!IsButtonDown()) g_pressedOver = nullptr;
   if (thread == nullptr) return;
   // A move replaces one that still waits.
   if (message == WM_MOUSEMOVE && !thread->input.IsEmpty()) {
