@@ -277,6 +277,35 @@ TEST_F(WindowContexts, WhatMovesTogetherKeepsItsPixelsOrIsInvalid) {
     if (HasFatalFailure()) FAIL() << "step " << step;
   }
 }
+
+// The children's places are none of what a window that leaves them out has to paint, however it was
+// invalidated. Wine counts them in.
+TEST_F(WindowContexts, NothingIsLeftToPaintAroundAChild) {
+  RECT client, place;
+  GetClientRect(top, &client);
+  GetWindowRect(child, &place);
+  MapWindowPoints(nullptr, top, reinterpret_cast<POINT*>(&place), 2);
+  const RECT sides[] = {{0, 0, client.right, place.top},
+                        {0, place.top, place.left, place.bottom},
+                        {place.right, place.top, client.right, place.bottom},
+                        {0, place.bottom, client.right, client.bottom}};
+  const auto isDue = [&] {
+    MSG message;
+    const bool waits = PeekMessageW(&message, top, WM_PAINT, WM_PAINT, PM_NOREMOVE);
+    EXPECT_EQ(GetUpdateRect(top, nullptr, FALSE), waits);
+    return waits;
+  };
+  InvalidateRect(top, nullptr, TRUE);
+  for (const RECT& side : sides) {
+    EXPECT_TRUE(isDue());
+    ValidateRect(top, &side);
+  }
+  EXPECT_FALSE(isDue());
+  MoveWindow(child, 0, 0, client.right, client.bottom, FALSE);
+  ValidateRect(top, nullptr);
+  InvalidateRect(top, nullptr, TRUE);
+  EXPECT_FALSE(isDue()) << "the child covers all of it";
+}
 #endif
 
 // Windows of which a part is hidden, or the place that it moves to.

@@ -150,7 +150,7 @@ void Invalidate(Window* window, const Region& region, Erase erase, Children chil
 
 Region UpdateOf(const Window* window) {
   Region update = window->update;
-  if (window->style & WS_CLIPCHILDREN) SubtractChildren(window, &update);
+  if (window->style & WS_CLIPCHILDREN && !update.IsEmpty()) SubtractChildren(window, &update);
   return update;
 }
 
@@ -161,7 +161,8 @@ void Validate(Window* window, const Region* region, Children children) {
   } else {
     window->update.Clear();
   }
-  if (window->update.IsEmpty()) {
+  if (UpdateOf(window).IsEmpty()) {
+    window->update.Clear();
     window->eraseUpdate = window->frameUpdate = false;
     if (!window->internalPaint) SetWantsPaint(window, false);
   }
@@ -262,7 +263,7 @@ bool TakePaint(Thread* thread, MSG* message, const Filter& filter, bool remove) 
       *message = {window->handle, WM_PAINT, 0, 0, static_cast<DWORD>(Now()), g_cursorPoint};
       if (remove && window->internalPaint) {
         window->internalPaint = false;
-        if (window->update.IsEmpty()) SetWantsPaint(window, false);
+        if (UpdateOf(window).IsEmpty()) SetWantsPaint(window, false);
       }
       return true;
     }
@@ -332,7 +333,7 @@ void Change(Window* window, const RECT* rect, HRGN handle, const Region& wanted,
     SetWantsPaint(window, true);
   } else if (flags & RDW_NOINTERNALPAINT) {
     window->internalPaint = false;
-    if (window->update.IsEmpty()) SetWantsPaint(window, false);
+    if (UpdateOf(window).IsEmpty()) SetWantsPaint(window, false);
   }
 }
 

@@ -40,7 +40,7 @@ Due TakeDue(HWND handle) {
   window->update.Intersect(client);
   due.client = UpdateOf(window);
   due.client.Move(-client.left, -client.top);
-  if (window->update.IsEmpty() && !window->internalPaint) SetWantsPaint(window, false);
+  if (due.client.IsEmpty() && !window->internalPaint) SetWantsPaint(window, false);
   return due;
 }
 
