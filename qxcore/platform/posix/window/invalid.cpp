@@ -304,10 +304,11 @@ Children ChildrenOf(UINT flags) {
   return flags & RDW_NOCHILDREN ? Children::No : flags & RDW_ALLCHILDREN ? Children::All : Children::Unclipped;
 }
 
-// Whether all of the client area is asked for, and is invalid as it is: who changes much in a row asks so each time.
-bool AddsNothing(const Window* window, const RECT* rect, HRGN handle, UINT flags) {
-  if (rect != nullptr || handle != nullptr || (flags & ~RDW_ERASE) != RDW_INVALIDATE) return false;
-  if (!window->wantsPaint || ((flags & RDW_ERASE) && !window->eraseUpdate)) return false;
+// Whether all of the client area is invalid as it is: who changes much in a row asks for that each time.
+bool IsInvalidAlready(HWND handle, bool erase) {
+  const Guard guard;
+  const Window* window = FindWindowObject(handle);
+  if (window == nullptr || !window->wantsPaint || (erase && !window->eraseUpdate)) return false;
   if (window->firstChild != nullptr && !(window->style & WS_CLIPCHILDREN)) return false;
   return window->update.Covers(ClientInWindow(window));
 }
@@ -370,7 +371,6 @@ BOOL RedrawWindow(HWND handle, const RECT* rect, HRGN region, UINT flags) {
       const Guard guard;
       Window* window = Expect(handle);
       if (window == nullptr) return FALSE;
-      if (AddsNothing(window, rect, region, flags)) return TRUE;
       Region wanted;
       if (!Wanted(window, rect, region, &wanted)) return FALSE;
       Change(window, rect, region, wanted, flags);
@@ -393,6 +393,7 @@ BOOL InvalidateRect(HWND window, const RECT* rect, BOOL erase) {
     const UINT flags = RDW_INVALIDATE | RDW_ALLCHILDREN | RDW_ERASE | RDW_FRAME | RDW_ERASENOW;
     return RedrawWindow(nullptr, nullptr, nullptr, flags);
   }
+  if (rect == nullptr && IsInvalidAlready(window, erase)) return TRUE;
   return RedrawWindow(window, rect, nullptr, RDW_INVALIDATE | (erase ? RDW_ERASE : 0));
 }
 
