@@ -181,6 +181,13 @@ void XClient::GiveKeyboard(const std::string& title) {
   XSync(m_state->server, False);
 }
 
+bool XClient::HasKeyboardOwner() {
+  ::Window focus = None;
+  int revert = 0;
+  XGetInputFocus(m_state->server, &focus, &revert);
+  return focus != None && focus != PointerRoot && focus != m_state->root;
+}
+
 // --- drag and drop ---
 
 namespace {

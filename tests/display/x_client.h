@@ -40,6 +40,8 @@ class XClient {
   // Takes the keyboard for a window of its own, and gives it back.
   void TakeKeyboard();
   void GiveKeyboard(const std::string& title);
+  // Whether some window has it: while one closes, there may be none for a moment, and keys are lost.
+  bool HasKeyboardOwner();
 
   // --- drag and drop ---
   // Drags files to a point of the screen and drops them there; `uris` has a line for each. Returns true once the window

@@ -10,10 +10,12 @@
 
 #include <X11/Xlib.h>
 
+#include <chrono>
 #include <cstdio>
 #include <iostream>
 #include <sstream>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "tests/display/x_client.h"
@@ -31,6 +33,12 @@ Words WordsOf(const std::string& line) {
 
 POINT PointAt(const Words& words, std::size_t at) {
   return {static_cast<LONG>(std::stol(words.at(at))), static_cast<LONG>(std::stol(words.at(at + 1)))};
+}
+
+// As a person who sees where the keyboard is; after a while without.
+void WaitForKeyboard(test::XClient& client) {
+  for (int tries = 0; tries < 500 && !client.HasKeyboardOwner(); ++tries)
+    std::this_thread::sleep_for(std::chrono::milliseconds(10));
 }
 
 void Press(test::XClient& client, const std::string& chord) {
@@ -70,6 +78,7 @@ std::string Do(test::XClient& client, const Words& words) {
   if (what == "drag") return Drag(client, PointAt(words, 1), PointAt(words, 3)), "done";
   if (what == "close") return client.AskToClose(words.at(1)), "done";
   if (what != "keys") return "unknown: " + what;
+  WaitForKeyboard(client);
   for (std::size_t at = 1; at < words.size(); ++at) Press(client, words[at]);
   return "done";
 }
