@@ -63,9 +63,7 @@ void STabBeam::OnDestroy() {
 
 int STabBeam::InsertTab(int index, LPCWSTR text, SWnd* window, int width) {
   if (index < 0 || index > m_count) return -1;
-  auto tab = std::make_unique<STab>();
-  tab->m_window = window;
-  if (text != nullptr) tab->m_text = text;
+  std::unique_ptr<STab> tab(new STab(window, text));
   if (width >= 0) tab->m_width = width;
   m_tabs.Insert(index, tab.get());
   tab.release();

@@ -16,6 +16,9 @@ class SWnd;
 
 // One tab.
 struct STab {
+  STab() = default;
+  STab(SWnd* window, const WCHAR* text) : m_window(window), m_text(text) {}
+
   SWnd* m_window = nullptr;  // what it stands for; not owned
   SString m_text;            // what is written on it
   int m_hasContent = 1;      // 0: the tab is empty, and is written in the font for empty tabs

@@ -142,8 +142,6 @@ RECT MenuBarRect(const Window* window) {
   return rect;
 }
 
-RECT ClientInWindow(const Window* window) { return Moved(window->client, -window->window.left, -window->window.top); }
-
 RECT VerticalBarRect(const Window* window) {
   if (!(window->style & WS_VSCROLL)) return {};
   const RECT client = ClientInWindow(window);

@@ -14,6 +14,8 @@ RECT MenuBarRect(const Window* window);
 RECT VerticalBarRect(const Window* window);
 RECT HorizontalBarRect(const Window* window);
 // The client area within the window.
-RECT ClientInWindow(const Window* window);
+inline RECT ClientInWindow(const Window* window) {
+  return Moved(window->client, -window->window.left, -window->window.top);
+}
 
 }  // namespace platform::model
