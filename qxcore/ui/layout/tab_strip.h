@@ -17,6 +17,7 @@ class SWnd;
 // One tab.
 struct STab {
   STab() = default;
+  // A tab with content, not yet measured; a null text is an empty one.
   STab(SWnd* window, const WCHAR* text) : m_window(window), m_text(text) {}
 
   SWnd* m_window = nullptr;  // what it stands for; not owned
