@@ -65,6 +65,15 @@ class Screen : public test::UiTest {
     UiTest::TearDown();
   }
 
+  // A menu bar with one menu of two commands.
+  void GiveMenu() {
+    const HMENU bar = ::CreateMenu(), file = ::CreatePopupMenu();
+    ::AppendMenuW(file, MF_STRING, kMenuCommand, WTEXT("&First"));
+    ::AppendMenuW(file, MF_STRING, kMenuCommand + 1, WTEXT("&Second"));
+    ::AppendMenuW(bar, MF_POPUP, reinterpret_cast<UINT_PTR>(file), WTEXT("&File"));
+    ::SetMenu(m_board.m_hWnd, bar);
+  }
+
   POINT OnScreen(int x, int y) const {
     SPoint point(x, y);
     m_board.ClientToScreen(&point);
@@ -208,11 +217,7 @@ TEST_F(Screen, KeysAndCharacters) {
 
 // A menu is a window of its own, which takes no keyboard away.
 TEST_F(Screen, AMenuIsUsedByTheMouse) {
-  const HMENU bar = ::CreateMenu(), file = ::CreatePopupMenu();
-  ::AppendMenuW(file, MF_STRING, kMenuCommand, WTEXT("First"));
-  ::AppendMenuW(file, MF_STRING, kMenuCommand + 1, WTEXT("Second"));
-  ::AppendMenuW(bar, MF_POPUP, reinterpret_cast<UINT_PTR>(file), WTEXT("File"));
-  ::SetMenu(m_board.m_hWnd, bar);
+  GiveMenu();
   ASSERT_TRUE(test::PumpUntil([&] { return IsOnScreen(); }));
   const POINT onBar = OnScreen(12, -8);
   std::thread hand([&] {
@@ -231,11 +236,7 @@ TEST_F(Screen, AMenuIsUsedByTheMouse) {
 
 // As fingers do it: Alt is held while the menu comes up, and is released then.
 TEST_F(Screen, AMenuIsUsedByTheKeyboard) {
-  const HMENU bar = ::CreateMenu(), file = ::CreatePopupMenu();
-  ::AppendMenuW(file, MF_STRING, kMenuCommand, WTEXT("&First"));
-  ::AppendMenuW(file, MF_STRING, kMenuCommand + 1, WTEXT("&Second"));
-  ::AppendMenuW(bar, MF_POPUP, reinterpret_cast<UINT_PTR>(file), WTEXT("&File"));
-  ::SetMenu(m_board.m_hWnd, bar);
+  GiveMenu();
   ASSERT_TRUE(test::PumpUntil([&] { return IsOnScreen(); }));
   std::thread hand([&] {
     m_client.Key("Alt_L", true);
