@@ -41,7 +41,7 @@ class Locked {
   const Drop* m_drop;
 };
 
-// The window that accepts files at a point of the screen; null for none. Behind a modal dialog there is none.
+// The window that accepts files at a point of the screen, or null. A window that a modal dialog disables accepts none.
 HWND AcceptingWindow(HWND top, POINT point) {
   if (!::IsWindowEnabled(top)) return nullptr;
   HWND window = top;

@@ -94,8 +94,9 @@ RECT ClipByParents(const Window* window) {
   return clip;
 }
 
-bool IsClientInvalid(const Window* window) {
-  return window->wantsPaint && window->eraseUpdate && window->update.Covers(ClientInWindow(window));
+bool IsClientInvalid(const Window* window, Erase erase) {
+  const bool isMarked = window->wantsPaint && (erase == Erase::No || window->eraseUpdate);
+  return isMarked && window->update.Covers(ClientInWindow(window));
 }
 
 bool IsUnpainted(const Window* window) {
@@ -308,9 +309,8 @@ Children ChildrenOf(UINT flags) {
 bool IsInvalidAlready(HWND handle, bool erase) {
   const Guard guard;
   const Window* window = FindWindowObject(handle);
-  if (window == nullptr || !window->wantsPaint || (erase && !window->eraseUpdate)) return false;
-  if (window->firstChild != nullptr && !(window->style & WS_CLIPCHILDREN)) return false;
-  return window->update.Covers(ClientInWindow(window));
+  if (window == nullptr || (window->firstChild != nullptr && !(window->style & WS_CLIPCHILDREN))) return false;
+  return IsClientInvalid(window, erase ? Erase::Yes : Erase::No);
 }
 
 void Change(Window* window, const RECT* rect, HRGN handle, const Region& wanted, UINT flags) {

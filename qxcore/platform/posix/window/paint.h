@@ -18,8 +18,8 @@ Region UpdateOf(const Window* window);
 void Validate(Window* window, const Region* region, Children children);
 // Something was taken from what is to be painted of the window.
 void ForgetAllInvalid(Window* window);
-// Whether all of the client area is to be erased and painted.
-bool IsClientInvalid(const Window* window);
+// Whether all of the client area is to be painted, and erased before if asked.
+bool IsClientInvalid(const Window* window, Erase erase);
 // Whether a window without children has nothing on the screen that is worth keeping: all that shows of it is yet to be
 // erased and painted.
 bool IsUnpainted(const Window* window);

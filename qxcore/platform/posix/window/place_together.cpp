@@ -43,7 +43,7 @@ Region Uncovered(const Batch& batch, Window* parent) {
 void UncoverTogether(const Batch& batch) {
   const Guard guard;
   Window* parent = FindWindowObject(batch.parent);
-  if (parent != nullptr && !IsClientInvalid(parent)) UncoverBetween(parent, Uncovered(batch, parent));
+  if (parent != nullptr && !IsClientInvalid(parent, Erase::Yes)) UncoverBetween(parent, Uncovered(batch, parent));
 }
 
 // A context that is open would draw where pixels wait.
@@ -105,7 +105,8 @@ bool CanMoveTogether(Batch* batch) {
     if (parent == nullptr || IsRoot(parent) || !ShowsWhole(parent)) return false;
     if (!AreChildrenApart(parent)) return false;
     batch->parent = parent->handle;
-    batch->before = IsClientInvalid(parent) ? Region(AtOrigin(parent->client)) : AreaOfChildren(parent).covered;
+    batch->before =
+        IsClientInvalid(parent, Erase::Yes) ? Region(AtOrigin(parent->client)) : AreaOfChildren(parent).covered;
     return true;
   });
 }
