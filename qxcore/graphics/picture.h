@@ -13,7 +13,7 @@ QXCORE_API HRESULT SWritePicture(const SString& file, HBITMAP bitmap);
 
 // The same of what a context shows in the area, in its pixels: a window, say, without a copy of all its pixels. A part
 // that is covered or outside is whatever BitBlt makes of it. E_INVALIDARG for a context without a handle or an empty
-// area.
+// area, E_OUTOFMEMORY where the system makes no bitmap as wide as it.
 QXCORE_API HRESULT SWritePicture(const SString& file, const SDC& source, const SRect& area);
 
 // Reads a PNG file into a bitmap as CreatePixels makes it, transparent parts laid over white. Returns 0; the error of
